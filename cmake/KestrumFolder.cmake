@@ -1,0 +1,34 @@
+# One folder of the house: a static library that sees its own headers and those of the folders it
+# names, nothing else.
+#
+#   kestrum_folder(core USES LogGenerator platform SOURCES KestrumModel.cpp)
+#
+# FOLDER gives the include prefix where it differs from the target's name (target
+# platform_propertylist, headers <platform/propertylist/...>).
+find_package(Threads REQUIRED)
+
+function(kestrum_folder name)
+    cmake_parse_arguments(arg "" "FOLDER" "USES;SOURCES;LIBRARIES" ${ARGN})
+    if(NOT arg_FOLDER)
+        set(arg_FOLDER ${name})
+    endif()
+    add_library(${name} STATIC ${arg_SOURCES})
+    # An include root with this folder's own headers alone in it: <core/...> is found only by those
+    # who use core, and <platform/linux/...> not by those who use platform.
+    set(root ${CMAKE_BINARY_DIR}/roots/${name})
+    file(REMOVE_RECURSE ${root})
+    file(MAKE_DIRECTORY ${root}/${arg_FOLDER})
+    file(GLOB headers CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR}/*.h)
+    foreach(header IN LISTS headers)
+        file(CREATE_LINK ${CMAKE_CURRENT_SOURCE_DIR}/${header} ${root}/${arg_FOLDER}/${header} SYMBOLIC)
+    endforeach()
+    target_include_directories(${name} PUBLIC ${root})
+    foreach(lower IN LISTS arg_USES)
+        if(NOT TARGET ${lower})
+            message(FATAL_ERROR "${name} uses ${lower}, which does not stand below it")
+        endif()
+        target_link_libraries(${name} PUBLIC ${lower})
+    endforeach()
+    # Libraries of the adapters stay private: who uses the folder does not see their headers.
+    target_link_libraries(${name} PRIVATE ${arg_LIBRARIES})
+endfunction()
