@@ -1,0 +1,185 @@
+#pragma once
+
+#include "support/Bytes.h"
+#include "support/Date.h"
+
+#include <concepts>
+#include <cstdint>
+#include <functional>
+#include <initializer_list>
+#include <iosfwd>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <variant>
+#include <vector>
+
+namespace kestrum {
+
+class Array;
+class Dictionary;
+
+using ArrayRef = std::shared_ptr<Array>;
+using DictionaryRef = std::shared_ptr<Dictionary>;
+
+/// A node of the display, of a template, of the generator state or of a property list.
+/// Arrays and dictionaries have identity: copies of the Value share the container. All else is a plain value.
+class Value {
+public:
+    enum class Kind { Null, String, Integer, Real, Boolean, Date, Data, Array, Dictionary };
+
+    Value() = default;
+    Value(std::string text) : _held(std::move(text)) {}
+    Value(std::string_view text) : _held(std::string(text)) {}
+    Value(const char* text) : _held(std::string(text)) {}
+    Value(ArrayRef array);           ///< null for a null reference
+    Value(DictionaryRef dictionary); ///< null for a null reference
+    Value(Data data) : _held(std::move(data)) {}
+    Value(Date date) : _held(date) {}
+    Value(std::floating_point auto real) : _held(static_cast<double>(real)) {}
+    Value(std::same_as<bool> auto boolean) : _held(boolean) {} // no conversions: a pointer is no boolean
+
+    /// 64-bit integers, signed and unsigned told apart by what they hold: 2^64-1 is not -1.
+    template <std::integral Number>
+        requires(!std::same_as<Number, bool> && !std::same_as<Number, char>)
+    Value(Number number)
+    {
+        if (std::is_unsigned_v<Number> && static_cast<std::uint64_t>(number) > std::uint64_t{INT64_MAX})
+            _held = static_cast<std::uint64_t>(number);
+        else
+            _held = static_cast<std::int64_t>(number);
+    }
+
+    Kind kind() const;
+    bool isNull() const { return kind() == Kind::Null; }
+    explicit operator bool() const { return !isNull(); }
+
+    /// What the value holds when it is of that kind; else nothing (a null pointer, an empty optional).
+    const std::string* string() const { return std::get_if<std::string>(&_held); }
+    std::optional<std::int64_t> integer() const;          ///< nothing above 2^63-1 too
+    std::optional<std::uint64_t> unsignedInteger() const; ///< nothing below 0
+    std::optional<double> real() const;
+    std::optional<bool> boolean() const;
+    std::optional<Date> date() const;
+    const Data* data() const { return std::get_if<Data>(&_held); }
+    ArrayRef array() const;
+    DictionaryRef dictionary() const;
+
+    /// A 32-bit number: an integer in range, or a real without fraction in range. A boolean is no number.
+    std::optional<std::int32_t> int32() const;
+
+    /// Makes this a string, reusing the storage of the one it holds.
+    void assignText(std::string_view text);
+
+    /// Equal kind and contents, containers compared element by element (dictionaries without regard to order).
+    /// Not for self-referring structures.
+    friend bool operator==(const Value& left, const Value& right);
+
+private:
+    std::variant<std::monostate, std::string, std::int64_t, std::uint64_t, double, bool, Date, Data, ArrayRef,
+                 DictionaryRef>
+        _held;
+};
+
+/// The kind's name as it is put into messages: "string", "integer", ...
+std::string_view nameOf(Value::Kind kind);
+
+/// Values in order.
+class Array {
+public:
+    Array() = default;
+    Array(std::initializer_list<Value> elements) : _elements(elements) {}
+    explicit Array(std::vector<Value> elements) : _elements(std::move(elements)) {}
+
+    std::size_t size() const { return _elements.size(); }
+    bool empty() const { return _elements.empty(); }
+    void clear() { _elements.clear(); }
+    void reserve(std::size_t count) { _elements.reserve(count); }
+    void append(Value element) { _elements.push_back(std::move(element)); }
+    /// `count` is not above `size()`.
+    void removeFirst(std::size_t count)
+    {
+        _elements.erase(_elements.begin(), _elements.begin() + static_cast<std::ptrdiff_t>(count));
+    }
+    const Value& operator[](std::size_t index) const { return _elements[index]; }
+    Value& operator[](std::size_t index) { return _elements[index]; }
+    const Value& back() const { return _elements.back(); }
+
+    auto begin() const { return _elements.begin(); }
+    auto end() const { return _elements.end(); }
+    auto begin() { return _elements.begin(); }
+    auto end() { return _elements.end(); }
+
+private:
+    std::vector<Value> _elements;
+};
+
+/// Values under string keys, in the order in which the keys first came.
+class Dictionary {
+public:
+    struct Entry {
+        std::string key;
+        Value value;
+    };
+
+    Dictionary() = default;
+    Dictionary(std::initializer_list<Entry> entries);
+
+    std::size_t size() const { return _entries.size(); }
+    bool empty() const { return _entries.empty(); }
+
+    /// The value under `key`, null when there is none.
+    const Value* find(std::string_view key) const;
+    Value* find(std::string_view key) { return const_cast<Value*>(std::as_const(*this).find(key)); }
+    /// As `find`, as a value: the null value when there is none.
+    Value at(std::string_view key) const;
+    bool contains(std::string_view key) const { return find(key) != nullptr; }
+
+    /// Replaces the value under `key` in its place, or appends the key.
+    void set(std::string_view key, Value value) { slot(key) = std::move(value); }
+    /// As `set`, without allocating when a text of that length stands there already.
+    void setText(std::string_view key, std::string_view text) { slot(key).assignText(text); }
+    void remove(std::string_view key);
+    void clear();
+
+    auto begin() const { return _entries.begin(); }
+    auto end() const { return _entries.end(); }
+    auto begin() { return _entries.begin(); }
+    auto end() { return _entries.end(); }
+
+private:
+    static constexpr std::size_t kNotThere = static_cast<std::size_t>(-1);
+
+    std::size_t indexOf(std::string_view key) const;
+    Value& slot(std::string_view key);
+    void index(std::size_t entry);
+
+    std::vector<Entry> _entries;
+    // Decoders set their keys in the same order each time, so the entry behind the last one found is tried first.
+    mutable std::size_t _next = 0;
+    // Kept beyond a few dozen keys only: property lists from outside may hold many thousands. Sorted, for keys can be
+    // chosen to collide in any hash.
+    std::map<std::string, std::size_t, std::less<>> _index;
+};
+
+ArrayRef makeArray(std::vector<Value> elements = {});
+DictionaryRef makeDictionary(std::initializer_list<Dictionary::Entry> entries = {});
+
+/// A dictionary of the entries before the first null value: a null ends the list, whatever follows it.
+DictionaryRef makeDictionaryUntilNull(std::initializer_list<Dictionary::Entry> entries);
+
+/// A copy of the top-level container alone; its children are shared. Other values are copied as they are.
+Value shallowCopy(const Value& value);
+/// A copy that shares no container with the original (data bytes are shared: they cannot change).
+/// Not for self-referring structures.
+Value deepCopy(const Value& value);
+
+/// One line: {"key": "text", "list": [1, 2.5, true, <3 bytes>]}. For logs and test messages.
+std::string describe(const Value& value);
+std::ostream& operator<<(std::ostream& out, const Value& value);
+void PrintTo(const Value& value, std::ostream* out);
+
+} // namespace kestrum
