@@ -1,0 +1,73 @@
+#include "platform/ChannelMessage.h"
+
+#include "platform/TelephonyService.h"
+
+namespace kestrum {
+namespace {
+
+constexpr Field kType = u8(0);
+constexpr Field kCode = u16(3);
+constexpr Field kTimeStamp = u32(5), kTimeStampUpper = u32(9);
+
+/// The record that opens a DLF stream tells who wrote it, whatever the modem.
+constexpr LogCode kDlfVersionReport = 0x1FFD;
+
+} // namespace
+
+std::optional<ChannelMessage> ChannelMessage::read(Bytes message)
+{
+    if (message.size() < kHeaderSize)
+        return std::nullopt;
+    const Record record(message.front() == kPrefixMarker ? message.subspan(kPrefixSize) : message);
+    const auto type = static_cast<std::uint8_t>(record.read(kType).value_or(0));
+    const LogCode code = record.read(kCode).value_or(0);
+    return ChannelMessage{record, type, type == kExtraCode ? kExtraCodes + code : code};
+}
+
+std::optional<std::uint64_t> ChannelMessage::timeStamp() const
+{
+    const auto low = record.read(kTimeStamp), high = record.read(kTimeStampUpper);
+    return high ? std::optional(std::uint64_t{*high} << 32 | *low) : std::nullopt;
+}
+
+std::optional<ChannelRecord> channelRecord(Bytes message)
+{
+    const auto read = ChannelMessage::read(message);
+    const auto timeStamp = read && read->isOfKnownType() ? read->timeStamp() : std::nullopt;
+    return timeStamp ? std::optional(ChannelRecord{read->logCode, *timeStamp}) : std::nullopt;
+}
+
+bool isPropertyList(Bytes message)
+{
+    auto text = textOf(message);
+    if (text.starts_with("\xEF\xBB\xBF"))
+        text.remove_prefix(3);
+    const auto begin = text.find_first_not_of(" \t\r\n");
+    return begin != text.npos && (text[begin] == '<' || text.starts_with("bplist"));
+}
+
+std::optional<std::string_view> technologyOf(Bytes message)
+{
+    const auto record = channelRecord(message);
+    if (!record)
+        return isPropertyList(message) ? std::optional(kVoxLogChannelTechnology_IFX) : std::nullopt;
+    if (record->code == kDlfVersionReport)
+        return std::nullopt;
+    // The first hexadecimal digit is the part of the modem that logs.
+    switch (record->code >> 12) {
+    case 0x1:
+        return kVoxLogChannelTechnology_Zephra_CDMA;
+    case 0x4:
+    case 0x5:
+    case 0x7:
+        return kVoxLogChannelTechnology_Zephra_GSM;
+    case 0xB:
+        return kVoxLogChannelTechnology_Zephra_LTE;
+    case 0xD:
+        return kVoxLogChannelTechnology_Zephra_UTRAN2;
+    default:
+        return std::nullopt;
+    }
+}
+
+} // namespace kestrum

@@ -1,0 +1,33 @@
+#pragma once
+
+#include "support/Bytes.h"
+#include "support/Value.h"
+
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace kestrum {
+
+/// Property lists: the serialised form of values that travels to and from the telephony service.
+class PropertyLists {
+public:
+    virtual ~PropertyLists() = default;
+
+    /// Any form (XML or binary), told apart by the bytes. Null for anything that is no property list; nothing that
+    /// the bytes hold can crash, hang or exhaust memory.
+    virtual Value parse(Bytes bytes) const = 0;
+
+    /// The XML form, version 1.0. Nulls are left out, characters that XML forbids become U+FFFD.
+    /// Nothing when the value is null or nested too deeply.
+    virtual std::optional<Data> toXml(const Value& value) const = 0;
+
+    /// The property list in a file; null when it cannot be read or parsed.
+    virtual Value load(const std::string& path) const = 0;
+
+    /// Writes a dictionary in XML form straight to its final path; a missing directory is created. The list is
+    /// serialised in full before the path is opened. False when it cannot be written.
+    virtual bool write(const Dictionary& dictionary, const std::string& path) const = 0;
+};
+
+} // namespace kestrum

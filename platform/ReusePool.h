@@ -1,0 +1,49 @@
+#pragma once
+
+#include "platform/Toolkit.h"
+
+#include <cstddef>
+#include <map>
+#include <memory>
+#include <string_view>
+#include <utility>
+
+namespace kestrum {
+
+/// The cells of a table that may be used again. A row gets back the cell that last showed it, so that a reload of an
+/// unchanged table keeps every row as it was.
+class ReusePool {
+public:
+    /// A row without a cell of its own gets another row's only when more than `kept` of them wait: until then it is
+    /// better served by a new cell of the right kind.
+    explicit ReusePool(std::size_t kept = 256) : _kept(kept) {}
+
+    /// A cell that no longer shows its row.
+    void put(std::size_t row, std::shared_ptr<ReusableCell> cell) { _cells.emplace(row, std::move(cell)); }
+
+    /// Null when there is none with that identifier.
+    std::shared_ptr<ReusableCell> take(std::size_t row, std::string_view reuseIdentifier)
+    {
+        // Rows are asked for from the top, so the cell of the topmost row is the least likely to be wanted back.
+        auto found = _cells.end();
+        for (auto each = _cells.begin(); each != _cells.end(); ++each) {
+            if (each->second->reuseIdentifier() != reuseIdentifier)
+                continue;
+            if (each->first == row) {
+                found = each;
+                break;
+            }
+            if (found == _cells.end() && _cells.size() > _kept)
+                found = each;
+        }
+        return found == _cells.end() ? nullptr : _cells.extract(found).mapped();
+    }
+
+    void clear() { _cells.clear(); }
+
+private:
+    std::size_t _kept;
+    std::multimap<std::size_t, std::shared_ptr<ReusableCell>> _cells;
+};
+
+} // namespace kestrum
