@@ -1,0 +1,101 @@
+#include "platform/propertylist/PropertyListCodec.h"
+
+#include "platform/propertylist/BinaryReader.h"
+#include "platform/propertylist/Limits.h"
+#include "platform/propertylist/XmlReader.h"
+#include "platform/propertylist/XmlWriter.h"
+
+#include <cstdio>
+#include <filesystem>
+#include <memory>
+
+namespace kestrum {
+namespace {
+
+struct CloseFile {
+    void operator()(std::FILE* file) const { std::fclose(file); }
+};
+using File = std::unique_ptr<std::FILE, CloseFile>;
+
+/// The file's bytes; nothing when it cannot be read, or holds more than any property list may.
+std::optional<std::vector<std::byte>> contents(const std::string& path)
+{
+    const File file(std::fopen(path.c_str(), "rb"));
+    if (!file)
+        return std::nullopt;
+    std::vector<std::byte> bytes;
+    std::byte block[1 << 16];
+    while (const std::size_t count = std::fread(block, 1, sizeof block, file.get())) {
+        if (count > PropertyListCodec::kMaxBytes - bytes.size())
+            return std::nullopt;
+        bytes.insert(bytes.end(), block, block + count);
+    }
+    return std::ferror(file.get()) ? std::nullopt : std::optional(std::move(bytes));
+}
+
+/// False also when the disk fills up while the last bytes leave the buffer.
+bool store(const std::string& text, const std::string& path)
+{
+    File file(std::fopen(path.c_str(), "wb"));
+    if (!file)
+        return false;
+    const bool written = std::fwrite(text.data(), 1, text.size(), file.get()) == text.size();
+    return std::fclose(file.release()) == 0 && written;
+}
+
+/// Nothing when the value has no XML form.
+std::optional<std::string> xmlText(const Value& value)
+{
+    if (value.isNull())
+        return std::nullopt;
+    try {
+        return propertylist::writeXml(value);
+    } catch (const propertylist::Refusal&) {
+        return std::nullopt;
+    }
+}
+
+} // namespace
+
+PropertyListCodec::Parsed PropertyListCodec::parseWithError(Bytes bytes) const
+{
+    try {
+        if (bytes.size() > kMaxBytes)
+            throw propertylist::Refusal{"too many bytes"};
+        return {textOf(bytes).starts_with(propertylist::kBinaryMagic) ? propertylist::readBinary(bytes)
+                                                                      : propertylist::readXml(bytes)};
+    } catch (propertylist::Refusal& refusal) {
+        return {Value(), std::move(refusal.reason), refusal.offset};
+    }
+}
+
+Value PropertyListCodec::parse(Bytes bytes) const
+{
+    return parseWithError(bytes).value;
+}
+
+std::optional<Data> PropertyListCodec::toXml(const Value& value) const
+{
+    const auto text = xmlText(value);
+    return text ? std::optional(Data(bytesOf(*text))) : std::nullopt;
+}
+
+Value PropertyListCodec::load(const std::string& path) const
+{
+    const auto bytes = contents(path);
+    return bytes ? parse(*bytes) : Value();
+}
+
+bool PropertyListCodec::write(const Dictionary& dictionary, const std::string& path) const
+{
+    const auto text = xmlText(std::make_shared<Dictionary>(dictionary));
+    if (!text)
+        return false;
+    if (const auto directory = std::filesystem::path(path).parent_path(); !directory.empty()) {
+        std::error_code ignored; // a directory that is missing still shows when the file is opened
+        std::filesystem::create_directories(directory, ignored);
+    }
+    return store(*text, path);
+}
+
+} // namespace kestrum
