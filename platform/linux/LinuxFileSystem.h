@@ -1,0 +1,21 @@
+#pragma once
+
+#include "platform/FileSystem.h"
+
+namespace kestrum {
+
+/// The device's files under a device root: "/" unless KESTRUM_DEVICE_ROOT names another folder.
+class LinuxFileSystem final : public FileSystem {
+public:
+    LinuxFileSystem();
+
+    bool exists(std::string_view path) const override;
+
+    /// $XDG_STATE_HOME/kestrum/DiagnosticLogs on a desktop, <device root>/var/log/diagnostics under a root of its own.
+    std::string diagnosticLogDirectory() const override;
+
+private:
+    std::string _root; // without a "/" at its end: empty is the system's
+};
+
+} // namespace kestrum

@@ -1,0 +1,38 @@
+#pragma once
+
+#include "platform/TelephonyService.h"
+#include "support/Bytes.h"
+
+#include <chrono>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+/// What a display and the telephony service say to each other beside the log channel; docs/protocol.md has the bytes.
+namespace kestrum::vox {
+
+/// The port at which the service takes server connections.
+inline constexpr std::string_view kServerPort = "org.kestrum.vox";
+
+// Message ids on a server connection.
+inline constexpr std::int32_t kCreateLogChannel = 1; ///< request: the address of the receiving port, as text
+inline constexpr std::int32_t kNotification = 2;     ///< message of the service: the notification's name, as text
+
+// Error domains of an answer; 0 is success.
+inline constexpr std::int32_t kServiceErrors = 1; ///< codes below
+inline constexpr std::int32_t kSystemErrors = 2;  ///< codes are errno's
+// Codes of kServiceErrors.
+inline constexpr std::int32_t kBadRequest = 1;
+inline constexpr std::int32_t kTooManyChannels = 2;
+inline constexpr std::int32_t kNoReceiver = 3; ///< nobody listens at the address given
+
+/// The address of a process's receive port of this name. Two displays of a user have the same port name.
+std::string addressOfPort(std::string_view name, int process);
+
+/// The answer's payload: error domain, error code (32-bit little-endian each), the remote port's name.
+std::vector<std::byte> encode(const LogChannelAnswer& answer);
+std::optional<LogChannelAnswer> decodeAnswer(Bytes payload);
+
+} // namespace kestrum::vox
