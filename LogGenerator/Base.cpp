@@ -1,0 +1,132 @@
+#include "LogGenerator/Base.h"
+
+#include "LogGenerator/ArrayLock.h"
+#include "platform/RecordWatch.h"
+
+#include <algorithm>
+#include <iterator>
+
+namespace kestrum {
+
+std::vector<LogCode> codesOf(std::span<const Layout> layouts, std::initializer_list<LogCode> others)
+{
+    std::vector<LogCode> codes;
+    codes.reserve(layouts.size() + others.size());
+    std::ranges::transform(layouts, std::back_inserter(codes), &Layout::code);
+    codes.insert(codes.end(), others);
+    return codes;
+}
+
+void Base::initWithDict(ClassDictionary& classDict, CodeDictionary& codeDict)
+{
+    classDict[std::string(getSectionName())] = this;
+    updateLogCodeDict(codeDict);
+}
+
+void Base::updateSectionRef(const Value& node)
+{
+    sectionRef = SectionRef(node);
+    roles.log.write(Priority::Warning, getSectionName());
+}
+
+void Base::updateLogCodeDict(CodeDictionary& codeDict)
+{
+    const auto codes = getLogCodeArray();
+    roles.log.write(Priority::Warning, format("Array Count: %d", static_cast<int>(codes.size())));
+    for (const LogCode code : codes)
+        codeDict[format("%u", code)].push_back(this);
+}
+
+void Base::clearElementsInArray(const SectionRef& array)
+{
+    if (const auto node = array.array()) {
+        const ArrayLocked locked;
+        node->clear();
+    }
+}
+
+void Base::replaceArray(const SectionRef& array, std::vector<Value> With)
+{
+    if (const auto node = array.array()) {
+        const ArrayLocked locked;
+        *node = Array(std::move(With));
+    }
+}
+
+std::int16_t Base::lookUpECNO(std::uint32_t linear)
+{
+    // The least ratio of each step is one above the number given here: -1 dB from 417648, -2 dB from 331809, ...
+    constexpr std::uint32_t kAbove[] = {417647, 331808, 263624, 209463, 166441, 132268, 105123, 83562,
+                                        66435,  52830,  42023,  33440,  26621,  21205,  16903,  13486,
+                                        10771,  8615,   6902,   5542,   4461,   3603,   2921,   2240,
+                                        1949,   1607,   1336,   1120,   949,    813,    705};
+    if (linear >= 524288)
+        return 0;
+    const auto* step = std::ranges::find_if(kAbove, [linear](std::uint32_t above) { return linear > above; });
+    // Below the scale 0 stands for "no energy": it is shown like full scale, on purpose.
+    return step == std::end(kAbove) ? std::int16_t{0} : static_cast<std::int16_t>(-1 - (step - std::begin(kAbove)));
+}
+
+void Base::logEntry() const
+{
+    roles.log.write(entryPriority(), entryLine());
+}
+
+void Base::logError(std::string_view text) const
+{
+    roles.log.write(Priority::Error, text);
+}
+
+void Base::reportUnknown(LogCode logCode) const
+{
+    logError(format("Received an unknown log message: %d", static_cast<std::int32_t>(logCode)));
+}
+
+bool Base::accepts(Record data, LogCode logCode, LogCode expected, std::size_t minimumLength, Foreign foreign) const
+{
+    logEntry();
+    if (logCode == expected)
+        return holds(data, minimumLength);
+    if (foreign == Foreign::Reported)
+        reportUnknown(logCode);
+    return false;
+}
+
+bool Base::holds(Record data, std::size_t minimumLength) const
+{
+    if (data.size() >= minimumLength)
+        return true;
+    if (roles.watch != nullptr)
+        roles.watch->tooShort();
+    return false;
+}
+
+bool Base::publish(Record data, LogCode logCode, std::span<const Layout> layouts) const
+{
+    const auto layout = std::ranges::find(layouts, logCode, &Layout::code);
+    if (layout == layouts.end())
+        return false;
+    if (holds(data, layout->minimumLength))
+        publish(data, layout->rows);
+    return true;
+}
+
+void Base::publish(Record data, std::span<const Row> rows) const
+{
+    if (const auto node = sectionRef.dictionary())
+        show(data, rows, *node);
+}
+
+void Base::publish(std::string_view key, std::string_view text) const
+{
+    if (const auto node = sectionRef.dictionary())
+        node->setText(key, text);
+}
+
+void Base::publish(std::string_view key, Value value) const
+{
+    if (const auto node = sectionRef.dictionary())
+        node->set(key, std::move(value));
+}
+
+} // namespace kestrum

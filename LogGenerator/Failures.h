@@ -1,0 +1,33 @@
+#pragma once
+
+#include <exception>
+#include <stdexcept>
+#include <string>
+#include <utility>
+
+namespace kestrum {
+
+/// An element was asked for that its record does not count.
+class ArrayOutOfBoundsException : public std::exception {
+public:
+    const char* what() const noexcept override { return "ArrayOutOfBoundsException"; }
+};
+
+/// An internal inconsistency: where it was found, and what it is. `what()` tells it all.
+class AssertionFailure : public std::runtime_error {
+public:
+    /// `object` is the one, or the class, whose operation found it. An empty `file` is reported as "<Unknown File>".
+    AssertionFailure(const std::string& operation, const std::string& object, const std::string& file, int line,
+                     std::string description);
+
+    const std::string& file() const { return _file; }
+    int line() const { return _line; }
+    const std::string& description() const { return _description; }
+
+private:
+    std::string _file;
+    int _line;
+    std::string _description;
+};
+
+} // namespace kestrum

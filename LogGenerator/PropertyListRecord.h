@@ -1,0 +1,45 @@
+#pragma once
+
+#include "platform/Roles.h"
+#include "support/Record.h"
+#include "support/Value.h"
+
+#include <optional>
+#include <string_view>
+
+namespace kestrum {
+
+/// The property list behind an extra-code record's header; null when it is none.
+Value propertyListIn(Record record, DecodingRoles& roles);
+
+/// The telephony service's cell-monitor record: an array of cell dictionaries. Logs "Cell Info Array data could not
+/// be constructed" when the record holds no such array.
+class CellInfoArray {
+public:
+    CellInfoArray(Record record, DecodingRoles& roles);
+
+    /// The cells; null when the holder holds nothing.
+    const ArrayRef& cells() const { return _cells; }
+
+private:
+    ArrayRef _cells;
+};
+
+/// Whether the dictionary of a cell says that it is of that technology and type. Anything but a dictionary is not.
+bool isCell(const Value& cell, std::string_view technology, std::string_view type);
+
+/// A number of a cell as 32 bits; nothing when it is absent or does not convert.
+std::optional<std::int32_t> cellNumber(const Value& cell, std::string_view key);
+
+/// The telephony service's PDP-context record: an array of rows. Holds nothing, and logs nothing, when it is none.
+class PDPContextArray {
+public:
+    PDPContextArray(Record record, DecodingRoles& roles) : _contexts(propertyListIn(record, roles).array()) {}
+
+    const ArrayRef& contexts() const { return _contexts; }
+
+private:
+    ArrayRef _contexts;
+};
+
+} // namespace kestrum

@@ -1,0 +1,132 @@
+#pragma once
+
+#include "support/Format.h"
+#include "support/Record.h"
+#include "support/Value.h"
+
+#include <algorithm>
+#include <concepts>
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kestrum {
+
+/// How a raw field becomes text: formatted, or looked up in a table of names.
+class Conversion {
+public:
+    using Formatted = std::string (*)(std::uint32_t raw);
+    using Named = std::string_view (*)(std::uint32_t raw);
+
+    constexpr Conversion(Formatted formatted) : _formatted(formatted) {}
+    constexpr Conversion(Named named) : _named(named) {}
+
+    /// Hands the text to `use`; nothing is allocated for a name or a text of up to 15 bytes.
+    template <typename Use>
+    void apply(std::uint32_t raw, Use use) const
+    {
+        if (_named != nullptr)
+            use(_named(raw));
+        else
+            use(std::string_view(_formatted(raw)));
+    }
+
+private:
+    Formatted _formatted = nullptr;
+    Named _named = nullptr;
+};
+
+/// One line of a record's layout: where the field stands, the key it is shown under, how it is worded.
+struct Row {
+    Field field;
+    std::string_view key;
+    Conversion conversion;
+};
+
+/// Where the last field of a layout ends.
+constexpr std::size_t reach(std::span<const Row> rows)
+{
+    std::size_t end = 0;
+    for (const auto& row : rows)
+        end = std::max(end, row.field.end());
+    return end;
+}
+
+/// Sets the key of each row whose field lies inside the record; the other keys keep their values.
+void show(Record record, std::span<const Row> rows, Dictionary& into);
+
+/// A new dictionary with a key for each row.
+DictionaryRef shown(Record record, std::span<const Row> rows);
+
+/// Elements that follow one another inside a record. Where they overlap or leave gaps, `length`, the bytes that an
+/// element's fields take, differs from `stride`.
+struct Elements {
+    std::size_t first;
+    std::size_t stride;
+    std::size_t length;
+
+    constexpr Elements(std::size_t from, std::size_t size) : Elements(from, size, size) {}
+    constexpr Elements(std::size_t from, std::size_t step, std::size_t size) : first(from), stride(step), length(size)
+    {}
+};
+
+/// The element of that index; nothing unless all of its bytes lie inside the record.
+inline std::optional<Record> elementOf(Record record, Elements elements, std::size_t index)
+{
+    return record.slice(elements.first + elements.stride * index, elements.length);
+}
+
+/// What `show` makes of each element, up to the first that does not lie inside the record: a count may promise more
+/// than there is. Elements of which it makes null are left out.
+template <std::invocable<Record> Show>
+std::vector<Value> listed(Record record, Elements elements, std::size_t count, Show showElement)
+{
+    std::vector<Value> found;
+    found.reserve(std::min(count, record.size() / elements.stride));
+    for (std::size_t i = 0; i < count; ++i) {
+        const auto element = elementOf(record, elements, i);
+        if (!element)
+            break;
+        if (Value value = showElement(*element))
+            found.push_back(std::move(value));
+    }
+    return found;
+}
+
+inline std::vector<Value> listed(Record record, Elements elements, std::size_t count, std::span<const Row> rows)
+{
+    return listed(record, elements, count, [rows](Record element) { return Value(shown(element, rows)); });
+}
+
+/// The text at `value` in a table of names that begins at 0; "Unknown" beyond its end.
+template <std::size_t Count>
+constexpr std::string_view nameIn(const std::string_view (&names)[Count], std::uint32_t value)
+{
+    return value < Count ? names[value] : std::string_view("Unknown");
+}
+
+/// The decimal text of a word, printed as signed 32 bits ("%d").
+inline std::string decimal(std::uint32_t raw)
+{
+    return std::to_string(static_cast<std::int32_t>(raw));
+}
+/// The decimal text of a signed byte or 16-bit word.
+inline std::string decimalSigned8(std::uint32_t raw)
+{
+    return std::to_string(static_cast<std::int8_t>(raw));
+}
+inline std::string decimalSigned16(std::uint32_t raw)
+{
+    return std::to_string(static_cast<std::int16_t>(raw));
+}
+/// The decimal text of an unsigned word ("%u").
+inline std::string decimalUnsigned(std::uint32_t raw)
+{
+    return std::to_string(raw);
+}
+
+} // namespace kestrum

@@ -1,0 +1,75 @@
+#include "LogGenerator/ZPHLogGenerator.h"
+
+#include "LogGenerator/DlfVersionReport.h"
+#include "platform/Bundle.h"
+#include "platform/SystemLog.h"
+#include "platform/Time.h"
+#include "support/Format.h"
+
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+/// When this file was compiled: "Aug  1 2017 22:02:27".
+constexpr std::string_view kBuildText = __DATE__ " " __TIME__;
+
+std::uint64_t packedTime(Date now, Clock::Zone zone)
+{
+    const auto seconds = std::chrono::floor<std::chrono::seconds>(now).time_since_epoch().count();
+    const auto minutes = static_cast<std::int16_t>(zone.offset / std::chrono::minutes(1));
+    return packDlfTime(static_cast<std::uint32_t>(seconds), minutes, zone.daylightSaving);
+}
+
+} // namespace
+
+void ZPHLogGenerator::moveBinDataToState(State& state)
+{
+    state.set("DisplayState", Data(std::exchange(binData, {})));
+}
+
+std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) const
+{
+    std::vector<std::byte> stream(kDlfVersionReportSize);
+    const auto versionText = format("Kestrum %@", _roles.bundle.version().value_or("(none)"));
+    const Date now = _roles.clock.now();
+    std::uint32_t written = 0;
+    const int result =
+        QrelDLFAddVersionReport(stream.data(), static_cast<std::uint32_t>(stream.size()), written, 1, 1, versionText,
+                                "EXECUTABLE_NAME", kBuildText, packedTime(now, _roles.clock.zoneAt(now)));
+    if (result != 0) {
+        _roles.log.write(Priority::Raw16, format("Could not write DLF header (result=%d)", result));
+        return std::nullopt;
+    }
+    if (const auto history = state.at("History").array()) {
+        for (const auto& entry : *history) {
+            const auto dictionary = entry.dictionary();
+            const Value recorded = dictionary ? dictionary->at("DisplayState") : Value();
+            if (recorded.isNull())
+                continue;
+            if (recorded.data() == nullptr) {
+                _roles.log.write(Priority::Raw16,
+                                 "Got wrong class writing history to DLF; aborting writing the DLF file");
+                return std::nullopt;
+            }
+            // Without the first record's type byte, so that the stream goes on with a record's length; the further
+            // type bytes stay.
+            const Bytes raw = recorded.data()->bytes();
+            if (raw.size() >= 2)
+                stream.insert(stream.end(), raw.begin() + 1, raw.end());
+        }
+    }
+    return Data(std::move(stream));
+}
+
+ArrayRef ZPHLogGenerator::getSaveContentsFromState(const State& state) const
+{
+    const auto history = state.at("History").array();
+    auto contents = history ? std::make_shared<Array>(*history) : makeArray();
+    if (const auto dlf = generateDlfFromState(state))
+        contents->append(makeDictionary(
+            {{"Description", format("DLF binary (%d bytes)", static_cast<int>(dlf->size()))}, {"DLF", *dlf}}));
+    return contents;
+}
+
+} // namespace kestrum
