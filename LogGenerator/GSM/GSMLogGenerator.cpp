@@ -1,0 +1,93 @@
+#include "LogGenerator/GSM/GSMLogGenerator.h"
+
+#include "LogGenerator/Failures.h"
+#include "platform/PropertyLists.h"
+#include "platform/SystemLog.h"
+#include "platform/TelephonyService.h"
+#include "support/Format.h"
+
+namespace kestrum {
+namespace {
+
+// Reported with a failed assertion: the lines are part of the message's text, whatever this file looks like.
+constexpr const char* kSourceFile = "LogGenerator/GSM/GSMLogGenerator";
+constexpr int kUnknownObjectLine = 78;
+constexpr int kNoObjectLine = 90;
+
+Value collapsed(const Value& object)
+{
+    const Value only = GSMLogGenerator::canCollapse(object);
+    return only ? only : object;
+}
+
+} // namespace
+
+std::unique_ptr<GSMLogGenerator> GSMLogGenerator::generator(DecodingRoles& roles)
+{
+    return std::unique_ptr<GSMLogGenerator>(new GSMLogGenerator(roles));
+}
+
+std::string_view GSMLogGenerator::technology() const
+{
+    return kVoxLogChannelTechnology_IFX;
+}
+
+void GSMLogGenerator::updateState(State& state, Bytes withData)
+{
+    const Value received = _roles.propertyLists.parse(withData);
+    if (received.isNull())
+        throw AssertionFailure("updateState:withData:", format("<GSMLogGenerator: %p>", _roles.log.shownAddress(this)),
+                               kSourceFile, kNoObjectLine, "Could not deserialize the object");
+    const Value processed = processObject(received);
+    dropForeignDisplay(state);
+    state.set("DisplayState", received);
+    setDisplay(state, processed);
+    state.set("ExtraInfo", makeDictionary());
+}
+
+Value GSMLogGenerator::processObject(const Value& object)
+{
+    if (object.string() != nullptr)
+        return object;
+    if (const auto dictionary = object.dictionary()) {
+        auto processed = makeDictionary();
+        for (const auto& [key, value] : *dictionary)
+            processed->set(key, collapsed(processObject(value)));
+        return processed;
+    }
+    if (const auto array = object.array()) {
+        auto processed = makeArray();
+        // The first element is always left out, on purpose.
+        for (std::size_t i = 1; i < array->size(); ++i)
+            processed->append(collapsed(processObject((*array)[i])));
+        return processed;
+    }
+    throw AssertionFailure("processObject:", "GSMLogGenerator", kSourceFile, kUnknownObjectLine,
+                           format("Unknown object of type %@ encountered", nameOf(object.kind())));
+}
+
+Value GSMLogGenerator::canCollapse(const Value& object)
+{
+    const auto dictionary = object.dictionary();
+    return dictionary && dictionary->size() == 1 ? dictionary->begin()->value : Value();
+}
+
+Value GSMLogGenerator::generateLogUsingState(State& state)
+{
+    dropForeignDisplay(state);
+    updateHistoryInState(state);
+    return state.at("Display");
+}
+
+DictionaryRef GSMLogGenerator::getStartCommand() const
+{
+    return makeDictionary({{"SetState", "Streaming"}});
+}
+
+ArrayRef GSMLogGenerator::getSaveContentsFromState(const State& state) const
+{
+    const auto history = state.at("History").array();
+    return history ? std::make_shared<Array>(*history) : makeArray();
+}
+
+} // namespace kestrum
