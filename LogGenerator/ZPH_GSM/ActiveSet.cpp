@@ -1,0 +1,73 @@
+#include "LogGenerator/ZPH_GSM/ActiveSet.h"
+
+#include "LogGenerator/ZPH_GSM/SearcherCells.h"
+
+namespace kestrum {
+namespace {
+
+// In a cell.
+constexpr Field kScramblingCode = u16(7).bits(0, 12);
+constexpr Field kSetMembership = u16(7).bits(13, 15);
+constexpr std::uint32_t kActive = 0;
+
+// In a measurement: linear Ec/Io, full scale 2^19.
+constexpr Field kEnergies[] = {u32(32), u32(36), u32(40)};
+
+/// The first that is not zero; zero when all are.
+std::uint32_t energyOf(Record measurement)
+{
+    for (const Field field : kEnergies)
+        if (const auto energy = measurement.read(field); energy.value_or(0) != 0)
+            return *energy;
+    return 0;
+}
+
+/// Received power in whole dBm, of a raw AGC value in tenths of a dB above -106 dBm, less 512.
+int receivedPower(std::int16_t agc)
+{
+    return (agc + 512) / 10 - 106; // truncated toward zero
+}
+
+Value rowOf(Record cell, Record measurement, int power)
+{
+    const int energyPerChip = Base::lookUpECNO(energyOf(measurement));
+    return makeDictionary({
+        {"Scrambling Code", decimal(cell.read(kScramblingCode).value_or(0))},
+        {"RSCP", format("%d dB", power + energyPerChip)}, // "dB", though it is in dBm: kept on purpose
+        {"Energy Per Chip", format("%d dB", energyPerChip)},
+    });
+}
+
+} // namespace
+
+std::string_view ActiveSet::getSectionName() const
+{
+    return "Active Set";
+}
+
+std::vector<LogCode> ActiveSet::getLogCodeArray() const
+{
+    return {searcher::kCode};
+}
+
+void ActiveSet::updateWithData(Record data, LogCode logCode)
+{
+    if (!accepts(data, logCode, searcher::kCode, searcher::kMinimumLength))
+        return;
+    const int power = receivedPower(static_cast<std::int16_t>(data.read(searcher::kReceiveAgc).value_or(0)));
+    const std::size_t count = data.read(searcher::kCount).value_or(0);
+    const Elements measurements{searcher::kCells.first + searcher::kCells.stride * count, searcher::kMeasurementSize};
+
+    std::vector<Value> rows;
+    for (std::size_t i = 0; i < count; ++i) {
+        const auto cell = elementOf(data, searcher::kCells, i);
+        const auto measurement = elementOf(data, measurements, i);
+        if (!cell || !measurement)
+            break;
+        if (cell->read(kSetMembership) == kActive)
+            rows.push_back(rowOf(*cell, *measurement, power));
+    }
+    replaceArray(sectionRef, std::move(rows));
+}
+
+} // namespace kestrum

@@ -1,0 +1,62 @@
+#include "LogGenerator/ZPH_GSM/HSDPAInformation.h"
+
+namespace kestrum {
+namespace {
+
+constexpr LogCode kCode = 0x4221;
+constexpr std::size_t kMinimumLength = 18;
+
+std::string_view carrier(std::uint32_t raw)
+{
+    static constexpr std::string_view kNames[] = {"Single Carrier", "MIMO", "Dual Carrier", "Reserved"};
+    return nameIn(kNames, raw);
+}
+
+// clang-format off
+constexpr Row kChannel[] = {
+    {u8(13),              "Version",      decimalUnsigned},
+    {u16(14).bits(0, 9),  "Sub Frames",   decimalUnsigned},
+    {u8(15).bits(2, 3),   "Carrier Info", carrier},
+};
+constexpr Row kProcess[] = {
+    {u8(0),               "Process ID",   decimalUnsigned},
+    {u32(1),              "No Rx Bits",   decimalUnsigned},
+    {u16(5),              "New Tx",       decimalUnsigned},
+    {u16(7),              "Block Errors", decimalUnsigned},
+};
+// clang-format on
+
+constexpr Field kPrimaryCount = u8(16), kSecondaryCount = u8(17);
+constexpr Elements kPrimary{18, 9};
+// The secondary processes lie 162 bytes further for each primary one, though that takes 9: on purpose.
+constexpr std::size_t kRoomForPrimary = 162;
+
+static_assert(reach(kChannel) <= kMinimumLength && reach(kProcess) == kPrimary.length);
+
+} // namespace
+
+std::string_view HSDPAInformation::getSectionName() const
+{
+    return "HSDPA Info";
+}
+
+std::vector<LogCode> HSDPAInformation::getLogCodeArray() const
+{
+    return {kCode};
+}
+
+void HSDPAInformation::updateWithData(Record data, LogCode logCode)
+{
+    if (!accepts(data, logCode, kCode, kMinimumLength, Foreign::Ignored))
+        return;
+    publish(data, kChannel);
+    const std::size_t primary = data.read(kPrimaryCount).value_or(0);
+    const std::size_t secondary = data.read(kSecondaryCount).value_or(0);
+    const Elements behind{kPrimary.first + kRoomForPrimary * primary, kPrimary.stride};
+    if (primary != 0)
+        publish("Primary HARQ Process", makeArray(listed(data, kPrimary, primary, kProcess)));
+    if (secondary != 0)
+        publish("Secondary HARQ Process", makeArray(listed(data, behind, secondary, kProcess)));
+}
+
+} // namespace kestrum

@@ -1,0 +1,18 @@
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace kestrum {
+
+/// Network, location area and service: log codes 0x7132 and 0x7135, and the telephony service's cell monitor.
+/// The network's codes are three characters from a record and plain numbers from the cell monitor.
+class ServingPLMN final : public Base {
+public:
+    using Base::Base;
+
+    std::string_view getSectionName() const override;
+    std::vector<LogCode> getLogCodeArray() const override;
+    void updateWithData(Record data, LogCode logCode) override;
+};
+
+} // namespace kestrum

@@ -1,0 +1,43 @@
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+#include <exception>
+
+namespace kestrum {
+
+/// The telephony service's SIM record: a dictionary of elementary files.
+class LogCode_0xFF0000 {
+public:
+    /// The record holds no such dictionary.
+    class UnknownDataException : public std::exception {
+    public:
+        const char* what() const noexcept override { return "LogCode_0xFF0000::UnknownDataException"; }
+    };
+
+    /// Throws UnknownDataException, once it has logged "SIM File dictionary data could not be constructed".
+    LogCode_0xFF0000(Record record, DecodingRoles& roles);
+
+    /// Never null.
+    const DictionaryRef& files() const { return _files; }
+
+private:
+    DictionaryRef _files;
+};
+
+/// Elementary files of the SIM (3GPP TS 31.102), each as the telephony service sends it, whatever its type. Other
+/// technologies show the same section.
+class SimInfo final : public Base {
+public:
+    using Base::Base;
+
+    std::string_view getSectionName() const override;
+    std::vector<LogCode> getLogCodeArray() const override;
+    /// LogCode_0xFF0000::UnknownDataException leaves it.
+    void updateWithData(Record data, LogCode logCode) override;
+
+protected:
+    std::string_view entryLine() const override { return "SimInfo"; }
+};
+
+} // namespace kestrum
