@@ -1,0 +1,18 @@
+#pragma once
+
+#include "LogGenerator/Base.h"
+
+namespace kestrum {
+
+/// The serving cell in an intra-frequency measurement of connected mode: log code 0xB179. RSRP and RSRQ are the layer 3
+/// filtered ones of 3GPP TS 36.331.
+class ConnectedModeMeasurementMisc final : public Base {
+public:
+    using Base::Base;
+
+    std::string_view getSectionName() const override;
+    std::vector<LogCode> getLogCodeArray() const override;
+    void updateWithData(Record data, LogCode logCode) override;
+};
+
+} // namespace kestrum

@@ -1,0 +1,88 @@
+#include "LogGenerator/LTE/NeighborCellsList.h"
+
+#include "LogGenerator/LTE/Conversions.h"
+
+namespace kestrum {
+namespace {
+
+constexpr std::size_t kMinimumLength = 21;
+
+constexpr Field kCountLessOne = u16(19).bits(6, 10);
+
+constexpr Field kPhysicalCellId = u32(0).bits(0, 8);
+constexpr Field kMeasuredRssi = u32(0).bits(9, 16);
+constexpr Field kMeasuredRsrp = u32(0).bits(17, 25);
+constexpr Field kAverageRsrp = u16(4).bits(0, 8);
+constexpr Field kMeasuredRsrq = u16(4).bits(9, 15);
+constexpr Field kAverageRsrq = u16(6).bits(0, 6);
+constexpr Field kFrameOffset = u32(12).bits(0, 10);
+constexpr Field kSampleOffset = u32(12).bits(11, 29);
+
+// RSRP has steps of half a dB here, twice those of the serving cell's records, on purpose.
+// clang-format off
+constexpr Row kCell[] = {
+    {kPhysicalCellId,    "Physical Cell ID",    decimal},
+    {kMeasuredRssi,      "Measured RSSI",       inDbm<powerHalfDb>},
+    {kMeasuredRsrp,      "Measured RSRP",       inDbm<powerHalfDb>},
+    {kAverageRsrp,       "Average RSRP",        inDbm<powerHalfDb>},
+    {kMeasuredRsrq,      "Measured RSRQ",       inDb<rsrqQuarterDb>},
+    {kAverageRsrq,       "Average RSRQ",        inDb<rsrqQuarterDb>},
+    {u16(6).bits(7, 13), "Srxlev",              inWholeDbm<srxlev>},
+    {u16(8),             "Frequency Offset",    decimal},
+    {kFrameOffset,       "Ant 0 Frame Offset",  decimal},
+    {kSampleOffset,      "Ant 0 Sample Offset", decimal},
+    // Antenna 1 shows the very bits of antenna 0, on purpose: what stands behind them is not read.
+    {kFrameOffset,       "Ant 1 Frame Offset",  decimal},
+    {kSampleOffset,      "Ant 1 Sample Offset", decimal},
+};
+// clang-format on
+
+constexpr Elements kCells{21, 20, 16};
+static_assert(reach(kCell) == kCells.length);
+
+/// The real-valued fields as they are logged.
+constexpr struct {
+    Field field;
+    double (*quantity)(std::uint32_t raw);
+} kLogged[] = {
+    {kMeasuredRssi, powerHalfDb},   {kMeasuredRsrp, powerHalfDb},  {kAverageRsrp, powerHalfDb},
+    {kMeasuredRsrq, rsrqQuarterDb}, {kAverageRsrq, rsrqQuarterDb},
+};
+
+} // namespace
+
+std::string_view NeighborCellsList::getSectionName() const
+{
+    return "Neighbor Cells List";
+}
+
+std::vector<LogCode> NeighborCellsList::getLogCodeArray() const
+{
+    return {0xB180};
+}
+
+void NeighborCellsList::updateWithData(Record data, LogCode logCode)
+{
+    if (!accepts(data, logCode, 0xB180, kMinimumLength))
+        return;
+    clearElementsInArray(sectionRef);
+    const std::uint32_t count = data.read(kCountLessOne).value_or(0) + 1;
+    roles.log.write(Priority::Warning,
+                    format("Number of neighboring cells being reported: %d\n", static_cast<std::int32_t>(count)));
+    replaceArray(sectionRef, listed(data, kCells, count, [this](Record cell) {
+                     logMeasurements(cell);
+                     return Value(shown(cell, kCell));
+                 }));
+}
+
+void NeighborCellsList::logMeasurements(Record cell) const
+{
+    const auto raw = [cell](Field field) { return cell.read(field).value_or(0); };
+    roles.log.write(Priority::Warning,
+                    format("Physical Cell ID: %d\n", static_cast<std::int32_t>(raw(kPhysicalCellId))));
+    // One label for RSSI, RSRP and RSRQ alike, on purpose.
+    for (const auto& [field, quantity] : kLogged)
+        roles.log.write(Priority::Warning, format("Measured RSSI: %lf\n", quantity(raw(field))));
+}
+
+} // namespace kestrum
