@@ -1,0 +1,50 @@
+#pragma once
+
+#include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/Row.h"
+#include "support/Record.h"
+
+#include <span>
+#include <string_view>
+
+namespace kestrum {
+
+class SystemLog;
+
+/// What a CDMA decoder works on. Values are published under lookup identifiers: the template says at which places
+/// of the display each is shown.
+class C2KContext {
+public:
+    C2KContext(State& runState, const DictionaryRef& places, DecodingRoles& roles)
+        : state(runState), log(roles.log), _lookup(places), _watch(roles.watch)
+    {}
+
+    /// Sets the value at all places of the identifier, up to the first that is none.
+    void publish(std::string_view identifier, const Value& value) const;
+    /// The rows' keys are the identifiers.
+    void publish(Record record, std::span<const Row> rows) const;
+
+    /// Ends a record of a wrong length: one line, at error priority.
+    void rejectLength(std::string_view line) const;
+
+    State& state;
+    SystemLog& log;
+
+private:
+    DictionaryRef _lookup;
+    RecordWatch* _watch;
+};
+
+// One decoder for each log code (3GPP2 C.S0005 for 1x, C.S0024 for EV-DO). A record of a wrong length publishes
+// nothing, logs one line, and leaves every value as it was. Offsets count from the record's first byte, header
+// included.
+void decodeEvdoStatus(Record record, C2KContext& context);          // 0x1183
+void decodeActiveSetPilots(Record record, C2KContext& context);     // 0x12B6
+void decodeFingers(Record record, C2KContext& context);             // 0x108A
+void decodeSystemIdentity(Record record, C2KContext& context);      // 0x134F
+void decodeTrafficDemodulation(Record record, C2KContext& context); // 0x119D
+void decodeForwardLinkRate(Record record, C2KContext& context);     // 0x1192
+void decodeReverseLinkRate(Record record, C2KContext& context);     // 0x127E
+void decodeOneXStatus(Record record, C2KContext& context);          // 0x119C
+
+} // namespace kestrum

@@ -1,0 +1,91 @@
+#include "LogGenerator/C2K/Decoders.h"
+#include "platform/SystemLog.h"
+
+#include <cmath>
+#include <optional>
+
+namespace kestrum {
+namespace {
+
+constexpr std::uint32_t kUnusedFinger = 0xFFFF;
+
+/// Where a record keeps its pilots, and what of each is read.
+struct PilotList {
+    Field count;
+    std::size_t first, size;
+    Field pn, energy; ///< from the pilot's first byte; energies are in units of 1/512
+};
+
+// clang-format off
+constexpr PilotList kActiveSet{u8(15), 25, 12, u16(0), u16(2)};
+constexpr PilotList kFingers  {u8(22), 23, 14, u16(0), u16(6)};
+// clang-format on
+
+unsigned lengthOf(Record record)
+{
+    return static_cast<unsigned>(record.size());
+}
+
+/// {"_sorted", "0;PN": strength, ...}: the index first, so that the list keeps the record's order. A pilot that is
+/// left out leaves a gap in the index.
+DictionaryRef strengths(Record record, const PilotList& list, std::uint32_t count, std::optional<std::uint32_t> leftOut)
+{
+    auto shownPilots = makeDictionary({{"_sorted", "_sorted"}});
+    for (std::uint32_t i = 0; i < count; ++i) {
+        const auto pilot = record.slice(list.first + list.size * i, list.size);
+        if (!pilot)
+            break;
+        const auto pn = pilot->read(list.pn).value_or(0);
+        if (leftOut == pn)
+            continue;
+        const double ratio = pilot->read(list.energy).value_or(0) / 512.0;
+        shownPilots->set(format("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
+                         format("%+.2f dB", 10.0 * std::log10(ratio)));
+    }
+    return shownPilots;
+}
+
+void publishPilots(C2KContext& context, std::string_view identifier, const DictionaryRef& pilots)
+{
+    if (pilots->size() > 1)
+        context.publish(identifier, Value(pilots));
+    else
+        context.publish(identifier, "(none)");
+}
+
+} // namespace
+
+void decodeActiveSetPilots(Record record, C2KContext& context)
+{
+    if (record.size() < kActiveSet.first) {
+        context.rejectLength(format("Log code 0x12b6 is %u bytes long but must be at least %lu bytes.",
+                                    lengthOf(record), kActiveSet.first));
+        return;
+    }
+    const auto count = record.read(kActiveSet.count).value_or(0);
+    if (record.size() < kActiveSet.first + kActiveSet.size * count) {
+        context.rejectLength(format("Log code 0x12b6 is %u bytes long, but has %d substructs.", lengthOf(record),
+                                    static_cast<std::int32_t>(count)));
+        return;
+    }
+    publishPilots(context, "kActiveSetPilots", strengths(record, kActiveSet, count, std::nullopt));
+}
+
+void decodeFingers(Record record, C2KContext& context)
+{
+    if (record.size() < kFingers.first) {
+        context.rejectLength(format("Log code 0x108a is %u bytes long but must be at least %lu bytes.",
+                                    lengthOf(record), kFingers.first));
+        return;
+    }
+    const auto count = record.read(kFingers.count).value_or(0);
+    if (record.size() != kFingers.first + kFingers.size * count) {
+        // "size" is the fixed part's, not a finger's; kept so.
+        context.rejectLength(format("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%lu).",
+                                    lengthOf(record), static_cast<std::int32_t>(count), kFingers.first));
+        return;
+    }
+    publishPilots(context, "kFingerC2I", strengths(record, kFingers, count, kUnusedFinger));
+}
+
+} // namespace kestrum

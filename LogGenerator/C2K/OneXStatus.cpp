@@ -1,0 +1,140 @@
+#include "LogGenerator/C2K/BandClass.h"
+#include "LogGenerator/C2K/Decoders.h"
+#include "LogGenerator/C2K/Subpackets.h"
+#include "platform/SystemLog.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace kestrum {
+namespace {
+
+constexpr std::size_t kMinimumLength = 17;
+constexpr std::uint32_t kTraffic = 8;
+
+enum Subpacket : std::uint32_t { kState = 1, kRf = 2, kActiveSet = 3, kFingers = 4 };
+
+std::string deviceState(std::uint32_t raw)
+{
+    constexpr std::string_view kNames[] = {"Inactive [0]",
+                                           "Deep sleep in start state [1]",
+                                           "Initial state for CDMA operation [2]",
+                                           "Acquisition [3]",
+                                           "Sync [4]",
+                                           "Slew [5]",
+                                           "Paging [6]",
+                                           "Slotted mode sleep state [7]",
+                                           "Traffic [8]",
+                                           "UnSlew [9]",
+                                           "Operation in PCG state [10]",
+                                           "Powerup state [11]"};
+    if (raw < std::size(kNames))
+        return std::string(kNames[raw]);
+    return format("[Bad Value %d]", static_cast<std::int32_t>(raw));
+}
+
+/// Receive AGC: 334/1000 dB a step, 0 at -63.248 dBm.
+std::string receiveAgc(std::uint32_t raw)
+{
+    return format("%+.2f dBm", static_cast<std::int8_t>(raw) * 334 / 1000.0 - 63.248);
+}
+
+/// Transmit AGC in tenths of dBm.
+std::string transmitAgc(std::uint32_t raw)
+{
+    return format("%+.2f dBm", static_cast<std::int16_t>(raw) / 10.0);
+}
+
+// clang-format off
+// From the first byte of their subpacket.
+constexpr Field kDeviceState = u8(4);
+
+constexpr Row kStateRows[] = {
+    {kDeviceState, "k1xDeviceState",  deviceState},
+};
+constexpr Row kChain0[] = {
+    {u8(4),        "k1xRx0BandClass", bandClassName},
+    {u16(6),       "k1xRx0ChanNum",   decimal},
+    {u8(10),       "k1xRxAGC0",       receiveAgc},
+};
+constexpr Row kChain1[] = {
+    {u8(5),        "k1xRx1BandClass", bandClassName},
+    {u16(8),       "k1xRx1ChanNum",   decimal},
+    {u8(11),       "k1xRxAGC1",       receiveAgc},
+    {u16(12),      "k1xTxAGC",        transmitAgc},
+};
+// clang-format on
+constexpr std::size_t kRfLength = std::max(reach(kChain0), reach(kChain1));
+constexpr std::size_t kActiveSetLength = 12;
+
+/// 10 log10 of the pilot's share of the received power, at least -50 dB. A quotient that is no number takes the floor
+/// as well, since no comparison with it holds.
+double strengthDb(double n, double gain, double k, double energy)
+{
+    constexpr double kFloor = 0.00001;
+    const double share = std::exp2(2.0 * k - 3.0) * energy / (gain * 9.0 * n * n) - 1.0 / n;
+    return 10.0 * std::log10(share > kFloor ? share : kFloor);
+}
+
+/// {"_sorted", "0;PN": strength, ...}, up to the first pilot that does not lie inside the record.
+DictionaryRef pilots(Record activeSet)
+{
+    const auto field = [&](Field which) { return activeSet.read(which).value_or(0); };
+    const auto n = field(u16(4)), gain = field(u8(6)), k = field(u8(7)), count = field(u8(8)), m = field(u8(9));
+    const auto reference = field(u16(10));
+    const std::size_t size = (std::size_t{6} * m + 15) / 4 * 4;
+
+    auto shownPilots = makeDictionary({{"_sorted", "_sorted"}});
+    for (std::uint32_t j = 0; j < count; ++j) {
+        const auto pnField = activeSet.slice(12 + size * j, 2);
+        const auto energyField = activeSet.slice(24 + 4 * m + size * j, 2);
+        if (!pnField || !energyField)
+            break;
+        const auto pn = pnField->read(u16(0)).value_or(0);
+        const double strength = strengthDb(n, gain, k, energyField->read(u16(0)).value_or(0));
+        shownPilots->set(format("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
+                         pn == reference ? format("(ref pilot) %+.2f dB", strength) : format("%+.2f dB", strength));
+    }
+    return shownPilots;
+}
+
+} // namespace
+
+void decodeOneXStatus(Record record, C2KContext& context)
+{
+    if (record.size() < kMinimumLength) {
+        context.rejectLength(format("Log code 0x119c is %u bytes long but must be at least %lu bytes.",
+                                    static_cast<unsigned>(record.size()), kMinimumLength));
+        return;
+    }
+    const auto state = findSubpacket(record, kState, context.log);
+    const auto rf = findSubpacket(record, kRf, context.log);
+    const auto activeSet = findSubpacket(record, kActiveSet, context.log);
+    const auto fingers = findSubpacket(record, kFingers, context.log); // has to be there, though nothing of it is read
+    if (!state || !rf || !activeSet || !fingers) {
+        context.log.write(Priority::Warning, format("Log code 0x119c: missing subpacket (ss=%d,rf=%d,ai=%d,fi=%d).",
+                                                    state ? 1 : 0, rf ? 1 : 0, activeSet ? 1 : 0, fingers ? 1 : 0));
+        return;
+    }
+    const auto deviceStateNow = state->read(kDeviceState);
+    if (!deviceStateNow || rf->size() < kRfLength || activeSet->size() < kActiveSetLength)
+        return;
+
+    const bool inTraffic = *deviceStateNow == kTraffic;
+    context.publish(*state, kStateRows);
+    context.publish(*rf, kChain0);
+    if (inTraffic)
+        context.publish(*rf, kChain1);
+    else
+        for (const auto& row : kChain1)
+            context.publish(row.key, "N/A");
+    context.publish("k1xActiveSetInfo", Value(pilots(*activeSet)));
+
+    // The last call's frame errors, once, after it ended.
+    if (const auto ratio = context.state.at("TrafficFER").real(); ratio && !inTraffic) {
+        context.publish("k1xTrafficFER", format("%.02f%% (old)", *ratio * 100.0));
+        context.state.remove("TrafficFER");
+    }
+}
+
+} // namespace kestrum
