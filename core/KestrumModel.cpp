@@ -1,0 +1,150 @@
+#include "core/KestrumModel.h"
+
+#include "platform/MainQueue.h"
+#include "platform/PropertyLists.h"
+#include "platform/SystemLog.h"
+#include "support/Format.h"
+
+#include <chrono>
+#include <exception>
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+
+constexpr auto kRefreshInterval = 2s;
+constexpr auto kRetryDelay = 5s;
+
+} // namespace
+
+KestrumModel::KestrumModel(MonitorRoles& roles) : _roles(roles) {}
+
+KestrumModel::~KestrumModel()
+{
+    destroyPorts();
+}
+
+void KestrumModel::startMonitor()
+{
+    // The wait for a reply serves timers and messages, which may call this again.
+    if (_displayUpdateTimer || _starting)
+        return;
+    const auto self = shared_from_this();
+    _starting = true;
+    const auto failure = failureOfAttempt();
+    _starting = false;
+    if (failure) {
+        logError(*failure);
+        destroyPorts();
+        scheduleRetry();
+    } else {
+        logError("Starting the display update timer");
+        _displayUpdateTimer = _roles.queue.repeat(kRefreshInterval, [self] { self->refresh(); });
+    }
+    notify(&KestrumModelObserver::updateStatus);
+}
+
+std::optional<std::string> KestrumModel::failureOfAttempt()
+{
+    if (!createPorts())
+        return "Could not create the ports necessary";
+    configureGenerator();
+    if (!_logGenerator)
+        return "No log generator technology works";
+    const auto command = _roles.propertyLists.toXml(_logGenerator->getStartCommand());
+    if (!command)
+        return " Could not generate PLIST";
+    const auto sent = send(command->bytes(), RemotePort::Reply::None);
+    if (sent.status != 0)
+        return format(" ***** Could not send the START command (got error=%d)", sent.status);
+    return std::nullopt;
+}
+
+void KestrumModel::scheduleRetry()
+{
+    if (std::exchange(_retryPending, true))
+        return;
+    _roles.queue.post(kRetryDelay, [self = shared_from_this()] {
+        self->_retryPending = false;
+        self->startMonitor();
+    });
+}
+
+void KestrumModel::restartMonitor()
+{
+    const auto self = shared_from_this();
+    destroyPorts();
+    startMonitor();
+}
+
+void KestrumModel::updateWithData(Bytes data)
+{
+    const auto self = shared_from_this();
+    if (_logGenerator) {
+        try {
+            _logGenerator->updateState(_state, data);
+        } catch (const std::exception& failure) {
+            logError(failure.what());
+        }
+    }
+    _updated = true;
+}
+
+void KestrumModel::refresh()
+{
+    const auto self = shared_from_this();
+    if (_sendPort && _recvPort && !_sendPort->isValid())
+        _recvPort->invalidate();
+    if (!std::exchange(_updated, false))
+        return;
+    dropTree();
+    notify(&KestrumModelObserver::updateViewControllerFromModel);
+}
+
+KestrumModelNodeRef KestrumModel::topLevelNodes()
+{
+    if (!_nodes && _logGenerator) {
+        const Value display = _logGenerator->generateLogUsingState(_state);
+        _nodesByPath.emplace();
+        _nodes = KestrumModelNode::makeTreeFromObject(display, *_nodesByPath);
+    }
+    return _nodes;
+}
+
+KestrumModelNodeRef KestrumModel::nodeAtPath(const std::string& path)
+{
+    if (!_nodesByPath)
+        topLevelNodes();
+    if (!_nodesByPath)
+        return nullptr;
+    const auto found = _nodesByPath->find(path);
+    return found == _nodesByPath->end() ? nullptr : found->second;
+}
+
+ArrayRef KestrumModel::getSaveContents() const
+{
+    return _logGenerator ? _logGenerator->getSaveContentsFromState(_state) : nullptr;
+}
+
+void KestrumModel::dropTree()
+{
+    _nodes = nullptr;
+    _nodesByPath.reset();
+}
+
+void KestrumModel::notify(void (KestrumModelObserver::*message)())
+{
+    _roles.queue.post([model = weak_from_this(), message] {
+        if (const auto self = model.lock(); self && self->_observer != nullptr)
+            (self->_observer->*message)();
+    });
+}
+
+void KestrumModel::logError(std::string_view text) const
+{
+    _roles.log.write(Priority::Error, text);
+}
+
+} // namespace kestrum

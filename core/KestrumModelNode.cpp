@@ -1,0 +1,138 @@
+#include "core/KestrumModelNode.h"
+
+#include "LogGenerator/ArrayLock.h"
+#include "support/Format.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+constexpr std::string_view kTitle = "Kestrum";
+constexpr std::string_view kSorted = "_sorted";
+constexpr char kOrderSeparator = ';';
+
+/// What stands before the first ";" of a key, and what behind it.
+std::pair<std::string_view, std::string_view> splitAtOrder(std::string_view key)
+{
+    const auto end = std::min(key.find(kOrderSeparator), key.size());
+    return {key.substr(0, end), key.substr(std::min(end + 1, key.size()))};
+}
+
+/// "3;Neighbor" is shown as "Neighbor". A key of more parts is no such pair, and is shown whole.
+std::string_view nameInSortedMode(std::string_view key)
+{
+    return std::ranges::count(key, kOrderSeparator) == 1 ? splitAtOrder(key).second : key;
+}
+
+/// The entries to show, in their order.
+std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary, bool sorted)
+{
+    std::vector<const Dictionary::Entry*> entries;
+    entries.reserve(dictionary.size());
+    for (const auto& entry : dictionary)
+        if (entry.key != kSorted && entry.value)
+            entries.push_back(&entry);
+    // Part by part: ";" sorts behind the digits, and would put "10;" before "1;". No numbers are read: "10" stands
+    // before "2" on purpose.
+    if (sorted)
+        std::ranges::sort(entries, {}, [](const auto* entry) { return splitAtOrder(entry->key); });
+    return entries;
+}
+
+/// The text of all paths of a tree. Real displays take a thousandth of it; a message of long names inside each other
+/// would take thousands of times its own size. What exceeds it is in the tree, but cannot be found by its path.
+constexpr std::size_t kPathBytes = std::size_t{64} << 20;
+
+/// Builds one tree. A node has no path when those built before it have used up all there is.
+class Builder {
+public:
+    using Path = std::optional<std::string>;
+
+    explicit Builder(PathDictionary& paths) : _paths(paths) {}
+
+    KestrumModelNodeRef build(std::string name, const Value& object, const Path& path)
+    {
+        auto node = make(std::move(name), object, path);
+        if (path)
+            _paths.insert_or_assign(*path, node);
+        return node;
+    }
+
+private:
+    KestrumModelNodeRef make(std::string name, const Value& object, const Path& path)
+    {
+        if (const auto* text = object.string())
+            return std::make_shared<KestrumModelLeafNode>(std::move(name), *text);
+        if (const auto dictionary = object.dictionary())
+            return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*dictionary, path));
+        if (const auto array = object.array())
+            return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*array, path));
+        return std::make_shared<KestrumModelLeafNode>(std::move(name), "(unknown)");
+    }
+
+    KestrumModelNodes childrenOf(const Dictionary& dictionary, const Path& path)
+    {
+        const Value* marker = dictionary.find(kSorted);
+        const bool sorted = marker != nullptr && !marker->isNull();
+        const auto entries = shownEntries(dictionary, sorted);
+        KestrumModelNodes children;
+        children.reserve(entries.size());
+        for (const auto* entry : entries)
+            children.push_back(
+                child(std::string(sorted ? nameInSortedMode(entry->key) : entry->key), entry->value, path));
+        return children;
+    }
+
+    KestrumModelNodes childrenOf(const Array& array, const Path& path)
+    {
+        const ArrayLocked locked; // For the whole walk, so that no section rewrites the array under it.
+        KestrumModelNodes children;
+        children.reserve(array.size());
+        for (const auto& element : array)
+            children.push_back(child(std::to_string(children.size()), element, path));
+        return children;
+    }
+
+    KestrumModelNodeRef child(std::string name, const Value& object, const Path& parent)
+    {
+        Path path;
+        if (parent && parent->size() + name.size() < _left) {
+            path = joinPath(*parent, name);
+            _left -= std::min(_left, path->size());
+        }
+        return build(std::move(name), object, path);
+    }
+
+    PathDictionary& _paths;
+    std::size_t _left = kPathBytes;
+};
+
+} // namespace
+
+std::string joinPath(std::string_view path, std::string_view name)
+{
+    const auto first = std::min(name.find_first_not_of('/'), name.size());
+    const auto component = name.substr(first, name.find_last_not_of('/') + 1 - first);
+    std::string joined(path);
+    if (!joined.ends_with('/'))
+        joined += '/';
+    return joined += component.empty() ? "(empty)" : component;
+}
+
+KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary,
+                              const std::string& path)
+{
+    return Builder(pathDictionary).build(std::move(name), object, path);
+}
+
+KestrumModelNodeRef KestrumModelNode::makeTreeFromObject(const Value& object, PathDictionary& withPathDictionary)
+{
+    return buildNode(std::string(kTitle), object, withPathDictionary, std::string(kRootPath));
+}
+
+} // namespace kestrum

@@ -1,0 +1,134 @@
+// The model's log channel: how it is opened and closed, which generator it takes, what comes in.
+#include "core/KestrumModel.h"
+
+#include "platform/MainQueue.h"
+#include "platform/PropertyLists.h"
+#include "platform/SystemLog.h"
+#include "platform/TelephonyService.h"
+#include "support/Format.h"
+
+#include <chrono>
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+
+constexpr std::int32_t kMessageId = 0; // the only one in either direction
+constexpr auto kSendTimeout = 1s;
+constexpr auto kReplyTimeout = 1s;
+constexpr std::int32_t kNoPort = -1; // the status of a message for which no port is open
+
+constexpr std::string_view kGetTechnology = "GetTechnology";
+
+} // namespace
+
+bool KestrumModel::createPorts()
+{
+    _recvPort = _roles.ports.createLocal(
+        kLogChannelServiceName, [this](std::int32_t messageId, Bytes payload) { handleMessage(messageId, payload); });
+    // Without a local port the channel is asked for all the same, on purpose: the service is the one to refuse it.
+    if (_recvPort) {
+        _recvPort->setDeliveryQueue(_roles.queue);
+        _recvPort->setInvalidationHandler([this, port = _recvPort.get()] { handleInvalidation(port); });
+    }
+
+    auto connection = _roles.telephony.connect([this](std::string_view) { refresh(); });
+    if (!connection) {
+        logError("Could not create VoxServerConnection");
+        return false;
+    }
+    const auto answer = connection->networkMonitorCreateLogChannel(kLogChannelServiceName);
+    connection.reset();
+    if (answer.errorCode != 0) {
+        logError(format("_VoxServerConnectionNetworkMonitorCreateLogChannel returns error: %ld!",
+                        static_cast<long>(answer.errorCode)));
+        return false;
+    }
+    if (!answer.remotePort || answer.remotePort->empty()) {
+        logError("Could not create a log channel (Vox returned null port)!");
+        return false;
+    }
+    _sendPort = _roles.ports.createRemote(*answer.remotePort);
+    if (!_sendPort) {
+        logError("Could not create the remote port!");
+        return false;
+    }
+    logError(format(" ***** Created ports (send=%p, recv=%p)", _roles.log.shownAddress(_sendPort.get()),
+                    _roles.log.shownAddress(_recvPort.get())));
+    return true;
+}
+
+void KestrumModel::destroyPorts()
+{
+    // The timer may be the last to hold this model; the destructor, which comes here too, has nobody left to ask.
+    const auto self = weak_from_this().lock();
+    std::exchange(_displayUpdateTimer, nullptr).reset();
+    const auto close = [](auto& field) {
+        if (const auto port = std::exchange(field, nullptr)) {
+            port->setInvalidationHandler({}); // Closed on purpose: no restart.
+            port->invalidate();
+        }
+    };
+    close(_recvPort);
+    close(_sendPort);
+}
+
+bool KestrumModel::isConnected() const
+{
+    return _recvPort && _sendPort;
+}
+
+void KestrumModel::configureGenerator()
+{
+    const auto request = _roles.propertyLists.toXml(makeDictionary({{std::string(kGetTechnology), kGetTechnology}}));
+    if (!request)
+        return logError(" Could not generate GetTechnology command; cannot configure");
+    const auto sent = send(request->bytes(), RemotePort::Reply::Awaited);
+    if (sent.status != 0)
+        return logError(format(" ***** Could not send the GetTechnology command (got error=%d)", sent.status));
+    if (!sent.reply)
+        return logError(" ***** No response to GetTechnology; cannot configure");
+    const Value reply = _roles.propertyLists.parse(sent.reply->bytes());
+    if (!reply)
+        return logError(" ***** Could not parse reply to GetTechnology; cannot configure");
+    const auto dictionary = reply.dictionary();
+    const Value technology = dictionary ? dictionary->at(kGetTechnology) : Value();
+    if (!technology)
+        return logError(" ***** Reply to GetTechnology had no answer; cannot configure");
+    takeGenerator(LogGenerator::generatorFromTechnology(technology, _roles));
+}
+
+void KestrumModel::takeGenerator(std::unique_ptr<LogGenerator> generator)
+{
+    _logGenerator = std::move(generator);
+    logError(format("Got log generated: %p", _roles.log.shownAddress(_logGenerator.get())));
+    if (_logGenerator && _logGenerator->replacesDisplayOf(_state)) {
+        dropTree();
+        notify(&KestrumModelObserver::displayReplaced);
+    }
+}
+
+RemotePort::Sent KestrumModel::send(Bytes payload, RemotePort::Reply reply)
+{
+    const auto port = _sendPort; // The wait may close it.
+    if (!port)
+        return {kNoPort, std::nullopt};
+    return port->sendRequest(kMessageId, payload, kSendTimeout,
+                             reply == RemotePort::Reply::Awaited ? kReplyTimeout : 0s, reply);
+}
+
+void KestrumModel::handleMessage(std::int32_t messageId, Bytes payload)
+{
+    if (messageId == kMessageId)
+        updateWithData(payload);
+}
+
+void KestrumModel::handleInvalidation(const Port* port)
+{
+    logError(format(" ***** INVALIDATED %p *****", _roles.log.shownAddress(port)));
+    restartMonitor();
+}
+
+} // namespace kestrum
