@@ -1,0 +1,49 @@
+#pragma once
+
+#include "platform/Toolkit.h"
+
+#include <memory>
+#include <optional>
+#include <string_view>
+#include <utility>
+
+namespace kestrum {
+
+/// A row of a pane: the bold key and, for a leaf, its value behind it in a strip that scrolls sideways.
+class KestrumCell final : public ReusableCell {
+public:
+    /// A cell for the key alone, without value and strip.
+    static std::shared_ptr<KestrumCell> initWithStyleKey(Toolkit& toolkit, TableView& table, CellStyle style,
+                                                         std::string_view reuseIdentifier);
+    /// A cell for key and value.
+    static std::shared_ptr<KestrumCell> initWithStyle(Toolkit& toolkit, TableView& table, CellStyle style,
+                                                      std::string_view reuseIdentifier);
+
+    const std::shared_ptr<Label>& key() const { return _key; }
+    void setKey(std::shared_ptr<Label> key) { _key = std::move(key); }
+    /// Null in a key-only cell.
+    const std::shared_ptr<Label>& value() const { return _value; }
+    void setValue(std::shared_ptr<Label> value) { _value = std::move(value); }
+
+    /// Sets both labels' texts, as far as the cell has the labels.
+    void setTexts(std::string_view key, std::optional<std::string_view> value);
+
+    /// Places the texts of a row that opens something: the key alone.
+    void setLayoutKey();
+    /// Places the texts of a leaf: the value at the right edge when both fit, else behind the key.
+    void setLayout();
+
+private:
+    KestrumCell(Toolkit& toolkit, TableView& table, CellStyle style, std::string_view reuseIdentifier);
+
+    Size measured(const Label* label) const;
+    /// Places the key, and tells the size of its text.
+    Size placeKey(Rect bounds);
+
+    Toolkit& _toolkit;
+    std::shared_ptr<Label> _key;
+    std::shared_ptr<Label> _value;
+    std::shared_ptr<ScrollView> _view; ///< holds both labels; null in a key-only cell
+};
+
+} // namespace kestrum

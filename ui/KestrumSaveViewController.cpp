@@ -1,0 +1,113 @@
+#include "ui/KestrumSaveViewController.h"
+
+#include "platform/FileSystem.h"
+#include "platform/MainQueue.h"
+#include "platform/PropertyLists.h"
+#include "platform/SystemLog.h"
+#include "platform/Time.h"
+#include "support/Format.h"
+#include "ui/SharedApplication.h"
+
+#include <chrono>
+#include <string>
+
+namespace kestrum {
+namespace {
+
+constexpr std::string_view kReuseIdentifier = "SaveHistoryContentCell";
+constexpr Font kRowFont{"Helvetica", 13};
+
+std::string snapshotPath(const FileSystem& files, Date now)
+{
+    const auto seconds = std::chrono::floor<std::chrono::seconds>(now).time_since_epoch().count();
+    return format("%@/KestrumSnapshot-%ld.kestrum", files.diagnosticLogDirectory(), seconds);
+}
+
+} // namespace
+
+KestrumSaveViewController::KestrumSaveViewController(ApplicationRoles& roles, SharedApplication& application,
+                                                     const Value& initWithSaveHistory)
+    : _roles(roles),
+      _application(application),
+      _timeStamp(roles.clock.now()),
+      _saveHistory(deepCopy(initWithSaveHistory)),
+      _interface(roles.toolkit.loadSaveInterface(*this))
+{
+    viewDidLoad();
+}
+
+void KestrumSaveViewController::viewDidLoad()
+{
+    saveContentTable().sizeToFit();
+}
+
+void KestrumSaveViewController::viewWillAppear(bool)
+{
+    _interface->setFrame(_roles.toolkit.mainScreenApplicationFrame());
+}
+
+std::size_t KestrumSaveViewController::numberOfRowsInSection(TableView&, std::size_t)
+{
+    const auto history = _saveHistory.array();
+    return history ? history->size() : 0;
+}
+
+std::shared_ptr<ReusableCell> KestrumSaveViewController::cellForRowAtIndexPath(TableView& table, IndexPath indexPath)
+{
+    auto reusable = table.dequeueReusableCell(kReuseIdentifier);
+    if (!reusable)
+        reusable = std::make_shared<ReusableCell>(table.makeCell(CellStyle::Default), kReuseIdentifier);
+
+    const auto history = _saveHistory.array();
+    const auto entry = history && indexPath.row < history->size() ? (*history)[indexPath.row].dictionary() : nullptr;
+    const Value description = entry ? entry->at("Description") : Value();
+    auto& cell = reusable->cell();
+    cell.textLabel().setFont(kRowFont);
+    // An entry without a description is a blank row: it is saved like the others.
+    cell.textLabel().setText(description.string() ? std::optional<std::string_view>(*description.string())
+                                                  : std::nullopt);
+    cell.setAccessory(Accessory::CheckMark);
+    return reusable;
+}
+
+void KestrumSaveViewController::didSelectRowAtIndexPath(TableView&, std::optional<IndexPath>)
+{
+    saveDescription().resignFirstResponder();
+}
+
+void KestrumSaveViewController::savePressed()
+{
+    const auto text = saveDescription().text();
+    const auto snapshot = makeDictionaryUntilNull(
+        {{"Timestamp", dateText(_timeStamp)}, {"Data", _saveHistory}, {"Description", text ? Value(*text) : Value()}});
+    const std::string path = snapshotPath(_roles.files, _roles.clock.now());
+    if (!_roles.propertyLists.write(*snapshot, path)) {
+        _roles.log.write(Priority::Error, format("Unable to write snapshot to %s", path));
+        _roles.toolkit.showAlert("File Error", "Unable to write file to disk", "Close");
+    }
+    postClose();
+}
+
+void KestrumSaveViewController::cancelPressed()
+{
+    postClose();
+}
+
+void KestrumSaveViewController::backgroundTouched()
+{
+    saveDescription().resignFirstResponder();
+}
+
+bool KestrumSaveViewController::textFieldShouldReturn()
+{
+    saveDescription().resignFirstResponder();
+    return true;
+}
+
+void KestrumSaveViewController::postClose()
+{
+    // Not this screen's own pointer: pressed twice, it is gone by the time of the second task.
+    _roles.queue.post([&application = _application] { application.closeSaveView(); });
+}
+
+} // namespace kestrum
