@@ -1,0 +1,131 @@
+#include "frontends/qt/Accessibility.h"
+
+#include "frontends/qt/Table.h"
+
+#include <QAccessible>
+#include <QAccessibleWidget>
+#include <algorithm>
+
+namespace kestrum::qt {
+
+namespace {
+
+Table* tableOf(const Cell& cell)
+{
+    QWidget* viewport = cell.parentWidget();
+    return viewport ? dynamic_cast<Table*>(viewport->parentWidget()) : nullptr;
+}
+
+class AccessibleCell final : public QAccessibleWidget {
+public:
+    explicit AccessibleCell(Cell& cell) : QAccessibleWidget(&cell, QAccessible::ListItem) {}
+
+    QAccessibleInterface* parent() const override { return QAccessible::queryAccessibleInterface(tableOf(cell())); }
+
+    QString text(QAccessible::Text kind) const override
+    {
+        return kind == QAccessible::Name ? cell().spoken() : QAccessibleWidget::text(kind);
+    }
+
+    QAccessible::State state() const override
+    {
+        QAccessible::State state = QAccessibleWidget::state();
+        state.focusable = state.selectable = true;
+        if (const auto [table, row] = place(); table) {
+            state.focused = table->hasFocus() && table->current() == row;
+            state.selected = table->selected() == row;
+        }
+        state.checked = cell().accessory() == Accessory::CheckMark;
+        state.hasPopup = false;
+        state.expandable = cell().accessory() == Accessory::DisclosureIndicator;
+        return state;
+    }
+
+    QStringList actionNames() const override { return {pressAction(), setFocusAction()}; }
+
+    void doAction(const QString& name) override
+    {
+        const auto [table, row] = place();
+        if (!table)
+            return;
+        table->makeCurrent(row);
+        if (name == pressAction())
+            table->select(row);
+        else
+            table->setFocus();
+    }
+
+private:
+    struct Place {
+        Table* table;
+        std::size_t row;
+    };
+
+    Cell& cell() const { return *static_cast<Cell*>(widget()); }
+
+    Place place() const
+    {
+        if (Table* table = tableOf(cell()))
+            if (const auto row = table->rowOf(cell()))
+                return {table, *row};
+        return {nullptr, 0};
+    }
+};
+
+/// Its children are the rows in view, top down.
+class AccessibleTable final : public QAccessibleWidget {
+public:
+    explicit AccessibleTable(Table& table) : QAccessibleWidget(&table, QAccessible::List) {}
+
+    int childCount() const override { return static_cast<int>(table().cellsInView().size()); }
+
+    QAccessibleInterface* child(int index) const override
+    {
+        const auto cells = table().cellsInView();
+        return index < 0 || index >= static_cast<int>(cells.size())
+                   ? nullptr
+                   : QAccessible::queryAccessibleInterface(cells[static_cast<std::size_t>(index)]);
+    }
+
+    int indexOfChild(const QAccessibleInterface* child) const override
+    {
+        const auto cells = table().cellsInView();
+        const auto found = std::find(cells.begin(), cells.end(), child->object());
+        return found == cells.end() ? -1 : static_cast<int>(found - cells.begin());
+    }
+
+    QAccessibleInterface* focusChild() const override
+    {
+        const auto row = table().current();
+        return row ? QAccessible::queryAccessibleInterface(table().cellAt(*row)) : nullptr;
+    }
+
+    QAccessibleInterface* childAt(int x, int y) const override
+    {
+        for (Cell* cell : table().cellsInView())
+            if (cell->rect().contains(cell->mapFromGlobal(QPoint(x, y))))
+                return QAccessible::queryAccessibleInterface(cell);
+        return nullptr;
+    }
+
+private:
+    Table& table() const { return *static_cast<Table*>(widget()); }
+};
+
+QAccessibleInterface* makeInterface(const QString&, QObject* object)
+{
+    if (auto* cell = dynamic_cast<Cell*>(object))
+        return new AccessibleCell(*cell);
+    if (auto* table = dynamic_cast<Table*>(object))
+        return new AccessibleTable(*table);
+    return nullptr;
+}
+
+} // namespace
+
+void installAccessibility()
+{
+    QAccessible::installFactory(makeInterface);
+}
+
+} // namespace kestrum::qt

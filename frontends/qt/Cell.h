@@ -1,0 +1,51 @@
+#pragma once
+
+#include "frontends/qt/Drawn.h"
+
+#include <QWidget>
+#include <vector>
+
+namespace kestrum::qt {
+
+/// One row. Its table places it and gives it its look; it takes no input itself.
+class Cell final : public QWidget, public TableCell {
+public:
+    explicit Cell(CellStyle style);
+
+    Rect contentBounds() const override;
+    void layoutSubviews() override;
+    void setAccessory(Accessory accessory) override;
+    void addSubview(std::shared_ptr<View> view) override;
+    Label& textLabel() override { return *_textLabel; }
+
+    /// The row that it shows, or showed last. What still rolls stays with the row that the cell leaves.
+    std::size_t row() const { return _row; }
+    void setRow(std::size_t row);
+
+    struct Look {
+        bool pressed = false, selected = false, ringed = false;
+        friend bool operator==(const Look&, const Look&) = default;
+    };
+    void setLook(Look look);
+    Look look() const { return _look; }
+
+    Accessory accessory() const { return _accessory; }
+    /// The strip that can be scrolled sideways; null when everything is in view.
+    Strip* strip() const;
+    double sideways() const; ///< its offset, 0 without one
+    void setSideways(double offset);
+    /// What a screen reader says: "key, value".
+    QString spoken() const;
+
+protected:
+    void paintEvent(QPaintEvent*) override;
+
+private:
+    Accessory _accessory = Accessory::None;
+    Look _look;
+    std::size_t _row = 0;
+    std::shared_ptr<TextLabel> _textLabel; ///< the default style's own
+    std::vector<std::shared_ptr<View>> _views;
+};
+
+} // namespace kestrum::qt

@@ -1,0 +1,147 @@
+#include "frontends/qt/Drawn.h"
+
+#include "frontends/qt/Measures.h"
+#include "frontends/qt/Type.h"
+
+#include <QFontMetricsF>
+#include <QLinearGradient>
+#include <QPainter>
+#include <QScrollEvent>
+#include <QScrollPrepareEvent>
+#include <algorithm>
+#include <limits>
+
+namespace kestrum::qt {
+
+void TextLabel::setFrame(Rect frame)
+{
+    if (frame == _frame)
+        return;
+    _frame = frame;
+    changed();
+}
+
+void TextLabel::setText(std::optional<std::string_view> text)
+{
+    if (text == _text)
+        return;
+    _text = text;
+    _line = lineOf(text.value_or(""));
+    changed();
+}
+
+void TextLabel::setFont(Font font)
+{
+    _family = font.family;
+    _size = font.size;
+    _bold = font.bold;
+    _font = fontOf(font);
+    changed();
+}
+
+void TextLabel::paint(QPainter& painter, const Paper& paper) const
+{
+    const QFontMetricsF metrics(_font);
+    const double room = std::min(_frame.width + 1, paper.width - _frame.x); // + 1: measures are rounded somewhere
+    const bool fits = metrics.horizontalAdvance(_line) <= room;
+    painter.setFont(_font);
+    painter.setPen(paper.colours.ink);
+    painter.drawText(QPointF(_frame.x, _frame.y + (_frame.height - metrics.height()) / 2 + metrics.ascent()),
+                     fits ? _line : metrics.elidedText(_line, Qt::ElideRight, room));
+}
+
+void Strip::setFrame(Rect frame)
+{
+    _frame = frame;
+    changed();
+}
+
+void Strip::addSubview(std::shared_ptr<View> view)
+{
+    _views.push_back(std::move(view));
+    changed();
+}
+
+void Strip::setContentSize(Size size)
+{
+    _content = size;
+    changed();
+}
+
+void Strip::setOffset(double offset)
+{
+    _offset = std::clamp(offset, 0.0, reach());
+    changed();
+}
+
+void Strip::setHolder(QWidget* holder)
+{
+    Drawn::setHolder(holder);
+    for (const auto& view : _views)
+        if (auto* drawn = dynamic_cast<Drawn*>(view.get()))
+            drawn->setHolder(holder);
+}
+
+QStringList Strip::texts() const
+{
+    QStringList texts;
+    for (const auto& view : _views)
+        if (const auto* drawn = dynamic_cast<const Drawn*>(view.get()))
+            texts += drawn->texts();
+    return texts;
+}
+
+void Strip::paint(QPainter& painter, const Paper& paper) const
+{
+    constexpr double kFade = 32; // points at an edge that what lies beyond fades in
+    painter.save();
+    const QRectF frame = rectOf(_frame);
+    painter.setClipRect(frame, Qt::IntersectClip);
+    painter.save();
+    painter.translate(frame.x() - offset(), frame.y());
+    for (const auto& view : _views)
+        if (const auto* drawn = dynamic_cast<const Drawn*>(view.get()))
+            drawn->paint(painter, {paper.colours, paper.background, std::numeric_limits<double>::infinity()});
+    painter.restore();
+
+    QColor clear = paper.background;
+    clear.setAlpha(0);
+    const auto fade = [&](double from, double to) {
+        QLinearGradient gradient(from, 0, to, 0);
+        gradient.setColorAt(0, paper.background);
+        gradient.setColorAt(0.45, paper.background);
+        gradient.setColorAt(1, clear);
+        painter.fillRect(QRectF(QPointF(std::min(from, to), frame.top()), QPointF(std::max(from, to), frame.bottom())),
+                         gradient);
+    };
+    if (offset() > 0)
+        fade(frame.left(), frame.left() + kFade);
+    if (offset() < reach()) {
+        fade(frame.right(), frame.right() - kFade);
+        // What lies beyond may begin there, with nothing to fade: three dots tell of it.
+        painter.setPen(Qt::NoPen);
+        painter.setBrush(paper.colours.muted);
+        for (int i = 0; i < 3; ++i)
+            painter.drawEllipse(QPointF(frame.right() - 2 - 4 * i, kRowHeight / 2.0 + 4), 1.25, 1.25);
+    }
+    painter.restore();
+}
+
+bool Strip::event(QEvent* event)
+{
+    if (event->type() == QEvent::ScrollPrepare) {
+        auto* prepare = static_cast<QScrollPrepareEvent*>(event);
+        prepare->setViewportSize({_frame.width, _frame.height});
+        prepare->setContentPosRange({0, 0, reach(), 0});
+        prepare->setContentPos({offset(), 0});
+        prepare->accept();
+        return true;
+    }
+    if (event->type() == QEvent::Scroll) {
+        setOffset(static_cast<QScrollEvent*>(event)->contentPos().x());
+        return true;
+    }
+    return QObject::event(event);
+}
+
+} // namespace kestrum::qt

@@ -1,0 +1,95 @@
+#pragma once
+
+#include "frontends/qt/Colours.h"
+#include "platform/Toolkit.h"
+
+#include <QFont>
+#include <QObject>
+#include <QPointer>
+#include <QRectF>
+#include <QString>
+#include <QStringList>
+#include <QWidget>
+#include <memory>
+#include <vector>
+
+class QPainter;
+
+/// The views inside a cell. They are drawn by the cell and no widgets of their own: a frame may lie between pixels,
+/// and a row costs one widget however much it holds.
+namespace kestrum::qt {
+
+/// What a view is drawn on.
+struct Paper {
+    const Colours& colours;
+    QColor background;
+    double width; ///< of the view that holds it; a text that would pass its end is cut short there
+};
+
+class Drawn {
+public:
+    virtual ~Drawn() = default;
+    virtual void paint(QPainter& painter, const Paper& paper) const = 0;
+    virtual QStringList texts() const = 0; ///< those that are not empty
+    virtual void setHolder(QWidget* holder) { _holder = holder; }
+
+protected:
+    void changed() const
+    {
+        if (_holder)
+            _holder->update();
+    }
+
+private:
+    QPointer<QWidget> _holder; ///< repainted when this changes
+};
+
+class TextLabel final : public Label, public Drawn {
+public:
+    void setFrame(Rect frame) override;
+    Rect frame() const override { return _frame; }
+    void setText(std::optional<std::string_view> text) override;
+    std::optional<std::string> text() const override { return _text; }
+    void setFont(Font font) override;
+    Font font() const override { return {_family, _size, _bold}; }
+
+    void paint(QPainter& painter, const Paper& paper) const override;
+    QStringList texts() const override { return _line.isEmpty() ? QStringList() : QStringList(_line); }
+
+private:
+    Rect _frame;
+    std::optional<std::string> _text;
+    QString _line; ///< `_text` as drawn
+    std::string _family;
+    double _size = 17;
+    bool _bold = false;
+    QFont _font;
+};
+
+/// The sideways scrolling strip. Its QScroller events move it.
+class Strip final : public QObject, public ScrollView, public Drawn {
+public:
+    void setFrame(Rect frame) override;
+    Rect frame() const override { return _frame; }
+    void addSubview(std::shared_ptr<View> view) override;
+    void setContentSize(Size size) override;
+
+    void paint(QPainter& painter, const Paper& paper) const override;
+    QStringList texts() const override;
+    void setHolder(QWidget* holder) override;
+
+    double reach() const { return std::max(0.0, _content.width - _frame.width); } ///< the largest offset
+    double offset() const { return std::min(_offset, reach()); }
+    void setOffset(double offset);
+
+protected:
+    bool event(QEvent* event) override;
+
+private:
+    Rect _frame;
+    Size _content;
+    double _offset = 0;
+    std::vector<std::shared_ptr<View>> _views;
+};
+
+} // namespace kestrum::qt

@@ -1,0 +1,48 @@
+#pragma once
+
+#include "frontends/qt/Alert.h"
+#include "frontends/qt/Navigation.h"
+
+namespace kestrum::qt {
+
+/// The one window: full screen on a handset, a handset's shape on a desktop.
+class MainWindow final : public QWidget, public Window {
+public:
+    MainWindow();
+    ~MainWindow() override;
+
+    void setRoot(NavigationView& root) override;
+    void makeKeyAndVisible() override;
+    void orderOut() override
+    {
+        if (!_abandoned)
+            hide();
+    }
+    /// The display is gone: the window is left as it is.
+    void abandon() { _abandoned = true; }
+
+    void showAlert(std::string_view title, std::string_view message, std::string_view button);
+    Alert* alert() const { return _alert; }
+    Navigation* root() const { return _root; }
+
+protected:
+    void resizeEvent(QResizeEvent*) override;
+
+private:
+    struct Message {
+        QString title, text, button;
+    };
+    void showNextAlert();
+
+    bool _abandoned = false;
+    QPointer<Navigation> _root;
+    QPointer<Alert> _alert;
+    std::vector<Message> _messages; ///< waiting behind `_alert`
+};
+
+/// Whether the whole screen is ours: a handset's, or one without a desktop.
+bool isHandset();
+/// The screen as the application knows it: a handset's own, on a desktop the piece of it that the window takes.
+QRect screenArea();
+
+} // namespace kestrum::qt

@@ -1,0 +1,237 @@
+#include "frontends/qt/Navigation.h"
+
+#include "frontends/qt/Colours.h"
+#include "frontends/qt/Measures.h"
+#include "frontends/qt/Paint.h"
+#include "frontends/qt/Type.h"
+
+#include <QKeyEvent>
+#include <QMouseEvent>
+
+namespace kestrum::qt {
+
+TitleBar::TitleBar(QWidget* parent) : QWidget(parent), _back(Button::Kind::Back, {}, this), _title(this)
+{
+    setAutoFillBackground(true);
+    _title.setFont(semiboldFont(kTitleSize));
+    _title.setTextFormat(Qt::PlainText);
+    _title.setAlignment(Qt::AlignCenter);
+    _back.hide();
+}
+
+void TitleBar::setTitles(const std::vector<std::string>& titles)
+{
+    _title.setLine(lineOf(titles.empty() ? "" : titles.back()));
+    _back.setVisible(titles.size() > 1);
+    if (titles.size() > 1) {
+        const QString to = lineOf(titles[titles.size() - 2]);
+        _back.setText(to);
+        _back.setAccessibleName(QStringLiteral("Back to %1").arg(to));
+    }
+    arrange();
+}
+
+void TitleBar::arrange()
+{
+    const int column = std::min(width(), kColumn), left = (width() - column) / 2;
+    const int backWidth = _back.isHidden() ? 0 : std::min(_back.sizeHint().width(), column * 2 / 5);
+    _back.setGeometry(left, 2, backWidth, kRowHeight);
+    // In the middle of the bar if it fits there, beside the button if not.
+    const int from = backWidth ? backWidth + kGap : kInset, to = column - kInset;
+    const int wanted = std::min(static_cast<int>(_title.wanted()), to - from);
+    const int x = std::clamp((column - wanted) / 2, from, to - wanted);
+    _title.setGeometry(left + x, 2, wanted, kRowHeight);
+}
+
+void TitleBar::resizeEvent(QResizeEvent*)
+{
+    arrange();
+}
+
+void TitleBar::paintEvent(QPaintEvent*)
+{
+    QPainter painter(this);
+    fillHairline(painter, *this, height(), 0, width(), coloursOf(*this).line);
+}
+
+Navigation::Navigation(NavigationViewDelegate& delegate) : _delegate(delegate), _bar(this), _stage(this)
+{
+    setAutoFillBackground(true);
+    _stage.setBackgroundRole(QPalette::Base);
+    _stage.setAutoFillBackground(true);
+    connect(&_bar.back(), &QAbstractButton::clicked, this, [this] { goBack(); });
+}
+
+Navigation::~Navigation()
+{
+    _slide.finish();
+    _rise.finish();
+    // Panes and the sheet belong to their controllers.
+    for (QWidget* each : std::initializer_list<QWidget*>{_table, _toolbar, _sheet})
+        if (each)
+            each->setParent(nullptr);
+}
+
+void Navigation::goBack()
+{
+    if (_depth > 1 && !_sheet)
+        _delegate.backRequested();
+}
+
+void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated)
+{
+    // This front end makes every screen, so it is one of ours.
+    auto& screen = static_cast<Screen&>(pane);
+    _slide.finish();
+    Table* const old = _table;
+    Toolbar* const oldBar = _toolbar;
+    Table* const fresh = &screen.table();
+    if (old == fresh)
+        return setTitles(std::move(titles));
+
+    const bool slides = animated && transition != Transition::None && old && old->isVisible() && motionWanted();
+    const bool ringed = old && old->isRinged();
+    QPointer<Still> still = slides ? new Still(*old, &_stage) : nullptr;
+    _table = fresh;
+    _toolbar = &screen.toolbar();
+    fresh->setParent(&_stage);
+    screen.toolbar().setParent(this);
+    fresh->clearSelection();
+    fresh->onSwipeBack([this] { goBack(); });
+    setTitles(std::move(titles));
+    arrange();
+    fresh->show();
+    if (ringed)
+        fresh->setRinged(true);
+    takeFocus();
+    // What leaves goes out of reach at once; only its picture stays until it has moved away.
+    if (old) {
+        old->setParent(nullptr);
+        old->onSwipeBack(nullptr);
+    }
+    if (oldBar)
+        oldBar->setParent(nullptr);
+    if (!still)
+        return;
+    still->show();
+    fresh->raise();
+    // The old pane goes a little slower than the new one, which covers it.
+    const int way = transition == Transition::Push ? _stage.width() : -_stage.width();
+    _slide.start(
+        kSlide,
+        [this, still, way](double done) {
+            if (_table)
+                _table->move(qRound(way * (1 - done)), 0);
+            if (still)
+                still->move(qRound(-0.8 * way * done), 0);
+        },
+        [still] { delete still; });
+}
+
+void Navigation::setTitles(std::vector<std::string> titles)
+{
+    _depth = titles.size();
+    _bar.setTitles(titles);
+}
+
+void Navigation::setToolbarHidden(bool hidden)
+{
+    _toolbarHidden = hidden;
+    arrange();
+}
+
+void Navigation::present(SaveInterface& screen, bool animated)
+{
+    // This front end makes every save interface, so it is one of ours.
+    _sheet = static_cast<SaveSheet*>(&screen);
+    _sheet->setParent(this);
+    _sheet->setGeometry(rect());
+    _sheet->show();
+    _sheet->raise();
+    takeFocus();
+    if (animated && motionWanted())
+        _rise.start(kSheet, [this](double done) {
+            if (_sheet)
+                _sheet->setRisen(done);
+        });
+}
+
+void Navigation::dismiss(bool animated)
+{
+    _rise.finish();
+    if (!_sheet)
+        return;
+    SaveSheet* const sheet = std::exchange(_sheet, nullptr);
+    const QPointer<Still> still = animated && motionWanted() ? new Still(sheet->card(), this) : nullptr;
+    sheet->setParent(nullptr);
+    takeFocus();
+    if (!still)
+        return;
+    still->show();
+    const int from = still->y();
+    _rise.start(
+        kSheet,
+        [this, still, from](double done) {
+            if (still)
+                still->move(still->x(), from + qRound((height() - from) * done));
+        },
+        [still] { delete still; });
+}
+
+void Navigation::takeFocus()
+{
+    // What lies under a modal screen is out of reach, of Tab and of a screen reader too.
+    for (QWidget* each : std::initializer_list<QWidget*>{&_bar, &_stage, _toolbar})
+        if (each)
+            each->setEnabled(!_sheet);
+    if (_sheet)
+        _sheet->takeFocus();
+    else if (_table)
+        _table->setFocus(Qt::OtherFocusReason);
+}
+
+void Navigation::arrange()
+{
+    const int bottom = _toolbarHidden || !_toolbar ? 0 : kBarHeight;
+    _bar.setGeometry(0, 0, width(), kBarHeight);
+    _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - bottom));
+    if (_table)
+        _table->setGeometry(_stage.rect());
+    if (_toolbar) {
+        _toolbar->setGeometry(0, height() - bottom, width(), kBarHeight);
+        _toolbar->setVisible(bottom > 0);
+    }
+}
+
+void Navigation::resizeEvent(QResizeEvent*)
+{
+    _slide.finish();
+    _rise.finish();
+    arrange();
+    if (_sheet)
+        _sheet->setGeometry(rect());
+}
+
+void Navigation::keyPressEvent(QKeyEvent* event)
+{
+    switch (event->key()) {
+    case Qt::Key_Escape:
+    case Qt::Key_Backspace:
+    case Qt::Key_Back:
+        if (!event->isAutoRepeat())
+            goBack();
+        return;
+    default:
+        event->ignore();
+    }
+}
+
+void Navigation::mousePressEvent(QMouseEvent* event)
+{
+    if (event->button() == Qt::BackButton)
+        goBack();
+    else
+        event->ignore();
+}
+
+} // namespace kestrum::qt

@@ -1,0 +1,72 @@
+#pragma once
+
+#include "frontends/qt/Button.h"
+#include "frontends/qt/Motion.h"
+#include "frontends/qt/SaveSheet.h"
+#include "frontends/qt/Screen.h"
+
+#include <QPointer>
+
+namespace kestrum::qt {
+
+/// Where one is, and the way back.
+class TitleBar final : public QWidget {
+public:
+    explicit TitleBar(QWidget* parent);
+    void setTitles(const std::vector<std::string>& titles);
+    Button& back() { return _back; }
+    QString title() const { return _title.accessibleName(); }
+
+protected:
+    void paintEvent(QPaintEvent*) override;
+    void resizeEvent(QResizeEvent*) override;
+
+private:
+    void arrange();
+
+    Button _back;
+    LineLabel _title;
+};
+
+/// Title bar, the top pane's table, its toolbar; over them the save sheet while it is presented.
+class Navigation final : public QWidget, public NavigationView {
+public:
+    explicit Navigation(NavigationViewDelegate& delegate);
+    ~Navigation() override;
+
+    using QWidget::show;
+    void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) override;
+    void setTitles(std::vector<std::string> titles) override;
+    void setToolbarHidden(bool hidden) override;
+    void present(SaveInterface& screen, bool animated) override;
+    void dismiss(bool animated) override;
+
+    TitleBar& titleBar() { return _bar; }
+    Table* table() const { return _table; }
+    Toolbar* toolbar() const { return _toolbar; }
+    SaveSheet* sheet() const { return _sheet; }
+    bool isMoving() const { return _slide.isRunning() || _rise.isRunning(); }
+    /// Gives the keyboard to what is on top: the sheet, or the pane.
+    void takeFocus();
+
+protected:
+    void resizeEvent(QResizeEvent*) override;
+    void keyPressEvent(QKeyEvent* event) override;
+    void mousePressEvent(QMouseEvent* event) override;
+
+private:
+    void arrange();
+    void goBack();
+
+    NavigationViewDelegate& _delegate;
+    TitleBar _bar;
+    QWidget _stage; ///< what slides, slides in here
+    QPointer<Table> _table;
+    QPointer<Toolbar> _toolbar;
+    QPointer<SaveSheet> _sheet;
+    std::size_t _depth = 0;
+    bool _toolbarHidden = true;
+    Movement _slide, _rise;
+};
+
+} // namespace kestrum::qt

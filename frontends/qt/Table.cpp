@@ -1,0 +1,468 @@
+#include "frontends/qt/Table.h"
+
+#include "frontends/qt/Measures.h"
+#include "frontends/qt/Paint.h"
+
+#include <QAccessible>
+#include <QKeyEvent>
+#include <QMouseEvent>
+#include <QScrollBar>
+#include <QScroller>
+#include <algorithm>
+#include <cmath>
+
+namespace kestrum::qt {
+
+namespace {
+
+constexpr int kSidewaysStep = 60; // points that an arrow key moves a strip by
+constexpr double kEdge = 24;      // points from the left edge within which a swipe back begins
+constexpr double kSwipe = 60;     // points that it takes
+
+/// Every cell comes from a table's `makeCell`, so it is one of ours.
+Cell& cellOf(ReusableCell& reusable)
+{
+    return static_cast<Cell&>(reusable.cell());
+}
+
+/// A slim line at the right edge, as long as the share of the rows that is in view.
+class ScrollMark final : public QWidget {
+public:
+    explicit ScrollMark(const QScrollBar& bar, QWidget* parent) : QWidget(parent), _bar(bar)
+    {
+        setAttribute(Qt::WA_TransparentForMouseEvents);
+    }
+
+protected:
+    void paintEvent(QPaintEvent*) override
+    {
+        const double whole = _bar.maximum() + _bar.pageStep();
+        if (_bar.maximum() == 0)
+            return;
+        const double length = std::max(24.0, height() * _bar.pageStep() / whole);
+        const double top = (height() - length) * _bar.value() / _bar.maximum();
+        QPainter painter(this);
+        painter.setRenderHint(QPainter::Antialiasing);
+        painter.setPen(Qt::NoPen);
+        painter.setBrush(coloursOf(*this).muted);
+        painter.drawRoundedRect(QRectF(0, top, width(), length), width() / 2.0, width() / 2.0);
+    }
+
+private:
+    const QScrollBar& _bar;
+};
+
+} // namespace
+
+Table::Table(TableDataSource& source) : _source(source)
+{
+    setFrameShape(QFrame::NoFrame);
+    setFocusPolicy(Qt::StrongFocus);
+    setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+    setVerticalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+    viewport()->setBackgroundRole(QPalette::Base);
+    viewport()->setAutoFillBackground(true);
+    _mark = new ScrollMark(*verticalScrollBar(), viewport());
+
+    QScrollerProperties properties;
+    properties.setScrollMetric(QScrollerProperties::VerticalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
+    properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
+    properties.setScrollMetric(QScrollerProperties::DragStartDistance, 0.0); // the table itself tells drags from taps
+    QScroller::scroller(this)->setScrollerProperties(properties);
+}
+
+Table::~Table()
+{
+    // Cells belong to those who share them, not to the viewport.
+    for (QWidget* child : viewport()->findChildren<QWidget*>(Qt::FindDirectChildrenOnly))
+        if (dynamic_cast<Cell*>(child))
+            child->setParent(nullptr);
+}
+
+void Table::reloadData()
+{
+    // A table that nobody sees asks when it is shown.
+    _stale = true;
+    if (isVisible())
+        fill(true);
+    if (_fitsRows)
+        updateGeometry();
+}
+
+std::shared_ptr<ReusableCell> Table::dequeueReusableCell(std::string_view reuseIdentifier)
+{
+    auto reusable = _asked ? _spare.take(*_asked, reuseIdentifier) : nullptr;
+    if (reusable)
+        cellOf(*reusable).resize(columnWidth(), kRowHeight);
+    return reusable;
+}
+
+std::unique_ptr<TableCell> Table::makeCell(CellStyle style)
+{
+    auto cell = std::make_unique<Cell>(style);
+    cell->setParent(viewport());
+    cell->resize(columnWidth(), kRowHeight);
+    return cell;
+}
+
+void Table::deselectRow(IndexPath indexPath, bool)
+{
+    if (_selected == indexPath.row)
+        clearSelection();
+}
+
+void Table::clearSelection()
+{
+    _selected.reset();
+    refreshLooks();
+}
+
+QSize Table::sizeHint() const
+{
+    const int rows = _fitsRows ? static_cast<int>(_source.numberOfRowsInSection(const_cast<Table&>(*this), 0)) : 3;
+    return {kPhoneWidth, rows * kRowHeight};
+}
+
+// Rows and cells ------------------------------------------------------------------------------------------------
+
+int Table::offset() const
+{
+    return verticalScrollBar()->value();
+}
+int Table::columnWidth() const
+{
+    return std::min(viewport()->width(), kColumn);
+}
+
+void Table::fill(bool anew)
+{
+    if (_filling)
+        return;
+    _filling = true;
+    if (anew) {
+        _stale = false;
+        _rows = _source.numberOfRowsInSection(*this, 0);
+        _laidOutWidth = columnWidth();
+        if (_current >= _rows)
+            _current = _rows ? std::optional(_rows - 1) : std::nullopt;
+        if (_selected >= _rows)
+            _selected.reset();
+    }
+    const int height = viewport()->height();
+    const int whole = static_cast<int>(std::min<std::size_t>(_rows, 40'000'000)) * kRowHeight;
+    verticalScrollBar()->setPageStep(height);
+    verticalScrollBar()->setSingleStep(kRowHeight);
+    verticalScrollBar()->setRange(0, std::max(0, whole - height));
+
+    const auto first = static_cast<std::size_t>(offset() / kRowHeight);
+    const auto end = std::min(_rows, static_cast<std::size_t>((offset() + height + kRowHeight - 1) / kRowHeight));
+    std::vector<QPointer<Cell>> left;
+    for (auto each = _shown.begin(); each != _shown.end();)
+        if (anew || each->first < first || each->first >= end) {
+            left.emplace_back(&cellOf(*each->second));
+            spare(each->first, std::move(each->second));
+            each = _shown.erase(each);
+        } else {
+            ++each;
+        }
+    for (std::size_t row = first; row < end; ++row)
+        if (!_shown.contains(row))
+            showRow(row);
+    // Only now: what shows a row again is never hidden in between.
+    for (const auto& cell : left)
+        if (cell && !rowOf(*cell))
+            cell->hide();
+    _filling = false;
+    place();
+    refreshLooks();
+}
+
+void Table::spare(std::size_t row, std::shared_ptr<ReusableCell> reusable)
+{
+    if (const double offset = cellOf(*reusable).sideways(); offset > 0)
+        _sideways[row] = offset;
+    else
+        _sideways.erase(row);
+    _spare.put(row, std::move(reusable));
+}
+
+void Table::showRow(std::size_t row)
+{
+    _asked = row;
+    auto reusable = _source.cellForRowAtIndexPath(*this, {0, row});
+    _asked.reset();
+    Cell& cell = cellOf(*reusable);
+    const auto sideways = _sideways.find(row);
+    cell.layoutSubviews();
+    cell.setRow(row);
+    cell.setSideways(sideways == _sideways.end() ? 0 : sideways->second);
+    _shown.emplace(row, std::move(reusable));
+}
+
+void Table::place()
+{
+    const int x = (viewport()->width() - columnWidth()) / 2;
+    for (const auto& [row, reusable] : _shown) {
+        Cell& cell = cellOf(*reusable);
+        cell.setGeometry(x, static_cast<int>(row) * kRowHeight - offset(), columnWidth(), kRowHeight);
+        cell.show();
+    }
+    _mark->setGeometry(viewport()->width() - 3, 2, 2, viewport()->height() - 4);
+    _mark->raise();
+    _mark->update();
+}
+
+void Table::refreshLooks()
+{
+    for (const auto& [row, reusable] : _shown)
+        cellOf(*reusable).setLook({.pressed = _press && _press->row == row && _press->drag == Drag::Undecided,
+                                   .selected = _selected == row,
+                                   .ringed = _ringed && hasFocus() && _current == row});
+}
+
+Cell* Table::cellAt(std::size_t row) const
+{
+    const auto found = _shown.find(row);
+    return found == _shown.end() ? nullptr : &cellOf(*found->second);
+}
+
+std::vector<Cell*> Table::cellsInView() const
+{
+    std::vector<Cell*> cells;
+    for (const auto& [row, reusable] : _shown)
+        cells.push_back(&cellOf(*reusable));
+    return cells;
+}
+
+std::size_t Table::cells() const
+{
+    const auto children = viewport()->findChildren<QWidget*>(Qt::FindDirectChildrenOnly);
+    return static_cast<std::size_t>(
+        std::count_if(children.begin(), children.end(), [](QWidget* each) { return dynamic_cast<Cell*>(each); }));
+}
+
+std::optional<std::size_t> Table::rowOf(const Cell& cell) const
+{
+    const auto found = _shown.find(cell.row());
+    return found != _shown.end() && &cellOf(*found->second) == &cell ? std::optional(cell.row()) : std::nullopt;
+}
+
+std::optional<std::size_t> Table::rowAt(QPointF point) const
+{
+    const double y = point.y() + offset();
+    const double x = point.x() - (viewport()->width() - columnWidth()) / 2.0;
+    if (y < 0 || x < 0 || x >= columnWidth() || y >= static_cast<double>(_rows) * kRowHeight)
+        return std::nullopt;
+    return static_cast<std::size_t>(y / kRowHeight);
+}
+
+void Table::resizeEvent(QResizeEvent* event)
+{
+    QAbstractScrollArea::resizeEvent(event);
+    if (isVisible())
+        fill(_stale || columnWidth() != _laidOutWidth);
+}
+
+void Table::showEvent(QShowEvent* event)
+{
+    QAbstractScrollArea::showEvent(event);
+    fill(_stale || columnWidth() != _laidOutWidth);
+}
+
+void Table::scrollContentsBy(int, int)
+{
+    if (isVisible())
+        fill(false);
+}
+
+// Touch and mouse -----------------------------------------------------------------------------------------------
+
+void Table::feed(QScroller& scroller, int input, const QMouseEvent& event)
+{
+    const QPointF at = input == QScroller::InputPress && _press ? _press->at : event.position();
+    scroller.handleInput(static_cast<QScroller::Input>(input), at, static_cast<qint64>(event.timestamp()));
+}
+
+void Table::mousePressEvent(QMouseEvent* event)
+{
+    if (event->button() != Qt::LeftButton)
+        return event->ignore();
+    QScroller& upright = *QScroller::scroller(this);
+    const bool stops = upright.state() == QScroller::Scrolling;
+    _press = Press{event->position(), stops ? std::nullopt : rowAt(event->position()), Drag::Undecided, nullptr};
+    if (const auto row = rowAt(event->position()))
+        if (const Cell* cell = cellAt(*row))
+            _press->strip = cell->strip();
+    _ringed = false;
+    feed(upright, QScroller::InputPress, *event);
+    if (_press->strip)
+        feed(*QScroller::scroller(_press->strip.data()), QScroller::InputPress, *event);
+    refreshLooks();
+}
+
+void Table::mouseMoveEvent(QMouseEvent* event)
+{
+    if (!_press)
+        return;
+    const QPointF moved = event->position() - _press->at;
+    if (_press->drag == Drag::Undecided) {
+        constexpr double kStart = 8; // points; a finger on a tap moves less
+        if (moved.manhattanLength() < kStart)
+            return;
+        const bool sideways = std::abs(moved.x()) > std::abs(moved.y());
+        if (!sideways)
+            _press->drag = Drag::Upright;
+        else if (moved.x() > 0 && _press->at.x() < kEdge)
+            _press->drag = Drag::Ignored; // a swipe back, if it goes far enough
+        else
+            _press->drag = _press->strip ? Drag::Sideways : Drag::Ignored;
+        refreshLooks();
+    }
+    if (_press->drag == Drag::Upright)
+        feed(*QScroller::scroller(this), QScroller::InputMove, *event);
+    else if (_press->drag == Drag::Sideways && _press->strip)
+        feed(*QScroller::scroller(_press->strip.data()), QScroller::InputMove, *event);
+}
+
+void Table::mouseReleaseEvent(QMouseEvent* event)
+{
+    if (event->button() != Qt::LeftButton || !_press)
+        return event->ignore();
+    feed(*QScroller::scroller(this), QScroller::InputRelease, *event);
+    if (_press->strip)
+        feed(*QScroller::scroller(_press->strip.data()), QScroller::InputRelease, *event);
+    const Press press = *std::exchange(_press, std::nullopt);
+    refreshLooks();
+    if (press.drag == Drag::Undecided && press.row && press.row == rowAt(event->position())) {
+        _current = press.row;
+        select(*press.row);
+    } else if (press.drag == Drag::Ignored && press.at.x() < kEdge && event->position().x() - press.at.x() > kSwipe &&
+               _swipedBack) {
+        _swipedBack();
+    }
+}
+
+void Table::wheelEvent(QWheelEvent* event)
+{
+    QPoint delta = event->pixelDelta().isNull() ? event->angleDelta() / 2 : event->pixelDelta();
+    if (event->modifiers() & Qt::ShiftModifier)
+        delta = {delta.x() ? delta.x() : delta.y(), 0};
+    if (std::abs(delta.x()) > std::abs(delta.y())) {
+        if (const auto row = rowAt(event->position()))
+            scrollSideways(*row, -delta.x());
+    } else {
+        verticalScrollBar()->setValue(offset() - delta.y());
+    }
+    event->accept();
+}
+
+void Table::scrollSideways(std::size_t row, double by)
+{
+    if (Cell* cell = cellAt(row))
+        cell->setSideways(cell->sideways() + by);
+}
+
+void Table::select(std::size_t row)
+{
+    if (_stale && isVisible())
+        fill(true);
+    if (row >= _rows)
+        return;
+    _selected = row;
+    refreshLooks();
+    _source.didSelectRowAtIndexPath(*this, IndexPath{0, row});
+}
+
+// Keyboard ------------------------------------------------------------------------------------------------------
+
+bool Table::event(QEvent* event)
+{
+    // A row's width does not change with the scheme or the font, but what stands in it does.
+    if (event->type() == QEvent::ApplicationFontChange && isVisible())
+        fill(true);
+    return QAbstractScrollArea::event(event);
+}
+
+void Table::setRinged(bool ringed)
+{
+    _ringed = ringed;
+    if (ringed && !_current && _rows)
+        _current = static_cast<std::size_t>(offset() / kRowHeight);
+    refreshLooks();
+}
+
+void Table::makeCurrent(std::size_t row)
+{
+    _current = row;
+    _ringed = true;
+    scrollTo(row);
+    refreshLooks();
+    if (Cell* cell = cellAt(row)) {
+        QAccessibleEvent focus(cell, QAccessible::Focus);
+        QAccessible::updateAccessibility(&focus);
+    }
+}
+
+void Table::scrollTo(std::size_t row)
+{
+    const int top = static_cast<int>(row) * kRowHeight;
+    if (top < offset())
+        verticalScrollBar()->setValue(top);
+    else if (top + kRowHeight > offset() + viewport()->height())
+        verticalScrollBar()->setValue(top + kRowHeight - viewport()->height());
+}
+
+void Table::keyPressEvent(QKeyEvent* event)
+{
+    const auto page = static_cast<std::size_t>(std::max(1, viewport()->height() / kRowHeight - 1));
+    const auto to = [&](std::size_t row) {
+        QScroller::scroller(this)->stop();
+        makeCurrent(std::min(row, _rows - 1));
+    };
+    const std::size_t at = _current.value_or(0);
+    if (_rows == 0)
+        return event->ignore();
+    switch (event->key()) {
+    case Qt::Key_Down:
+        return to(_current ? at + 1 : 0);
+    case Qt::Key_Up:
+        return to(at ? at - 1 : 0);
+    case Qt::Key_PageDown:
+        return to(at + page);
+    case Qt::Key_PageUp:
+        return to(at > page ? at - page : 0);
+    case Qt::Key_Home:
+        return to(0);
+    case Qt::Key_End:
+        return to(_rows - 1);
+    case Qt::Key_Right:
+        return _current ? scrollSideways(at, kSidewaysStep) : void();
+    case Qt::Key_Left:
+        return _current ? scrollSideways(at, -kSidewaysStep) : void();
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+    case Qt::Key_Space:
+    case Qt::Key_Select:
+        if (_current && !event->isAutoRepeat()) {
+            makeCurrent(at);
+            select(at);
+        }
+        return;
+    default:
+        event->ignore();
+    }
+}
+
+void Table::focusInEvent(QFocusEvent* event)
+{
+    QAbstractScrollArea::focusInEvent(event);
+    setRinged(_ringed || event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason);
+}
+
+void Table::focusOutEvent(QFocusEvent* event)
+{
+    QAbstractScrollArea::focusOutEvent(event);
+    refreshLooks();
+}
+
+} // namespace kestrum::qt

@@ -1,0 +1,104 @@
+#pragma once
+
+#include "frontends/qt/Cell.h"
+#include "platform/ReusePool.h"
+#include "platform/Toolkit.h"
+
+#include <QAbstractScrollArea>
+#include <QPointer>
+#include <functional>
+#include <map>
+#include <optional>
+#include <vector>
+
+class QScroller;
+
+namespace kestrum::qt {
+
+/// The table: cells for the rows in view, and a few spare ones.
+class Table final : public QAbstractScrollArea, public TableView {
+public:
+    explicit Table(TableDataSource& source);
+    ~Table() override;
+
+    void reloadData() override;
+    std::shared_ptr<ReusableCell> dequeueReusableCell(std::string_view reuseIdentifier) override;
+    std::unique_ptr<TableCell> makeCell(CellStyle style) override;
+    void deselectRow(IndexPath indexPath, bool animated) override;
+    void sizeToFit() override
+    {
+        _fitsRows = true;
+        updateGeometry();
+    }
+
+    std::size_t rows() const { return _rows; }
+    std::optional<std::size_t> current() const { return _current; } ///< where the keyboard is
+    std::optional<std::size_t> selected() const { return _selected; }
+    void clearSelection();
+    /// Whether the keyboard's place is shown; the pane that opens takes it over from the one that was left.
+    bool isRinged() const { return _ringed; }
+    void setRinged(bool ringed);
+    void makeCurrent(std::size_t row);
+    /// As a tap or Enter does.
+    void select(std::size_t row);
+
+    Cell* cellAt(std::size_t row) const;                      ///< null when it is not in view
+    std::vector<Cell*> cellsInView() const;                   ///< top down
+    std::optional<std::size_t> rowOf(const Cell& cell) const; ///< nothing when it is not in view
+    std::size_t cells() const;                                ///< those that wait to be used again among them
+
+    /// Told of a swipe from the left edge.
+    void onSwipeBack(std::function<void()> action) { _swipedBack = std::move(action); }
+
+    QSize sizeHint() const override;
+
+protected:
+    bool event(QEvent* event) override;
+    void resizeEvent(QResizeEvent* event) override;
+    void showEvent(QShowEvent* event) override;
+    void scrollContentsBy(int dx, int dy) override;
+    void keyPressEvent(QKeyEvent* event) override;
+    void mousePressEvent(QMouseEvent* event) override;
+    void mouseMoveEvent(QMouseEvent* event) override;
+    void mouseReleaseEvent(QMouseEvent* event) override;
+    void mouseDoubleClickEvent(QMouseEvent* event) override { mousePressEvent(event); }
+    void wheelEvent(QWheelEvent* event) override;
+    void focusInEvent(QFocusEvent* event) override;
+    void focusOutEvent(QFocusEvent* event) override;
+
+private:
+    enum class Drag { Undecided, Sideways, Upright, Ignored };
+    struct Press {
+        QPointF at;
+        std::optional<std::size_t> row; ///< nothing when the press stopped a scroll
+        Drag drag = Drag::Undecided;
+        QPointer<Strip> strip;
+    };
+
+    int offset() const;
+    int columnWidth() const;
+    std::optional<std::size_t> rowAt(QPointF point) const;
+    void fill(bool anew);
+    void showRow(std::size_t row);
+    void spare(std::size_t row, std::shared_ptr<ReusableCell> reusable);
+    void place();
+    void refreshLooks();
+    void scrollTo(std::size_t row);
+    void feed(QScroller& scroller, int input, const QMouseEvent& event);
+    void scrollSideways(std::size_t row, double by);
+
+    TableDataSource& _source;
+    std::size_t _rows = 0;
+    std::map<std::size_t, std::shared_ptr<ReusableCell>> _shown; ///< by row
+    ReusePool _spare;
+    std::map<std::size_t, double> _sideways; ///< offsets of rows out of view that are not 0
+    std::optional<std::size_t> _asked;       ///< the row whose cell the data source is making
+    std::optional<std::size_t> _current, _selected;
+    std::optional<Press> _press;
+    std::function<void()> _swipedBack;
+    int _laidOutWidth = -1;
+    bool _filling = false, _stale = true, _ringed = false, _fitsRows = false;
+    QWidget* _mark; ///< how far the table is scrolled
+};
+
+} // namespace kestrum::qt

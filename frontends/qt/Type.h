@@ -1,0 +1,27 @@
+#pragma once
+
+#include "platform/Toolkit.h"
+
+#include <QFont>
+#include <QRectF>
+#include <QString>
+
+/// Text as the window draws and measures it.
+namespace kestrum::qt {
+
+/// The font at its size in points; an empty family is the system's sans.
+QFont fontOf(const Font& font);
+/// Of bars and cards: heavier than the text around it, lighter than a row's key.
+QFont semiboldFont(double size);
+
+/// UTF-8 as it stands in one line: line breaks and other controls become blanks.
+QString lineOf(std::string_view text);
+
+Size measured(const QString& line, const QFont& font);
+
+inline QRectF rectOf(const Rect& rect)
+{
+    return {rect.x, rect.y, rect.width, rect.height};
+}
+
+} // namespace kestrum::qt
