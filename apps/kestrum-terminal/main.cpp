@@ -1,0 +1,53 @@
+#include "frontends/terminal/TerminalToolkit.h"
+#include "frontends/terminal/TextDisplay.h"
+#include "platform/linux/LinuxDevice.h"
+#include "ui/KestrumApp.h"
+
+#include <CLI/CLI.hpp>
+#include <QCoreApplication>
+
+#include <iostream>
+
+using namespace kestrum;
+
+int main(int argc, char** argv)
+{
+    const auto charset = chooseLocale();
+    const QCoreApplication loop(argc, argv);
+
+    CLI::App arguments("Cellular field test in a terminal. Keys: ? shows them.");
+    constexpr int kRefreshes = 3;
+    int refreshes = 0; // stays 0 for a bare --text
+    arguments.set_version_flag("--version", "kestrum-terminal " KESTRUM_VERSION);
+    const auto* text = arguments.add_option("--text", refreshes, "Print the tree of the first N refreshes, then end")
+                           ->option_text("[N=3]")
+                           ->expected(0, 1)
+                           ->check(CLI::PositiveNumber);
+    try {
+        arguments.parse(argc, argv);
+    } catch (const CLI::ParseError& error) {
+        return arguments.exit(error) == 0 ? 0 : 2;
+    }
+
+    const auto problem = TerminalToolkit::problem();
+    if (!*text && problem) {
+        std::cerr << "kestrum-terminal: " << *problem << "; --text prints without one\n";
+        return 1;
+    }
+
+    if (refreshes == 0)
+        refreshes = kRefreshes;
+
+    TerminalToolkit toolkit(charset);
+    LinuxDevice device("kestrum-terminal", LinuxDevice::Output::Quiet);
+    auto roles = device.applicationRoles(toolkit);
+    int status = 0;
+    if (*text) {
+        status = TextDisplay(roles, std::cout, refreshes).run();
+    } else {
+        const auto application = KestrumApp::make(roles);
+        status = toolkit.run(*application);
+    }
+    device.dropQueued();
+    return status;
+}

@@ -1,0 +1,138 @@
+#include "frontends/terminal/Cells.h"
+
+#include <algorithm>
+#include <cmath>
+#include <stdexcept>
+
+namespace kestrum {
+
+namespace {
+
+constexpr int kInset = 1; // columns, on either side of a row
+
+int column(double points)
+{
+    return static_cast<int>(std::lround(points / kPointsPerColumn));
+}
+
+std::string_view mark(Accessory accessory)
+{
+    switch (accessory) {
+    case Accessory::DisclosureIndicator:
+        return "›";
+    case Accessory::CheckMark:
+        return "✓";
+    case Accessory::None:
+        break;
+    }
+    return "";
+}
+
+} // namespace
+
+void TerminalLabel::draw(const Line& line) const
+{
+    if (_text)
+        line.part(column(_frame.x), column(_frame.width)).put(0, *_text, {.bold = _font.bold});
+}
+
+int TerminalLabel::end() const
+{
+    return column(_frame.x) + (_text ? columns(*_text) : 0);
+}
+
+void Subviews::add(std::shared_ptr<View> view)
+{
+    auto* drawn = dynamic_cast<Drawn*>(view.get());
+    if (!drawn)
+        throw std::invalid_argument("a view of another toolkit");
+    _drawn.push_back(drawn);
+    _views.push_back(std::move(view));
+}
+
+void Subviews::draw(const Line& line) const
+{
+    for (const auto* each : _drawn)
+        each->draw(line);
+}
+
+int Subviews::end() const
+{
+    int end = 0;
+    for (const auto* each : _drawn)
+        end = std::max(end, each->end());
+    return end;
+}
+
+const std::string* Subviews::name() const
+{
+    for (const auto* each : _drawn)
+        if (const auto* name = each->name())
+            return name;
+    return nullptr;
+}
+
+bool Subviews::scrollSideways(int columns)
+{
+    bool moved = false;
+    for (auto* each : _drawn)
+        moved |= each->scrollSideways(columns);
+    return moved;
+}
+
+int TerminalScrollView::furthest() const
+{
+    // The content's width may reach further than its texts do: nobody wants to scroll into nothing.
+    if (_contentSize.width <= _frame.width)
+        return 0;
+    return std::max(0, std::min(_content.end(), column(_contentSize.width)) - column(_frame.width));
+}
+
+void TerminalScrollView::draw(const Line& line) const
+{
+    const int scrolled = std::min(_scrolled, furthest());
+    auto strip = line.part(column(_frame.x), column(_frame.width), scrolled);
+    _content.draw(strip);
+    strip.markCut(scrolled > 0, scrolled < furthest());
+}
+
+int TerminalScrollView::end() const
+{
+    return column(_frame.x + _frame.width);
+}
+
+bool TerminalScrollView::scrollSideways(int columns)
+{
+    const int before = std::min(_scrolled, furthest());
+    _scrolled = std::clamp(before + columns, 0, furthest());
+    return _scrolled != before;
+}
+
+int TerminalCell::contentColumns() const
+{
+    return std::max(0, _columns - kInset - (_accessory == Accessory::None ? 0 : 2));
+}
+
+Rect TerminalCell::contentBounds() const
+{
+    return {0, 0, contentColumns() * kPointsPerColumn, kPointsPerLine};
+}
+
+std::string TerminalCell::name() const
+{
+    const auto* name = _style == CellStyle::Default ? _textLabel.name() : _content.name();
+    return name ? *name : std::string();
+}
+
+void TerminalCell::draw(const Line& line) const
+{
+    line.fill();
+    const auto content = line.part(0, contentColumns());
+    if (_style == CellStyle::Default)
+        content.part(kInset, content.width() - kInset).put(0, cutAtTheEnd(name(), content.width() - kInset));
+    else
+        _content.draw(content);
+    line.part(_columns - kInset - 1, 1).put(0, mark(_accessory), {.colour = Colour::Accent});
+}
+
+} // namespace kestrum

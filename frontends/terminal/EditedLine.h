@@ -1,0 +1,30 @@
+#pragma once
+
+#include "frontends/terminal/Screen.h"
+
+#include <cstddef>
+#include <string>
+
+namespace kestrum {
+
+/// One line of text under edit, and the place where the next character goes.
+class EditedLine {
+public:
+    std::string text() const { return utf8(_text); }
+    std::string beforeCursor() const { return utf8(std::wstring_view(_text).substr(0, _cursor)); }
+    bool isEmpty() const { return _text.empty(); }
+
+    /// Takes what is typed, and the keys that move and erase. False when the input is not for it.
+    bool handle(const Input& input);
+
+private:
+    bool handleCharacter(wchar_t character);
+    std::size_t before() const; ///< where the character before the cursor begins; its marks belong to it
+    std::size_t after() const;
+    void eraseTo(std::size_t place);
+
+    std::wstring _text;
+    std::size_t _cursor = 0;
+};
+
+} // namespace kestrum

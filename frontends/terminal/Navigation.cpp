@@ -1,0 +1,315 @@
+#include "frontends/terminal/Navigation.h"
+
+#include "frontends/terminal/Box.h"
+
+#include <algorithm>
+#include <array>
+#include <utility>
+
+namespace kestrum {
+
+namespace {
+
+constexpr int kInset = 1, kGap = 2; // columns
+
+struct HelpLine {
+    std::string_view keys, what;
+};
+
+constexpr std::array kHelp = {
+    HelpLine{"Up Down  k j", "choose a row"},
+    HelpLine{"Home End  g G", "first row, last row"},
+    HelpLine{"PgUp PgDn", "a screen up, down"},
+    HelpLine{"Right Enter l", "open the row"},
+    HelpLine{"Left Esc h", "back"},
+    HelpLine{"< >", "move a row sideways"},
+    HelpLine{"/  n", "jump to a name, again"},
+    HelpLine{"s", "save, where offered"},
+    HelpLine{"Ctrl-L", "draw anew"},
+    HelpLine{"q", "quit"},
+    HelpLine{"mouse", "click, wheel"},
+};
+constexpr int kHelpKeys = 15; // columns
+
+} // namespace
+
+void TerminalTableScreen::setToolbarItems(std::vector<ToolbarItem> items, bool)
+{
+    _items = std::move(items);
+    _repaint.repaintLater();
+}
+
+bool TerminalTableScreen::isSpinning() const
+{
+    return std::ranges::any_of(_items, [](const ToolbarItem& each) {
+        const auto* indicator = std::get_if<ActivityIndicatorItem>(&each);
+        return indicator && indicator->running;
+    });
+}
+
+std::string TerminalTableScreen::status() const
+{
+    for (const auto& each : _items)
+        if (const auto* label = std::get_if<LabelItem>(&each))
+            return label->text;
+    return {};
+}
+
+const SaveItem* TerminalTableScreen::saveItem() const
+{
+    for (const auto& each : _items)
+        if (const auto* save = std::get_if<SaveItem>(&each))
+            return save;
+    return nullptr;
+}
+
+void TerminalNavigationView::show(TableScreen& pane, std::vector<std::string> titles, Transition, bool)
+{
+    // All panes come from the same toolkit. A terminal has no transitions: the pane is there at once.
+    _pane = static_cast<TerminalTableScreen*>(&pane);
+    _jump.reset();
+    setTitles(std::move(titles));
+}
+
+void TerminalNavigationView::setTitles(std::vector<std::string> titles)
+{
+    _titles = std::move(titles);
+    _repaint.repaintLater();
+}
+
+void TerminalNavigationView::setToolbarHidden(bool hidden)
+{
+    _toolbarHidden = hidden;
+    _repaint.repaintLater();
+}
+
+void TerminalNavigationView::present(SaveInterface& screen, bool)
+{
+    _save = static_cast<TerminalSaveInterface*>(&screen);
+    _jump.reset();
+    _helpShown = false;
+    _repaint.repaintLater();
+}
+
+void TerminalNavigationView::dismiss(bool)
+{
+    _save = nullptr;
+    _repaint.repaintLater();
+}
+
+void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool inBackground)
+{
+    screen.clear();
+    screen.setDimmed(inBackground || _helpShown);
+    if (_save) {
+        _save->draw(screen);
+        return;
+    }
+    const int rows = screen.rows(), columns = screen.columns();
+    _bottom = rows - 1;
+    int cursorRow = _bottom, cursorColumn = 0;
+    if (_pane) {
+        _pane->table().draw(screen, {1, 0, std::max(0, rows - 2), columns}, true);
+        cursorRow = _pane->table().chosenLine();
+    }
+    drawTitle({screen, 0, 0, columns});
+    const Line bottom(screen, _bottom, 0, columns);
+    if (_jump) {
+        const int end = bottom.put(kInset, "/" + _jump->name.text(), {.bold = true});
+        if (!_jump->found)
+            bottom.put(end + kGap, "no such row", {.colour = Colour::Danger});
+        cursorRow = _bottom;
+        cursorColumn = kInset + 1 + kestrum::columns(_jump->name.beforeCursor());
+    } else if (!_toolbarHidden) {
+        drawToolbar(bottom, spinner);
+    }
+    if (_helpShown) {
+        screen.setDimmed(inBackground);
+        drawHelp(screen);
+    }
+    screen.placeCursor(cursorRow, cursorColumn, _jump.has_value());
+}
+
+void TerminalNavigationView::drawTitle(const Line& line) const
+{
+    const std::string position = _pane ? _pane->table().position() : std::string();
+    const int width = line.width() - 2 * kInset - (position.empty() ? 0 : columns(position) + kGap);
+    std::string path;
+    for (const auto& title : _titles)
+        path += (path.empty() ? "" : " › ") + title;
+    line.put(kInset, cutInTheMiddle(path, width), {.bold = true});
+    line.part(0, line.width() - kInset).putRight(position, {.dim = true});
+}
+
+void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spinner)
+{
+    if (!_pane)
+        return;
+    // What matters most comes first, and what finds no room beside the status is left out from the end.
+    _hints.clear();
+    if (_pane->saveItem())
+        _hints.push_back({L's', "s save"});
+    _hints.push_back({L'?', "? help"});
+    _hints.push_back({L'q', "q quit"});
+    const int spinning = _pane->isSpinning() ? columns(spinner) + 1 : 0;
+    int room = line.width() - 2 * kInset - spinning - columns(_pane->status());
+    std::size_t kept = 0;
+    for (; kept < _hints.size() && columns(_hints[kept].text) + kGap <= room; ++kept)
+        room -= columns(_hints[kept].text) + kGap;
+    // Save is never left out: the status gives way.
+    if (_pane->saveItem())
+        kept = std::max<std::size_t>(kept, 1);
+    _hints.resize(kept);
+
+    int right = line.width() - kInset;
+    for (auto each = _hints.rbegin(); each != _hints.rend(); ++each) {
+        right -= columns(each->text);
+        each->column = right;
+        const bool save = each->key == L's';
+        line.put(right, each->text, {.dim = !save, .colour = save ? Colour::Accent : Colour::Plain});
+        right -= kGap;
+    }
+    if (spinning)
+        line.put(kInset, spinner, {.colour = Colour::Accent});
+    line.put(kInset + spinning, cutAtTheEnd(_pane->status(), right - kInset - spinning));
+}
+
+void TerminalNavigationView::drawHelp(Screen& screen) const
+{
+    int widest = 0;
+    for (const auto& each : kHelp)
+        widest = std::max(widest, kHelpKeys + columns(each.what));
+    const Area inside = drawBox(screen, static_cast<int>(kHelp.size()), widest);
+    for (int row = 0; row < std::min(inside.rows, static_cast<int>(kHelp.size())); ++row) {
+        const Line line(screen, inside.row + row, inside.column, inside.columns);
+        const auto& [keys, what] = kHelp[static_cast<std::size_t>(row)];
+        line.put(0, keys, {.bold = true});
+        line.put(kHelpKeys, what);
+    }
+}
+
+void TerminalNavigationView::handle(const Input& input)
+{
+    _repaint.repaintLater();
+    if (_save)
+        _save->handle(input);
+    else if (_helpShown)
+        _helpShown = input.key == Key::Release || input.key == Key::Other; // anything typed or pressed closes it
+    else if (_jump)
+        handleJump(input);
+    else if (_pane)
+        handlePane(input);
+}
+
+void TerminalNavigationView::handleJump(const Input& input)
+{
+    auto& table = _pane->table();
+    switch (input.key) {
+    case Key::Enter:
+        _lastJump = _jump->name.text();
+        _jump.reset();
+        return;
+    case Key::Escape:
+    case Key::Press:
+        table.choose(_jump->from);
+        _jump.reset();
+        return;
+    case Key::Backspace:
+        if (_jump->name.isEmpty()) {
+            _jump.reset();
+            return;
+        }
+        break;
+    default:
+        break;
+    }
+    if (!_jump->name.handle(input))
+        return;
+    _jump->found = table.choose(_jump->name.text(), _jump->from);
+    if (!_jump->found || _jump->name.isEmpty())
+        table.choose(_jump->from);
+}
+
+void TerminalNavigationView::handlePane(const Input& input)
+{
+    auto& table = _pane->table();
+    switch (input.key) {
+    case Key::Character:
+        handleCommand(input.character);
+        return;
+    case Key::Left:
+    case Key::Escape:
+    case Key::Backspace:
+        _delegate.backRequested();
+        return;
+    case Key::Press:
+        if (input.row == 0)
+            _delegate.backRequested(); // the title line is the back button
+        else if (input.row == _bottom && !_toolbarHidden)
+            for (const auto& each : std::vector(_hints)) {
+                if (input.column >= each.column && input.column < each.column + columns(each.text))
+                    handleCommand(each.key);
+            }
+        else
+            table.handle(input);
+        return;
+    default:
+        table.handle(input);
+        return;
+    }
+}
+
+void TerminalNavigationView::handleCommand(wchar_t key)
+{
+    auto& table = _pane->table();
+    switch (key) {
+    case L'j':
+        table.handle({Key::Down});
+        return;
+    case L'k':
+        table.handle({Key::Up});
+        return;
+    case L'l':
+        table.handle({Key::Right});
+        return;
+    case L'h':
+        _delegate.backRequested();
+        return;
+    case L'g':
+        table.handle({Key::Home});
+        return;
+    case L'G':
+        table.handle({Key::End});
+        return;
+    case L'<':
+        table.handle({Key::ShiftLeft});
+        return;
+    case L'>':
+        table.handle({Key::ShiftRight});
+        return;
+    case L'/':
+        _jump = Jump{{}, table.chosen()};
+        return;
+    case L'n':
+        if (!_lastJump.empty())
+            table.choose(_lastJump, table.chosen() + 1);
+        return;
+    case L's':
+        // A copy: the action may replace the toolbar that holds it.
+        if (const auto* save = _pane->saveItem()) {
+            const auto action = save->action;
+            action();
+        }
+        return;
+    case L'?':
+        _helpShown = true;
+        return;
+    case L'q':
+        _quit();
+        return;
+    default:
+        return;
+    }
+}
+
+} // namespace kestrum

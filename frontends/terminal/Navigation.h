@@ -1,0 +1,95 @@
+#pragma once
+
+#include "frontends/terminal/EditedLine.h"
+#include "frontends/terminal/Repaint.h"
+#include "frontends/terminal/SaveScreen.h"
+#include "frontends/terminal/Screen.h"
+#include "frontends/terminal/Table.h"
+#include "platform/Toolkit.h"
+
+#include <cstddef>
+#include <functional>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kestrum {
+
+/// A pane: rows, and what stands in the bottom line.
+class TerminalTableScreen final : public TableScreen {
+public:
+    TerminalTableScreen(TableDataSource& source, Repaint& repaint) : _table(source, repaint), _repaint(repaint) {}
+
+    TerminalTable& table() override { return _table; }
+    void setTitle(std::string_view title) override { _title = title; }
+    std::string title() const override { return _title; }
+    void setToolbarItems(std::vector<ToolbarItem> items, bool animated) override;
+    void resignFirstResponder() override {} // nothing in a pane is typed into
+
+    bool isSpinning() const;
+    std::string status() const;
+    const SaveItem* saveItem() const;
+
+private:
+    TerminalTable _table;
+    Repaint& _repaint;
+    std::string _title;
+    std::vector<ToolbarItem> _items;
+};
+
+/// The whole screen: the path in the title line, the pane's rows, the toolbar in the bottom line; over them the save
+/// screen, the help, or the name to jump to.
+class TerminalNavigationView final : public NavigationView {
+public:
+    TerminalNavigationView(NavigationViewDelegate& delegate, Repaint& repaint, std::function<void()> quit)
+        : _delegate(delegate), _repaint(repaint), _quit(std::move(quit))
+    {}
+
+    void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) override;
+    void setTitles(std::vector<std::string> titles) override;
+    void setToolbarHidden(bool hidden) override;
+    void present(SaveInterface& screen, bool animated) override;
+    void dismiss(bool animated) override;
+
+    /// `spinner` is the indicator's present picture. `inBackground`: something else takes the input.
+    void draw(Screen& screen, std::string_view spinner, bool inBackground);
+    void handle(const Input& input);
+    bool isSpinning() const { return _pane && _pane->isSpinning(); }
+
+private:
+    /// A key that the bottom line names, and where, so that it can be clicked as well.
+    struct Hint {
+        wchar_t key;
+        std::string text;
+        int column = 0;
+    };
+
+    void handleJump(const Input& input);
+    void handlePane(const Input& input);
+    void handleCommand(wchar_t key);
+    void drawTitle(const Line& line) const;
+    void drawToolbar(const Line& line, std::string_view spinner);
+    void drawHelp(Screen& screen) const;
+
+    NavigationViewDelegate& _delegate;
+    Repaint& _repaint;
+    std::function<void()> _quit;
+    TerminalTableScreen* _pane = nullptr;
+    TerminalSaveInterface* _save = nullptr;
+    std::vector<std::string> _titles;
+    bool _toolbarHidden = false, _helpShown = false;
+    std::vector<Hint> _hints;
+    int _bottom = 0; // the toolbar's line
+
+    /// While a name is typed to jump to.
+    struct Jump {
+        EditedLine name;
+        std::size_t from; // the row chosen before
+        bool found = true;
+    };
+    std::optional<Jump> _jump;
+    std::string _lastJump;
+};
+
+} // namespace kestrum

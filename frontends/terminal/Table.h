@@ -1,0 +1,68 @@
+#pragma once
+
+#include "frontends/terminal/Cells.h"
+#include "frontends/terminal/Repaint.h"
+#include "frontends/terminal/Screen.h"
+#include "platform/Toolkit.h"
+
+#include <cstddef>
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+
+namespace kestrum {
+
+/// Rows, one to a line, one of them chosen.
+class TerminalTable final : public TableView {
+public:
+    TerminalTable(TableDataSource& source, Repaint& repaint) : _source(source), _repaint(repaint) {}
+
+    void reloadData() override;
+    std::shared_ptr<ReusableCell> dequeueReusableCell(std::string_view reuseIdentifier) override;
+    std::unique_ptr<TableCell> makeCell(CellStyle style) override;
+    /// The chosen row stays: without it the keyboard would have no place in the table.
+    void deselectRow(IndexPath, bool) override {}
+    void sizeToFit() override {} // it always has the screen's width
+
+    /// Brings rows and cells up to date for this area, and shows them.
+    void draw(Screen& screen, Area area, bool focused);
+
+    /// The keys and the mouse of a list. False when the input is not for it.
+    bool handle(const Input& input);
+
+    /// Chooses the next row after `from`, round the end, in whose name `part` occurs. False when there is none.
+    bool choose(std::string_view part, std::size_t from);
+    void choose(std::size_t row);
+    std::size_t chosen() const;
+    int chosenLine() const; ///< on the screen, as last drawn
+    std::size_t rows() const { return _rows; }
+    std::string position() const; ///< "12/40" when not all rows are in sight
+
+private:
+    void load();
+    std::shared_ptr<ReusableCell> cellFor(std::size_t row);
+    std::string nameOf(std::size_t row);
+    void move(std::ptrdiff_t rows);
+    void scroll(std::ptrdiff_t rows);
+    bool open(std::size_t row);
+    std::size_t rowAt(int line) const;
+    std::size_t top() const;
+    std::size_t height() const { return static_cast<std::size_t>(_area.rows); }
+
+    TableDataSource& _source;
+    Repaint& _repaint;
+    Area _area;
+    std::size_t _rows = 0;
+    // Where the user put them. They are held to the rows that there are only when they are used, so that rows which come
+    // back find them again.
+    std::size_t _chosen = 0, _top = 0;
+    std::size_t _pressed = 0;
+    bool _loaded = false, _chosenInSight = true;
+    /// The rows in sight. A row keeps its cell, and no other row gets it: a leaf's value would be lost in the cell of a
+    /// row that opens.
+    std::map<std::size_t, std::shared_ptr<ReusableCell>> _cells;
+    std::shared_ptr<ReusableCell> _offered; // to the data source, for the row it is asked for
+};
+
+} // namespace kestrum

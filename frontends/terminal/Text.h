@@ -1,0 +1,42 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+/// Text as a terminal shows it. Widths come from wcwidth(3), so the process runs in a UTF-8 locale.
+namespace kestrum {
+
+/// What the terminal can show.
+enum class Charset { Unicode, Ascii };
+
+/// Sets a UTF-8 locale for the process, before Qt and the terminal library look at it. Ascii where the environment
+/// names a locale with another character set; where it names none, as in most containers, Unicode is taken for granted.
+Charset chooseLocale();
+
+std::string utf8(std::wstring_view text);
+
+/// What stands in one or two columns: a character with the marks combined with it.
+struct Glyph {
+    std::wstring text;
+    int columns;
+};
+
+/// `text` as it may be sent to a terminal. Control characters are shown as their pictures (U+2400...), what is no UTF-8,
+/// has no width or turns the direction of writing as U+FFFD: nothing from outside ever steers the terminal.
+std::vector<Glyph> glyphs(std::string_view text);
+
+/// The same as one string.
+std::string harmless(std::string_view text);
+
+/// The columns that `text` takes.
+int columns(std::string_view text);
+
+/// `text` in at most `width` columns, its middle or its end left out ("…") when it is longer.
+std::string cutInTheMiddle(std::string_view text, int width);
+std::string cutAtTheEnd(std::string_view text, int width);
+
+/// Whether `part` occurs in `whole`, upper and lower case alike.
+bool contains(std::string_view whole, std::string_view part);
+
+} // namespace kestrum
