@@ -1,0 +1,51 @@
+#pragma once
+
+#include "support/Bytes.h"
+
+#include <cstddef>
+#include <deque>
+#include <optional>
+
+namespace kestrum {
+
+/// Messages that a client has not taken yet. At the bound the oldest go, whole, and are counted.
+class Outbox {
+public:
+    explicit Outbox(std::size_t capacity) : _capacity(capacity) {} ///< bytes
+
+    void add(Data message)
+    {
+        _held += cost(message);
+        _messages.push_back(std::move(message));
+        while (_held > _capacity && !_messages.empty()) {
+            _held -= cost(_messages.front());
+            _messages.pop_front();
+            ++_dropped;
+        }
+    }
+
+    std::optional<Data> take()
+    {
+        if (_messages.empty())
+            return std::nullopt;
+        auto oldest = std::move(_messages.front());
+        _messages.pop_front();
+        _held -= cost(oldest);
+        return oldest;
+    }
+
+    std::size_t held() const { return _held; }       ///< bytes, each message with what keeping it costs
+    std::size_t dropped() const { return _dropped; } ///< messages, since the beginning
+
+private:
+    static std::size_t cost(const Data& message) { return message.size() + kOverhead; }
+
+    // Lest a flood of tiny messages cost far more memory than their bytes.
+    static constexpr std::size_t kOverhead = 64;
+
+    std::size_t _capacity;
+    std::size_t _held = 0, _dropped = 0;
+    std::deque<Data> _messages;
+};
+
+} // namespace kestrum

@@ -1,0 +1,132 @@
+#include "voxd/ServiceChannel.h"
+
+#include "platform/SystemLog.h"
+#include "support/Format.h"
+
+#include <filesystem>
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+// What the socket is given to keep; the rest waits in the outbox, where whole messages can still be dropped.
+constexpr std::size_t kSocketBytes = 256 << 10;
+constexpr std::int32_t kLogMessage = 0;
+
+} // namespace
+
+ServiceChannel::ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort, std::size_t heldBytes)
+    : _host(host), _logPort(std::move(logPort)), _listener(host.log), _outbox(heldBytes)
+{
+    _logPort->closed = [this] { end(); };
+    _logPort->readable = [this] { readLogPort(); };
+    _logPort->written = [this] { flush(); };
+    _listener.accepted = [this](auto connection) { accept(std::move(connection)); };
+    _commandTimeout.setSingleShot(true);
+    QObject::connect(&_commandTimeout, &QTimer::timeout, &_commandTimeout, [this] {
+        _host.log.write(Priority::Warning, format("Channel %s: nobody came to its command port", _name));
+        end();
+    });
+}
+
+ServiceChannel::~ServiceChannel()
+{
+    if (_outbox.dropped() > _reportedDrops)
+        _host.log.write(Priority::Warning, format("Channel %s: its client did not read, %lu messages were dropped",
+                                                  _name, _outbox.dropped() - _reportedDrops));
+}
+
+std::string ServiceChannel::listen(const std::string& path)
+{
+    _name = std::filesystem::path(path).filename().string();
+    _commandTimeout.start(kCommandTimeout);
+    return _listener.listen(path);
+}
+
+void ServiceChannel::accept(std::unique_ptr<FrameConnection> connection)
+{
+    if (_commands) // a channel has one master
+        return;
+    _commandTimeout.stop();
+    _commands = std::move(connection);
+    _commands->closed = [this] { end(); };
+    _commands->readable = [this] { readCommands(); };
+}
+
+void ServiceChannel::readCommands()
+{
+    while (const auto frame = _ended ? std::nullopt : _commands->next())
+        obey(*frame);
+}
+
+// The client has nothing to say here; reading tells a malformed peer, and keeps the socket from filling up.
+void ServiceChannel::readLogPort()
+{
+    while (!_ended && _logPort->next())
+        continue;
+}
+
+void ServiceChannel::obey(const Frame& frame)
+{
+    if (frame.messageId != kLogMessage || frame.kind == Frame::Kind::Reply)
+        return;
+    const auto command = _host.lists.parse(frame.payload).dictionary();
+    if (!command) {
+        _host.log.write(Priority::Error,
+                        format("Channel %s: a command that is no dictionary (%lu bytes)", _name, frame.payload.size()));
+        return;
+    }
+    if (command->contains("GetTechnology") && frame.kind == Frame::Kind::Request) {
+        const auto reply = _host.lists.toXml(makeDictionary({{"GetTechnology", _host.technology()}}));
+        if (reply && !_commands->send({Frame::Kind::Reply, frame.messageId, frame.serial, reply->bytes()}))
+            return end();
+    }
+    if (const auto state = command->at("SetState"); const auto* text = state.string()) {
+        if (*text == "Streaming")
+            _subscription.emplace(*command);
+        else
+            _subscription.reset();
+        _host.streamingChanged();
+    }
+}
+
+void ServiceChannel::stream(const Data& message)
+{
+    if (!_subscription || !_subscription->wants(message.bytes()))
+        return;
+    const std::size_t before = _outbox.dropped();
+    _outbox.add(message);
+    if (_outbox.dropped() > before && !std::exchange(_dropping, true))
+        _host.log.write(Priority::Warning,
+                        format("Channel %s: its client does not read, the oldest messages go", _name));
+    flush();
+}
+
+void ServiceChannel::flush()
+{
+    while (_logPort->isOpen()) {
+        if (_logPort->unsent() >= kSocketBytes)
+            _logPort->push();
+        if (_logPort->unsent() >= kSocketBytes)
+            return; // `written` goes on
+        const auto message = _outbox.take();
+        if (!message) {
+            if (std::exchange(_dropping, false)) {
+                const std::size_t dropped = _outbox.dropped() - std::exchange(_reportedDrops, _outbox.dropped());
+                _host.log.write(
+                    Priority::Warning,
+                    format("Channel %s: its client reads again, %lu messages were dropped", _name, dropped));
+            }
+            return;
+        }
+        _logPort->send({Frame::Kind::Message, kLogMessage, 0, message->bytes()});
+    }
+}
+
+void ServiceChannel::end()
+{
+    if (!std::exchange(_ended, true))
+        _host.ended(*this);
+}
+
+} // namespace kestrum

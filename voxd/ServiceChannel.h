@@ -1,0 +1,68 @@
+#pragma once
+
+#include "platform/PropertyLists.h"
+#include "platform/linux/FrameSocket.h"
+#include "voxd/Outbox.h"
+#include "voxd/Subscription.h"
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include <QTimer>
+
+namespace kestrum {
+
+class SystemLog;
+
+/// One client's log channel: its commands come in at a port of its own, the log goes out to the client's port. It ends
+/// when either side of it goes.
+class ServiceChannel {
+public:
+    /// What the channel asks of the service.
+    struct Host {
+        std::function<std::string_view()> technology;
+        std::function<void()> streamingChanged;
+        std::function<void(ServiceChannel&)> ended; ///< at most once; must not destroy the channel at once
+        const PropertyLists& lists;
+        SystemLog& log;
+    };
+
+    /// Bytes held back for a client that does not read.
+    static constexpr std::size_t kHeldBytes = 8 << 20;
+    /// A client that has not connected to the command port by then is gone.
+    static constexpr std::chrono::seconds kCommandTimeout{10};
+
+    /// `logPort` leads to the client's receiving port. `host` outlives the channel.
+    ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort, std::size_t heldBytes = kHeldBytes);
+    ~ServiceChannel();
+
+    /// Listens for the client's commands. Empty on success, else what is wrong.
+    std::string listen(const std::string& path);
+
+    bool isStreaming() const { return _subscription.has_value(); }
+    /// Sends the message when the client has asked for it, or holds it back.
+    void stream(const Data& message);
+
+private:
+    void accept(std::unique_ptr<FrameConnection> connection);
+    void readCommands();
+    void readLogPort();
+    void obey(const Frame& frame);
+    void flush();
+    void end();
+
+    const Host& _host;
+    std::string _name;
+    std::unique_ptr<FrameConnection> _logPort, _commands;
+    FrameListener _listener;
+    QTimer _commandTimeout;
+    std::optional<Subscription> _subscription; // nothing: not streaming
+    Outbox _outbox;
+    std::size_t _reportedDrops = 0;
+    bool _dropping = false;
+    bool _ended = false;
+};
+
+} // namespace kestrum

@@ -1,0 +1,152 @@
+#include "platform/linux/LinuxClock.h"
+#include "platform/linux/LinuxSystemLog.h"
+#include "platform/linux/RuntimeDirectory.h"
+#include "platform/linux/TerminationSignals.h"
+#include "platform/propertylist/PropertyListCodec.h"
+#include "support/Format.h"
+#include "voxd/ReplaySource.h"
+#include "voxd/Service.h"
+#include "voxd/capture/Capture.h"
+#include "voxd/scenarios/Scenario.h"
+
+#include <CLI/CLI.hpp>
+#include <QCoreApplication>
+
+#include <fstream>
+#include <iostream>
+#include <stdexcept>
+
+namespace {
+
+using namespace kestrum;
+
+constexpr int kRunTimeError = 1, kUsageError = 2;
+
+struct Options {
+    std::string scenario, replay, record, write, start;
+    double speed = 1, seconds = 60;
+    bool loop = false;
+    std::uint64_t seed = 1;
+};
+
+std::string scenarioNames()
+{
+    std::string lines = "The live scenario:";
+    for (const auto& each : scenarios())
+        lines += format("\n%s: %s", each.name, each.summary);
+    return lines;
+}
+
+std::unique_ptr<Source> makeSource(const Options& options, const PropertyLists& lists)
+{
+    if (!options.replay.empty())
+        return std::make_unique<ReplaySource>(options.replay, options.loop);
+    const Date start = options.start.empty() ? LinuxClock().now() : *dateFromIso(options.start);
+    return makeScenario(options.scenario, {options.seed, start, lists});
+}
+
+std::ofstream openForWriting(const std::string& path)
+{
+    std::ofstream file(path, std::ios::binary | std::ios::trunc);
+    if (!file)
+        throw std::runtime_error(path + ": cannot be written");
+    return file;
+}
+
+// The source's first seconds, at once and without a service.
+void writeCapture(Source& source, const Options& options)
+{
+    auto file = openForWriting(options.write);
+    const std::chrono::duration<double> end(options.seconds);
+    for (auto message = source.next(); message && message->at < end; message = source.next())
+        writeKcap(file, message->bytes);
+    if (!file.flush())
+        throw std::runtime_error(options.write + ": cannot be written to its end");
+}
+
+int serve(QCoreApplication& application, const Options& options)
+{
+    const TerminationSignals termination([&] { application.quit(); });
+    LinuxSystemLog log(standardErrorSink("voxd"));
+    const PropertyListCodec lists;
+    const auto source = makeSource(options, lists);
+    std::ofstream record;
+    if (!options.record.empty())
+        record = openForWriting(options.record);
+    Service service({runtimeDirectory(), options.speed}, *source, lists, log, [&](Bytes message) {
+        if (!record.is_open())
+            return;
+        writeKcap(record, message);
+        if (!record.flush()) {
+            log.write(Priority::Error, options.record + ": cannot be written; the recording ends here");
+            record.close();
+        }
+    });
+    service.sourceEnded = [&] {
+        const auto* const replay = dynamic_cast<const ReplaySource*>(source.get());
+        if (replay != nullptr && !replay->fault().empty())
+            log.write(Priority::Error, replay->fault());
+        else
+            log.write(Priority::Notice, "the log has ended; clients stay connected");
+    };
+    if (const auto wrong = service.start(); !wrong.empty())
+        throw std::runtime_error(wrong);
+    std::cout << "voxd: serving " << source->technology() << " in " << runtimeDirectory() << std::endl;
+    return QCoreApplication::exec();
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    Options options;
+    CLI::App commands("Kestrum's telephony service: streams a modem's log to field-test displays.", "voxd");
+    commands.set_version_flag("--version", std::string("voxd ") + KESTRUM_VERSION);
+    auto* const scenario = commands.add_option("--scenario", options.scenario, scenarioNames());
+    auto* const replay = commands.add_option("--replay", options.replay, "A capture, .kcap or .dlf");
+    commands.add_flag("--loop", options.loop, "Begin the capture again at its end")->needs(replay);
+    commands.add_option("--speed", options.speed, "Times real time")
+        ->check(CLI::Range(0.001, 1e6))
+        ->capture_default_str();
+    commands.add_option("--seed", options.seed, "Equal seeds give equal scenarios")
+        ->needs(scenario)
+        ->capture_default_str();
+    commands
+        .add_option("--start", options.start,
+                    "Moment at which the scenario begins, 2026-11-16T06:05:42Z (default: now)")
+        ->needs(scenario)
+        ->check([](const std::string& text) { return dateFromIso(text) ? "" : text + " is no date of that form"; });
+    auto* const record = commands.add_option("--record", options.record, "Write what is streamed to FILE.kcap");
+    auto* const write = commands.add_option("--write", options.write, "Write a capture at once, serve nobody, and end");
+    commands.add_option("--seconds", options.seconds, "How much of the source --write writes")
+        ->needs(write)
+        ->check(CLI::PositiveNumber)
+        ->capture_default_str();
+    scenario->excludes(replay)->check([](const std::string& name) {
+        for (const auto& each : scenarios())
+            if (each.name == name)
+                return std::string();
+        return "there is no scenario " + name;
+    });
+    record->excludes(write);
+    try {
+        commands.parse(argc, argv);
+        if (options.scenario.empty() && options.replay.empty())
+            throw CLI::RequiredError("--scenario or --replay");
+    } catch (const CLI::ParseError& error) {
+        return commands.exit(error) == 0 ? 0 : kUsageError;
+    }
+
+    try {
+        if (!options.write.empty()) {
+            const PropertyListCodec lists;
+            writeCapture(*makeSource(options, lists), options);
+            return 0;
+        }
+        QCoreApplication application(argc, argv);
+        return serve(application, options);
+    } catch (const std::exception& error) {
+        std::cerr << "voxd: " << error.what() << std::endl;
+        return kRunTimeError;
+    }
+}

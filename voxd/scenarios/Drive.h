@@ -1,0 +1,39 @@
+#pragma once
+
+#include "voxd/Source.h"
+#include "voxd/scenarios/Modem.h"
+#include "voxd/scenarios/Scenario.h"
+#include "voxd/scenarios/World.h"
+
+#include <deque>
+#include <initializer_list>
+#include <memory>
+
+namespace kestrum {
+
+/// The source of a live scenario: a car goes through the world, and its modem's log comes out. With several modems the
+/// drive has legs of half a minute: one after the other has its turn, again and again.
+class Drive final : public Source {
+public:
+    using MakeModem = std::unique_ptr<Modem> (*)(const World& world, Random random);
+
+    Drive(const ScenarioSetting& setting, std::initializer_list<MakeModem> modems);
+
+    std::optional<Message> next() override;
+    std::string_view technology() const override { return modem().technology(); }
+
+private:
+    Modem& modem() const { return *_modems[_leg % _modems.size()]; }
+    void tick();
+
+    Date _start;
+    Random _random;
+    World _world;
+    ModemLog _log;
+    std::vector<std::unique_ptr<Modem>> _modems;
+    std::size_t _leg = 0;
+    unsigned _ticks = 0;
+    std::deque<Message> _ready; // of the last tick
+};
+
+} // namespace kestrum

@@ -1,0 +1,31 @@
+#pragma once
+
+#include "voxd/scenarios/Traffic.h"
+#include "voxd/scenarios/World.h"
+
+namespace kestrum {
+
+/// UTRA's radio resource control (3GPP TS 25.331), as both modems that know it number its states.
+enum class RrcState { Disconnected, Connecting, Fach, Dch, CellPch, UraPch };
+
+/// Little data goes over the common channel, much over a dedicated one; after it the phone is paged for a while, in the
+/// area where it is fast, else in the cell.
+inline RrcState rrcState(const Traffic& traffic, const World& world)
+{
+    constexpr double kLittle = 0.25, kFast = 22; // part of the link; m/s
+    switch (traffic.phase()) {
+    case Traffic::Phase::Setup:
+        return RrcState::Connecting;
+    case Traffic::Phase::Active:
+        return traffic.isData() && traffic.load() < kLittle ? RrcState::Fach : RrcState::Dch;
+    case Traffic::Phase::Release:
+        if (traffic.isVoice())
+            return RrcState::Fach;
+        return world.speed() > kFast ? RrcState::UraPch : RrcState::CellPch;
+    case Traffic::Phase::Idle:
+        break;
+    }
+    return RrcState::Disconnected;
+}
+
+} // namespace kestrum

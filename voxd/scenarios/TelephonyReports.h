@@ -1,0 +1,37 @@
+#pragma once
+
+#include "support/Record.h"
+#include "support/Value.h"
+#include "voxd/scenarios/World.h"
+
+#include <initializer_list>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kestrum {
+
+// What the telephony service itself adds to the modem's log: property lists.
+
+constexpr LogCode kSimReport = 0xFF0000, kCellReport = 0xFF0001, kPdpReport = 0xFF0002;
+
+/// The number of what could not be measured.
+constexpr int kNotMeasured = 32767;
+
+/// A cell of the cell monitor: its technology and type, and the numbers that the modem knows of it.
+DictionaryRef cellReport(std::string_view technology, std::string_view type,
+                         std::initializer_list<Dictionary::Entry> numbers);
+
+/// The elementary files of the SIM (3GPP TS 31.102), as text. The location files hold where the phone was registered
+/// last; the other networks' ones are forbidden.
+DictionaryRef simReport(const Plmn& registered, int locationArea, int routingArea);
+
+/// The packet data contexts: one for the phone itself always, one for what its user does.
+ArrayRef pdpReport(std::string_view radioAccess, bool userData);
+
+/// A network identity's digits: MCC, then MNC with 2 or 3 digits.
+std::string plmnText(const Plmn& plmn);
+/// A network identity in its three octets (3GPP TS 24.008, 10.5.1.3).
+std::vector<int> plmnOctets(const Plmn& plmn);
+
+} // namespace kestrum
