@@ -1,0 +1,224 @@
+#include "tools/Decoding.h"
+
+#include "platform/ChannelMessage.h"
+#include "platform/PropertyLists.h"
+#include "platform/TelephonyService.h"
+#include "platform/Time.h"
+#include "support/Format.h"
+
+#include <algorithm>
+#include <stdexcept>
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+// Without a technology nothing can be shown of them.
+constexpr std::size_t kMostEarlyBytes = 16 << 20;
+
+// What the generator keeps raw for a snapshot is let go this often.
+constexpr std::size_t kInterval = 256 << 10;
+
+/// The codes that a start command asks for.
+std::set<LogCode> codesIn(const LogGenerator& generator)
+{
+    std::set<LogCode> codes;
+    const auto command = generator.getStartCommand();
+    const auto add = [&](std::string_view key, LogCode above) {
+        if (const auto list = command->at(key).array())
+            for (const auto& code : *list)
+                codes.insert(above + static_cast<LogCode>(code.integer().value_or(0)));
+    };
+    add("SetZephraLogCodes", 0);
+    add("SetVoxExtraCodes", ChannelMessage::kExtraCodes);
+    return codes;
+}
+
+} // namespace
+
+std::string codeText(LogCode code)
+{
+    auto digits = format("%04x", code);
+    std::ranges::transform(digits, digits.begin(),
+                           [](char c) { return c >= 'a' ? static_cast<char>(c - 'a' + 'A') : c; });
+    return "0x" + digits;
+}
+
+Tally& Tally::operator+=(const Tally& other)
+{
+    messages += other.messages;
+    decoded += other.decoded;
+    tooShort += other.tooShort;
+    withoutSubscriber += other.withoutSubscriber;
+    refused += other.refused;
+    return *this;
+}
+
+class Decoding::Watch final : public RecordWatch {
+public:
+    void tooShort() override { wasTooShort = true; }
+    bool wasTooShort = false;
+};
+
+class Decoding::Log final : public SystemLog {
+public:
+    explicit Log(LogLine line) : _line(std::move(line)) {}
+    void write(Priority priority, std::string_view text) override
+    {
+        if (_line)
+            _line(priority, text);
+    }
+    const void* shownAddress(const void*) const override { return nullptr; }
+
+private:
+    LogLine _line;
+};
+
+// Standard output is the display's alone; and no date of today belongs into what a capture shows.
+class Decoding::Quiet final : public Console, public Clock {
+public:
+    void printLine(std::string_view) override {}
+    void debug(std::string_view) override {}
+    bool isDebugWatched() const override { return false; }
+
+    Date now() const override { return moment; }
+    Zone zoneAt(Date) const override { return {std::chrono::seconds(0), false}; }
+    std::string localText(Date date, std::string_view) const override { return dateText(date); }
+
+    Date moment{};
+};
+
+Decoding::Decoding(std::string technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then)
+    : _bundle(bundle),
+      _lists(lists),
+      _told(!technology.empty()),
+      _then(std::move(then)),
+      _watch(std::make_unique<Watch>()),
+      _log(std::make_unique<Log>(std::move(log))),
+      _quiet(std::make_unique<Quiet>()),
+      _roles{*_log, *_quiet, *_quiet, _bundle, _lists, _watch.get()}
+{
+    if (_told)
+        use(technology);
+}
+
+Decoding::~Decoding() = default;
+
+void Decoding::take(Bytes message)
+{
+    if (!_told && tells(message))
+        for (const auto& early : std::exchange(_early, {}))
+            decode(early);
+    if (_generator)
+        return decode(message);
+    _earlyBytes += message.size();
+    if (_earlyBytes > kMostEarlyBytes)
+        throw std::runtime_error(format(
+            "the first %lu messages do not tell their technology: name it with --technology", _early.size() + 1));
+    _early.emplace_back(message.begin(), message.end());
+}
+
+void Decoding::finish()
+{
+    if (!_early.empty())
+        throw std::runtime_error("no message tells the technology: name it with --technology");
+    if (_generator)
+        endInterval();
+}
+
+Tally Decoding::total() const
+{
+    Tally sum;
+    for (const auto& [code, tally] : _statistics)
+        sum += tally;
+    sum.messages += _early.size();
+    return sum;
+}
+
+// True when a generator was made. A log that goes on in another technology gets another generator, as it would have
+// done live; a foreign record alone, of a code that no display of that technology takes, does not count.
+bool Decoding::tells(Bytes message)
+{
+    const auto told = technologyOf(message);
+    if (!told || *told == _technology)
+        return false;
+    if (_generator) {
+        const auto record = channelRecord(message);
+        if (record && _codes.contains(record->code))
+            return false;
+        Log silent(nullptr);
+        DecodingRoles roles{silent, *_quiet, *_quiet, _bundle, _lists};
+        const bool takes = record ? codesIn(*LogGenerator::generatorFromTechnology(*told, roles)).contains(record->code)
+                                  : !_lists.parse(message).isNull();
+        if (!takes)
+            return false;
+        endInterval();
+    }
+    use(*told);
+    return true;
+}
+
+void Decoding::use(std::string_view technology)
+{
+    _technology = technology;
+    _generator = LogGenerator::generatorFromTechnology(technology, _roles);
+    _codes = codesIn(*_generator);
+}
+
+void Decoding::decode(Bytes message)
+{
+    Decoded decoded;
+    bool reaches = false;
+    Tally& tally = classified(message, decoded, reaches);
+    ++tally.messages;
+    _watch->wasTooShort = false;
+    try {
+        _generator->updateState(_state, message);
+        if (reaches)
+            ++(_watch->wasTooShort ? tally.tooShort : tally.decoded);
+    } catch (const std::exception& failure) {
+        if (reaches)
+            ++tally.refused;
+        _log->write(Priority::Error, failure.what());
+    }
+    _inInterval += message.size();
+    if (_inInterval >= kInterval)
+        endInterval();
+    if (_then)
+        _then(decoded);
+}
+
+// Counts what no decoder will see.
+Tally& Decoding::classified(Bytes message, Decoded& decoded, bool& reaches)
+{
+    if (_technology == kVoxLogChannelTechnology_IFX) {
+        reaches = true;
+        return _statistics[std::nullopt];
+    }
+    const auto read = ChannelMessage::read(message);
+    if (!read) {
+        Tally& tally = _statistics[std::nullopt];
+        ++tally.tooShort;
+        return tally;
+    }
+    decoded.code = read->logCode;
+    // A stamp of 0 is none.
+    if (const auto stamp = read->timeStamp().value_or(0); stamp != 0)
+        _quiet->moment = *(decoded.time = dateFromTimeStamp(stamp));
+    Tally& tally = _statistics[read->logCode];
+    if (!read->isOfKnownType() && _technology != kVoxLogChannelTechnology_Zephra_CDMA)
+        ++tally.refused;
+    else if (!_codes.contains(read->logCode))
+        ++tally.withoutSubscriber;
+    else
+        reaches = true;
+    return tally;
+}
+
+void Decoding::endInterval()
+{
+    _generator->generateLogUsingState(_state);
+    _inInterval = 0;
+}
+
+} // namespace kestrum

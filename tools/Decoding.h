@@ -1,0 +1,102 @@
+#pragma once
+
+#include "LogGenerator/LogGenerator.h"
+#include "platform/Console.h"
+#include "platform/RecordWatch.h"
+#include "platform/SystemLog.h"
+#include "support/Date.h"
+#include "support/Record.h"
+
+#include <cstdint>
+#include <functional>
+#include <map>
+#include <memory>
+#include <optional>
+#include <set>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kestrum {
+
+/// What has become of the messages of one log code. Each is counted once: decoded, or under one of the others.
+struct Tally {
+    std::uint64_t messages = 0;
+    std::uint64_t decoded = 0;
+    std::uint64_t tooShort = 0;          ///< for one of its decoders at least
+    std::uint64_t withoutSubscriber = 0; ///< no section takes the code
+    std::uint64_t refused = 0;           ///< of an invalid type, no property list where one is due, or contradictory
+
+    std::uint64_t dropped() const { return tooShort + refused; }
+    Tally& operator+=(const Tally& other);
+};
+
+/// "0xB0C2": as the standards and their tools write log codes.
+std::string codeText(LogCode code);
+
+/// By effective log code; nothing: messages that have none (the trees of an IFX modem, fragments).
+using Statistics = std::map<std::optional<LogCode>, Tally>;
+
+/// Decodes a capture as the display does, with the memory of one display, however long the capture is.
+class Decoding {
+public:
+    /// A line of the system log: addresses are shown as null, so that two runs log the same.
+    using LogLine = std::function<void(Priority, std::string_view)>;
+
+    /// What is known of a message once it is decoded.
+    struct Decoded {
+        std::optional<Date> time; ///< from the record's time stamp
+        std::optional<LogCode> code;
+    };
+    using Then = std::function<void(const Decoded&)>;
+
+    /// `technology`: an identifier, or empty when the messages shall tell. Bundle and lists outlive the decoding;
+    /// `then`, if there is one, is called behind each message.
+    Decoding(std::string technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then);
+    ~Decoding();
+
+    /// Messages that come before one that tells the technology are kept until then. Throws std::runtime_error when
+    /// too many do.
+    void take(Bytes message);
+    /// No further message comes. Throws std::runtime_error when there were messages, and none told the technology.
+    void finish();
+
+    /// Empty while it is not known.
+    const std::string& technology() const { return _technology; }
+    /// The display dictionary; null when there is none.
+    Value display() const { return _state.at("Display"); }
+    const Statistics& statistics() const { return _statistics; }
+    Tally total() const;
+
+private:
+    class Watch;
+    class Log;
+    class Quiet;
+
+    bool tells(Bytes message);
+    void use(std::string_view technology);
+    void decode(Bytes message);
+    Tally& classified(Bytes message, Decoded& decoded, bool& reaches);
+    void endInterval();
+
+    Bundle& _bundle;
+    PropertyLists& _lists;
+    const bool _told;
+    std::string _technology;
+    Then _then;
+
+    std::unique_ptr<Watch> _watch;
+    std::unique_ptr<Log> _log;
+    std::unique_ptr<Quiet> _quiet;
+    DecodingRoles _roles;
+    State _state;
+    std::unique_ptr<LogGenerator> _generator;
+    std::set<LogCode> _codes; ///< that the generator takes
+    std::size_t _inInterval = 0;
+
+    std::vector<std::vector<std::byte>> _early;
+    std::size_t _earlyBytes = 0;
+    Statistics _statistics;
+};
+
+} // namespace kestrum

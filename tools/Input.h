@@ -1,0 +1,38 @@
+#pragma once
+
+#include <chrono>
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <string>
+
+namespace kestrum {
+
+/// A file that is read from its beginning to its end, and, where it is followed, on as it grows.
+class Input {
+public:
+    /// "-" is standard input. Throws std::system_error when it cannot be opened.
+    Input(const std::string& path, bool follow);
+    ~Input();
+    Input(const Input&) = delete;
+    Input& operator=(const Input&) = delete;
+
+    /// 0 at the end. Throws std::system_error.
+    std::size_t read(std::span<std::byte> into);
+    /// Nothing when it is no regular file.
+    std::optional<std::uint64_t> size() const;
+
+    /// Whether it may grow: a regular file that is followed.
+    bool mayGrow() const { return _changes >= 0; }
+    enum class Woken { Changed, TimedOut, Ended };
+    /// Waits until the file has changed, or the program is asked to end (SIGINT, SIGTERM, SIGHUP). Throws
+    /// std::runtime_error when the file has become shorter than what was read.
+    Woken wait(std::optional<std::chrono::milliseconds> atMost);
+
+private:
+    int _file = -1, _changes = -1, _signals = -1;
+    std::uint64_t _read = 0;
+};
+
+} // namespace kestrum

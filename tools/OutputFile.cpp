@@ -1,0 +1,38 @@
+#include "tools/OutputFile.h"
+
+#include <cerrno>
+#include <system_error>
+#include <unistd.h>
+
+namespace kestrum {
+namespace {
+
+constexpr std::size_t kPiece = 64 << 10;
+
+} // namespace
+
+void OutputFile::write(std::string_view text)
+{
+    _held += text;
+    if (_held.size() >= kPiece)
+        flush();
+}
+
+void OutputFile::flush()
+{
+    std::string_view rest = _held;
+    while (!rest.empty()) {
+        const auto written = ::write(_descriptor, rest.data(), rest.size());
+        if (written >= 0)
+            rest.remove_prefix(static_cast<std::size_t>(written));
+        else if (errno != EINTR && _loss == Loss::Ignored)
+            break;
+        else if (errno == EPIPE)
+            throw ClosedPipe{};
+        else if (errno != EINTR)
+            throw OutputFailure(std::system_error(errno, std::generic_category(), "standard output").what());
+    }
+    _held.clear();
+}
+
+} // namespace kestrum

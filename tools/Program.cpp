@@ -1,0 +1,278 @@
+#include "tools/Program.h"
+
+#include "platform/propertylist/PropertyListCodec.h"
+#include "support/Format.h"
+#include "support/Record.h"
+#include "tools/ByteWindow.h"
+#include "tools/Extraction.h"
+#include "tools/Input.h"
+#include "tools/KcapScanner.h"
+#include "tools/RecordScanner.h"
+#include "tools/Snapshot.h"
+#include "voxd/capture/Capture.h"
+
+#include <algorithm>
+#include <chrono>
+#include <csignal>
+#include <stdexcept>
+#include <unistd.h>
+
+namespace kestrum {
+namespace {
+
+using SteadyClock = std::chrono::steady_clock;
+
+constexpr int kBadInput = 1;
+constexpr std::uint64_t kMostFaultLines = 100;
+/// The display of a file that is followed is shown anew this often at most, as the panes are.
+constexpr std::chrono::milliseconds kRefresh{2000};
+
+/// How far a long run has come, on a terminal.
+class Progress {
+public:
+    Progress(OutputFile& to, bool isWanted) : _to(to), _isWatched(isWanted && ::isatty(STDERR_FILENO) != 0) {}
+
+    void show(const std::string& file, std::uint64_t done, std::optional<std::uint64_t> size)
+    {
+        const auto now = SteadyClock::now();
+        if (!_isWatched || now < _next)
+            return;
+        _next = now + std::chrono::milliseconds(250);
+        const auto part =
+            size && *size != 0 ? format(" (%lu%%)", std::min<std::uint64_t>(100, done * 100 / *size)) : std::string();
+        _to.write(format("\r%s: %lu MB%s\x1b[K", file, done / 1'000'000, part));
+        _to.flush();
+        _isShown = true;
+    }
+    /// Makes room for a line.
+    void clear()
+    {
+        if (std::exchange(_isShown, false))
+            _to.write("\r\x1b[K");
+    }
+
+private:
+    OutputFile& _to;
+    const bool _isWatched;
+    bool _isShown = false;
+    SteadyClock::time_point _next = SteadyClock::now() + std::chrono::seconds(1);
+};
+
+class Program {
+public:
+    Program(const DecodeOptions& options, Bundle& bundle)
+        : _options(options),
+          _output(Output::make(options.format, options.log, _data, _remarks)),
+          _decoding(options.technology, bundle, _lists,
+                    options.log ? [this](Priority priority, std::string_view text) { _output->logLine(priority, text); }
+                                : Decoding::LogLine(),
+                    [this](const Decoding::Decoded& decoded) { _output->message(_decoding, decoded); })
+    {}
+
+    int run()
+    {
+        try {
+            for (const auto& file : _options.files)
+                decode(file, &file == &_options.files.back());
+            finish();
+        } catch (const ClosedPipe&) {
+            return 0; // Nobody wants the rest.
+        }
+        return _isBad ? kBadInput : 0;
+    }
+
+private:
+    void decode(const std::string& file, bool isLast)
+    {
+        _file = file == "-" ? "standard input" : file;
+        _faults = {};
+        try {
+            Input input(file, _options.follow && isLast);
+            // What is decoded is shown before more is waited for.
+            ByteWindow window([&](std::span<std::byte> into) {
+                _data.flush();
+                _remarks.flush();
+                _progress.show(_file, _window == nullptr ? 0 : _window->offset(), input.size());
+                return input.read(into);
+            });
+            _window = &window;
+            decode(file, input, window);
+        } catch (const OutputFailure&) {
+            throw;
+        } catch (const std::runtime_error& error) {
+            complain(format("%s: %s", _file, error.what()));
+        }
+        _window = nullptr;
+        if (_faults.lines > kMostFaultLines)
+            complain(format("%s: %lu more places like these; %lu bytes skipped in them", _file,
+                            _faults.lines - kMostFaultLines, _faults.untold));
+    }
+
+    void decode(const std::string& file, Input& input, ByteWindow& window)
+    {
+        const Bytes begin = window.peek(8);
+        auto known = captureFormat(file);
+        if (!known &&
+            (file.ends_with(".kestrum") || textOf(begin).starts_with("<") || textOf(begin).starts_with("bplist")))
+            return decodeSnapshot(file, window);
+        if (!known)
+            known = Record(begin).read(u32(0)).value_or(0) <= CaptureReader::kMaximumMessage ? CaptureFormat::Kcap
+                                                                                             : CaptureFormat::Dlf;
+        const auto told = [this](const Fault& fault) { tell(fault); };
+        if (*known == CaptureFormat::Kcap) {
+            KcapScanner scanner(window, told);
+            scan(scanner, input, window);
+        } else {
+            RecordScanner scanner(window, told, RecordScanner::Origin::Dlf);
+            scan(scanner, input, window);
+        }
+    }
+
+    void scan(MessageScanner& scanner, Input& input, ByteWindow& window)
+    {
+        for (bool mayGrow = input.mayGrow(); mayGrow;) {
+            while (const auto message = scanner.next(true))
+                _decoding.take(*message);
+            mayGrow = waitForMore(input);
+            window.resume();
+        }
+        while (const auto message = scanner.next())
+            _decoding.take(*message);
+    }
+
+    bool waitForMore(Input& input)
+    {
+        for (;;) {
+            const auto messages = _decoding.total().messages;
+            if (messages != _shownMessages && SteadyClock::now() >= _nextDisplay) {
+                _output->display(_decoding);
+                _shownMessages = messages;
+                _nextDisplay = SteadyClock::now() + kRefresh;
+            }
+            _data.flush();
+            _remarks.flush();
+            std::optional<std::chrono::milliseconds> atMost;
+            if (messages != _shownMessages)
+                atMost = std::chrono::ceil<std::chrono::milliseconds>(_nextDisplay - SteadyClock::now());
+            const auto woken = input.wait(atMost);
+            if (woken != Input::Woken::TimedOut)
+                return woken == Input::Woken::Changed;
+        }
+    }
+
+    void decodeSnapshot(const std::string& file, ByteWindow& window)
+    {
+        const Bytes all = window.peek(PropertyListCodec::kMaxBytes + 1);
+        const auto parsed = _lists.parseWithError(all);
+        if (!parsed)
+            throw std::runtime_error(format("at offset %lu: %s", parsed.offset, parsed.reason));
+        const Snapshot snapshot(file, parsed.value, [this](const Fault& fault) { tell(fault); });
+        _output->snapshot(snapshot.listing());
+        std::optional<Extraction> extraction;
+        if (!_options.extract.empty())
+            extraction.emplace(_options.extract, snapshot);
+        snapshot.recover(_lists, [&](Bytes message) {
+            if (extraction)
+                extraction->take(message);
+            _decoding.take(message);
+        });
+        if (!extraction)
+            return;
+        extraction->finish();
+        if (extraction->inKcapAlone() != 0 && snapshot.dlf())
+            remark(format("%s: %lu messages that are no ordinary records stand in the extracted .kcap alone", _file,
+                          extraction->inKcapAlone()));
+    }
+
+    void finish()
+    {
+        try {
+            _decoding.finish();
+        } catch (const std::runtime_error& error) {
+            complain(error.what());
+        }
+        if (_decoding.total().messages == 0)
+            remark("no message was found");
+        _progress.clear();
+        _remarks.flush();
+        if (_shownMessages == 0 || _shownMessages != _decoding.total().messages)
+            _output->display(_decoding);
+        _data.flush();
+        if (_options.stats)
+            showStatistics();
+        _remarks.flush();
+    }
+
+    void showStatistics()
+    {
+        _remarks.write("code        messages     decoded   too short  without subscriber     refused\n");
+        const auto row = [this](const std::string& name, const Tally& tally) {
+            const auto column = [](std::uint64_t count, std::size_t width) {
+                const auto digits = std::to_string(count);
+                return std::string(width - std::min(width - 1, digits.size()), ' ') + digits;
+            };
+            std::string line = name;
+            line.resize(std::max<std::size_t>(line.size(), 8), ' ');
+            _remarks.write(line + column(tally.messages, 12) + column(tally.decoded, 12) + column(tally.tooShort, 12) +
+                           column(tally.withoutSubscriber, 20) + column(tally.refused, 12) + '\n');
+        };
+        for (const auto& [code, tally] : _decoding.statistics())
+            row(code ? codeText(*code) : "(none)", tally);
+        row("total", _decoding.total());
+        _remarks.write(format("bytes skipped: %lu\n", _skipped));
+    }
+
+    void tell(const Fault& fault)
+    {
+        _skipped += fault.size;
+        _isBad = true;
+        if (++_faults.lines > kMostFaultLines) {
+            _faults.untold += fault.size;
+            return;
+        }
+        const auto skipped = fault.size == 0 ? std::string() : format("; %lu bytes skipped", fault.size);
+        complain(format("%s: at offset %lu: %s%s", _file, fault.offset, fault.reason, skipped));
+    }
+    void complain(const std::string& line)
+    {
+        _isBad = true;
+        remark(line);
+    }
+    void remark(const std::string& line)
+    {
+        _progress.clear();
+        _remarks.write("kestrum-decode: " + line + '\n');
+        _remarks.flush();
+    }
+
+    const DecodeOptions& _options;
+    OutputFile _data{STDOUT_FILENO}, _remarks{STDERR_FILENO, OutputFile::Loss::Ignored};
+    // Not between rows that the same terminal shows as they come.
+    Progress _progress{_remarks,
+                       !_options.follow && (_options.format == OutputFormat::Tree ||
+                                            _options.format == OutputFormat::Json || ::isatty(STDOUT_FILENO) == 0)};
+    PropertyListCodec _lists;
+    std::unique_ptr<Output> _output;
+    Decoding _decoding;
+
+    std::string _file; ///< as it is called in remarks
+    ByteWindow* _window = nullptr;
+    struct {
+        std::uint64_t lines = 0, untold = 0;
+    } _faults;
+    std::uint64_t _skipped = 0;
+    bool _isBad = false;
+    std::uint64_t _shownMessages = 0;
+    SteadyClock::time_point _nextDisplay{};
+};
+
+} // namespace
+
+int decodeFiles(const DecodeOptions& options, Bundle& bundle)
+{
+    // A reader that goes away is told by the write.
+    std::signal(SIGPIPE, SIG_IGN);
+    return Program(options, bundle).run();
+}
+
+} // namespace kestrum

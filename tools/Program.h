@@ -1,0 +1,25 @@
+#pragma once
+
+#include "tools/Output.h"
+
+#include <string>
+#include <vector>
+
+namespace kestrum {
+
+class Bundle;
+
+/// What the command line asks for.
+struct DecodeOptions {
+    std::vector<std::string> files; ///< "-": standard input
+    std::string technology;         ///< an identifier; empty: told from the messages
+    OutputFormat format = OutputFormat::Tree;
+    bool log = false, stats = false, follow = false;
+    std::string extract; ///< a directory; empty: nothing is extracted
+};
+
+/// Decodes the files, as parts of one log, onto standard output; all else goes to standard error. Gives the exit
+/// status: 0, or 1 when there was bad input, whose good parts are shown all the same.
+int decodeFiles(const DecodeOptions& options, Bundle& bundle);
+
+} // namespace kestrum

@@ -1,0 +1,136 @@
+#include "tools/Snapshot.h"
+
+#include "LogGenerator/DlfVersionReport.h"
+#include "platform/PropertyLists.h"
+#include "support/Format.h"
+#include "support/Record.h"
+#include "tools/RecordScanner.h"
+
+#include <stdexcept>
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+constexpr LogCode kVersionReport = 0x1FFD;
+
+std::uint64_t leavesOf(const Value& value)
+{
+    std::uint64_t count = 0;
+    if (const auto dictionary = value.dictionary())
+        for (const auto& entry : *dictionary)
+            count += leavesOf(entry.value);
+    else if (const auto array = value.array())
+        for (const auto& element : *array)
+            count += leavesOf(element);
+    else
+        count = 1;
+    return count;
+}
+
+std::optional<std::string> textAt(const Dictionary& dictionary, std::string_view key)
+{
+    const Value held = dictionary.at(key);
+    return held.string() != nullptr ? std::optional(*held.string()) : std::nullopt;
+}
+
+} // namespace
+
+Snapshot::Snapshot(std::string file, const Value& propertyList, MessageScanner::Tell tell) : _tell(std::move(tell))
+{
+    const auto root = propertyList.dictionary();
+    if (!root || (!root->contains("Timestamp") && !root->contains("Data")))
+        throw std::runtime_error("the property list is no snapshot");
+    const auto wrong = [this](const std::string& what, const Value& held, std::string_view due) {
+        _tell({0, 0, format("%s is of type %@ where %s is due", what, nameOf(held.kind()), due)});
+    };
+    _listing = {std::move(file), textAt(*root, "Timestamp"), textAt(*root, "Description"), {}};
+    for (const auto key : {"Timestamp", "Description"})
+        if (root->contains(key) && root->at(key).string() == nullptr)
+            wrong(format("\"%s\"", key), root->at(key), "a string");
+    if (!root->contains("Data"))
+        return;
+    const auto data = root->at("Data").array();
+    if (!data) {
+        wrong("\"Data\"", root->at("Data"), "an array");
+        return;
+    }
+    for (const auto& element : *data) {
+        const std::size_t index = _listing.entries.size();
+        SnapshotListing::Entry listed{{}, {}, 0, "nothing"};
+        if (const auto entry = element.dictionary()) {
+            listed.description = textAt(*entry, "Description").value_or("");
+            listed.date = textAt(*entry, "Date").value_or("");
+            const Value dlf = entry->at("DLF"), state = entry->at("DisplayState");
+            if (dlf.data() != nullptr) {
+                listed.content = "DLF";
+                listed.size = dlf.data()->size();
+                _dlf = *dlf.data();
+                _dlfEntry = index;
+            } else if (dlf) {
+                wrong(format("entry %lu: \"DLF\"", index), dlf, "data");
+            } else if (state.data() != nullptr) {
+                listed.content = "records";
+                listed.size = state.data()->size();
+                _intervals.emplace_back(index, *state.data());
+            } else if (state.string() != nullptr || state.dictionary() || state.array()) {
+                listed.content = "tree";
+                listed.size = leavesOf(state);
+                _trees.push_back(state);
+            } else if (state) {
+                wrong(format("entry %lu: \"DisplayState\"", index), state, "data");
+            }
+        } else {
+            wrong(format("entry %lu", index), element, "a dictionary");
+        }
+        _listing.entries.push_back(std::move(listed));
+    }
+}
+
+Bytes Snapshot::versionReport() const
+{
+    const Bytes dlf = _dlf ? _dlf->bytes() : Bytes();
+    const Record record(dlf);
+    const bool isReport = dlf.size() >= kDlfVersionReportSize && record.read(u16(0)) == kDlfVersionReportSize &&
+                          record.read(u16(2)) == kVersionReport;
+    return isReport ? dlf.first(kDlfVersionReportSize) : Bytes();
+}
+
+void Snapshot::recover(const PropertyLists& lists, const std::function<void(Bytes)>& take) const
+{
+    for (const auto& tree : _trees) {
+        if (const auto message = lists.toXml(tree))
+            take(message->bytes());
+        else
+            _tell({0, leavesOf(tree), "a tree cannot be serialised"});
+    }
+    // The stream lacks the first byte of each interval.
+    std::size_t accounted = versionReport().size();
+    for (const auto& [entry, interval] : _intervals)
+        accounted += interval.size() >= 2 ? interval.size() - 1 : 0;
+    if (!_dlf || _dlf->size() <= accounted) {
+        for (const auto& [entry, interval] : _intervals)
+            scan(interval.bytes(), 0, false, format("entry %lu", entry), take);
+        return;
+    }
+    if (!_intervals.empty())
+        _tell({0, 0,
+               format("the DLF stream has %lu bytes, of which the other entries account for %lu: it is taken",
+                      _dlf->size(), accounted)});
+    scan(_dlf->bytes().subspan(versionReport().size()), versionReport().size(), true, format("entry %lu", _dlfEntry),
+         take);
+}
+
+void Snapshot::scan(Bytes bytes, std::uint64_t from, bool isDlf, const std::string& place,
+                    const std::function<void(Bytes)>& take) const
+{
+    ByteWindow window(bytes);
+    const auto tell = [&](const Fault& fault) {
+        _tell({fault.offset + from, fault.size, format("%s: %s", place, fault.reason)});
+    };
+    RecordScanner scanner(window, tell, isDlf ? RecordScanner::Origin::Dlf : RecordScanner::Origin::Interval);
+    while (const auto message = scanner.next())
+        take(*message);
+}
+
+} // namespace kestrum

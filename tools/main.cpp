@@ -1,0 +1,83 @@
+#include "platform/TelephonyService.h"
+#include "platform/linux/LinuxBundle.h"
+#include "tools/Program.h"
+
+#include <CLI/CLI.hpp>
+
+#include <exception>
+#include <iostream>
+#include <map>
+
+namespace {
+
+using namespace kestrum;
+
+constexpr int kFailed = 1, kUsageError = 2;
+
+const std::map<std::string, std::string> kTechnologies = {
+    {"ifx", std::string(kVoxLogChannelTechnology_IFX)},
+    {"gsm", std::string(kVoxLogChannelTechnology_Zephra_GSM)},
+    {"cdma", std::string(kVoxLogChannelTechnology_Zephra_CDMA)},
+    {"lte", std::string(kVoxLogChannelTechnology_Zephra_LTE)},
+    {"utran", std::string(kVoxLogChannelTechnology_Zephra_UTRAN2)}};
+
+const std::map<std::string, OutputFormat> kFormats = {{"tree", OutputFormat::Tree},
+                                                      {"json", OutputFormat::Json},
+                                                      {"jsonl", OutputFormat::Jsonl},
+                                                      {"csv", OutputFormat::Csv}};
+
+constexpr const char* kFooter = R"(Formats:
+  tree   what the panes show after the last message
+  json   one object: technology, messages, dropped, display, and (with --log) log
+  jsonl  one object for each message that changed the display: time, code, changes by path
+  csv    the same changes as rows: time, code, path, value
+
+Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum); other names are told by their content.
+Several files are read one after the other, as parts of one log. "dropped" counts messages of an invalid type, too short
+for their decoder, or no property list where one is due.
+
+The display goes to standard output, everything else to standard error.
+Exit status: 0 all was read, 1 there was bad input (the rest is shown), 2 wrong usage.)";
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    DecodeOptions options;
+    CLI::App commands("Decodes captures and snapshots of a modem's log offline: a file in, the display out.",
+                      "kestrum-decode");
+    commands.footer(kFooter);
+    commands.set_version_flag("--version", std::string("kestrum-decode ") + KESTRUM_VERSION);
+    commands.add_option("FILE", options.files, "Captures and snapshots; - is standard input")->required();
+    std::string technology, format = "tree";
+    commands.add_option("--technology", technology, "ifx, gsm, cdma, lte or utran (default: told from the messages)")
+        ->check(CLI::IsMember(&kTechnologies));
+    commands.add_option("--format", format, "tree, json, jsonl or csv")
+        ->check(CLI::IsMember(&kFormats))
+        ->capture_default_str();
+    commands.add_flag("--log", options.log, "The system log too: in the object of json, else on standard error");
+    commands.add_flag("--stats", options.stats, "Count the messages of each log code, on standard error");
+    commands.add_flag("--follow", options.follow, "Go on as the last file grows, until interrupted");
+    commands.add_option("--extract", options.extract,
+                        "Write a snapshot's DLF stream, and the recovered records as .dlf and .kcap, into a directory");
+    try {
+        commands.parse(argc, argv);
+        if (!options.extract.empty())
+            for (const auto& file : options.files)
+                if (file.ends_with(".kcap") || file.ends_with(".dlf"))
+                    throw CLI::ValidationError("--extract", file + " is no snapshot");
+    } catch (const CLI::ParseError& error) {
+        return commands.exit(error) == 0 ? 0 : kUsageError;
+    }
+    if (!technology.empty())
+        options.technology = kTechnologies.at(technology);
+    options.format = kFormats.at(format);
+
+    try {
+        LinuxBundle bundle;
+        return decodeFiles(options, bundle);
+    } catch (const std::exception& error) {
+        std::cerr << "kestrum-decode: " << error.what() << '\n';
+        return kFailed;
+    }
+}
