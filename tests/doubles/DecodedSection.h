@@ -1,0 +1,79 @@
+#pragma once
+
+#include "LogGenerator/Base.h"
+#include "doubles/DecodingDoubles.h"
+#include "doubles/RecordBuilder.h"
+
+#include <stdexcept>
+#include <string>
+#include <utility>
+
+namespace kestrum {
+
+/// A section at work on a node of its own, and what it logs.
+template <typename Section>
+class DecodedSection {
+public:
+    template <typename... Records>
+    explicit DecodedSection(Value node, const Records&... records) : _node(std::move(node)), _section(_doubles.roles)
+    {
+        _section.updateSectionRef(_node);
+        log().lines.clear();
+        (receive(records), ...);
+    }
+
+    /// Hands over one record, under its own code unless another is given.
+    DecodedSection& receive(const RecordBuilder& record) { return receive(record, record.code()); }
+    DecodedSection& receive(const RecordBuilder& record, LogCode code)
+    {
+        if (const Value& list = record.propertyList())
+            _doubles.propertyLists.parsed[describe(list)] = list;
+        _section.updateWithData(Record(record.bytes()), code);
+        return *this;
+    }
+
+    /// The whole display of the section.
+    const Value& node() const { return _node; }
+    /// Its text in one line, as `{"Cell ID": "12"}` or `[{"ARFCN": "3"}]`.
+    std::string text() const { return describe(_node); }
+
+    /// Of a dictionary section: the value under `key`, null when there is none.
+    Value at(std::string_view key) const { return _node.dictionary()->at(key); }
+    bool contains(std::string_view key) const { return _node.dictionary()->contains(key); }
+
+    /// Of a list section.
+    std::size_t size() const { return _node.array()->size(); }
+    DictionaryRef row(std::size_t index) const
+    {
+        const auto found = index < size() ? (*_node.array())[index].dictionary() : nullptr;
+        if (!found)
+            throw std::out_of_range("no such row in " + text());
+        return found;
+    }
+
+    Section& section() { return _section; }
+    DecodingDoubles& doubles() { return _doubles; }
+    RecordingLog& log() { return _doubles.log; }
+    const RecordingLog& log() const { return _doubles.log; }
+
+private:
+    DecodingDoubles _doubles;
+    Value _node;
+    Section _section;
+};
+
+/// A dictionary section after these records.
+template <typename Section, typename... Records>
+DecodedSection<Section> decoded(const Records&... records)
+{
+    return DecodedSection<Section>(makeDictionary(), records...);
+}
+
+/// A list section after these records.
+template <typename Section, typename... Records>
+DecodedSection<Section> decodedList(const Records&... records)
+{
+    return DecodedSection<Section>(makeArray(), records...);
+}
+
+} // namespace kestrum

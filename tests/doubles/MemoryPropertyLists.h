@@ -1,0 +1,41 @@
+#pragma once
+
+#include "platform/PropertyLists.h"
+
+#include <map>
+
+namespace kestrum {
+
+/// Property lists that the test lays down: files by path, parsed bytes by their text. What is not laid down is no
+/// property list.
+class MemoryPropertyLists final : public PropertyLists {
+public:
+    Value parse(Bytes bytes) const override { return find(parsed, std::string(textOf(bytes))); }
+    std::optional<Data> toXml(const Value& value) const override
+    {
+        if (value.isNull() || !writable)
+            return std::nullopt;
+        return Data(bytesOf(describe(value)));
+    }
+    Value load(const std::string& path) const override { return deepCopy(find(files, path)); }
+    bool write(const Dictionary& dictionary, const std::string& path) const override
+    {
+        if (!writable)
+            return false;
+        files[path] = deepCopy(std::make_shared<Dictionary>(dictionary));
+        return true;
+    }
+
+    std::map<std::string, Value> parsed;
+    mutable std::map<std::string, Value> files;
+    bool writable = true;
+
+private:
+    static Value find(const std::map<std::string, Value>& among, const std::string& key)
+    {
+        const auto found = among.find(key);
+        return found == among.end() ? Value() : found->second;
+    }
+};
+
+} // namespace kestrum

@@ -1,0 +1,20 @@
+#pragma once
+
+#include "platform/Console.h"
+
+#include <string>
+#include <vector>
+
+namespace kestrum {
+
+/// Keeps what is printed.
+class RecordingConsole final : public Console {
+public:
+    void printLine(std::string_view line) override { printed.emplace_back(line); }
+    void debug(std::string_view line) override { debugged.emplace_back(line); }
+    bool isDebugWatched() const override { return true; }
+
+    std::vector<std::string> printed, debugged;
+};
+
+} // namespace kestrum

@@ -1,0 +1,37 @@
+#pragma once
+
+#include "platform/SystemLog.h"
+
+#include <algorithm>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace kestrum {
+
+/// Keeps the lines, addresses shown as null.
+class RecordingLog final : public SystemLog {
+public:
+    using Line = std::pair<Priority, std::string>;
+
+    void write(Priority priority, std::string_view text) override { lines.emplace_back(priority, text); }
+    const void* shownAddress(const void*) const override { return nullptr; }
+
+    std::vector<std::string> texts(Priority priority) const
+    {
+        std::vector<std::string> found;
+        for (const auto& [at, text] : lines)
+            if (at == priority)
+                found.push_back(text);
+        return found;
+    }
+    std::vector<std::string> errors() const { return texts(Priority::Error); }
+    std::size_t count(std::string_view text) const
+    {
+        return static_cast<std::size_t>(std::ranges::count(lines, text, &Line::second));
+    }
+
+    std::vector<Line> lines;
+};
+
+} // namespace kestrum

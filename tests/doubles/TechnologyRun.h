@@ -1,0 +1,71 @@
+#pragma once
+
+#include "LogGenerator/ZPHLogGenerator2.h"
+#include "doubles/DecodingDoubles.h"
+#include "platform/propertylist/PropertyListCodec.h"
+
+#include <memory>
+#include <set>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kestrum {
+
+/// What a section's node looks like: the keys of a dictionary, or of a list's rows.
+struct SectionShape {
+    std::string_view name;
+    Value::Kind kind;
+    std::set<std::string, std::less<>> keys;
+};
+
+inline std::set<std::string, std::less<>> keysOf(const Value& dictionary)
+{
+    std::set<std::string, std::less<>> keys;
+    if (const auto held = dictionary.dictionary())
+        for (const auto& entry : *held)
+            keys.insert(entry.key);
+    return keys;
+}
+
+/// The value under a key, wherever in the tree it stands; null when there is none.
+inline Value nodeNamed(std::string_view name, const Value& tree)
+{
+    if (const auto dictionary = tree.dictionary()) {
+        if (dictionary->contains(name))
+            return dictionary->at(name);
+        for (const auto& entry : *dictionary)
+            if (Value found = nodeNamed(name, entry.value))
+                return found;
+    }
+    return {};
+}
+
+/// A technology's generator at work on the template that ships with the program.
+template <typename Generator>
+class TechnologyRun {
+public:
+    explicit TechnologyRun(std::string_view templateName)
+    {
+        doubles.bundle.paths = {resource(templateName)};
+        generator = Generator::generator(roles);
+    }
+
+    static std::string resource(std::string_view templateName)
+    {
+        return std::string(KESTRUM_SOURCE_DIR) + "/resources/" + std::string(templateName) + ".plist";
+    }
+
+    void receive(Bytes message) { generator->updateState(state, message); }
+
+    Value display() const { return state.at("Display"); }
+    Value section(std::string_view name) const { return nodeNamed(name, display()); }
+
+    DecodingDoubles doubles;
+    PropertyListCodec codec;
+    DecodingRoles roles{doubles.log, doubles.console, doubles.clock, doubles.bundle, codec};
+    State state;
+    std::unique_ptr<Generator> generator;
+};
+
+} // namespace kestrum
