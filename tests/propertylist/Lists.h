@@ -1,0 +1,115 @@
+#pragma once
+
+#include "doubles/ScratchDirectory.h"
+#include "platform/propertylist/PropertyListCodec.h"
+
+#include <cstdint>
+#include <cstdlib>
+#include <fstream>
+#include <iterator>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+namespace kestrum {
+
+inline std::string contentsOf(const std::string& path)
+{
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
+/// What peer.py makes of `input`.
+inline std::string peer(const std::string& arguments, const std::string& input)
+{
+    const ScratchDirectory scratch;
+    std::ofstream(scratch.file("in"), std::ios::binary) << input;
+    const std::string command = "python3 '" KESTRUM_SOURCE_DIR "/tests/propertylist/peer.py' " + arguments + " <'" +
+                                scratch.file("in") + "' >'" + scratch.file("out") + "'";
+    if (std::system(command.c_str()) != 0)
+        throw std::runtime_error("Python's plistlib refuses");
+    return contentsOf(scratch.file("out"));
+}
+
+inline bool peerIsThere()
+{
+    return std::system("python3 -c 'import plistlib' 2>/dev/null") == 0;
+}
+
+inline std::string bigEndian(std::uint64_t number, unsigned width)
+{
+    std::string text;
+    while (width-- > 0)
+        text += static_cast<char>(number >> 8 * width & 0xFF);
+    return text;
+}
+
+inline std::string hex(const std::string& digits)
+{
+    std::string bytes;
+    for (std::size_t i = 0; i + 1 < digits.size(); i += 2)
+        bytes += static_cast<char>(std::stoi(digits.substr(i, 2), nullptr, 16));
+    return bytes;
+}
+
+/// A binary property list from its objects' bytes, in which references to others take one byte. What the trailer says
+/// can be falsified.
+struct BinaryList {
+    std::vector<std::string> objects;
+    std::uint64_t root = 0;
+    unsigned tableWidth = 2;                           ///< of an offset, in truth
+    unsigned offsetWidth = 2, referenceWidth = 1;      ///< as the trailer says
+    std::int64_t moreObjects = 0, moreTableOffset = 0; ///< added to what is true
+
+    std::string bytes() const
+    {
+        std::string text = "bplist00", table;
+        for (const auto& object : objects) {
+            table += bigEndian(text.size(), tableWidth);
+            text += object;
+        }
+        const auto tableAt = text.size() + static_cast<std::uint64_t>(moreTableOffset);
+        text += table + std::string(6, '\0') + bigEndian(offsetWidth, 1) + bigEndian(referenceWidth, 1);
+        text += bigEndian(objects.size() + static_cast<std::uint64_t>(moreObjects), 8);
+        return text + bigEndian(root, 8) + bigEndian(tableAt, 8);
+    }
+};
+
+inline std::string repeated(const std::string& text, std::size_t count)
+{
+    std::string all;
+    all.reserve(text.size() * count);
+    while (count-- > 0)
+        all += text;
+    return all;
+}
+
+inline std::string xmlList(const std::string& inside)
+{
+    return "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<plist version=\"1.0\">" + inside + "</plist>";
+}
+
+inline PropertyListCodec::Parsed parsed(const std::string& text)
+{
+    return PropertyListCodec().parseWithError(bytesOf(text));
+}
+
+/// The XML form, or nothing.
+inline std::string xmlOf(const Value& value)
+{
+    const auto xml = PropertyListCodec().toXml(value);
+    return xml ? std::string(textOf(xml->bytes())) : std::string();
+}
+
+/// A case of a parametrised test, shown by its name.
+template <typename Expected>
+struct NamedCase {
+    const char* name;
+    std::string input;
+    Expected expected;
+
+    friend void PrintTo(const NamedCase& shown, std::ostream* out) { *out << shown.name; }
+};
+inline constexpr auto caseName = [](const auto& each) { return std::string(each.param.name); };
+
+} // namespace kestrum

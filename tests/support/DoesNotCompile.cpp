@@ -1,0 +1,58 @@
+// Compiled once for each case, which has to fail, and once without any.
+#include "support/Format.h"
+#include "support/Record.h"
+#include "support/Value.h"
+
+using namespace kestrum;
+
+const int number = -1;
+const std::string text = format("%d %s %lu %+.2f %c %p %@ 100%%", number, "text", 1ul, 0.5, 'c', &number, "object")
+#if defined TEXT_FOR_A_NUMBER
+                         + format("%d", "12")
+#elif defined NUMBER_FOR_A_TEXT
+                         + format("%s", 12)
+#elif defined SIGNED_FOR_UNSIGNED
+                         + format("%u", -1)
+#elif defined UNSIGNED_FOR_SIGNED
+                         + format("%d", 1u)
+#elif defined LONG_WITHOUT_L
+                         + format("%d", 1l)
+#elif defined INTEGER_FOR_A_REAL
+                         + format("%f", 1)
+#elif defined REAL_FOR_AN_INTEGER
+                         + format("%d", 1.0)
+#elif defined BOOLEAN_FOR_A_NUMBER
+                         + format("%d", true)
+#elif defined CHARACTER_FOR_A_NUMBER
+                         + format("%d", 'c')
+#elif defined PRECISION_FOR_AN_INTEGER
+                         + format("%.2d", 1)
+#elif defined UNKNOWN_CONVERSION
+                         + format("%q", 1)
+#elif defined UNFINISHED_CONVERSION
+                         + format("100 %", 1)
+#elif defined TOO_FEW_ARGUMENTS
+                         + format("%d %d", 1)
+#elif defined TOO_MANY_ARGUMENTS
+                         + format("%d", 1, 2)
+#endif
+    ;
+
+constexpr Field fields[] = {
+    u32(21).bits(15, 21),
+    u8(13).bit(7),
+#if defined BITS_BEYOND_THE_WORD
+    u16(19).bits(9, 16),
+#elif defined BITS_IN_REVERSE
+    u16(19).bits(8, 0),
+#elif defined BIT_BEYOND_THE_WORD
+    u8(13).bit(8),
+#endif
+};
+
+const Value value =
+#if defined POINTER_FOR_A_VALUE
+    &fields[0]; // it would become a boolean
+#else
+    true;
+#endif

@@ -1,0 +1,216 @@
+#include "support/Value.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+
+TEST(Value, KnowsItsKind)
+{
+    EXPECT_EQ(Value().kind(), Value::Kind::Null);
+    EXPECT_EQ(Value("text").kind(), Value::Kind::String);
+    EXPECT_EQ(Value(-1).kind(), Value::Kind::Integer);
+    EXPECT_EQ(Value(UINT64_MAX).kind(), Value::Kind::Integer);
+    EXPECT_EQ(Value(0.5f).kind(), Value::Kind::Real);
+    EXPECT_EQ(Value(true).kind(), Value::Kind::Boolean);
+    EXPECT_EQ(Value(Date(1s)).kind(), Value::Kind::Date);
+    EXPECT_EQ(Value(Data()).kind(), Value::Kind::Data);
+    EXPECT_EQ(Value(makeArray()).kind(), Value::Kind::Array);
+    EXPECT_EQ(Value(makeDictionary()).kind(), Value::Kind::Dictionary);
+    EXPECT_EQ(nameOf(Value::Kind::Dictionary), "dictionary");
+}
+
+TEST(Value, OfANullReferenceIsNull)
+{
+    EXPECT_TRUE(Value(ArrayRef()).isNull());
+    EXPECT_TRUE(Value(DictionaryRef()).isNull());
+    EXPECT_FALSE(Value());
+    EXPECT_TRUE(Value(false)); // there is a value, whatever it says
+}
+
+TEST(Value, GivesNothingOfAnotherKind)
+{
+    const Value text = "1";
+    EXPECT_FALSE(text.integer() || text.unsignedInteger() || text.real() || text.boolean() || text.date());
+    EXPECT_FALSE(text.array() || text.dictionary() || text.data() != nullptr || text.int32());
+    EXPECT_EQ(Value(1).string(), nullptr);
+    EXPECT_FALSE(Value(1).real() || Value(1.0).integer() || Value(true).integer());
+}
+
+TEST(Value, TellsSignedFromUnsigned)
+{
+    EXPECT_NE(Value(-1), Value(UINT64_MAX));
+    EXPECT_EQ(Value(-1).integer(), -1);
+    EXPECT_FALSE(Value(-1).unsignedInteger());
+    EXPECT_EQ(Value(UINT64_MAX).unsignedInteger(), UINT64_MAX);
+    EXPECT_FALSE(Value(UINT64_MAX).integer());
+    EXPECT_EQ(Value(1u), Value(1));
+    EXPECT_EQ(Value(std::uint64_t{INT64_MAX}), Value(INT64_MAX));
+    EXPECT_FALSE(Value(std::uint64_t{INT64_MAX} + 1).integer());
+}
+
+TEST(Value, ConvertsTo32BitsOnlyWithoutLoss)
+{
+    EXPECT_EQ(Value(INT32_MIN).int32(), INT32_MIN);
+    EXPECT_EQ(Value(INT32_MAX).int32(), INT32_MAX);
+    EXPECT_FALSE(Value(std::int64_t{INT32_MAX} + 1).int32());
+    EXPECT_FALSE(Value(std::int64_t{INT32_MIN} - 1).int32());
+    EXPECT_FALSE(Value(UINT64_MAX).int32());
+    EXPECT_EQ(Value(262.0).int32(), 262);
+    EXPECT_EQ(Value(-2147483648.0).int32(), INT32_MIN);
+    EXPECT_FALSE(Value(2147483648.0).int32());
+    EXPECT_FALSE(Value(0.5).int32());
+    EXPECT_FALSE(Value(std::nan("")).int32());
+    EXPECT_FALSE(Value(HUGE_VAL).int32());
+    EXPECT_FALSE(Value(true).int32());
+    EXPECT_FALSE(Value("1").int32());
+}
+
+TEST(Value, TakesTextOverWhateverItHeld)
+{
+    Value value = makeArray();
+    value.assignText("a");
+    EXPECT_EQ(value, Value("a"));
+    value.assignText("");
+    EXPECT_EQ(value, Value(""));
+}
+
+TEST(Value, CopiesShareTheirContainer)
+{
+    const Value original = makeArray({1});
+    const Value copy = original;
+    copy.array()->append(2);
+    EXPECT_EQ(original, Value(makeArray({1, 2})));
+}
+
+TEST(Value, AShallowCopySharesTheChildren)
+{
+    const Value original = makeDictionary({{"cells", makeArray()}});
+    const Value copy = shallowCopy(original);
+    copy.dictionary()->set("more", 1);
+    copy.dictionary()->at("cells").array()->append("x");
+    EXPECT_FALSE(original.dictionary()->contains("more"));
+    EXPECT_EQ(original.dictionary()->at("cells"), Value(makeArray({"x"})));
+}
+
+TEST(Value, ADeepCopySharesOnlyData)
+{
+    const Data data(bytesOf("raw"));
+    const Value original = makeDictionary({{"cells", makeArray({makeArray()})}, {"raw", data}});
+    const Value copy = deepCopy(original);
+    EXPECT_EQ(copy, original);
+    (*copy.dictionary()->at("cells").array())[0].array()->append("x");
+    EXPECT_NE(copy, original);
+    EXPECT_TRUE(copy.dictionary()->at("raw").data()->sharesStorageWith(data));
+}
+
+TEST(Value, ComparesContents)
+{
+    EXPECT_EQ(Value(makeDictionary({{"a", 1}, {"b", 2}})), Value(makeDictionary({{"b", 2}, {"a", 1}})));
+    EXPECT_NE(Value(makeDictionary({{"a", 1}})), Value(makeDictionary({{"a", 1}, {"b", 2}})));
+    EXPECT_NE(Value(makeArray({1, 2})), Value(makeArray({2, 1})));
+    EXPECT_NE(Value(makeArray({1})), Value(makeArray({1, 2})));
+    EXPECT_EQ(Value(Data(bytesOf("a"))), Value(Data(bytesOf("a"))));
+    EXPECT_NE(Value(1), Value(1.0));
+    EXPECT_NE(Value(true), Value(1));
+    EXPECT_NE(Value(""), Value());
+}
+
+TEST(Value, DescribesItselfOnOneLine)
+{
+    EXPECT_EQ(describe(makeDictionary({{"key", "text"},
+                                       {"list", makeArray({1, UINT64_MAX, 2.5, true, Data(bytesOf("abc")), Value()})},
+                                       {"date", Date(1s)}})),
+              "{\"key\": \"text\", \"list\": [1, 18446744073709551615, 2.500000, true, <3 bytes>, null], "
+              "\"date\": 1970-01-01 00:00:01 +0000}");
+}
+
+TEST(Array, RemovesFromItsStart)
+{
+    Array array{1, 2, 3};
+    array.removeFirst(2);
+    EXPECT_EQ(Value(makeArray({3})), Value(std::make_shared<Array>(array)));
+    array.removeFirst(1);
+    array.removeFirst(0);
+    EXPECT_TRUE(array.empty());
+}
+
+std::string keysOf(const Dictionary& dictionary)
+{
+    std::string keys;
+    for (const auto& entry : dictionary)
+        keys += entry.key + " ";
+    return keys;
+}
+
+TEST(Dictionary, KeepsTheOrderInWhichKeysCame)
+{
+    Dictionary dictionary{{"b", 1}, {"a", 2}};
+    dictionary.set("c", 3);
+    dictionary.set("a", 4);
+    EXPECT_EQ(keysOf(dictionary), "b a c ");
+    EXPECT_EQ(dictionary.at("a"), Value(4));
+    dictionary.remove("b");
+    dictionary.remove("not there");
+    dictionary.set("b", 5);
+    EXPECT_EQ(keysOf(dictionary), "a c b ");
+}
+
+TEST(Dictionary, GivesNothingForAnUnknownKey)
+{
+    const Dictionary dictionary{{"a", Value()}};
+    EXPECT_TRUE(dictionary.contains("a"));
+    EXPECT_FALSE(dictionary.contains(""));
+    EXPECT_EQ(dictionary.find("b"), nullptr);
+    EXPECT_TRUE(dictionary.at("b").isNull());
+}
+
+TEST(Dictionary, SetsTextInPlace)
+{
+    Dictionary dictionary;
+    dictionary.setText("a", "first");
+    dictionary.setText("a", "second");
+    EXPECT_EQ(dictionary.at("a"), Value("second"));
+    EXPECT_EQ(dictionary.size(), 1u);
+}
+
+TEST(Dictionary, FindsEveryKeyOfMany)
+{
+    // Beyond a few dozen keys an index helps: it has to follow every change.
+    Dictionary dictionary;
+    for (int i = 0; i < 1000; ++i)
+        dictionary.set(std::to_string(i), i);
+    for (int i = 999; i >= 0; --i)
+        ASSERT_EQ(dictionary.at(std::to_string(i)), Value(i));
+    for (int i = 0; i < 980; i += 2)
+        dictionary.remove(std::to_string(i));
+    for (int i = 0; i < 1000; ++i)
+        ASSERT_EQ(dictionary.contains(std::to_string(i)), i % 2 == 1 || i >= 980) << i;
+    Dictionary copy = dictionary;
+    for (int i = 1; i < 1000; i += 2)
+        copy.remove(std::to_string(i));
+    EXPECT_EQ(keysOf(copy), "980 982 984 986 988 990 992 994 996 998 ");
+    EXPECT_EQ(dictionary.size(), 510u);
+    copy.clear();
+    EXPECT_TRUE(copy.empty());
+    EXPECT_FALSE(copy.contains("980"));
+    copy.set("980", 1);
+    EXPECT_EQ(copy.at("980"), Value(1));
+}
+
+TEST(Data, SharesItsBytes)
+{
+    const Data data(bytesOf("raw"));
+    const Data copy = data;
+    EXPECT_TRUE(copy.sharesStorageWith(data));
+    EXPECT_FALSE(copy.sharesStorageWith(Data(bytesOf("raw"))));
+    EXPECT_TRUE(Data().empty());
+    EXPECT_EQ(Data().size(), 0u);
+}
+
+} // namespace
+} // namespace kestrum
