@@ -1,0 +1,65 @@
+#include "LogGenerator/ParsedOnce.h"
+
+#include <gtest/gtest.h>
+
+namespace kestrum {
+namespace {
+
+/// Takes any bytes for the list of their text, but for "none".
+class CountingLists final : public PropertyLists {
+public:
+    Value parse(Bytes bytes) const override
+    {
+        ++parsed;
+        return textOf(bytes) == "none" ? Value() : Value(makeArray({Value(textOf(bytes))}));
+    }
+    std::optional<Data> toXml(const Value&) const override { return Data(bytesOf("xml")); }
+    Value load(const std::string& path) const override { return path; }
+    bool write(const Dictionary&, const std::string& path) const override { return path == "writable"; }
+
+    mutable int parsed = 0;
+};
+
+TEST(ParsedOnce, ReadsEqualBytesOnce)
+{
+    const CountingLists lists;
+    const ParsedOnce once(lists);
+    const std::string first = "cells", again = "cells"; // equal bytes at different addresses
+    const Value list = once.parse(bytesOf(first));
+    EXPECT_EQ(list, Value(makeArray({"cells"})));
+    EXPECT_EQ(once.parse(bytesOf(again)).array(), list.array());
+    EXPECT_EQ(lists.parsed, 1);
+}
+
+TEST(ParsedOnce, ReadsOtherBytesAtTheSameAddressAnew)
+{
+    const CountingLists lists;
+    const ParsedOnce once(lists);
+    std::string buffer = "cells";
+    once.parse(bytesOf(buffer));
+    buffer = "files";
+    EXPECT_EQ(once.parse(bytesOf(buffer)), Value(makeArray({"files"})));
+}
+
+TEST(ParsedOnce, RemembersThatBytesAreNone)
+{
+    const CountingLists lists;
+    const ParsedOnce once(lists);
+    EXPECT_TRUE(once.parse(bytesOf("none")).isNull());
+    EXPECT_TRUE(once.parse(bytesOf("none")).isNull());
+    EXPECT_EQ(lists.parsed, 1);
+    EXPECT_FALSE(once.parse(bytesOf("cells")).isNull());
+}
+
+TEST(ParsedOnce, LeavesTheRestToTheListsBehindIt)
+{
+    const CountingLists lists;
+    const ParsedOnce once(lists);
+    EXPECT_EQ(textOf(once.toXml(Value("any"))->bytes()), "xml");
+    EXPECT_EQ(once.load("path"), Value("path"));
+    EXPECT_TRUE(once.write({}, "writable"));
+    EXPECT_FALSE(once.write({}, "elsewhere"));
+}
+
+} // namespace
+} // namespace kestrum
