@@ -1,0 +1,248 @@
+// How the log channel ends: by itself, on purpose, and in the middle of something.
+#include "core/Monitor.h"
+
+namespace kestrum {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+class Channel : public Monitor {
+protected:
+    static constexpr const char* kInvalidated = " ***** INVALIDATED 0x0 *****";
+
+    Value display(const char* rat) { return makeDictionary({{"RAT", rat}, {"Cell", "17"}}); }
+};
+
+TEST_F(Channel, DeliversNothingBeforeItIsOpen)
+{
+    EXPECT_FALSE(ports.send(kLogPort, 0, "list"));
+}
+
+TEST_F(Channel, DeathWhileIdleIsFoundByTheNextRefreshAndRestarts)
+{
+    startRunning();
+    ports.kill(kCommandPort);
+    queue.run();
+    EXPECT_THAT(log.lines, IsEmpty()); // the death alone says nothing
+    serve();
+
+    seconds(2);
+    EXPECT_EQ(log.count(kInvalidated), 1u);
+    EXPECT_EQ(attempts(), 1u);
+    EXPECT_TRUE(model->isConnected());
+    EXPECT_EQ(queue.timers(), 1u);
+    EXPECT_THAT(told, ElementsAre("status"));
+}
+
+TEST_F(Channel, DeathWithoutAServiceToComeBackToIsRetriedEveryFiveSeconds)
+{
+    startRunning();
+    ports.kill(kCommandPort);
+    seconds(2);
+    EXPECT_FALSE(model->isConnected());
+    EXPECT_EQ(log.errors().back(), "Could not create the ports necessary");
+    EXPECT_THAT(told, ElementsAre("status"));
+    serve();
+    seconds(4.999);
+    EXPECT_FALSE(model->isConnected());
+    seconds(0.001);
+    EXPECT_TRUE(model->isConnected());
+    EXPECT_THAT(told, ElementsAre("status", "status"));
+}
+
+TEST_F(Channel, DeathWhileRecordsStreamKeepsTheDisplayAndGoesOnAfterwards)
+{
+    startRunning();
+    stream(display("GSM"));
+    seconds(2);
+    ASSERT_EQ(textAt("/RAT"), "GSM");
+    ports.send(kLogPort, 0, "list");
+    ports.kill(kCommandPort);
+    serve();
+    seconds(2);
+    EXPECT_EQ(log.count(kInvalidated), 1u);
+    EXPECT_EQ(textAt("/RAT"), "GSM");
+
+    stream(display("UMTS"));
+    seconds(2);
+    EXPECT_EQ(textAt("/RAT"), "UMTS");
+}
+
+TEST_F(Channel, DeathWhileTheReplyIsAwaitedEndsTheAttempt)
+{
+    replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(900));
+    whileAsked = [this] { queue.post([this] { ports.kill(kCommandPort); }); };
+    model->startMonitor();
+    EXPECT_EQ(queue.now(), std::chrono::milliseconds(0)); // the wait ended at once
+    EXPECT_THAT(log.errors(), ElementsAre(" ***** Created ports (send=0x0, recv=0x0)",
+                                          " ***** Could not send the GetTechnology command (got error=-3)",
+                                          "No log generator technology works"));
+    whileAsked = nullptr;
+    serve();
+    seconds(6);
+    EXPECT_TRUE(model->isConnected());
+}
+
+TEST_F(Channel, InvalidatedLocalPortRestarts)
+{
+    startRunning();
+    ports.invalidateLocal(kLogPort);
+    EXPECT_THAT(log.lines, IsEmpty()); // not inside the call that invalidates
+    queue.run();
+    EXPECT_EQ(log.lines.front(), RecordingLog::Line(Priority::Error, kInvalidated));
+    EXPECT_EQ(attempts(), 1u);
+    EXPECT_TRUE(model->isConnected());
+}
+
+TEST_F(Channel, DeliberateCloseDoesNotRestart)
+{
+    startRunning();
+    model->destroyPorts();
+    EXPECT_FALSE(model->isConnected());
+    EXPECT_EQ(queue.timers(), 0u);
+    seconds(60);
+    EXPECT_THAT(log.lines, IsEmpty());
+    EXPECT_THAT(ports.requests, IsEmpty());
+    EXPECT_THAT(told, IsEmpty());
+}
+
+TEST_F(Channel, DeliberateCloseCancelsAPendingInvalidation)
+{
+    startRunning();
+    ports.invalidateLocal(kLogPort);
+    model->destroyPorts();
+    seconds(60);
+    EXPECT_THAT(log.lines, IsEmpty());
+}
+
+TEST_F(Channel, ClosingTwiceOrBeforeOpeningIsHarmless)
+{
+    model->destroyPorts();
+    model->destroyPorts();
+    startRunning();
+    model->destroyPorts();
+    model->destroyPorts();
+    EXPECT_FALSE(model->isConnected());
+    model->startMonitor();
+    EXPECT_TRUE(model->isConnected());
+}
+
+TEST_F(Channel, ClosingLeavesGeneratorAndStateAlone)
+{
+    startRunning();
+    stream(display("GSM"));
+    model->destroyPorts();
+    EXPECT_EQ(textAt("/RAT"), "GSM");
+}
+
+TEST_F(Channel, MessageUnderWayWhenTheChannelClosesIsLost)
+{
+    startRunning();
+    propertyLists.parsed["list"] = display("GSM");
+    ports.send(kLogPort, 0, "list");
+    model->restartMonitor();
+    queue.run();
+    told.clear();
+    seconds(2);
+    EXPECT_THAT(told, IsEmpty());
+}
+
+TEST_F(Channel, MessagesAreServedWhileTheReplyIsAwaited)
+{
+    startRunning();
+    replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(500));
+    propertyLists.parsed["list"] = display("GSM");
+    whileAsked = [this] { ports.send(kLogPort, 0, "list"); };
+    model->restartMonitor();
+    EXPECT_EQ(queue.now(), std::chrono::milliseconds(500));
+    EXPECT_EQ(textAt("/RAT"), "GSM");
+}
+
+TEST_F(Channel, StartWhileTheReplyIsAwaitedDoesNothing)
+{
+    replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(500));
+    whileAsked = [this] { queue.post([this] { model->startMonitor(); }); };
+    model->startMonitor();
+    queue.run();
+    EXPECT_TRUE(model->isConnected());
+    EXPECT_EQ(attempts(), 1u);
+    EXPECT_EQ(queue.timers(), 1u);
+    EXPECT_EQ(queue.tasks(), 0u);
+}
+
+TEST_F(Channel, RestartWhileTheReplyIsAwaitedEndsTheAttemptAndLeavesOneRetry)
+{
+    replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(500));
+    whileAsked = [this] {
+        whileAsked = nullptr;
+        queue.post([this] { model->restartMonitor(); });
+    };
+    model->startMonitor();
+    queue.run();
+    EXPECT_EQ(attempts(), 1u);
+    EXPECT_FALSE(model->isConnected());
+    EXPECT_EQ(log.errors().back(), "No log generator technology works");
+    EXPECT_EQ(queue.timers(), 0u);
+    EXPECT_EQ(queue.tasks(), 1u);
+    seconds(6);
+    EXPECT_TRUE(model->isConnected());
+    EXPECT_EQ(queue.timers(), 1u);
+}
+
+TEST_F(Channel, RestartWhileTheReplyIsAwaitedWithAnEarlierGeneratorFailsAtTheStartCommand)
+{
+    startRunning();
+    replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(500));
+    whileAsked = [this] {
+        whileAsked = nullptr;
+        queue.post([this] { model->restartMonitor(); });
+    };
+    model->restartMonitor();
+    EXPECT_THAT(log.errors(), ElementsAre(" ***** Created ports (send=0x0, recv=0x0)",
+                                          " ***** Could not send the GetTechnology command (got error=-3)",
+                                          " ***** Could not send the START command (got error=-1)"));
+    EXPECT_FALSE(model->isConnected());
+    queue.run();
+    EXPECT_EQ(queue.tasks(), 1u); // the retry
+}
+
+TEST_F(Channel, ModelLetGoWhileTheReplyIsAwaitedEndsItsAttempt)
+{
+    replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(500));
+    whileAsked = [this] {
+        queue.post([this] {
+            model->setObserver(nullptr);
+            model.reset();
+        });
+    };
+    model->startMonitor();
+    EXPECT_EQ(model, nullptr);
+    EXPECT_EQ(queue.timers(), 1u); // it runs on, held by its timer
+    queue.drop();
+    EXPECT_FALSE(ports.hasLocal(kLogPort));
+}
+
+TEST_F(Channel, NotificationOfTheServiceRefreshes)
+{
+    model->updateWithData(bytesOf("anything"));
+    telephony.whileCreating = [](const auto& notify) { notify("any name"); };
+    model->startMonitor();
+    queue.run();
+    EXPECT_THAT(told, ElementsAre("update", "status"));
+}
+
+TEST_F(Channel, RefreshOfADeadChannelInvalidatesOnce)
+{
+    startRunning();
+    ports.kill(kCommandPort);
+    serve();
+    model->refresh();
+    model->refresh();
+    queue.run();
+    EXPECT_EQ(log.count(kInvalidated), 1u);
+    EXPECT_EQ(attempts(), 1u);
+}
+
+} // namespace
+} // namespace kestrum

@@ -1,0 +1,554 @@
+#include "ui/KestrumApp.h"
+
+#include "doubles/ApplicationDoubles.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+constexpr const char* kMarker = "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
+constexpr const char* kCommands = "vox.commands";
+
+/// Two entries at least, so that the modem's wrapper dictionaries do not matter here.
+Value cell(const char* rssi)
+{
+    return makeDictionary({{"RSSI", rssi}, {"Band", makeDictionary({{"Now", "3"}, {"Before", "8"}})}});
+}
+
+/// The application on its doubles, with a telephony service that the test brings up and down.
+class KestrumAppTest : public testing::Test {
+protected:
+    void TearDown() override { EXPECT_THAT(doubles.toolkit.record.faults, IsEmpty()); }
+
+    void launch()
+    {
+        app = KestrumApp::make(doubles.applicationRoles);
+        app->applicationDidFinishLaunching();
+    }
+    /// A service whose modem runs that technology.
+    void serve(std::string_view technology = "kVoxLogChannelTechnology_IFX")
+    {
+        doubles.propertyLists.parsed["reply"] = makeDictionary({{"GetTechnology", technology}});
+        doubles.ports.serve(kCommands, [](const MemoryPorts::Request& request) {
+            const bool asked = request.reply == RemotePort::Reply::Awaited;
+            return MemoryPorts::Answer{0, asked ? std::optional(Data(bytesOf("reply"))) : std::nullopt};
+        });
+    }
+    void launchConnected()
+    {
+        serve();
+        launch();
+        doubles.queue.run();
+    }
+    /// A message that holds the whole display, and the refresh that finds it.
+    void show(Value display)
+    {
+        doubles.propertyLists.parsed["message"] = std::move(display);
+        ASSERT_TRUE(doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0, "message"));
+        doubles.queue.advance(2s);
+    }
+    void showCells() { show(makeDictionary({{"Serving", cell("-80 dBm")}, {"Neighbor", cell("-95 dBm")}})); }
+    void open(std::string_view key)
+    {
+        const auto row = top().rows.find(key);
+        ASSERT_TRUE(row) << key;
+        top().rows.tap(*row);
+    }
+
+    RecordingScreen& top() const { return doubles.toolkit.top(); }
+    const std::vector<std::string>& path() const { return doubles.toolkit.navigation->path; }
+
+    ApplicationDoubles doubles;
+    std::shared_ptr<KestrumApp> app;
+};
+
+// Launch
+
+TEST_F(KestrumAppTest, FirstScreenIsUpBeforeAnythingIsOpened)
+{
+    serve();
+    launch();
+    EXPECT_TRUE(doubles.toolkit.window->visible);
+    EXPECT_EQ(doubles.toolkit.windowFrame, (Rect{0, 0, 320, 480}));
+    EXPECT_EQ(doubles.toolkit.window->root, doubles.toolkit.navigation);
+    EXPECT_EQ(top().title(), "Kestrum");
+    EXPECT_EQ(top().rows.rowCount(), 0u);
+    EXPECT_THAT(doubles.telephony.channelsAsked, IsEmpty());
+
+    doubles.queue.run();
+    EXPECT_EQ(doubles.telephony.channelsAsked.size(), 1u);
+}
+
+TEST_F(KestrumAppTest, VeryFirstStatusIsConnectingWithoutDots)
+{
+    launch();
+    EXPECT_EQ(top().status(), "Connecting");
+    EXPECT_TRUE(top().isLoading());
+    EXPECT_EQ(app->updateMessage(), "Connecting...");
+
+    doubles.queue.run(); // the first attempt, without a service
+    EXPECT_EQ(top().status(), "Connecting...");
+    EXPECT_TRUE(top().isLoading());
+}
+
+TEST_F(KestrumAppTest, MonitoringStartsOnlyWhileTheApplicationHasAModel)
+{
+    serve();
+    launch();
+    app->applicationWillTerminate();
+    doubles.queue.advance(10s);
+    EXPECT_THAT(doubles.telephony.channelsAsked, IsEmpty());
+}
+
+// Status
+
+TEST_F(KestrumAppTest, StatusFollowsConnectDataLossAndReconnect)
+{
+    launchConnected();
+    EXPECT_EQ(top().status(), "Connecting...") << "connected, before the first data";
+    EXPECT_FALSE(top().isLoading());
+
+    showCells();
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44");
+    EXPECT_FALSE(top().isLoading());
+
+    doubles.queue.advance(2s);
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44") << "a refresh without new data";
+
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(2s);
+    EXPECT_EQ(top().status(), "Connecting...");
+    EXPECT_TRUE(top().isLoading());
+    EXPECT_THAT(top().rows.texts(), ElementsAre("Serving", "Neighbor")) << "what was seen last stays";
+
+    serve();
+    doubles.queue.advance(5s);
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44") << "the old text until new data comes";
+    EXPECT_FALSE(top().isLoading());
+
+    showCells();
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:55");
+}
+
+TEST_F(KestrumAppTest, UpdateTimeIsShownInTheDevicesZone)
+{
+    doubles.clock.zone = {std::chrono::hours(2), false};
+    launchConnected();
+    showCells();
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 08:05:44");
+}
+
+TEST_F(KestrumAppTest, UpdateMessageStandsWhileThereIsNoConnection)
+{
+    launchConnected();
+    showCells();
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(2s);
+    app->updateViewControllerFromModel();
+    EXPECT_EQ(app->updateMessage(), "Updated 2026-11-16 at 06:05:44");
+    EXPECT_EQ(top().status(), "Connecting...");
+}
+
+TEST_F(KestrumAppTest, PaneThatIsOpenedOrRevealedShowsTheStatusOfTheMoment)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44");
+
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(2s);
+    EXPECT_EQ(top().status(), "Connecting...");
+    doubles.toolkit.navigation->pressBack();
+    EXPECT_EQ(top().title(), "Kestrum");
+    EXPECT_EQ(top().status(), "Connecting...");
+    EXPECT_TRUE(top().isLoading());
+}
+
+// Panes
+
+TEST_F(KestrumAppTest, EveryPaneFollowsItsPath)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    open("Band");
+    const auto band = makeDictionary({{"Now", "20"}, {"Before", "3"}});
+    show(makeDictionary(
+        {{"Detected", cell("-101 dBm")}, {"Serving", makeDictionary({{"RSSI", "-70 dBm"}, {"Band", band}})}}));
+    EXPECT_THAT(path(), ElementsAre("Kestrum", "Serving", "Band"));
+    EXPECT_THAT(top().rows.texts(), ElementsAre("Now: 20", "Before: 3"));
+    doubles.toolkit.navigation->pressBack();
+    EXPECT_THAT(top().rows.texts(), ElementsAre("RSSI: -70 dBm", "Band"));
+    doubles.toolkit.navigation->pressBack();
+    EXPECT_THAT(top().rows.texts(), ElementsAre("Detected", "Serving"));
+}
+
+TEST_F(KestrumAppTest, MiddlePaneWhosePathIsGonePopsBackToTheReloadedRoot)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    open("Band");
+    show(makeDictionary({{"Neighbor", cell("-90 dBm")}, {"Detected", cell("-101 dBm")}}));
+    EXPECT_THAT(path(), ElementsAre("Kestrum"));
+    EXPECT_EQ(doubles.toolkit.navigation->transitions.back(), std::pair(Transition::Pop, true));
+    EXPECT_THAT(top().rows.texts(), ElementsAre("Neighbor", "Detected"));
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:46");
+}
+
+TEST_F(KestrumAppTest, TopPaneWhosePathIsGonePopsAlone)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    open("Band");
+    show(makeDictionary(
+        {{"Neighbor", cell("-90 dBm")}, {"Serving", makeDictionary({{"RSSI", "-70 dBm"}, {"PLMN", cell("")}})}}));
+    EXPECT_THAT(path(), ElementsAre("Kestrum", "Serving"));
+    EXPECT_THAT(top().rows.texts(), ElementsAre("RSSI: -70 dBm", "PLMN"));
+}
+
+TEST_F(KestrumAppTest, RowThatTurnsFromInnerToLeafKeepsItsKeyOnlyCell)
+{
+    launchConnected();
+    showCells();
+    show(makeDictionary({{"Serving", "none"}, {"Neighbor", cell("-90 dBm")}}));
+    EXPECT_THAT(top().rows.texts(), ElementsAre("Serving", "Neighbor"));
+    EXPECT_EQ(top().rows.row(0).accessory, Accessory::None);
+}
+
+TEST_F(KestrumAppTest, PaneWhoseNodeBecameALeafStaysWithoutRows)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    show(makeDictionary({{"Serving", "none"}, {"State", "Idle"}}));
+    EXPECT_THAT(path(), ElementsAre("Kestrum", "Serving"));
+    EXPECT_THAT(top().rows.texts(), IsEmpty());
+
+    showCells();
+    EXPECT_THAT(top().rows.texts(), ElementsAre("RSSI: -80 dBm", "Band"));
+}
+
+TEST_F(KestrumAppTest, RowThatARefreshRemovedTakesNoTap)
+{
+    launchConnected();
+    showCells();
+    show(makeDictionary({{"Serving", cell("-80 dBm")}}));
+    top().rows.tap(1);
+    EXPECT_THAT(path(), ElementsAre("Kestrum"));
+}
+
+TEST_F(KestrumAppTest, WithoutAGeneratorTheRootIsCalledKestrumAndHasNoRows)
+{
+    launch();
+    doubles.queue.run();
+    app->updateViewControllerFromModel();
+    EXPECT_EQ(top().title(), "Kestrum");
+    EXPECT_EQ(top().rows.rowCount(), 0u);
+    EXPECT_EQ(top().rows.reloads, 1);
+}
+
+TEST_F(KestrumAppTest, RefreshWithoutNewDataTouchesNoPane)
+{
+    launchConnected();
+    showCells();
+    const int reloads = top().rows.reloads;
+    doubles.queue.advance(20s);
+    EXPECT_EQ(top().rows.reloads, reloads);
+}
+
+TEST_F(KestrumAppTest, AnotherTechnologysDisplayClosesWhatWasOpenInTheOldOne)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(2s);
+    serve("kVoxLogChannelTechnology_Zephra_LTE");
+    doubles.queue.advance(5s);
+    EXPECT_THAT(path(), ElementsAre("Kestrum"));
+    EXPECT_THAT(top().rows.texts(), IsEmpty()) << "nothing of the old display looks current";
+    EXPECT_FALSE(top().isLoading());
+}
+
+// Save
+
+TEST_F(KestrumAppTest, WithoutTheInternalInstallMarkerNoPaneOffersSave)
+{
+    launchConnected();
+    EXPECT_FALSE(app->allowSaveButton());
+    showCells();
+    EXPECT_EQ(top().toolbar.size(), 3u);
+    open("Serving");
+    EXPECT_EQ(top().toolbar.size(), 3u);
+}
+
+TEST_F(KestrumAppTest, WithTheInternalInstallMarkerEveryPaneOffersSave)
+{
+    doubles.files.paths.insert(kMarker);
+    launchConnected();
+    EXPECT_TRUE(app->allowSaveButton());
+    EXPECT_NE(top().saveButton(), nullptr);
+    showCells();
+    open("Serving");
+    EXPECT_NE(top().saveButton(), nullptr);
+}
+
+class KestrumAppSaveTest : public KestrumAppTest {
+protected:
+    KestrumAppSaveTest() { doubles.files.paths.insert(kMarker); }
+
+    RecordingNavigationView& navigation() { return *doubles.toolkit.navigation; }
+    const Value& file(const char* path) { return doubles.propertyLists.files.at(path); }
+};
+
+TEST_F(KestrumAppSaveTest, HeldSaveButtonSurvivesARefresh)
+{
+    launchConnected();
+    showCells();
+    const auto held = top().saveButton();
+    showCells();
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:46");
+    EXPECT_EQ(top().saveButton(), held);
+    std::get<SaveItem>(*held).action();
+    EXPECT_NE(navigation().presented, nullptr);
+}
+
+TEST_F(KestrumAppSaveTest, SavePressedTwicePresentsOneScreen)
+{
+    launchConnected();
+    top().pressSave();
+    top().pressSave();
+    EXPECT_EQ(navigation().presentations, 1);
+    EXPECT_EQ(navigation().presentedAnimated, true);
+    EXPECT_EQ(app->saveViewController(), nullptr) << "the property is none of the screen's business";
+}
+
+TEST_F(KestrumAppSaveTest, ListsAndWritesTheHistoryOfTheMoment)
+{
+    launchConnected();
+    showCells();
+    showCells();
+    top().pressSave();
+    EXPECT_THAT(navigation().presented->rows.texts(),
+                ElementsAre("Snapshot (2026-11-16 06:05:44 +0000)", "Snapshot (2026-11-16 06:05:46 +0000)"));
+    showCells();
+    EXPECT_EQ(navigation().presented->rows.rowCount(), 2u) << "data that comes meanwhile is not added";
+
+    navigation().presented->owner.savePressed();
+    EXPECT_NE(navigation().presented, nullptr) << "the screen is closed after its button has returned";
+    doubles.queue.run();
+    EXPECT_EQ(navigation().presented, nullptr);
+
+    // 2026-11-16 06:05:48 UTC
+    const auto snapshot = file("/logs/KestrumSnapshot-1794809148.kestrum").dictionary();
+    ASSERT_NE(snapshot, nullptr);
+    EXPECT_EQ(snapshot->at("Timestamp"), "2026-11-16 06:05:46 +0000");
+    EXPECT_EQ(snapshot->at("Data").array()->size(), 2u);
+}
+
+TEST_F(KestrumAppSaveTest, CanBeOpenedAgainAfterItWasClosed)
+{
+    launchConnected();
+    top().pressSave();
+    navigation().presented->owner.cancelPressed();
+    doubles.queue.run();
+    top().pressSave();
+    EXPECT_EQ(navigation().presentations, 2);
+    EXPECT_NE(navigation().presented, nullptr);
+    EXPECT_THAT(doubles.propertyLists.files, IsEmpty());
+}
+
+TEST_F(KestrumAppSaveTest, CancelPressedTwiceClosesOnce)
+{
+    launchConnected();
+    top().pressSave();
+    navigation().presented->owner.cancelPressed();
+    navigation().presented->owner.cancelPressed();
+    doubles.queue.run();
+    EXPECT_EQ(navigation().presented, nullptr);
+    app->closeSaveView();
+    EXPECT_EQ(navigation().presentations, 1);
+}
+
+TEST_F(KestrumAppSaveTest, FailedWriteClosesTheScreenBehindItsAlert)
+{
+    doubles.propertyLists.writable = false;
+    launchConnected();
+    top().pressSave();
+    navigation().presented->owner.savePressed();
+    doubles.queue.run();
+    EXPECT_EQ(navigation().presented, nullptr);
+    EXPECT_THAT(doubles.toolkit.alerts,
+                ElementsAre(RecordingToolkit::Alert{"File Error", "Unable to write file to disk", "Close"}));
+}
+
+TEST_F(KestrumAppSaveTest, WithoutAGeneratorOnlyTheTimeIsSaved)
+{
+    launch();
+    doubles.queue.run();
+    top().pressSave();
+    EXPECT_EQ(navigation().presented->rows.rowCount(), 0u);
+    navigation().presented->owner.savePressed();
+    EXPECT_EQ(file("/logs/KestrumSnapshot-1794809142.kestrum"),
+              Value(makeDictionary({{"Timestamp", "2026-11-16 06:05:42 +0000"}})));
+}
+
+TEST_F(KestrumAppSaveTest, PanesUnderTheScreenTakeNoBack)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    top().pressSave();
+    navigation().pressBack();
+    EXPECT_THAT(path(), ElementsAre("Kestrum", "Serving"));
+}
+
+TEST_F(KestrumAppSaveTest, ScreenTakesTheKeyboardFromThePaneAndGivesItBackItsToolbar)
+{
+    launchConnected();
+    showCells();
+    EXPECT_EQ(top().resigned, 0);
+    top().pressSave();
+    EXPECT_EQ(top().resigned, 1);
+
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(2s);
+    navigation().presented->owner.cancelPressed();
+    doubles.queue.run();
+    EXPECT_EQ(navigation().presentedAnimated, true);
+    EXPECT_EQ(top().status(), "Connecting...");
+    EXPECT_NE(top().saveButton(), nullptr);
+}
+
+TEST_F(KestrumAppSaveTest, PaneWhosePathGoesUnderTheScreenIsClosedThere)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    top().pressSave();
+    show(makeDictionary({{"Neighbor", cell("-90 dBm")}, {"Detected", cell("-101 dBm")}}));
+    EXPECT_NE(navigation().presented, nullptr);
+    EXPECT_THAT(path(), ElementsAre("Kestrum"));
+
+    navigation().presented->owner.cancelPressed();
+    doubles.queue.run();
+    EXPECT_EQ(navigation().presented, nullptr);
+    EXPECT_EQ(top().title(), "Kestrum");
+}
+
+// Termination
+
+TEST_F(KestrumAppSaveTest, TerminationKeepsItsOrder)
+{
+    launchConnected();
+    showCells();
+    top().pressSave();
+    app->setWindow(std::make_shared<RecordingWindow>(doubles.toolkit.record));
+    app->setSaveViewController(std::make_shared<KestrumSaveViewController>(doubles.applicationRoles, *app, Value()));
+    doubles.preferences.onCall = [&] {
+        EXPECT_TRUE(app->updateMessage());
+        EXPECT_NE(app->saveViewController(), nullptr);
+        EXPECT_TRUE(doubles.toolkit.window->visible);
+    };
+    int ordersOut = 0;
+    doubles.toolkit.window->onOrderOut = [&] {
+        ++ordersOut;
+        EXPECT_EQ(doubles.preferences.calls.size(), 3u);
+        EXPECT_EQ(app->updateMessage(), std::nullopt);
+        EXPECT_EQ(app->saveViewController(), nullptr);
+        EXPECT_NE(app->window(), nullptr);
+        // The model is still there: it answers for the status.
+        app->updateStatus();
+        EXPECT_FALSE(top().isLoading());
+    };
+    app->applicationWillTerminate();
+
+    EXPECT_THAT(doubles.preferences.calls,
+                ElementsAre("set org.kestrum.homescreen HXShowGSMRSSI false", "synchronize org.kestrum.homescreen",
+                            "changed org.kestrum.homescreen HXShowGSMRSSI"));
+    EXPECT_EQ(ordersOut, 1);
+    EXPECT_EQ(app->window(), nullptr);
+    app->updateStatus();
+    EXPECT_TRUE(top().isLoading()) << "no model any more";
+
+    // What the properties never held is left alone.
+    EXPECT_EQ(doubles.toolkit.record.windows, 1);
+    EXPECT_FALSE(doubles.toolkit.window->visible);
+    EXPECT_NE(navigation().presented, nullptr);
+}
+
+TEST_F(KestrumAppTest, RunningMonitorKeepsTheChannelOpenUntilTheQueueIsDropped)
+{
+    launchConnected();
+    showCells();
+    app->applicationWillTerminate();
+    EXPECT_TRUE(doubles.ports.hasLocal("org.kestrum.vox.baseband-state-report.log"));
+    const int reloads = top().rows.reloads;
+    doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0, "message");
+    doubles.queue.advance(4s);
+    EXPECT_EQ(top().rows.reloads, reloads) << "nobody is told any more";
+
+    doubles.queue.drop();
+    EXPECT_FALSE(doubles.ports.hasLocal("org.kestrum.vox.baseband-state-report.log"));
+}
+
+TEST_F(KestrumAppTest, ModelOutlivesTheApplicationUnharmed)
+{
+    launchConnected();
+    doubles.propertyLists.parsed["message"] = cell("-80 dBm");
+    doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0, "message");
+    app.reset();
+    EXPECT_EQ(doubles.toolkit.record.windows, 0);
+    doubles.queue.advance(10s);
+    EXPECT_EQ(doubles.queue.timers(), 1u);
+}
+
+TEST_F(KestrumAppTest, TaskThatFindsNoModelDoesNothing)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    app->applicationWillTerminate();
+    app->updateViewControllerFromModel();
+    app->showSaveView();
+    EXPECT_THAT(path(), ElementsAre("Kestrum", "Serving"));
+    EXPECT_EQ(doubles.toolkit.navigation->presentations, 0);
+}
+
+TEST_F(KestrumAppTest, MainLoopLaunchesAndTerminatesIt)
+{
+    app = KestrumApp::make(doubles.applicationRoles);
+    doubles.toolkit.mainLoop = [&] {
+        EXPECT_TRUE(doubles.toolkit.window->visible);
+        EXPECT_THAT(doubles.preferences.calls, IsEmpty());
+    };
+    EXPECT_EQ(doubles.toolkit.run(*app), 0);
+    EXPECT_FALSE(doubles.toolkit.window->visible);
+    EXPECT_EQ(doubles.preferences.calls.size(), 3u);
+}
+
+TEST_F(KestrumAppTest, TerminatedBeforeItWasLaunchedItOnlyResetsThePreference)
+{
+    app = KestrumApp::make(doubles.applicationRoles);
+    app->applicationWillTerminate();
+    EXPECT_EQ(doubles.preferences.calls.size(), 3u);
+}
+
+TEST_F(KestrumAppTest, HomeScreenKeyTakesEitherValue)
+{
+    app = KestrumApp::make(doubles.applicationRoles);
+    app->_setGSMRSSI(true);
+    EXPECT_EQ(doubles.preferences.calls.front(), "set org.kestrum.homescreen HXShowGSMRSSI true");
+}
+
+} // namespace
+} // namespace kestrum
