@@ -1,0 +1,215 @@
+#include "doubles/RecordingLog.h"
+#include "linux/EventLoop.h"
+#include "linux/RawSocket.h"
+#include "linux/Scratch.h"
+#include "platform/linux/LinuxTelephonyService.h"
+#include "platform/linux/QtMainQueue.h"
+
+#include <gmock/gmock.h>
+
+#include <thread>
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+/// A service that a thread of the test plays on a plain socket, since the client does not serve the event loop.
+class TelephonyServiceTest : public testing::Test {
+protected:
+    ~TelephonyServiceTest() override
+    {
+        if (played.joinable())
+            played.join();
+    }
+
+    /// Plays the service to the next client.
+    void play(std::function<void(RawSocket&)> part)
+    {
+        played = std::thread([this, part = std::move(part)] {
+            auto client = listening.accept();
+            part(client);
+        });
+    }
+    static std::string words(std::uint32_t domain, std::uint32_t code)
+    {
+        std::string bytes;
+        for (auto word : {domain, code})
+            for (int i = 0; i < 4; ++i, word >>= 8)
+                bytes.push_back(static_cast<char>(word & 0xFF));
+        return bytes;
+    }
+
+    ScratchDirectory directory;
+    RecordingLog log;
+    QtMainQueue queue;
+    LinuxTelephonyService telephony{directory.path(), queue, log};
+    RawSocket listening = RawSocket::listenAt(directory / "org.kestrum.vox");
+    std::thread played;
+};
+
+const std::string kRequestForLog = "log." + std::to_string(::getpid());
+const std::size_t kRequestSize = 13 + kRequestForLog.size();
+
+TEST_F(TelephonyServiceTest, IsNotReachedWhereNobodyListens)
+{
+    listening.close();
+    EXPECT_FALSE(telephony.connect({}));
+    std::filesystem::remove(directory / "org.kestrum.vox");
+    EXPECT_FALSE(telephony.connect({}));
+}
+
+TEST_F(TelephonyServiceTest, AsksForALogToThisProcessesPortAndGivesTheAnswer)
+{
+    std::string request;
+    play([&](RawSocket& client) {
+        request = client.receive(kRequestSize);
+        client.send(frame(kReply, 1, 1, words(0, 0) + "org.kestrum.vox.command.77.1"));
+    });
+    const auto connection = telephony.connect({});
+    ASSERT_TRUE(connection);
+    const auto answer = connection->networkMonitorCreateLogChannel("log");
+    EXPECT_EQ(answer.errorDomain, 0);
+    EXPECT_EQ(answer.errorCode, 0);
+    EXPECT_EQ(answer.remotePort, "org.kestrum.vox.command.77.1");
+    EXPECT_EQ(request, frame(kRequest, 1, 1, kRequestForLog));
+}
+
+TEST_F(TelephonyServiceTest, GivesTheErrorPairOfARefusal)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.send(frame(kReply, 1, 1, words(1, 0xFFFFFFFE)));
+    });
+    const auto answer = telephony.connect({})->networkMonitorCreateLogChannel("log");
+    EXPECT_EQ(answer.errorDomain, 1);
+    EXPECT_EQ(answer.errorCode, -2);
+    EXPECT_FALSE(answer.remotePort);
+}
+
+TEST_F(TelephonyServiceTest, GivesSuccessWithoutAPortAsItCame)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.send(frame(kReply, 1, 1, words(0, 0)));
+    });
+    const auto answer = telephony.connect({})->networkMonitorCreateLogChannel("log");
+    EXPECT_EQ(answer.errorCode, 0);
+    EXPECT_FALSE(answer.remotePort);
+}
+
+TEST_F(TelephonyServiceTest, GivesUpOnASilentServiceAfterASecond)
+{
+    std::atomic<bool> over = false;
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.receive(1); // until the client goes
+        over = true;
+    });
+    auto connection = telephony.connect({});
+    const auto before = std::chrono::steady_clock::now();
+    const auto answer = connection->networkMonitorCreateLogChannel("log");
+    const auto took = std::chrono::steady_clock::now() - before;
+    EXPECT_EQ(answer.errorCode, ETIMEDOUT);
+    EXPECT_GE(took, 900ms);
+    EXPECT_LT(took, 5s);
+    connection.reset();
+    EXPECT_TRUE(eventually([&] { return over.load(); }));
+}
+
+TEST_F(TelephonyServiceTest, FailsAtOnceWhenTheServiceGoes)
+{
+    play([&](RawSocket& client) { client.receive(kRequestSize); });
+    const auto before = std::chrono::steady_clock::now();
+    EXPECT_EQ(telephony.connect({})->networkMonitorCreateLogChannel("log").errorCode, EPIPE);
+    EXPECT_LT(std::chrono::steady_clock::now() - before, 900ms);
+}
+
+TEST_F(TelephonyServiceTest, AnAnswerThatIsTooShortIsAFailure)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.send(frame(kReply, 1, 1, "seven.."));
+    });
+    EXPECT_EQ(telephony.connect({})->networkMonitorCreateLogChannel("log").errorCode, EBADMSG);
+}
+
+TEST_F(TelephonyServiceTest, AMalformedFrameIsAFailureWithOneLine)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.send("\xFF\xFF\xFF\xFF");
+        client.receive(1);
+    });
+    EXPECT_EQ(telephony.connect({})->networkMonitorCreateLogChannel("log").errorCode, EPIPE);
+    EXPECT_EQ(log.errors().size(), 1u);
+}
+
+TEST_F(TelephonyServiceTest, SkipsRepliesToOtherRequests)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.send(frame(kReply, 1, 99, words(0, 0) + "wrong") + frame(kReply, 1, 1, words(0, 0) + "right"));
+    });
+    EXPECT_EQ(telephony.connect({})->networkMonitorCreateLogChannel("log").remotePort, "right");
+}
+
+TEST_F(TelephonyServiceTest, NotificationsArriveOnTheMainQueueUntilTheConnectionGoes)
+{
+    std::atomic<bool> sent = false;
+    play([&](RawSocket& client) {
+        // One within the wait for an answer, one from the event loop.
+        client.receive(kRequestSize);
+        client.send(frame(kMessage, 2, 0, "first") + frame(kReply, 1, 1, words(0, 0) + "port") +
+                    frame(kMessage, 2, 0, "second"));
+        client.receive(1);
+        sent = true;
+    });
+    std::vector<std::string> names;
+    auto connection = telephony.connect([&](std::string_view name) { names.emplace_back(name); });
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("log").remotePort, "port");
+    EXPECT_THAT(names, IsEmpty()) << "not within the call";
+    ASSERT_TRUE(eventually([&] { return names.size() == 2; }));
+    EXPECT_THAT(names, ElementsAre("first", "second"));
+    connection.reset();
+    EXPECT_TRUE(eventually([&] { return sent.load(); }));
+}
+
+TEST_F(TelephonyServiceTest, ItsEndCancelsNotificationsStillQueued)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.send(frame(kMessage, 2, 0, "unheard") + frame(kReply, 1, 1, words(0, 0) + "port"));
+        client.receive(1);
+    });
+    auto connection = telephony.connect([](std::string_view) { ADD_FAILURE() << "heard"; });
+    connection->networkMonitorCreateLogChannel("log");
+    connection.reset();
+    bool settled = false;
+    queue.post(10ms, [&] { settled = true; });
+    EXPECT_TRUE(eventually([&] { return settled; }));
+}
+
+TEST_F(TelephonyServiceTest, MayBeDestroyedWithinItsNotification)
+{
+    play([&](RawSocket& client) {
+        client.send(frame(kMessage, 2, 0, "one") + frame(kMessage, 2, 0, "two"));
+        client.receive(1);
+    });
+    std::unique_ptr<VoxServerConnection> connection;
+    int heard = 0;
+    connection = telephony.connect([&](std::string_view) {
+        ++heard;
+        connection.reset();
+    });
+    ASSERT_TRUE(eventually([&] { return heard > 0; }));
+    bool settled = false;
+    queue.post(10ms, [&] { settled = true; });
+    EXPECT_TRUE(eventually([&] { return settled; }));
+    EXPECT_EQ(heard, 1);
+}
+
+} // namespace
+} // namespace kestrum

@@ -1,0 +1,623 @@
+#include "doubles/RecordingLog.h"
+#include "linux/EventLoop.h"
+#include "linux/RawSocket.h"
+#include "linux/Scratch.h"
+#include "platform/TelephonyService.h"
+#include "platform/linux/LinuxMessagePorts.h"
+#include "platform/linux/LinuxTelephonyService.h"
+#include "platform/linux/QtMainQueue.h"
+#include "platform/propertylist/PropertyListCodec.h"
+
+#include <QProcess>
+#include <gmock/gmock.h>
+
+#include <csignal>
+#include <fstream>
+#include <sstream>
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+using namespace std::string_literals;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+
+std::string little(std::uint64_t value, int bytes)
+{
+    std::string text;
+    for (int i = 0; i < bytes; ++i, value >>= 8)
+        text.push_back(static_cast<char>(value & 0xFF));
+    return text;
+}
+
+std::string record(std::uint16_t code, std::string_view payload, char type = 1)
+{
+    return type + little(12 + payload.size(), 2) + little(code, 2) + little(0, 8) + std::string(payload);
+}
+
+std::string kcap(const std::vector<std::string>& messages)
+{
+    std::string bytes;
+    for (const auto& each : messages)
+        bytes += little(each.size(), 4) + each;
+    return bytes;
+}
+
+std::string contentsOf(const std::string& path)
+{
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
+/// The real program, and clients of it in this process.
+class ServiceTest : public testing::Test {
+protected:
+    /// voxd in a process of its own, in the test's runtime directory.
+    struct Voxd {
+        QProcess process;
+        std::string errors;
+
+        explicit Voxd(const std::string& directory)
+        {
+            auto environment = QProcessEnvironment::systemEnvironment();
+            environment.insert("KESTRUM_RUNTIME_DIR", QString::fromStdString(directory));
+            // Its memory is measured, and freed memory that the address sanitizer keeps is none of it.
+            environment.insert("ASAN_OPTIONS", environment.value("ASAN_OPTIONS") + ":quarantine_size_mb=1");
+            process.setProcessEnvironment(environment);
+        }
+        ~Voxd()
+        {
+            process.kill();
+            process.waitForFinished();
+        }
+        void launch(const QStringList& arguments) { process.start(KESTRUM_BINARY_DIR "/voxd", arguments); }
+        /// Until it takes connections.
+        bool start(const QStringList& arguments)
+        {
+            launch(arguments);
+            return eventually([&] { return process.canReadLine(); });
+        }
+        const std::string& log()
+        {
+            errors += process.readAllStandardError().toStdString();
+            return errors;
+        }
+        bool logs(std::string_view text)
+        {
+            return eventually([&] { return log().find(text) != std::string::npos; });
+        }
+        int finish()
+        {
+            EXPECT_TRUE(eventually([&] { return process.state() == QProcess::NotRunning; }));
+            EXPECT_EQ(process.exitStatus(), QProcess::NormalExit);
+            return process.exitCode();
+        }
+        /// Bytes of memory that are really there.
+        std::size_t memory() const
+        {
+            std::ifstream file("/proc/" + std::to_string(process.processId()) + "/statm");
+            std::size_t total = 0, resident = 0;
+            file >> total >> resident;
+            return resident * static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
+        }
+    };
+
+    /// A display's side of a channel.
+    struct Client {
+        ServiceTest& test;
+        std::string name;
+        std::vector<std::string> received = {};
+        std::unique_ptr<LocalPort> local = {};
+        std::unique_ptr<RemotePort> remote = {};
+
+        ~Client()
+        {
+            remote.reset();
+            local.reset();
+        }
+        LogChannelAnswer open()
+        {
+            local = test.ports.createLocal(name, [this](std::int32_t id, Bytes payload) {
+                EXPECT_EQ(id, 0);
+                received.emplace_back(textOf(payload));
+            });
+            local->setDeliveryQueue(test.queue);
+            auto connection = test.telephony.connect({});
+            if (!connection)
+                return {-1, -1, std::nullopt};
+            const auto answer = connection->networkMonitorCreateLogChannel(name);
+            if (answer.remotePort)
+                remote = test.ports.createRemote(*answer.remotePort);
+            return answer;
+        }
+        RemotePort::Sent send(const Value& command, RemotePort::Reply reply = RemotePort::Reply::None)
+        {
+            return remote->sendRequest(0, test.lists.toXml(command)->bytes(), 1s, 5s, reply);
+        }
+        std::string technology()
+        {
+            const auto sent =
+                send(makeDictionary({{"GetTechnology", Value("GetTechnology")}}), RemotePort::Reply::Awaited);
+            if (!sent.reply)
+                return "no reply";
+            const auto answer = test.lists.parse(sent.reply->bytes()).dictionary();
+            return answer && answer->at("GetTechnology").string() ? *answer->at("GetTechnology").string() : "no answer";
+        }
+        void startStreaming() { EXPECT_EQ(send(makeDictionary({{"SetState", Value("Streaming")}})).status, 0); }
+        bool hasReceived(std::size_t count)
+        {
+            return eventually([&] { return received.size() >= count; });
+        }
+    };
+
+    std::string capture(const std::vector<std::string>& messages, const std::string& name = "a.kcap")
+    {
+        std::ofstream(files / name, std::ios::binary) << kcap(messages);
+        return files / name;
+    }
+    static QStringList replay(const std::string& path, const QStringList& more = {})
+    {
+        return QStringList{"--replay", QString::fromStdString(path)} + more;
+    }
+    std::vector<std::string> sockets() const
+    {
+        std::vector<std::string> names;
+        for (const auto& each : std::filesystem::directory_iterator(directory.path()))
+            names.push_back(each.path().filename().string());
+        return names;
+    }
+
+    ScratchDirectory directory, files;
+    PropertyListCodec lists;
+    RecordingLog log;
+    QtMainQueue queue;
+    LinuxMessagePorts ports{directory.path(), queue, log};
+    LinuxTelephonyService telephony{directory.path(), queue, log};
+    Voxd voxd{directory.path()};
+};
+
+TEST_F(ServiceTest, AnswersGetTechnologyAndStreamsTheScenario)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
+    Client client{*this, "log"};
+    const auto answer = client.open();
+    EXPECT_EQ(answer.errorCode, 0);
+    ASSERT_TRUE(client.remote);
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_IFX");
+    EXPECT_THAT(client.received, IsEmpty()) << "before the start command";
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(10));
+    for (const auto& each : client.received)
+        EXPECT_TRUE(lists.parse(bytesOf(each)).dictionary());
+    EXPECT_THAT(log.lines, IsEmpty());
+}
+
+TEST_F(ServiceTest, StreamsNothingBeforeTheStartCommandAndLosesNothingUntilThen)
+{
+    ASSERT_TRUE(voxd.start(replay(capture({record(0xB0C2, "1"), record(0xB0C2, "2")}), {"--speed", "1000"})));
+    Client client{*this, "log"};
+    client.open();
+    for (int i = 0; i < 20; ++i) // each a round trip through the service's event loop
+        EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE");
+    EXPECT_THAT(client.received, IsEmpty());
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(2));
+    EXPECT_THAT(client.received, ElementsAre(record(0xB0C2, "1"), record(0xB0C2, "2")));
+}
+
+TEST_F(ServiceTest, SendsOnlyTheCodesAskedFor)
+{
+    const std::vector<std::string> messages{record(0xB0C2, "a"),
+                                            record(0xB179, "b"),
+                                            record(1, "c", '\xFF'),
+                                            record(2, "d", '\xFF'),
+                                            "\x81\x01" + record(0xB0C2, "e"),
+                                            record(0xB0C2, "last")};
+    ASSERT_TRUE(voxd.start(replay(capture(messages), {"--speed", "1000"})));
+    Client client{*this, "log"};
+    client.open();
+    client.send(makeDictionary({{"SetState", Value("Streaming")},
+                                {"SetZephraLogCodes", makeArray({Value(0xB0C2)})},
+                                {"SetVoxExtraCodes", makeArray({Value(2)})}}));
+    ASSERT_TRUE(client.hasReceived(4));
+    EXPECT_THAT(client.received, ElementsAre(messages[0], messages[3], messages[4], messages[5]));
+}
+
+TEST_F(ServiceTest, StopsWhenAskedForAnotherState)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "200"}));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(5));
+    client.send(makeDictionary({{"SetState", Value("Idle")}}));
+    client.technology(); // what was on its way has come when this is answered, or comes in the next loop
+    ASSERT_TRUE(eventually([&, before = std::size_t{0}]() mutable {
+        client.technology();
+        return std::exchange(before, client.received.size()) == client.received.size();
+    }));
+}
+
+TEST_F(ServiceTest, ServesSeveralClientsTheSameLog)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
+    Client one{*this, "one"}, two{*this, "two"};
+    one.open();
+    two.open();
+    EXPECT_EQ(one.technology(), two.technology());
+    one.startStreaming();
+    ASSERT_TRUE(one.hasReceived(3));
+    two.startStreaming();
+    ASSERT_TRUE(two.hasReceived(5));
+    ASSERT_TRUE(eventually([&] { return std::ranges::count(one.received, two.received[4]) == 1; }));
+    const auto at = std::ranges::find(one.received, two.received[0]);
+    EXPECT_TRUE(std::equal(two.received.begin(), two.received.begin() + 5, at));
+    one.remote.reset(); // one's end is not two's
+    const auto before = two.received.size();
+    EXPECT_TRUE(two.hasReceived(before + 5));
+}
+
+TEST_F(ServiceTest, EndsAChannelWhoseClientHasGoneAndGoesOnForTheNext)
+{
+    std::vector<std::string> messages;
+    for (int i = 0; i < 40; ++i)
+        messages.push_back(record(0xB0C2, std::to_string(i)));
+    ASSERT_TRUE(voxd.start(replay(capture(messages), {"--speed", "20"})));
+    std::size_t seen = 0;
+    {
+        Client first{*this, "log"};
+        first.open();
+        first.startStreaming();
+        ASSERT_TRUE(first.hasReceived(3));
+        seen = first.received.size();
+    }
+    ASSERT_TRUE(eventually([&] { return sockets() == std::vector<std::string>{"org.kestrum.vox"}; }))
+        << "the channel's command port is gone";
+    Client second{*this, "log"};
+    second.open();
+    second.startStreaming();
+    ASSERT_TRUE(second.hasReceived(3));
+    // The log stood still between the two.
+    EXPECT_LT(std::ranges::find(messages, second.received[0]) - messages.begin(),
+              static_cast<std::ptrdiff_t>(seen) + 10);
+}
+
+TEST_F(ServiceTest, ChangesItsTechnologyByMakingTheClientsConnectAgain)
+{
+    ASSERT_TRUE(voxd.start(
+        replay(capture({record(0xB0C2, "lte"), record(0x417A, "umts"), record(0x417A, "more")}), {"--speed", "100"})));
+    Client client{*this, "log"};
+    client.open();
+    std::vector<std::string> notifications;
+    const auto connection = telephony.connect([&](std::string_view name) { notifications.emplace_back(name); });
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE");
+    client.startStreaming();
+    ASSERT_TRUE(eventually([&] { return !client.remote->isValid(); }));
+    ASSERT_TRUE(client.hasReceived(1));
+    EXPECT_THAT(client.received, ElementsAre(record(0xB0C2, "lte")));
+    EXPECT_TRUE(eventually([&] { return !notifications.empty(); }));
+    EXPECT_THAT(notifications, ElementsAre("kVoxTechnologyChangedNotification"));
+
+    client.remote.reset();
+    client.local.reset();
+    client.open();
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_GSM");
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(3));
+    EXPECT_EQ(client.received[1], record(0x417A, "umts")) << "nothing is lost by the change";
+    EXPECT_EQ(client.received[2], record(0x417A, "more"));
+}
+
+TEST_F(ServiceTest, RecordsWhatItStreamsAndReplaysIt)
+{
+    const auto recorded = files / "recorded.kcap";
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "100", "--record", QString::fromStdString(recorded)}));
+    std::vector<std::string> live;
+    {
+        Client client{*this, "log"};
+        client.open();
+        client.startStreaming();
+        ASSERT_TRUE(client.hasReceived(20));
+        live = client.received;
+    }
+    voxd.process.terminate();
+    EXPECT_EQ(voxd.finish(), 0);
+
+    Voxd again(directory.path());
+    ASSERT_TRUE(again.start(replay(recorded, {"--speed", "100"})));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(20));
+    client.received.resize(20);
+    live.resize(20);
+    EXPECT_EQ(client.received, live);
+}
+
+TEST_F(ServiceTest, WritesACaptureAtOnceEqualForEqualSeeds)
+{
+    for (const char* name : {"/one.kcap", "/two.kcap"}) {
+        Voxd writer(directory.path());
+        writer.launch({"--scenario", "ifx", "--seed", "5", "--start", "2026-11-16T06:05:42Z", "--seconds", "30",
+                       "--write", QString::fromStdString(files.path() + name)});
+        EXPECT_EQ(writer.finish(), 0);
+    }
+    const auto one = contentsOf(files / "one.kcap");
+    EXPECT_GT(one.size(), 60u * 500);
+    EXPECT_TRUE(one == contentsOf(files / "two.kcap"));
+}
+
+TEST_F(ServiceTest, KilledItTakesItsPortsWithItAndComesBackOverWhatItLeft)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(1));
+    voxd.process.kill();
+    ASSERT_TRUE(eventually([&] { return !client.remote->isValid(); }));
+    EXPECT_TRUE(client.local->isValid());
+    EXPECT_FALSE(telephony.connect({}));
+    EXPECT_THAT(sockets(), testing::Contains("org.kestrum.vox")) << "killed, it could not remove it";
+
+    Voxd next(directory.path());
+    ASSERT_TRUE(next.start({"--scenario", "ifx", "--speed", "50"}));
+    client.remote.reset();
+    client.local.reset();
+    client.received.clear();
+    EXPECT_EQ(client.open().errorCode, 0);
+    client.startStreaming();
+    EXPECT_TRUE(client.hasReceived(3));
+}
+
+class Termination : public ServiceTest, public testing::WithParamInterface<int> {};
+
+TEST_P(Termination, EndsItCleanly)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(1));
+    ::kill(static_cast<pid_t>(voxd.process.processId()), GetParam());
+    EXPECT_EQ(voxd.finish(), 0);
+    client.local.reset();
+    EXPECT_THAT(sockets(), IsEmpty());
+}
+
+INSTANTIATE_TEST_SUITE_P(Signals, Termination, testing::Values(SIGTERM, SIGINT),
+                         [](const auto& each) { return std::string(each.param == SIGTERM ? "Term" : "Int"); });
+
+TEST_F(ServiceTest, ASecondOneInTheSameDirectorySaysWhatIsWrong)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    Voxd second(directory.path());
+    second.launch({"--scenario", "ifx"});
+    EXPECT_EQ(second.finish(), 1);
+    EXPECT_EQ(second.log(), "voxd: another process listens at " + (directory / "org.kestrum.vox") + "\n");
+    Client client{*this, "log"};
+    EXPECT_EQ(client.open().errorCode, 0) << "the first one is unharmed";
+}
+
+TEST_F(ServiceTest, MalformedFramesEndTheirConnectionWithOneLineEach)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
+    Client client{*this, "log"};
+    client.open();
+    const auto bad = RawSocket::connectTo(directory / "org.kestrum.vox");
+    bad.send("\xFF\xFF\xFF\xFF more");
+    EXPECT_TRUE(eventually([&] { return bad.isAbandoned(); }));
+    EXPECT_TRUE(voxd.logs("Port org.kestrum.vox: closed the connection of process " + std::to_string(::getpid()) +
+                          ": a frame of 4294967295 bytes"));
+
+    const auto receiving = RawSocket::listenAt(directory / "rude.1");
+    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
+    server.send(frame(kRequest, 1, 1, "rude.1"));
+    const auto answer =
+        server.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".2").size());
+    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    ASSERT_TRUE(command.isOpen());
+    command.send(std::string("\0\0\0\0", 4));
+    EXPECT_TRUE(eventually([&] { return command.isAbandoned(); }));
+    EXPECT_TRUE(voxd.logs(".2: closed the connection of process"));
+
+    client.startStreaming();
+    EXPECT_TRUE(client.hasReceived(3)) << "the others are served";
+}
+
+TEST_F(ServiceTest, CommandsThatAreNoDictionaryAreLoggedAndTheNextOneIsServed)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    Client client{*this, "log"};
+    client.open();
+    const auto deep = [] {
+        std::string text = "<plist version=\"1.0\">";
+        for (int i = 0; i < 100'000; ++i)
+            text += "<array>";
+        return text;
+    }();
+    for (const auto& each : {"noise"s, "<plist version=\"1.0\"><string>text</string></plist>"s, ""s, deep})
+        client.remote->sendRequest(0, bytesOf(each), 1s, 0ms, RemotePort::Reply::None);
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_IFX");
+    EXPECT_TRUE(voxd.logs("a command that is no dictionary (5 bytes)"));
+    EXPECT_TRUE(voxd.logs("a command that is no dictionary (0 bytes)"));
+    EXPECT_TRUE(voxd.logs("a command that is no dictionary (" + std::to_string(deep.size()) + " bytes)"));
+}
+
+TEST_F(ServiceTest, IgnoresOtherMessageIds)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "100"}));
+    Client client{*this, "log"};
+    client.open();
+    const auto start = lists.toXml(makeDictionary({{"SetState", Value("Streaming")}}));
+    client.remote->sendRequest(7, start->bytes(), 1s, 0ms, RemotePort::Reply::None);
+    for (int i = 0; i < 20; ++i)
+        client.technology();
+    EXPECT_THAT(client.received, IsEmpty());
+}
+
+TEST_F(ServiceTest, RefusesALogChannelToNobody)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    const auto connection = telephony.connect({});
+    ASSERT_TRUE(connection);
+    const auto answer = connection->networkMonitorCreateLogChannel("nobody");
+    EXPECT_EQ(answer.errorDomain, 1);
+    EXPECT_EQ(answer.errorCode, 3);
+    EXPECT_FALSE(answer.remotePort);
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("../../etc/passwd").errorCode, 1);
+    Client client{*this, "log"};
+    EXPECT_EQ(client.open().errorCode, 0);
+}
+
+TEST_F(ServiceTest, SilentConnectionsHarmNobody)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
+    std::vector<RawSocket> silent;
+    for (int i = 0; i < 30; ++i)
+        silent.push_back(RawSocket::connectTo(directory / "org.kestrum.vox"));
+    Client client{*this, "log"};
+    EXPECT_EQ(client.open().errorCode, 0);
+    client.startStreaming();
+    EXPECT_TRUE(client.hasReceived(3));
+}
+
+TEST_F(ServiceTest, BoundsItsConnectionsAndItsChannels)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    std::vector<std::unique_ptr<Client>> clients;
+    for (int i = 0; i < 16; ++i) {
+        clients.push_back(std::make_unique<Client>(*this, "log" + std::to_string(i)));
+        EXPECT_EQ(clients.back()->open().errorCode, 0) << i;
+    }
+    Client oneMore{*this, "more"};
+    EXPECT_EQ(oneMore.open().errorCode, 2);
+    std::vector<RawSocket> many;
+    for (int i = 0; i < 70; ++i)
+        many.push_back(RawSocket::connectTo(directory / "org.kestrum.vox"));
+    EXPECT_TRUE(voxd.logs("refused a server connection: 64 stand already"));
+}
+
+TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndNobodyElse)
+{
+    std::vector<std::string> messages;
+    for (int i = 0; i < 100; ++i)
+        messages.push_back(record(0xB0C2, std::string(20'000, static_cast<char>('a' + i % 26))));
+    // 0.5 s of nominal spacing in 5 µs: some 200,000 messages a second, were they taken.
+    ASSERT_TRUE(voxd.start(replay(capture(messages), {"--loop", "--speed", "100000"})));
+    const auto receiving = RawSocket::listenAt(directory / "deaf.1");
+    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
+    server.send(frame(kRequest, 1, 1, "deaf.1"));
+    const auto answer =
+        server.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".1").size());
+    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    const auto start = lists.toXml(makeDictionary({{"SetState", Value("Streaming")}}));
+    command.send(frame(kMessage, 0, 0, textOf(start->bytes())));
+    ASSERT_TRUE(voxd.logs("its client does not read, the oldest messages go"));
+
+    Client client{*this, "log"};
+    client.open();
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE") << "commands are served under the flood";
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(2000)) << client.received.size() << voxd.log();
+    for (const auto& each : client.received)
+        ASSERT_EQ(each.size(), 20'013u) << "messages are dropped whole";
+    EXPECT_LT(voxd.memory(), std::size_t{100} << 20);
+
+    // Reading again, it is told what it has missed, in the service's log.
+    const auto deaf = receiving.accept();
+    client.send(makeDictionary({{"SetState", Value("Idle")}}));
+    command.send(frame(kMessage, 0, 0, textOf(lists.toXml(makeDictionary({{"SetState", Value("Idle")}}))->bytes())));
+    EXPECT_TRUE(eventually([&] {
+        deaf.received();
+        return voxd.log().find("its client reads again, ") != std::string::npos;
+    }));
+    EXPECT_THAT(voxd.log(), testing::ContainsRegex("[1-9][0-9]* messages were dropped"));
+}
+
+struct BadUse {
+    const char* name;
+    QStringList arguments;
+    int status;
+    const char* says;
+
+    friend void PrintTo(const BadUse& shown, std::ostream* out) { *out << shown.name; }
+};
+
+class BadUses : public ServiceTest, public testing::WithParamInterface<BadUse> {};
+
+TEST_P(BadUses, AreToldClearly)
+{
+    voxd.launch(GetParam().arguments);
+    EXPECT_EQ(voxd.finish(), GetParam().status);
+    EXPECT_THAT(voxd.log(), HasSubstr(GetParam().says));
+    EXPECT_THAT(voxd.process.readAllStandardOutput().toStdString(), IsEmpty());
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    CommandLine, BadUses,
+    testing::Values(BadUse{"NoSource", {}, 2, "--scenario or --replay is required"},
+                    BadUse{"UnknownScenario", {"--scenario", "moon"}, 2, "there is no scenario moon"},
+                    BadUse{"UnknownOption", {"--frobnicate"}, 2, "--frobnicate"},
+                    BadUse{"TwoSources", {"--scenario", "ifx", "--replay", "a.kcap"}, 2, "excludes"},
+                    BadUse{"SpeedZero", {"--scenario", "ifx", "--speed", "0"}, 2, "--speed"},
+                    BadUse{"SpeedNoNumber", {"--scenario", "ifx", "--speed", "fast"}, 2, "--speed"},
+                    BadUse{"StartNoDate", {"--scenario", "ifx", "--start", "yesterday"}, 2, "yesterday is no date"},
+                    BadUse{"LoopWithoutReplay", {"--scenario", "ifx", "--loop"}, 2, "--replay"},
+                    BadUse{"NoSuchCapture", {"--replay", "/nowhere/a.kcap"}, 1, "/nowhere/a.kcap: cannot be read"},
+                    BadUse{"RecordNowhere",
+                           {"--scenario", "ifx", "--record", "/nowhere/a.kcap"},
+                           1,
+                           "/nowhere/a.kcap: cannot be written"}),
+    [](const auto& each) { return std::string(each.param.name); });
+
+TEST_F(ServiceTest, TellsItsVersionAndItsHelp)
+{
+    voxd.launch({"--version"});
+    EXPECT_EQ(voxd.finish(), 0);
+    EXPECT_EQ(voxd.process.readAllStandardOutput(), "voxd 1.0.0\n");
+    Voxd help(directory.path());
+    help.launch({"--help"});
+    EXPECT_EQ(help.finish(), 0);
+    const auto text = help.process.readAllStandardOutput().toStdString();
+    for (const char* each : {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx"})
+        EXPECT_THAT(text, HasSubstr(each));
+}
+
+TEST_F(ServiceTest, SaysThatItsDirectoryCannotBeMade)
+{
+    std::ofstream(files / "file") << "";
+    Voxd elsewhere(files / "file/inside");
+    elsewhere.launch({"--scenario", "ifx"});
+    EXPECT_EQ(elsewhere.finish(), 1);
+    EXPECT_THAT(elsewhere.log(), HasSubstr("voxd: cannot create " + (files / "file/inside")));
+}
+
+TEST_F(ServiceTest, GoesOnServingWhenTheCaptureEnds)
+{
+    ASSERT_TRUE(voxd.start(replay(capture({record(0xB0C2, "only")}), {"--speed", "1000"})));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(1));
+    EXPECT_TRUE(voxd.logs("the log has ended; clients stay connected"));
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE");
+    EXPECT_TRUE(client.remote->isValid());
+}
+
+TEST_F(ServiceTest, LogsWhereADamagedCaptureEnds)
+{
+    const auto path = files / "damaged.kcap";
+    std::ofstream(path, std::ios::binary) << kcap({record(0xB0C2, "good")}) << "\x40\0\0\0short"s;
+    ASSERT_TRUE(voxd.start(replay(path, {"--speed", "1000"})));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(1));
+    EXPECT_TRUE(voxd.logs(path + ": at offset 21: the last message ends 59 bytes short"));
+}
+
+} // namespace
+} // namespace kestrum
