@@ -1,0 +1,51 @@
+#pragma once
+
+#include "linux/EventLoop.h"
+#include "linux/Scratch.h"
+#include "platform/Toolkit.h"
+
+#include <QProcess>
+#include <gmock/gmock.h>
+
+#include <filesystem>
+#include <string>
+
+namespace kestrum {
+
+/// The one toolkit of the test program; it holds the application object.
+Toolkit& toolkit();
+
+/// A device of the test's own, and the real telephony service on it.
+class EndToEnd : public testing::Test {
+protected:
+    EndToEnd()
+    {
+        std::filesystem::create_directories(directory / "device");
+        std::filesystem::create_directories(runtime());
+        std::filesystem::permissions(runtime(), std::filesystem::perms::owner_all);
+    }
+    ~EndToEnd() override { killService(); }
+
+    std::string runtime() const { return directory / "run"; }
+
+    /// Until it serves.
+    bool startService(const QStringList& arguments = {"--scenario", "ifx"})
+    {
+        service.start(KESTRUM_BINARY_DIR "/voxd", arguments);
+        return eventually([&] { return service.canReadLine(); });
+    }
+    void killService()
+    {
+        service.kill();
+        service.waitForFinished();
+    }
+
+    ScratchDirectory directory;
+    // This process and those that it starts.
+    ScopedVariable runtimeVariable{"KESTRUM_RUNTIME_DIR", runtime()};
+    ScopedVariable deviceVariable{"KESTRUM_DEVICE_ROOT", directory / "device"};
+    ScopedVariable configurationVariable{"XDG_CONFIG_HOME", directory / "config"};
+    QProcess service;
+};
+
+} // namespace kestrum

@@ -1,0 +1,631 @@
+#include "Demonstration.h"
+#include "Pseudoterminal.h"
+
+#include <gtest/gtest.h>
+
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+
+// The real program on a terminal of the test's own, against the real telephony service.
+namespace kestrum {
+namespace {
+
+using Key = Pseudoterminal::Key;
+
+std::string neighbours()
+{
+    std::string entries;
+    for (int i = 0; i < 40; ++i) {
+        const std::string number = (i < 10 ? "0" : "") + std::to_string(i);
+        entries += text("Cell " + number, "-" + std::to_string(60 + i) + " dBm");
+    }
+    return entries;
+}
+
+/// All kinds of rows. `beat` is what moves.
+std::string display(const std::string& beat)
+{
+    return propertyList(
+        text("_sorted", "_sorted") +
+        dictionary("0;Serving Cell", text("Physical Cell ID", "101") + text("RSRP", "-97 dBm")) +
+        dictionary("1;Neighbours", text("_sorted", "_sorted") + neighbours()) + dictionary("2;Nothing", "") +
+        text("3;Beat", beat) + text("4;PLMN 日本", "漢字") + text("5;Hostile", "a&#x9B;31m&#x202E;b&#x7F;") +
+        text("6;A key that is long enough", "and a value that goes on far beyond the right edge of eighty columns"));
+}
+
+class Terminal : public testing::Test {
+protected:
+    void serve() { device.serve({display("tick"), display("tock")}); }
+
+    void start(std::map<std::string, std::string> changes = {})
+    {
+        auto environment = device.environment();
+        environment.merge(std::map<std::string, std::string>{{"NO_COLOR", ""}, {"LC_ALL", "C.UTF-8"}});
+        for (auto& [name, value] : changes)
+            environment[name] = value;
+        terminal.start("kestrum-terminal", {}, environment);
+    }
+
+    /// The first display is on the screen.
+    void startAndWait(std::map<std::string, std::string> changes = {})
+    {
+        serve();
+        start(std::move(changes));
+        ASSERT_TRUE(terminal.waitFor("Updated 20")) << terminal.text();
+    }
+
+    void expectChosen(const std::string& name)
+    {
+        EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().find(name) != std::string::npos; }))
+            << "not chosen: " << name << "\n"
+            << terminal.text();
+    }
+    void expectShown(const std::string& text)
+    {
+        EXPECT_TRUE(terminal.waitFor(text)) << text << "\n" << terminal.text();
+    }
+    void expectGone(const std::string& text)
+    {
+        EXPECT_TRUE(terminal.waitUntil([&] { return !terminal.shows(text); })) << text << "\n" << terminal.text();
+    }
+    void expectTitle(const std::string& title)
+    {
+        EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(0).substr(0, title.size() + 1) == " " + title; }))
+            << title << "\n"
+            << terminal.text();
+    }
+    /// Rows have been drawn anew from later data.
+    void expectRefresh()
+    {
+        const auto updated = terminal.row(23);
+        EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(23) != updated; })) << terminal.text();
+    }
+    void expectRestored(const termios& before)
+    {
+        EXPECT_FALSE(terminal.onAlternateScreen());
+        EXPECT_TRUE(terminal.cursorVisible());
+        const auto after = terminal.modes();
+        EXPECT_EQ(after.c_lflag, before.c_lflag);
+        EXPECT_EQ(after.c_iflag, before.c_iflag);
+        EXPECT_EQ(after.c_oflag, before.c_oflag);
+    }
+
+    Demonstration device;
+    Pseudoterminal terminal{24, 80};
+};
+
+TEST_F(Terminal, SaysConnectingUntilTheServiceAnswers)
+{
+    start();
+    expectTitle("Kestrum");
+    expectShown("Connecting...");
+    EXPECT_TRUE(terminal.onAlternateScreen());
+    EXPECT_FALSE(terminal.cursorVisible());
+}
+
+TEST_F(Terminal, ShowsKeysBoldAndValuesAgainstTheRightEdge)
+{
+    startAndWait();
+    EXPECT_EQ(terminal.row(0), " Kestrum");
+    EXPECT_EQ(terminal.row(1), " Serving Cell" + std::string(65, ' ') + "›");
+    EXPECT_EQ(terminal.row(3), " Nothing" + std::string(70, ' ') + "›");
+    EXPECT_EQ(terminal.row(4).substr(0, 5), " Beat");
+    EXPECT_EQ(terminal.row(4).size(), 79u);
+    EXPECT_TRUE(terminal.isBold(4, 1));
+    EXPECT_FALSE(terminal.isBold(4, 76));
+    EXPECT_NE(terminal.row(23).find("? help  q quit"), std::string::npos);
+}
+
+TEST_F(Terminal, ShowsWideCharactersAndNothingThatSteersTheTerminal)
+{
+    startAndWait();
+    EXPECT_EQ(terminal.row(5), " PLMN 日本" + std::string(65, ' ') + "漢字");
+    EXPECT_NE(terminal.row(6).find("a\uFFFD31m\uFFFDb␡"), std::string::npos) << terminal.row(6);
+}
+
+TEST_F(Terminal, ScrollsALongRowSideways)
+{
+    startAndWait();
+    terminal.press(Key::End);
+    expectChosen("A key that is long enough");
+    EXPECT_EQ(terminal.row(7).substr(0, 38), " A key that is long enough     and a v");
+    EXPECT_TRUE(terminal.row(7).ends_with("…"));
+    terminal.press(Key::ShiftRight);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(7).starts_with("…"); })) << terminal.row(7);
+    terminal.type(">>>>>>>>");
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(7).ends_with("eighty columns"); })) << terminal.row(7);
+    const auto furthest = terminal.row(7);
+    expectRefresh();
+    EXPECT_EQ(terminal.row(7), furthest); // a refresh moves nothing
+    terminal.type("<<<<<<<<<");
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(7).starts_with(" A key"); })) << terminal.row(7);
+}
+
+TEST_F(Terminal, OpensRowsAndGoesBackWithArrows)
+{
+    startAndWait();
+    expectChosen("Serving Cell");
+    terminal.press(Key::Right);
+    expectTitle("Kestrum › Serving Cell");
+    expectShown("-97 dBm");
+    terminal.press(Key::Left);
+    expectTitle("Kestrum");
+    expectShown("Neighbours");
+    terminal.press(Key::Down);
+    terminal.press(Key::Enter);
+    expectTitle("Kestrum › Neighbours");
+    terminal.press(Key::Escape);
+    expectChosen("Neighbours");
+    terminal.press(Key::Backspace);
+    expectChosen("Neighbours"); // there is nothing behind the root
+}
+
+TEST_F(Terminal, OpensRowsAndGoesBackWithLetters)
+{
+    startAndWait();
+    terminal.type("jl");
+    expectTitle("Kestrum › Neighbours");
+    terminal.type("jjk");
+    expectChosen("Cell 01");
+    terminal.type("G");
+    expectChosen("Cell 39");
+    terminal.type("g");
+    expectChosen("Cell 00");
+    terminal.type("hk");
+    expectChosen("Serving Cell");
+}
+
+TEST_F(Terminal, LeavesALeafChosenThatIsOpened)
+{
+    startAndWait();
+    terminal.type("/beat\r\r");
+    expectChosen("Beat");
+    expectTitle("Kestrum");
+}
+
+TEST_F(Terminal, OpensARowWithoutChildren)
+{
+    startAndWait();
+    terminal.type("jjl");
+    expectTitle("Kestrum › Nothing");
+    EXPECT_EQ(terminal.row(1), "");
+    terminal.type("jkl");
+    terminal.press(Key::End);
+    terminal.press(Key::PageDown);
+    terminal.type("h");
+    expectChosen("Nothing");
+}
+
+TEST_F(Terminal, MovesByPagesAndSaysWhereItIs)
+{
+    startAndWait();
+    terminal.type("jl");
+    expectShown("1/40");
+    terminal.press(Key::PageDown);
+    expectChosen("Cell 21");
+    terminal.press(Key::PageDown);
+    expectChosen("Cell 39");
+    expectShown("40/40");
+    terminal.press(Key::PageUp);
+    expectChosen("Cell 18");
+    terminal.press(Key::Home);
+    expectChosen("Cell 00");
+}
+
+TEST_F(Terminal, JumpsToARowByItsName)
+{
+    startAndWait();
+    terminal.type("jl/LL 3");
+    expectChosen("Cell 30");
+    EXPECT_EQ(terminal.row(23), " /LL 3");
+    EXPECT_TRUE(terminal.cursorVisible());
+    terminal.type("7");
+    expectChosen("Cell 37");
+    terminal.press(Key::Enter);
+    expectShown("? help");
+    expectChosen("Cell 37");
+    terminal.type("n"); // the next one, round the end: the same
+    expectChosen("Cell 37");
+}
+
+TEST_F(Terminal, ComesBackFromAJumpThatFindsNothing)
+{
+    startAndWait();
+    terminal.type("jl/nothing like it");
+    expectShown("no such row");
+    expectChosen("Cell 00");
+    terminal.press(Key::Escape);
+    expectGone("no such row");
+    expectChosen("Cell 00");
+    expectTitle("Kestrum › Neighbours"); // Escape ended the jump alone
+}
+
+TEST_F(Terminal, KeepsChoiceAndPlaceThroughARefresh)
+{
+    startAndWait();
+    terminal.type("jl/Cell 30\rkk");
+    expectChosen("Cell 28");
+    const auto rows = terminal.text().substr(0, terminal.text().rfind(" Updated"));
+    const auto updated = terminal.row(23);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(23) != updated; }));
+    EXPECT_EQ(terminal.text().substr(0, terminal.text().rfind(" Updated")), rows);
+    terminal.type("h");
+    expectChosen("Neighbours");
+}
+
+TEST_F(Terminal, SendsOnlyWhatChanged)
+{
+    startAndWait();
+    terminal.type("jl");
+    expectTitle("Kestrum › Neighbours");
+    expectRefresh(); // by then the pane has been drawn to its end
+    terminal.forgetWritten();
+    expectRefresh();
+    // Two digits of the time, and where they stand.
+    EXPECT_LT(terminal.written().size(), 100u) << terminal.written();
+    EXPECT_EQ(terminal.written().find("dBm"), std::string::npos);
+}
+
+TEST_F(Terminal, FollowsTheMouse)
+{
+    startAndWait();
+    EXPECT_NE(terminal.written().find("\x1B[?1006;1000h"), std::string::npos);
+    terminal.click(2, 10);
+    expectTitle("Kestrum › Neighbours");
+    terminal.turnWheel(true);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(1).starts_with(" Cell 03"); })) << terminal.text();
+    terminal.turnWheel(false);
+    expectChosen("Cell 00");
+    terminal.click(0, 3); // the title goes back
+    expectTitle("Kestrum");
+    expectShown("Serving Cell");
+    terminal.click(23, static_cast<int>(terminal.row(23).find("? help")));
+    expectShown("choose a row");
+}
+
+TEST_F(Terminal, ShowsItsKeysAndHidesThemAtTheNextOne)
+{
+    startAndWait();
+    terminal.type("?");
+    expectShown("jump to a name, again");
+    terminal.type("q");
+    expectGone("jump to a name, again");
+    expectShown("Serving Cell");
+}
+
+TEST_F(Terminal, FitsFortyColumnsAndTwentyLines)
+{
+    terminal.resize(20, 40);
+    startAndWait();
+    EXPECT_EQ(terminal.row(1), " Serving Cell" + std::string(25, ' ') + "›");
+    EXPECT_EQ(terminal.row(4).size(), 39u);
+    EXPECT_EQ(terminal.row(19).substr(0, 9), " Updated ");
+    EXPECT_TRUE(terminal.row(19).ends_with("? help")) << terminal.row(19);
+    terminal.type("?");
+    expectShown("jump to a name, again │");
+}
+
+TEST_F(Terminal, KeepsSaveInSightOnFortyColumns)
+{
+    device.offerSave();
+    terminal.resize(20, 40);
+    startAndWait();
+    EXPECT_TRUE(terminal.row(19).ends_with("s save")) << terminal.row(19);
+}
+
+TEST_F(Terminal, FollowsTheTerminalsSize)
+{
+    startAndWait();
+    terminal.type("jl/Cell 20\r");
+    expectChosen("Cell 20");
+    terminal.resize(10, 40);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(9).starts_with(" Updated"); })) << terminal.text();
+    expectChosen("Cell 20");
+    EXPECT_EQ(terminal.chosen().size(), 39u);
+    terminal.resize(50, 132);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(49).starts_with(" Updated"); })) << terminal.text();
+    expectChosen("Cell 20");
+    EXPECT_EQ(terminal.rowOf("Cell 00"), 1);
+    EXPECT_EQ(terminal.chosen().size(), 131u);
+}
+
+TEST_F(Terminal, BearsTheSmallestSizes)
+{
+    startAndWait();
+    for (const auto& [rows, columns] : {std::pair{1, 1}, {2, 3}, {3, 10}, {1, 80}, {24, 1}}) {
+        terminal.resize(rows, columns);
+        terminal.type("jlkh?x/a\r");
+    }
+    terminal.resize(24, 80);
+    expectShown("Updated 20");
+    expectShown("Serving Cell");
+}
+
+TEST_F(Terminal, SaysThatTheServiceIsGoneAndGoesOnWhenItIsBack)
+{
+    startAndWait();
+    terminal.type("jjj");
+    expectChosen("Beat");
+    device.killService();
+    expectShown("Connecting...");
+    EXPECT_TRUE(terminal.shows("Serving Cell")); // what was known stays
+    device.restartService();
+    expectShown("Updated 20");
+    expectRefresh();
+    expectChosen("Beat");
+}
+
+TEST_F(Terminal, GoesBackWhenWhatItShowsIsNoMore)
+{
+    const auto without = propertyList(text("_sorted", "_sorted") + text("3;Beat", "alone") + text("4;Other", "1"));
+    device.serve({display("tick"), without}, {"--speed", "0.1"}); // the second display comes after 5 s
+    start();
+    expectShown("Neighbours");
+    terminal.type("jl");
+    expectTitle("Kestrum › Neighbours");
+    expectShown("alone");
+    EXPECT_EQ(terminal.row(0), " Kestrum");
+}
+
+TEST_F(Terminal, ShowsTheValueOfARowThatOpenedBefore)
+{
+    const auto before = propertyList(dictionary("Changing", text("a", "1") + text("b", "2")) + text("Other", "1"));
+    const auto after = propertyList(text("Changing", "has a value now") + text("Other", "1"));
+    device.serve({before, after}, {"--speed", "0.1"});
+    start();
+    expectShown("›");
+    expectShown("has a value now");
+    EXPECT_EQ(terminal.row(1), " Changing" + std::string(55, ' ') + "has a value now");
+}
+
+class TerminalSave : public Terminal {
+protected:
+    void open()
+    {
+        device.offerSave();
+        startAndWait();
+        terminal.type("s");
+        expectShown("Save Snapshot");
+    }
+    std::string saved()
+    {
+        std::error_code none;
+        for (const auto& each : std::filesystem::directory_iterator(device.diagnosticLogs(), none)) {
+            std::ifstream file(each.path());
+            return {std::istreambuf_iterator<char>(file), {}};
+        }
+        return {};
+    }
+};
+
+TEST_F(TerminalSave, IsNotOfferedOnOrdinaryDevices)
+{
+    startAndWait();
+    EXPECT_FALSE(terminal.shows("s save"));
+    terminal.type("sjj");
+    expectChosen("Nothing");
+    EXPECT_FALSE(terminal.shows("Save Snapshot"));
+}
+
+TEST_F(TerminalSave, WritesTheDescriptionThatWasTyped)
+{
+    open();
+    expectShown("Snapshot (20");
+    EXPECT_NE(terminal.text().find("✓"), std::string::npos);
+    EXPECT_TRUE(terminal.cursorVisible());
+    terminal.type("roof, north é 漢");
+    expectShown("roof, north é 漢");
+    terminal.press(Key::Enter);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().empty() && !terminal.cursorVisible(); }));
+    EXPECT_EQ(saved(), "") << "Return closes the field, and saves nothing";
+    terminal.press(Key::Enter);
+    expectGone("Save Snapshot");
+    expectShown("Serving Cell");
+    EXPECT_NE(saved().find("<string>roof, north é 漢</string>"), std::string::npos) << saved();
+}
+
+TEST_F(TerminalSave, IsLeftWithEscape)
+{
+    open();
+    terminal.type("q"); // a letter like any other
+    terminal.press(Key::Escape);
+    expectGone("Save Snapshot");
+    expectShown("Serving Cell");
+    EXPECT_EQ(saved(), "");
+}
+
+TEST_F(TerminalSave, GoesRoundItsPartsWithTab)
+{
+    open();
+    EXPECT_TRUE(terminal.waitFor("Snapshot (20"));
+    terminal.press(Key::Tab);
+    expectChosen("Snapshot (20");
+    terminal.press(Key::Tab);
+    const auto reverse = [&](const std::string& button) {
+        const int row = terminal.rowOf(button);
+        return row >= 0 && terminal.isReverse(row, static_cast<int>(terminal.row(row).find(button)));
+    };
+    EXPECT_TRUE(terminal.waitUntil([&] { return reverse("[ Save ]"); })) << terminal.text();
+    terminal.press(Key::Tab);
+    EXPECT_TRUE(terminal.waitUntil([&] { return reverse("[ Cancel ]"); })) << terminal.text();
+    terminal.press(Key::Enter);
+    expectGone("Save Snapshot");
+    EXPECT_EQ(saved(), "");
+}
+
+TEST_F(TerminalSave, IsPressedWithTheMouse)
+{
+    open();
+    const int row = terminal.rowOf("[ Save ]");
+    terminal.click(row, static_cast<int>(terminal.row(row).find("[ Save ]")) + 2);
+    expectGone("Save Snapshot");
+    EXPECT_NE(saved(), "");
+}
+
+TEST_F(TerminalSave, SaysWhenTheFileCannotBeWritten)
+{
+    std::filesystem::create_directories(device.diagnosticLogs().parent_path());
+    std::ofstream(device.diagnosticLogs()) << "in the way";
+    open();
+    terminal.type("\r\r");
+    expectShown("File Error");
+    expectShown("Unable to write file to disk");
+    expectShown("[ Close ]");
+    expectGone("Save Snapshot"); // closed behind the alert
+    terminal.type("jq");         // the alert takes the keys
+    terminal.press(Key::Enter);
+    expectGone("File Error");
+    expectChosen("Serving Cell");
+}
+
+TEST_F(Terminal, QuitsAndLeavesTheTerminalAsItWas)
+{
+    const auto before = terminal.modes();
+    startAndWait();
+    EXPECT_NE(terminal.modes().c_lflag, before.c_lflag);
+    terminal.type("q");
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 0);
+    expectRestored(before);
+}
+
+class TerminalSignal : public Terminal, public testing::WithParamInterface<int> {};
+
+TEST_P(TerminalSignal, EndsItAndLeavesTheTerminalAsItWas)
+{
+    const auto before = terminal.modes();
+    startAndWait();
+    terminal.signal(GetParam());
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 0);
+    expectRestored(before);
+}
+
+INSTANTIATE_TEST_SUITE_P(Signals, TerminalSignal, testing::Values(SIGTERM, SIGHUP, SIGINT),
+                         [](const auto& each) { return std::string("Signal") + sigabbrev_np(each.param); });
+
+TEST_F(Terminal, EndsWithCtrlC)
+{
+    const auto before = terminal.modes();
+    startAndWait();
+    terminal.type("\x03");
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 0);
+    expectRestored(before);
+}
+
+TEST_F(Terminal, EndsWhenItsTerminalIsClosed)
+{
+    startAndWait();
+    terminal.hangUp();
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 0);
+}
+
+TEST_F(Terminal, StopsWithCtrlZAndComesBack)
+{
+    const auto before = terminal.modes();
+    startAndWait();
+    terminal.type("j\x1A");
+    ASSERT_TRUE(terminal.waitForStop());
+    expectRestored(before);
+    terminal.signal(SIGCONT);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.onAlternateScreen(); }));
+    expectChosen("Neighbours");
+    expectRefresh();
+}
+
+TEST_F(Terminal, EndsWhileItIsStopped)
+{
+    startAndWait();
+    terminal.type("\x1A");
+    ASSERT_TRUE(terminal.waitForStop());
+    terminal.signal(SIGTERM);
+    terminal.signal(SIGCONT);
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 0);
+    EXPECT_FALSE(terminal.onAlternateScreen());
+}
+
+bool setsColour(const std::string& written)
+{
+    // ESC [ 3x, 4x, 9x, 10x ... m: parameters from 30 to 49 and from 90 to 107 are colours.
+    for (auto at = written.find("\x1B["); at != std::string::npos; at = written.find("\x1B[", at + 1)) {
+        const auto end = written.find_first_not_of("0123456789;", at + 2);
+        if (end == std::string::npos || written[end] != 'm')
+            continue;
+        int parameter = 0;
+        for (auto each = at + 2; each <= end; ++each) {
+            if (written[each] >= '0' && written[each] <= '9') {
+                parameter = parameter * 10 + (written[each] - '0');
+                continue;
+            }
+            if ((parameter >= 30 && parameter <= 49) || (parameter >= 90 && parameter <= 107))
+                return true;
+            parameter = 0;
+        }
+    }
+    return false;
+}
+
+TEST_F(Terminal, UsesTheTerminalsColours)
+{
+    startAndWait();
+    EXPECT_TRUE(terminal.isColoured(2, 78)); // the mark of a row that opens
+    EXPECT_FALSE(terminal.isColoured(2, 1));
+    EXPECT_TRUE(setsColour(terminal.written()));
+}
+
+TEST_F(Terminal, SendsNoColourWhereNoneIsWanted)
+{
+    startAndWait({{"NO_COLOR", "1"}});
+    terminal.type("?");
+    expectShown("choose a row");
+    EXPECT_FALSE(setsColour(terminal.written()));
+    terminal.type("?");
+    expectChosen("Serving Cell"); // in reverse video
+}
+
+TEST_F(Terminal, LosesNothingOnAMonochromeTerminal)
+{
+    startAndWait({{"TERM", "vt220"}});
+    EXPECT_FALSE(setsColour(terminal.written()));
+    expectChosen("Serving Cell");
+    expectShown("›");
+}
+
+TEST_F(Terminal, SpeaksAsciiWhereTheLocaleDoes)
+{
+    startAndWait({{"LC_ALL", "POSIX"}});
+    EXPECT_EQ(terminal.row(1), " Serving Cell" + std::string(65, ' ') + ">");
+    EXPECT_EQ(terminal.row(5), " PLMN ????" + std::string(65, ' ') + "????");
+    EXPECT_TRUE(terminal.row(7).ends_with("~"));
+}
+
+TEST_F(Terminal, TakesUnicodeForGrantedWhereNoLocaleIsNamed)
+{
+    startAndWait({{"LC_ALL", ""}, {"LC_CTYPE", ""}, {"LANG", ""}});
+    EXPECT_TRUE(terminal.row(1).ends_with("›"));
+}
+
+TEST_F(Terminal, NamesAnUnknownKindOfTerminal)
+{
+    start({{"TERM", "no-such-terminal"}});
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 1);
+    EXPECT_TRUE(terminal.shows("kestrum-terminal: the terminal \"no-such-terminal\" is not known here"))
+        << terminal.text();
+}
+
+TEST_F(Terminal, RefusesATerminalThatCannotPlaceItsCursor)
+{
+    start({{"TERM", "dumb"}});
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 1);
+    EXPECT_TRUE(terminal.shows("cannot place its cursor")) << terminal.text();
+}
+
+} // namespace
+} // namespace kestrum

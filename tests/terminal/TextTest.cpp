@@ -1,0 +1,144 @@
+#include "frontends/terminal/Text.h"
+#include "frontends/terminal/EditedLine.h"
+
+#include <gtest/gtest.h>
+
+namespace kestrum {
+namespace {
+
+class TerminalText : public testing::Test {
+protected:
+    static void SetUpTestSuite() { chooseLocale(); }
+};
+
+TEST_F(TerminalText, CountsColumnsNotBytesOrCharacters)
+{
+    EXPECT_EQ(columns(""), 0);
+    EXPECT_EQ(columns("RSRP"), 4);
+    EXPECT_EQ(columns("é"), 1);
+    EXPECT_EQ(columns("e\xCC\x81"), 1); // e and a combining acute accent
+    EXPECT_EQ(columns("漢字"), 4);
+}
+
+TEST_F(TerminalText, ShowsControlCharactersAsPictures)
+{
+    EXPECT_EQ(harmless("a\x1B[31mb"), "a␛[31mb");
+    EXPECT_EQ(harmless(std::string_view("\0\a\n\x7F", 4)), "␀␇␊␡");
+}
+
+TEST_F(TerminalText, ReplacesWhatWouldSteerATerminal)
+{
+    EXPECT_EQ(harmless("a\xC2\x9B"
+                       "31m"),
+              "a\uFFFD31m"); // U+009B begins a sequence as ESC [ does
+    EXPECT_EQ(harmless("\u202Eabc\u202C"), "\uFFFDabc\uFFFD");
+    EXPECT_EQ(harmless("\u2067abc"), "\uFFFDabc");
+}
+
+TEST_F(TerminalText, ReplacesEachByteThatIsNoUtf8)
+{
+    EXPECT_EQ(harmless("a\xFFz"), "a\uFFFDz");
+    EXPECT_EQ(harmless("\xE6\xBC"), "\uFFFD\uFFFD"); // a character that ends too early
+    EXPECT_EQ(harmless("\xC0\xAF"), "\uFFFD\uFFFD"); // a slash in too many bytes
+}
+
+TEST_F(TerminalText, HoldsAMarkWithoutALetter)
+{
+    EXPECT_EQ(columns("\xCC\x81"), 1);
+    EXPECT_EQ(harmless("\xCC\x81"), "◌\xCC\x81");
+}
+
+TEST_F(TerminalText, DropsMarksThatNoCellCanHold)
+{
+    std::string tower = "a";
+    for (int i = 0; i < 100; ++i)
+        tower += "\xCC\x81";
+    const auto shown = glyphs(tower);
+    ASSERT_EQ(shown.size(), 1u);
+    EXPECT_LE(shown[0].text.size(), 5u);
+}
+
+TEST_F(TerminalText, IsCutInTheMiddleOrAtItsEnd)
+{
+    EXPECT_EQ(cutInTheMiddle("abcdefghij", 10), "abcdefghij");
+    EXPECT_EQ(cutInTheMiddle("abcdefghij", 7), "abc…hij");
+    EXPECT_EQ(cutInTheMiddle("漢字漢字", 6), "漢…字");
+    EXPECT_EQ(cutAtTheEnd("abcdefghij", 4), "abc…");
+    EXPECT_EQ(cutAtTheEnd("漢字", 3), "漢…");
+    EXPECT_EQ(cutAtTheEnd("abc", 1), "…");
+    EXPECT_EQ(cutAtTheEnd("abc", 0), "");
+    EXPECT_EQ(cutInTheMiddle("abc", -3), "");
+}
+
+TEST_F(TerminalText, IsFoundWhateverItsCase)
+{
+    EXPECT_TRUE(contains("Measured RSRP", "rsrp"));
+    EXPECT_TRUE(contains("ÉTAT", "état"));
+    EXPECT_TRUE(contains("Any", ""));
+    EXPECT_FALSE(contains("RSRP", "RSRQ"));
+}
+
+class TerminalEditedLine : public TerminalText {
+protected:
+    void type(std::wstring_view text)
+    {
+        for (const wchar_t each : text)
+            line.handle({Key::Character, each});
+    }
+    EditedLine line;
+};
+
+TEST_F(TerminalEditedLine, TakesWhatIsTypedWhereTheCursorIs)
+{
+    type(L"roof");
+    line.handle({Key::Home});
+    type(L"é漢 ");
+    EXPECT_EQ(line.text(), "é漢 roof");
+    EXPECT_EQ(line.beforeCursor(), "é漢 ");
+}
+
+TEST_F(TerminalEditedLine, ErasesALetterWithItsMarks)
+{
+    type(L"ae\u0301");
+    line.handle({Key::Backspace});
+    EXPECT_EQ(line.text(), "a");
+    line.handle({Key::Backspace});
+    line.handle({Key::Backspace});
+    EXPECT_TRUE(line.isEmpty());
+}
+
+TEST_F(TerminalEditedLine, ErasesForwards)
+{
+    type(L"e\u0301a");
+    line.handle({Key::Home});
+    line.handle({Key::Delete});
+    EXPECT_EQ(line.text(), "a");
+    line.handle({Key::End});
+    line.handle({Key::Delete});
+    EXPECT_EQ(line.text(), "a");
+}
+
+TEST_F(TerminalEditedLine, ErasesWordsAndLinesAsAShellDoes)
+{
+    type(L"on the roof  ");
+    type(L"\x17");
+    EXPECT_EQ(line.text(), "on the ");
+    type(L"\x17\x17\x17");
+    EXPECT_EQ(line.text(), "");
+    type(L"abc");
+    line.handle({Key::Left});
+    type(L"\x15");
+    EXPECT_EQ(line.text(), "c");
+    type(L"\x0B");
+    EXPECT_EQ(line.text(), "");
+}
+
+TEST_F(TerminalEditedLine, LeavesOtherKeysAndControlCharactersAlone)
+{
+    EXPECT_FALSE(line.handle({Key::Up}));
+    EXPECT_FALSE(line.handle({Key::Character, L'\x02'}));
+    EXPECT_TRUE(line.isEmpty());
+}
+
+} // namespace
+} // namespace kestrum

@@ -1,0 +1,323 @@
+#include "Messages.h"
+#include "Tool.h"
+#include "doubles/ScratchDirectory.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <sys/resource.h>
+
+namespace kestrum {
+namespace {
+
+using namespace std::string_literals;
+using testing::AllOf;
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+
+// "Num Tx Antennas" of an LTE record, which needs 22 bytes.
+std::string antennas(int count, std::uint64_t stamp = kStamp)
+{
+    return message(0xB0C1, std::string(7, '\0') + static_cast<char>(count) + '\0', stamp);
+}
+
+std::string ifx(const std::string& value)
+{
+    return R"(<?xml version="1.0" encoding="UTF-8"?><plist version="1.0"><dict><key>Cell</key><string>)" + value +
+           "</string><key>Other</key><string>o</string></dict></plist>";
+}
+
+class ProgramTest : public testing::Test {
+protected:
+    ProgramTest() { std::signal(SIGPIPE, SIG_IGN); }
+
+    std::string capture(const std::string& contents, const std::string& name = "a.kcap") const
+    {
+        writeFile(scratch.file(name), contents);
+        return scratch.file(name);
+    }
+
+    ScratchDirectory scratch;
+};
+
+TEST_F(ProgramTest, HelpNamesEveryOptionAndStatus)
+{
+    const auto ran = run({"--help"});
+    EXPECT_EQ(ran.status, 0);
+    for (const auto* each : {"--technology", "--format", "--log", "--stats", "--follow", "--extract", "--version",
+                             "standard input", "Exit status"})
+        EXPECT_THAT(ran.output, HasSubstr(each));
+}
+
+TEST_F(ProgramTest, VersionIsOneLine)
+{
+    EXPECT_EQ(run({"--version"}).output, "kestrum-decode 1.0.0\n");
+}
+
+struct Usage {
+    const char* name;
+    std::vector<std::string> arguments;
+
+    friend void PrintTo(const Usage& shown, std::ostream* out) { *out << shown.name; }
+};
+
+class WrongUsage : public testing::TestWithParam<Usage> {};
+
+TEST_P(WrongUsage, EndsWithStatus2AndSaysWhy)
+{
+    const auto ran = run(GetParam().arguments);
+    EXPECT_EQ(ran.status, 2);
+    EXPECT_EQ(ran.output, "");
+    EXPECT_NE(ran.remarks, "");
+}
+
+INSTANTIATE_TEST_SUITE_P(CommandLine, WrongUsage,
+                         testing::Values(Usage{"NoFile", {}}, Usage{"UnknownOption", {"--colour", "a.kcap"}},
+                                         Usage{"UnknownFormat", {"--format", "xml", "a.kcap"}},
+                                         Usage{"UnknownTechnology", {"--technology", "nmt", "a.kcap"}},
+                                         Usage{"ExtractFromACapture", {"--extract", "d", "a.kcap"}}),
+                         [](const auto& each) { return std::string(each.param.name); });
+
+TEST_F(ProgramTest, AFileThatIsNotThereIsBadInput)
+{
+    const auto ran = run({"/no/such.kcap"});
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_THAT(ran.remarks,
+                StartsWith("kestrum-decode: /no/such.kcap: cannot be opened: No such file or directory\n"));
+}
+
+TEST_F(ProgramTest, ADirectoryIsBadInput)
+{
+    const auto ran = run({scratch.path()});
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_THAT(ran.remarks, HasSubstr("cannot be read: Is a directory"));
+}
+
+TEST_F(ProgramTest, AnEmptyCaptureHasNothingToShow)
+{
+    const auto ran = run({"--format", "json", capture("")});
+    EXPECT_EQ(ran.status, 0);
+    EXPECT_EQ(ran.output,
+              "{\n  \"technology\": null,\n  \"messages\": 0,\n  \"dropped\": 0,\n  \"display\": null\n}\n");
+    EXPECT_EQ(ran.remarks, "kestrum-decode: no message was found\n");
+}
+
+TEST_F(ProgramTest, BadInputIsNamedWithFileAndOffsetAndTheRestIsShown)
+{
+    const auto file = capture(kcap(antennas(1)) + "\xFF\xFF\xFF\xFF" + kcap(antennas(2)));
+    const auto ran = run({file});
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_EQ(ran.remarks,
+              "kestrum-decode: " + file +
+                  ": at offset 26: a message of 4294967295 bytes, allowed are 16777216; 4 bytes skipped\n");
+    EXPECT_THAT(ran.output, HasSubstr("Num Tx Antennas: 2\n"));
+}
+
+TEST_F(ProgramTest, MessagesThatTellNoTechnologyNeedItNamed)
+{
+    const auto file = capture(kcap(message(1, "no list", kStamp, 0xFF)));
+    EXPECT_EQ(run({file}).status, 1);
+    EXPECT_THAT(run({file}).remarks, HasSubstr("no message tells the technology: name it with --technology"));
+    EXPECT_EQ(run({"--technology", "lte", file}).status, 0);
+}
+
+TEST_F(ProgramTest, MessagesBeforeTheOneThatTellsAreDecodedToo)
+{
+    const auto ran = run({"--stats", capture(kcap(message(1, "no list", kStamp, 0xFF)) + kcap(antennas(4)))});
+    EXPECT_THAT(ran.remarks, HasSubstr("0xFF0001           1"));
+    EXPECT_THAT(ran.remarks, HasSubstr("total              2"));
+}
+
+TEST_F(ProgramTest, ALogThatGoesOnInAnotherTechnologyShowsThatOne)
+{
+    const auto ran = run({"--format", "json", capture(kcap(antennas(4)) + kcap(ifx("here")))});
+    EXPECT_THAT(ran.output, HasSubstr("\"technology\": \"kVoxLogChannelTechnology_IFX\""));
+    EXPECT_THAT(ran.output, HasSubstr("\"Cell\": \"here\""));
+}
+
+TEST_F(ProgramTest, ForeignCodesDoNotChangeTheTechnology)
+{
+    const auto ran = run({"--format", "json", capture(kcap(antennas(4)) + kcap(message(0x5FFF, "?")))});
+    EXPECT_THAT(ran.output, HasSubstr("Zephra_LTE"));
+}
+
+TEST_F(ProgramTest, StatisticsHideNothing)
+{
+    const auto ran = run({"--stats", "--technology", "lte",
+                          capture(kcap("fragment") + kcap(antennas(1)) + kcap(message(0xB0C1, "odd type", kStamp, 7)) +
+                                  kcap(message(0xB0C1, "short")) + kcap(message(0xB193, "nobody's")) +
+                                  kcap(antennas(2)) + "#########")});
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_THAT(ran.remarks, EndsWith("code        messages     decoded   too short  without subscriber     refused\n"
+                                      "(none)             1           0           1                   0           0\n"
+                                      "0xB0C1             4           2           1                   0           1\n"
+                                      "0xB193             1           0           0                   1           0\n"
+                                      "total              6           2           2                   1           1\n"
+                                      "bytes skipped: 9\n"));
+}
+
+TEST_F(ProgramTest, DroppedAreThoseThatCouldNotBeTaken)
+{
+    const auto ran = run({"--format", "json", capture(kcap(ifx("a")) + kcap("<no list>") + kcap(ifx("b")))});
+    EXPECT_THAT(ran.output, HasSubstr("\"messages\": 3,\n  \"dropped\": 1,\n"));
+    EXPECT_THAT(ran.output, HasSubstr("\"Cell\": \"b\""));
+}
+
+TEST_F(ProgramTest, TheLogFollowsTheDisplayInJson)
+{
+    const auto ran = run({"--format", "json", "--log", capture(kcap(ifx("a")) + kcap("<no list>"))});
+    EXPECT_THAT(ran.output, HasSubstr("  \"log\": [\n    [4,\"Creating Log object: 0x0\"],\n    [3,"));
+    EXPECT_THAT(ran.output, HasSubstr("Could not deserialize the object"));
+    EXPECT_THAT(ran.output, EndsWith("\"]\n  ]\n}\n"));
+    EXPECT_EQ(ran.remarks, "");
+}
+
+TEST_F(ProgramTest, TheLogOfTheOtherFormatsGoesToStandardError)
+{
+    const auto ran = run({"--log", capture(kcap(ifx("a")))});
+    EXPECT_EQ(ran.output, "Cell: a\nOther: o\n");
+    EXPECT_EQ(ran.remarks, "[4,\"Creating Log object: 0x0\"]\n");
+}
+
+TEST_F(ProgramTest, TreesShowControlCharactersHarmlessly)
+{
+    EXPECT_EQ(run({capture(kcap(ifx("a&#10;b\x7F&#x9B;")))}).output, "Cell: a\\x0ab\\x7f\\xc2\\x9b\nOther: o\n");
+}
+
+TEST_F(ProgramTest, JsonlGivesOneObjectForEachMessageThatChangedTheDisplay)
+{
+    const auto file = capture(kcap(antennas(2)) + kcap(antennas(2, kStamp + (800ull << 16))) +
+                              kcap(antennas(4, kStamp + (801ull << 16))));
+    const auto ran = run({"--format", "jsonl", file});
+    EXPECT_EQ(std::ranges::count(ran.output, '\n'), 2);
+    EXPECT_THAT(ran.output, StartsWith(R"({"time":"2026-11-16T06:05:42.000000Z","code":"0xB0C1","changes":{)"));
+    EXPECT_THAT(ran.output, EndsWith(R"({"time":"2026-11-16T06:05:43.001250Z","code":"0xB0C1","changes":{)"
+                                     R"("/0;Serving Cell/Serving Cell Info/Num Tx Antennas":"4"}})"
+                                     "\n"));
+}
+
+TEST_F(ProgramTest, JsonlHasNoTimeWhereAMessageHasNone)
+{
+    EXPECT_EQ(run({"--format", "jsonl", capture(kcap(ifx("a")) + kcap(ifx("b")))}).output,
+              "{\"time\":null,\"code\":null,\"changes\":{\"/Cell\":\"a\",\"/Other\":\"o\"}}\n"
+              "{\"time\":null,\"code\":null,\"changes\":{\"/Cell\":\"b\"}}\n");
+    EXPECT_THAT(run({"--format", "jsonl", capture(kcap(antennas(1, 0)))}).output,
+                StartsWith("{\"time\":null,\"code\":\"0xB0C1\""));
+}
+
+TEST_F(ProgramTest, CsvQuotesAsRfc4180)
+{
+    EXPECT_EQ(run({"--format", "csv", capture(kcap(ifx("a,\"b\"&#10;c")))}).output,
+              "time,code,path,value\r\n,,/Cell,\"a,\"\"b\"\"\nc\"\r\n,,/Other,o\r\n");
+}
+
+TEST_F(ProgramTest, CsvHasTimeAndCode)
+{
+    EXPECT_THAT(
+        run({"--format", "csv", capture(kcap(antennas(4)))}).output,
+        HasSubstr("\n2026-11-16T06:05:42.000000Z,0xB0C1,/0;Serving Cell/Serving Cell Info/Num Tx Antennas,4\r\n"));
+}
+
+TEST_F(ProgramTest, StandardInputIsReadAsWhatItHolds)
+{
+    EXPECT_THAT(run({"-"}, kcap(antennas(3))).output, HasSubstr("Num Tx Antennas: 3\n"));
+    EXPECT_THAT(run({"-"}, antennas(2).substr(1)).output, HasSubstr("Num Tx Antennas: 2\n"));
+    const auto cut = run({"-"}, kcap(antennas(3)) + "abc");
+    EXPECT_EQ(cut.remarks,
+              "kestrum-decode: standard input: at offset 26: the length has only 3 of its 4 bytes; 3 bytes skipped\n");
+}
+
+TEST_F(ProgramTest, SeveralFilesArePartsOfOneLog)
+{
+    const auto first = capture(kcap(antennas(1)), "1.kcap"), second = capture(antennas(4).substr(1), "2.dlf");
+    const auto ran = run({"--format", "json", first, "/no/such.kcap", second});
+    EXPECT_EQ(ran.status, 1) << "one of them is bad";
+    EXPECT_THAT(ran.output, AllOf(HasSubstr("\"messages\": 2"), HasSubstr("\"Num Tx Antennas\": \"4\"")));
+}
+
+TEST_F(ProgramTest, AClosedPipeEndsItQuietly)
+{
+    Tool tool({"--format", "csv", "-"});
+    tool.closeOutput();
+    std::string piece;
+    for (int i = 0; i < 1000; ++i)
+        piece += kcap(antennas(i & 1));
+    while (tool.write(piece)) {
+    }
+    EXPECT_EQ(tool.remarks(), "");
+    EXPECT_EQ(tool.status(), 0);
+}
+
+TEST_F(ProgramTest, AFullDiskIsTold)
+{
+    const auto file = capture(kcap(antennas(1))), told = scratch.file("told");
+    const auto command = std::string(KESTRUM_BINARY_DIR) + "/kestrum-decode " + file + " >/dev/full 2>" + told;
+    EXPECT_EQ(WEXITSTATUS(std::system(command.c_str())), 1);
+    EXPECT_EQ(contentsOf(told), "kestrum-decode: standard output: No space left on device\n");
+}
+
+TEST_F(ProgramTest, FollowsAFileAsItGrows)
+{
+    const auto file = capture(kcap(antennas(1)));
+    Tool tool({"--follow", "--format", "jsonl", "--stats", file});
+    EXPECT_THAT(tool.line(), HasSubstr("\"1\""));
+    writeFile(file, kcap(antennas(2)), std::ios::app);
+    EXPECT_THAT(tool.line(), HasSubstr("\"2\""));
+    // A message that is written in two pieces.
+    const auto third = kcap(antennas(3));
+    writeFile(file, third.substr(0, 7), std::ios::app);
+    writeFile(file, third.substr(7), std::ios::app);
+    EXPECT_THAT(tool.line(), HasSubstr("\"3\""));
+    tool.signal(SIGINT);
+    EXPECT_THAT(tool.remarks(), HasSubstr("0xB0C1             3           3"));
+    EXPECT_EQ(tool.status(), 0);
+}
+
+TEST_F(ProgramTest, AFollowedTreeIsShownWhenItsEndIsMetAndAtTheEnd)
+{
+    const auto file = capture(kcap(ifx("a")));
+    Tool tool({"--follow", file});
+    EXPECT_EQ(tool.line(), "Cell: a");
+    EXPECT_EQ(tool.line(), "Other: o");
+    tool.signal(SIGTERM);
+    EXPECT_EQ(tool.output(), "") << "nothing has changed since";
+    EXPECT_EQ(tool.status(), 0);
+}
+
+TEST_F(ProgramTest, AFollowedFileThatShrinksIsBadInput)
+{
+    const auto file = capture(kcap(ifx("a")) + kcap(ifx("b")));
+    Tool tool({"--follow", "--format", "jsonl", file});
+    tool.line();
+    tool.line();
+    writeFile(file, "");
+    EXPECT_THAT(tool.remarks(), HasSubstr("has become shorter than what was read of it"));
+    EXPECT_EQ(tool.status(), 1);
+}
+
+// Far more than any buffer goes through a pipe; what the process ever held is asked of the system.
+TEST_F(ProgramTest, MemoryDoesNotGrowWithTheCapture)
+{
+    std::string piece;
+    for (int i = 0; i < 4'000; ++i)
+        piece += kcap(antennas(i % 5, kStamp + (static_cast<std::uint64_t>(i) << 16)));
+    Tool tool({"-", "--log", "--format", "json"});
+    const auto resident = [&] {
+        const auto status = contentsOf("/proc/" + std::to_string(tool.process()) + "/status");
+        return std::stol(status.substr(status.find("VmHWM:") + 6));
+    };
+    ASSERT_TRUE(tool.write(piece) && tool.write(piece));
+    const auto before = resident();
+    for (int i = 0; i < 30; ++i)
+        ASSERT_TRUE(tool.write(piece));
+    EXPECT_LE(resident(), before + 4'000) << "kilobytes, after fifteen times as many messages";
+    tool.closeInput();
+    tool.closeOutput();
+    tool.status();
+}
+
+} // namespace
+} // namespace kestrum

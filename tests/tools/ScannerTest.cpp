@@ -1,0 +1,309 @@
+#include "Messages.h"
+#include "Tool.h"
+#include "tools/KcapScanner.h"
+#include "tools/RecordScanner.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <rapidcheck/gtest.h>
+
+namespace kestrum {
+namespace {
+
+using namespace std::string_literals;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::SizeIs;
+
+struct Scanned {
+    std::vector<std::string> messages;
+    std::vector<Fault> faults;
+    std::uint64_t lost = 0;
+};
+
+Scanned drained(MessageScanner& scanner)
+{
+    Scanned result;
+    while (const auto message = scanner.next())
+        result.messages.emplace_back(textOf(*message));
+    return result;
+}
+
+template <typename... Origin>
+struct Scan {
+    template <typename Scanner>
+    static Scanned as(const std::string& stream, Origin... origin)
+    {
+        ByteWindow window(bytesOf(stream));
+        std::vector<Fault> faults;
+        Scanner scanner(
+            window, [&](const Fault& fault) { faults.push_back(fault); }, origin...);
+        Scanned result = drained(scanner);
+        for (const auto& fault : faults)
+            result.lost += fault.size;
+        result.faults = faults;
+        return result;
+    }
+};
+
+Scanned scanKcap(const std::string& stream)
+{
+    return Scan<>::as<KcapScanner>(stream);
+}
+Scanned scanDlf(const std::string& stream)
+{
+    return Scan<RecordScanner::Origin>::as<RecordScanner>(stream, RecordScanner::Origin::Dlf);
+}
+Scanned scanInterval(const std::string& stream)
+{
+    return Scan<RecordScanner::Origin>::as<RecordScanner>(stream, RecordScanner::Origin::Interval);
+}
+
+const std::string kFirst = message(0xB0C1, "first payload");
+const std::string kSecond = message(0xB0C2, "second", kStamp + (100ull << 16));
+const std::string kThird = message(0xB17F, "the third one", kStamp + (200ull << 16));
+const std::string kXml = "<?xml version=\"1.0\"?><plist version=\"1.0\"><array/></plist>\n";
+
+TEST(KcapScanner, GivesMessagesAsTheyTravelled)
+{
+    const auto prefixed = "\x81\x07"s + kSecond;
+    const auto list = message(0, kXml, kStamp, 0xFF);
+    const auto got = scanKcap(kcap(kFirst) + kcap(prefixed) + kcap(list) + kcap(kXml));
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, prefixed, list, kXml));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(KcapScanner, GivesFragmentsAndUnknownTypesThatStandInOrder)
+{
+    const auto odd = message(0xB0C1, "odd", kStamp, 2);
+    const auto got = scanKcap(kcap("abc") + kcap("") + kcap(kFirst) + kcap(odd) + kcap("x"));
+    EXPECT_THAT(got.messages, ElementsAre("abc", "", kFirst, odd, "x"));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(KcapScanner, FindsTheNextMessageBehindADamagedLength)
+{
+    const auto got = scanKcap(kcap(kFirst) + "\xFF\xFF\xFF\x7F" + kSecond + kcap(kThird));
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, kThird));
+    ASSERT_THAT(got.faults, SizeIs(1));
+    EXPECT_EQ(got.faults[0].offset, kcap(kFirst).size());
+    EXPECT_EQ(got.faults[0].size, kcap(kSecond).size());
+    EXPECT_EQ(got.faults[0].reason, "a message of 2147483647 bytes, allowed are 16777216");
+}
+
+TEST(KcapScanner, DoesNotTrustALengthBehindWhichNothingBegins)
+{
+    const auto got = scanKcap(littleEndian(kSecond.size() + 9, 4) + kSecond + kcap(kThird) + kcap(kFirst));
+    EXPECT_THAT(got.messages, ElementsAre(kThird, kFirst));
+    EXPECT_EQ(got.lost, kcap(kSecond).size());
+}
+
+TEST(KcapScanner, TellsOfALastMessageThatIsCutShort)
+{
+    const auto whole = kcap(kFirst) + kcap(kSecond);
+    const auto got = scanKcap(whole.substr(0, whole.size() - 3));
+    EXPECT_THAT(got.messages, ElementsAre(kFirst));
+    ASSERT_THAT(got.faults, SizeIs(1));
+    EXPECT_EQ(got.faults[0].reason, "the last message ends 3 bytes short");
+    EXPECT_EQ(got.faults[0].size, kcap(kSecond).size() - 3);
+}
+
+TEST(KcapScanner, WaitsForTheRestWhileTheInputMayGrow)
+{
+    const auto whole = kcap(kFirst);
+    std::string there = whole.substr(0, 9);
+    std::size_t read = 0;
+    ByteWindow window([&](std::span<std::byte> into) {
+        const auto count = there.copy(reinterpret_cast<char*>(into.data()), into.size(), read);
+        read += count;
+        return count;
+    });
+    KcapScanner scanner(window, [](const Fault&) { FAIL() << "nothing is wrong"; });
+    EXPECT_FALSE(scanner.next(true));
+    there = whole;
+    window.resume();
+    const auto message = scanner.next(true);
+    ASSERT_TRUE(message);
+    EXPECT_EQ(textOf(*message), kFirst);
+    EXPECT_FALSE(scanner.next(true));
+}
+
+TEST(DlfScanner, PutsTheTypeByteBeforeEachRecord)
+{
+    const auto got = scanDlf(kFirst.substr(1) + kSecond.substr(1) + kThird.substr(1));
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, kSecond, kThird));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(DlfScanner, ReadsWhatASnapshotLeavesOfItsIntervals)
+{
+    const auto prefixed = "\x81\x07"s + kSecond;
+    const auto list = message(1, kXml, kStamp, 0xFF);
+    // The first byte of each interval is missing: a type, a prefix's marker, a service record's type.
+    const auto stream =
+        (kFirst + prefixed + list).substr(1) + (prefixed + kThird).substr(1) + (list + kFirst).substr(1);
+    const auto got = scanDlf(stream);
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, prefixed, list, prefixed, kThird, list, kFirst));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(DlfScanner, FollowsALogWhoseTimeJumps)
+{
+    const auto later = kStamp + (9'000'000'000ull << 16);
+    const auto got = scanDlf(dlf(0xB0C1, "a") + dlf(0xB0C2, "b", later) + dlf(0xB0C1, "c", later));
+    EXPECT_THAT(got.messages, SizeIs(3));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(DlfScanner, TakesRecordsWithoutTimeStamp)
+{
+    const auto got = scanDlf(dlf(0xB0C1, "a", 0) + dlf(0xB0C2, "b", 0) + dlf(0xB0C1, "c", 0));
+    EXPECT_THAT(got.messages, ElementsAre(message(0xB0C1, "a", 0), message(0xB0C2, "b", 0), message(0xB0C1, "c", 0)));
+}
+
+TEST(DlfScanner, SkipsWhatIsNoRecord)
+{
+    const auto got = scanDlf(kFirst.substr(1) + std::string(40, '#') + kSecond.substr(1) + kThird.substr(1));
+    EXPECT_EQ(got.messages.size(), 3u);
+    EXPECT_EQ(got.messages.back(), kThird);
+    EXPECT_FALSE(got.faults.empty());
+}
+
+TEST(DlfScanner, TellsOfALastRecordThatIsCutShort)
+{
+    const auto whole = kFirst.substr(1) + kSecond.substr(1);
+    const auto got = scanDlf(whole.substr(0, whole.size() - 2));
+    EXPECT_THAT(got.messages, ElementsAre(kFirst));
+    ASSERT_THAT(got.faults, SizeIs(1));
+    EXPECT_EQ(got.faults[0].reason, "the last record ends 2 bytes short");
+    EXPECT_EQ(got.faults[0].offset, kFirst.size() - 1);
+}
+
+TEST(IntervalScanner, SplitsMessagesThatBearTheirTypes)
+{
+    const auto prefixed = "\x81\x07"s + kSecond;
+    const auto odd = message(0x1183, "odd", kStamp, 2);
+    const auto got = scanInterval(kFirst + prefixed + odd + message(0, kXml, kStamp, 0xFF) + kThird);
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, prefixed, odd, message(0, kXml, kStamp, 0xFF), kThird));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+struct Lie {
+    const char* name;
+    int by;
+
+    friend void PrintTo(const Lie& shown, std::ostream* out) { *out << shown.name; }
+};
+
+class LyingLength : public testing::TestWithParam<Lie> {};
+
+TEST_P(LyingLength, GivesWayToWhatFollows)
+{
+    auto lying = kSecond;
+    lying.replace(1, 2, littleEndian(static_cast<std::uint64_t>(12 + 6 + GetParam().by), 2));
+    const auto got = scanInterval(kFirst + lying + kThird + kFirst);
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, lying, kThird, kFirst));
+    EXPECT_EQ(got.lost, 0u);
+}
+
+INSTANTIATE_TEST_SUITE_P(IntervalScanner, LyingLength,
+                         testing::Values(Lie{"CountsTheTypeByte", 1}, Lie{"TooLong", 5}, Lie{"MuchTooLong", 40'000},
+                                         Lie{"TooShort", -4}),
+                         [](const auto& each) { return std::string(each.param.name); });
+
+TEST(IntervalScanner, TakesAListThatIsLongerThanItsRecordCanCount)
+{
+    auto list = kXml;
+    list.insert(list.find("<array/>"), "<!--" + std::string(70'000, ' ') + "-->");
+    const auto service = message(1, list, kStamp, 0xFF);
+    const auto got = scanInterval(kFirst + service + kSecond);
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, service, kSecond));
+}
+
+TEST(IntervalScanner, AccountsForEveryByteThatIsNoMessage)
+{
+    const auto got = scanInterval(kFirst + "fragment" + kSecond);
+    EXPECT_EQ(got.messages.back(), kSecond);
+    std::size_t taken = 0;
+    for (const auto& each : got.messages)
+        taken += each.size();
+    EXPECT_EQ(taken + got.lost, (kFirst + "fragment" + kSecond).size());
+}
+
+// Whatever is done to a capture: its scan ends, and what is given and what is told of account for every byte.
+class DamagedCapture : public testing::Test {
+protected:
+    const std::string capture = kcap(kFirst) + kcap("\x81\x07"s + kSecond) + kcap(message(1, kXml, kStamp, 0xFF)) +
+                                kcap(kThird) + kcap(kFirst) + kcap(kSecond);
+
+    static void accountFor(const std::string& damaged)
+    {
+        const auto got = scanKcap(damaged);
+        std::size_t taken = 0;
+        for (const auto& each : got.messages)
+            taken += 4 + each.size();
+        ASSERT_EQ(taken + got.lost, damaged.size());
+    }
+};
+
+TEST_F(DamagedCapture, CutAnywhere)
+{
+    for (std::size_t length = 0; length <= capture.size(); ++length)
+        accountFor(capture.substr(0, length));
+}
+
+TEST_F(DamagedCapture, WithAnyByteFlippedLosesThatMessageAtMost)
+{
+    const auto all = scanKcap(capture).messages;
+    for (std::size_t at = 0; at < capture.size(); ++at)
+        for (const unsigned flip : {0x01u, 0x80u, 0xFFu}) {
+            auto damaged = capture;
+            damaged[at] = static_cast<char>(static_cast<unsigned char>(damaged[at]) ^ flip);
+            accountFor(damaged);
+            const auto got = scanKcap(damaged).messages;
+            std::size_t intact = 0;
+            for (const auto& each : got)
+                intact += std::ranges::count(all, each) > 0 ? 1u : 0u;
+            ASSERT_GE(intact, all.size() - 2) << "at " << at << " with " << flip;
+        }
+}
+
+TEST_F(DamagedCapture, WithAnyByteFlippedADlfStreamGoesOn)
+{
+    const std::string stream = kFirst.substr(1) + kSecond.substr(1) + kThird.substr(1) + kFirst.substr(1);
+    for (std::size_t at = 0; at < stream.size(); ++at) {
+        auto damaged = stream;
+        damaged[at] = static_cast<char>(~damaged[at]);
+        ASSERT_GE(scanDlf(damaged).messages.size(), 2u) << "at " << at;
+    }
+}
+
+RC_GTEST_PROP(AnyBytes, AreScannedToTheirEnd, (const std::vector<std::uint8_t>& bytes))
+{
+    const std::string stream(bytes.begin(), bytes.end());
+    const auto asKcap = scanKcap(stream);
+    std::size_t taken = 0;
+    for (const auto& each : asKcap.messages)
+        taken += 4 + each.size();
+    RC_ASSERT(taken + asKcap.lost == stream.size());
+    scanDlf(stream);
+    const auto asInterval = scanInterval(stream);
+    taken = 0;
+    for (const auto& each : asInterval.messages)
+        taken += each.size();
+    RC_ASSERT(taken + asInterval.lost == stream.size());
+}
+
+TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
+{
+    // Nothing but heads that promise much, none of them true.
+    std::string heads;
+    while (heads.size() < (1u << 20))
+        heads += littleEndian(0xFFFFFF, 4) + "\x01\xFE\xFF\xC1\xB0" + littleEndian(kStamp, 8);
+    EXPECT_THAT(scanKcap(heads).messages, IsEmpty());
+    const auto got = scanDlf(heads);
+    EXPECT_LE(got.messages.size(), heads.size() / 12);
+}
+
+} // namespace
+} // namespace kestrum
