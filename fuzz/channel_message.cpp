@@ -1,0 +1,229 @@
+// Channel messages of every technology, through its real generator, template and property lists. The first byte chooses
+// the technology; then messages, each behind its length (16 bits, little-endian), where a length of 0 is a refresh.
+//
+// Equal bytes give equal displays and logs; a display has no keys but those of its template and its sections' rows; the
+// interval's raw messages are kept as they came; the history keeps five entries at most.
+#include "LogGenerator/Failures.h"
+#include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/ZPH_GSM/SimInfo.h"
+#include "Require.h"
+#include "core/KestrumModelNode.h"
+#include "doubles/MemoryBundle.h"
+#include "doubles/RecordingConsole.h"
+#include "doubles/RecordingLog.h"
+#include "doubles/VirtualClock.h"
+#include "platform/Roles.h"
+#include "platform/TelephonyService.h"
+#include "platform/propertylist/PropertyListCodec.h"
+#include "support/Record.h"
+
+#include <algorithm>
+#include <cctype>
+#include <cstdint>
+#include <optional>
+#include <set>
+#include <string>
+#include <vector>
+
+namespace kestrum::fuzz {
+namespace {
+
+struct Technology {
+    std::string_view identifier;
+    std::string_view templateName;                       ///< none: its messages bring the whole display
+    bool keepsAll = false;                               ///< every message goes into the interval's raw bytes
+    std::set<std::string, std::less<>> rowKeys = {};     ///< of the rows of list sections
+    bool (*isListedKey)(std::string_view key) = nullptr; ///< of what a decoder lists at a place of its own
+};
+
+/// "_sorted", or an index and an offset as in "0;PN".
+bool isPilotKey(std::string_view key)
+{
+    const auto semicolon = key.find(';');
+    const auto isNumber = [](std::string_view text) { return !text.empty() && std::ranges::all_of(text, ::isdigit); };
+    return key == "_sorted" || (semicolon != std::string_view::npos && isNumber(key.substr(0, semicolon)) &&
+                                isNumber(key.substr(semicolon + 1)));
+}
+
+// clang-format off
+const Technology kTechnologies[] = {
+    {kVoxLogChannelTechnology_IFX, ""},
+    {kVoxLogChannelTechnology_Zephra_GSM, "ZPH_GSM", true,
+     {"ARFCN", "BSIC", "RSSI", "C1 Value", "Scrambling Code", "RSCP", "Energy Per Chip", "Ranking Value",
+      "Downlink Frequency", "Rank Cell RSCP", "UARFCN", "Mobile Country Code", "Mobile Network Code",
+      "Transport Channel ID", "CRC Received", "CRC Received in Error", "Process ID", "No Rx Bits", "New Tx",
+      "Block Errors"}},
+    {kVoxLogChannelTechnology_Zephra_CDMA, "C2KTemplate", false, {}, isPilotKey},
+    {kVoxLogChannelTechnology_Zephra_LTE, "LTE", true,
+     {"Physical Cell ID", "Filtered RSRP", "Filtered RSRQ", "Measured RSSI", "Measured RSRP", "Average RSRP",
+      "Measured RSRQ", "Average RSRQ", "Srxlev", "Frequency Offset", "Ant 0 Frame Offset", "Ant 0 Sample Offset",
+      "Ant 1 Frame Offset", "Ant 1 Sample Offset", "Candidate Priority", "Candidate RAT Type", "E ARFCN", "Cell ID",
+      "U ARFCN", "PSC", "ARFCN", "Band", "BSIC ID", "Channel", "Pilot"}},
+    {kVoxLogChannelTechnology_Zephra_UTRAN2, "UTRAN", true,
+     {"UARFCN", "Cell ID", "Filter RSCP", "Status", "inJDCS", "TRCH ID", "TRCH BLER Measurement", "CCTRCH ID", "TSNUM",
+      "SIR"}},
+};
+// clang-format on
+
+std::string pathOf(std::string_view templateName)
+{
+    return std::string(KESTRUM_SOURCE_DIR "/resources/").append(templateName).append(".plist");
+}
+
+const PropertyListCodec kCodec;
+
+/// One generator, from its start on.
+class Run {
+public:
+    Run(const Technology& technology, const Value& loadedTemplate) : _technology(technology)
+    {
+        _bundle.paths = {pathOf(technology.templateName)};
+        if (loadedTemplate)
+            state.set("Template", loadedTemplate); // as read before: reading it is not what is tried here
+        _generator = LogGenerator::generatorFromTechnology(Value(technology.identifier), _roles);
+        require(_generator != nullptr, "no generator for the technology");
+    }
+
+    void receive(Bytes message)
+    {
+        // What a decoder may throw, and nothing else.
+        try {
+            _generator->updateState(state, message);
+        } catch (const LogCode_0xFF0000::UnknownDataException& failure) {
+            log.lines.emplace_back(Priority::Error, failure.what());
+        } catch (const ArrayOutOfBoundsException& failure) {
+            log.lines.emplace_back(Priority::Error, failure.what());
+        } catch (const AssertionFailure& failure) {
+            log.lines.emplace_back(Priority::Error, failure.description());
+        }
+        _interval.insert(_interval.end(), message.begin(), message.end());
+    }
+
+    void refresh()
+    {
+        const Value display = _generator->generateLogUsingState(state);
+        require(display.isNull() || display == state.at("Display"), "a refresh shows something else");
+        checkHistory();
+        if (_technology.keepsAll)
+            require(state.at("DisplayState").data() != nullptr &&
+                        std::ranges::equal(state.at("DisplayState").data()->bytes(), _interval),
+                    "the interval's raw messages are not as they came");
+        _interval.clear();
+
+        PathDictionary paths;
+        const auto tree = KestrumModelNode::makeTreeFromObject(state.at("Display"), paths);
+        require(tree != nullptr && paths.contains(std::string(kRootPath)), "no tree");
+        const auto contents = _generator->getSaveContentsFromState(state);
+        require(contents && contents->size() >= state.at("History").array()->size(), "the history cannot be saved");
+    }
+
+    State state;
+    RecordingLog log;
+
+private:
+    void checkHistory() const
+    {
+        const auto history = state.at("History").array();
+        require(history && !history->empty() && history->size() <= 5, "the history holds no entry, or more than five");
+        for (const auto& entry : *history)
+            require(entry.dictionary() != nullptr, "a history entry is no dictionary");
+    }
+
+    const Technology& _technology;
+    RecordingConsole _console;
+    VirtualClock _clock;
+    MemoryBundle _bundle;
+    PropertyListCodec _propertyLists;
+    DecodingRoles _roles{log, _console, _clock, _bundle, _propertyLists};
+    std::unique_ptr<LogGenerator> _generator;
+    std::vector<std::byte> _interval;
+};
+
+/// Whether the rows of a list have known keys, and texts alone or lists of such rows below them.
+bool isListing(const Technology& technology, const Value& value)
+{
+    if (const auto dictionary = value.dictionary())
+        return std::ranges::all_of(*dictionary, [&](const Dictionary::Entry& entry) {
+            const bool known = technology.rowKeys.contains(entry.key) ||
+                               (technology.isListedKey != nullptr && technology.isListedKey(entry.key));
+            return known && isListing(technology, entry.value);
+        });
+    if (const auto array = value.array())
+        return std::ranges::all_of(*array, [&](const Value& each) { return isListing(technology, each); });
+    return value.string() != nullptr;
+}
+
+/// Whether the display has no keys but those of the template beside it and of the rows listed inside it.
+bool hasShapeOf(const Technology& technology, const Value& templateNode, const Value& display)
+{
+    const auto expected = templateNode.dictionary(), shown = display.dictionary();
+    if (!expected || !shown)
+        return isListing(technology, display);
+    return std::ranges::all_of(*shown, [&](const Dictionary::Entry& entry) {
+        // These rows are the telephony service's own.
+        const bool isService = entry.key == "PDP Context Info" && entry.value.array();
+        return expected->contains(entry.key) &&
+               (isService || hasShapeOf(technology, expected->at(entry.key), entry.value));
+    });
+}
+
+/// The template of each technology, read once.
+Value loadedTemplate(std::size_t technology)
+{
+    static const auto templates = [] {
+        std::vector<Value> all;
+        for (const auto& each : kTechnologies) {
+            all.push_back(each.templateName.empty() ? Value() : kCodec.load(pathOf(each.templateName)));
+            require(each.templateName.empty() || all.back().dictionary(), "a template cannot be read");
+        }
+        return all;
+    }();
+    return templates[technology];
+}
+
+void decode(Bytes input)
+{
+    const Record record(input);
+    const auto chosen = record.read(u8(0)).value_or(0) % std::size(kTechnologies);
+    const Technology& technology = kTechnologies[chosen];
+    const Value templateNode = loadedTemplate(chosen);
+    const std::string templateBefore = describe(templateNode);
+
+    Run once(technology, templateNode), again(technology, templateNode);
+    constexpr int kMostRefreshes = 12; // twice what the history holds; zeros are many in what a fuzzer makes
+    int refreshes = 0;
+    for (std::size_t at = 1; at < input.size();) {
+        const auto length = record.from(at)->read(u16(0));
+        at += 2;
+        if (!length)
+            break;
+        if (*length == 0) {
+            if (refreshes++ < kMostRefreshes) {
+                once.refresh();
+                again.refresh();
+            }
+            continue;
+        }
+        const Bytes message = input.subspan(at, std::min<std::size_t>(*length, input.size() - at));
+        at += message.size();
+        once.receive(message);
+        again.receive(message);
+    }
+    once.refresh();
+    again.refresh();
+
+    require(describe(once.state.at("Display")) == describe(again.state.at("Display")), "equal bytes, other display");
+    require(once.log.lines == again.log.lines, "equal bytes, other log");
+    require(describe(templateNode) == templateBefore, "the template was changed");
+    if (const Value display = once.state.at("Display"); templateNode && display)
+        require(hasShapeOf(technology, templateNode, display), "a key that nobody announced");
+}
+
+} // namespace
+} // namespace kestrum::fuzz
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
+{
+    kestrum::fuzz::decode(std::as_bytes(std::span(data, size)));
+    return 0;
+}

@@ -1,0 +1,37 @@
+// Any bytes are a property list or are refused with a reason; what is read can be written, and then reads the same.
+#include "platform/propertylist/PropertyListCodec.h"
+
+#include <cstdint>
+#include <cstdio>
+#include <cstdlib>
+
+namespace {
+
+void require(bool condition, const char* what)
+{
+    if (condition)
+        return;
+    std::fprintf(stderr, "%s\n", what);
+    std::abort();
+}
+
+} // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
+{
+    const kestrum::PropertyListCodec codec;
+    const auto read = codec.parseWithError(std::as_bytes(std::span(data, size)));
+    require(read.value.isNull() == !read.reason.empty(), "neither a value nor a reason");
+    require(read.offset <= size, "an offset beyond the end");
+    if (!read)
+        return 0;
+    // Replaced characters can make two keys equal, so it is the second list that has to stay as it is.
+    const auto first = codec.toXml(read.value);
+    if (!first)
+        return 0; // indented, a large one can exceed the limit
+    const auto second = codec.toXml(codec.parse(first->bytes()));
+    require(second.has_value(), "what was written is not read");
+    const auto third = codec.toXml(codec.parse(second->bytes()));
+    require(third && kestrum::textOf(third->bytes()) == kestrum::textOf(second->bytes()), "it reads differently");
+    return 0;
+}
