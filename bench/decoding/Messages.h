@@ -1,0 +1,59 @@
+#pragma once
+
+#include "decoding/Counting.h"
+#include "doubles/MemoryBundle.h"
+#include "doubles/VirtualClock.h"
+#include "platform/Console.h"
+#include "platform/Roles.h"
+#include "platform/SystemLog.h"
+#include "platform/propertylist/PropertyListCodec.h"
+
+#include <benchmark/benchmark.h>
+
+#include <cstring>
+#include <vector>
+
+namespace kestrum::bench {
+
+/// What decoding needs, doing nothing: only the decoding is measured.
+struct Surroundings {
+    class Log final : public SystemLog {
+        void write(Priority, std::string_view) override {}
+    } log;
+    class Nowhere final : public Console {
+        void printLine(std::string_view) override {}
+        void debug(std::string_view) override {}
+        bool isDebugWatched() const override { return false; }
+    } console;
+    VirtualClock clock;
+    MemoryBundle bundle;
+    PropertyListCodec propertyLists;
+
+    DecodingRoles roles{log, console, clock, bundle, propertyLists};
+};
+
+inline std::vector<std::byte> copied(Bytes bytes)
+{
+    return {bytes.begin(), bytes.end()};
+}
+
+/// The binary form of a list of dictionaries, arrays and strings of ASCII, up to 250 different objects.
+std::vector<std::byte> binaryPropertyList(const Value& root);
+
+/// Measures `work` on one message: messages and bytes a second, heap allocations a message. `plainCopy` of as many
+/// bytes is what to compare it with.
+template <typename Work>
+void measure(benchmark::State& run, const std::vector<std::byte>& message, Work work)
+{
+    for (int i = 0; i < 1000; ++i)
+        work();
+    const std::size_t before = allocations();
+    for (auto _ : run)
+        work();
+    run.SetItemsProcessed(run.iterations());
+    run.SetBytesProcessed(run.iterations() * static_cast<std::int64_t>(message.size()));
+    run.counters["allocations"] =
+        benchmark::Counter(static_cast<double>(allocations() - before), benchmark::Counter::kAvgIterations);
+}
+
+} // namespace kestrum::bench
