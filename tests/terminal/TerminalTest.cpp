@@ -1,7 +1,7 @@
 #include "Demonstration.h"
 #include "Pseudoterminal.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
 #include <csignal>
 #include <filesystem>
@@ -13,6 +13,7 @@ namespace kestrum {
 namespace {
 
 using Key = Pseudoterminal::Key;
+using testing::EndsWith, testing::HasSubstr, testing::SizeIs, testing::StartsWith;
 
 std::string neighbours()
 {
@@ -76,6 +77,22 @@ protected:
             << title << "\n"
             << terminal.text();
     }
+    /// A frame may come in pieces: what a row is to show is waited for, too.
+    void expectRow(int row, const testing::Matcher<std::string>& matcher)
+    {
+        terminal.waitUntil([&] { return matcher.Matches(terminal.row(row)); });
+        EXPECT_THAT(terminal.row(row), matcher) << terminal.text();
+    }
+    void expectCursor()
+    {
+        EXPECT_TRUE(terminal.waitUntil([&] { return terminal.cursorVisible(); }));
+    }
+    void clickOn(const std::string& text)
+    {
+        ASSERT_TRUE(terminal.waitFor(text)) << terminal.text();
+        const int row = terminal.rowOf(text);
+        terminal.click(row, static_cast<int>(terminal.row(row).find(text)));
+    }
     /// Rows have been drawn anew from later data.
     void expectRefresh()
     {
@@ -108,21 +125,21 @@ TEST_F(Terminal, SaysConnectingUntilTheServiceAnswers)
 TEST_F(Terminal, ShowsKeysBoldAndValuesAgainstTheRightEdge)
 {
     startAndWait();
-    EXPECT_EQ(terminal.row(0), " Kestrum");
-    EXPECT_EQ(terminal.row(1), " Serving Cell" + std::string(65, ' ') + "›");
-    EXPECT_EQ(terminal.row(3), " Nothing" + std::string(70, ' ') + "›");
-    EXPECT_EQ(terminal.row(4).substr(0, 5), " Beat");
-    EXPECT_EQ(terminal.row(4).size(), 79u);
+    expectRow(0, " Kestrum");
+    expectRow(1, " Serving Cell" + std::string(65, ' ') + "›");
+    expectRow(3, " Nothing" + std::string(70, ' ') + "›");
+    expectRow(4, StartsWith(" Beat"));
+    expectRow(4, SizeIs(79));
     EXPECT_TRUE(terminal.isBold(4, 1));
     EXPECT_FALSE(terminal.isBold(4, 76));
-    EXPECT_NE(terminal.row(23).find("? help  q quit"), std::string::npos);
+    expectRow(23, HasSubstr("? help  q quit"));
 }
 
 TEST_F(Terminal, ShowsWideCharactersAndNothingThatSteersTheTerminal)
 {
     startAndWait();
-    EXPECT_EQ(terminal.row(5), " PLMN 日本" + std::string(65, ' ') + "漢字");
-    EXPECT_NE(terminal.row(6).find("a\uFFFD31m\uFFFDb␡"), std::string::npos) << terminal.row(6);
+    expectRow(5, " PLMN 日本" + std::string(65, ' ') + "漢字");
+    expectRow(6, HasSubstr("a\uFFFD31m\uFFFDb␡"));
 }
 
 TEST_F(Terminal, ScrollsALongRowSideways)
@@ -130,17 +147,17 @@ TEST_F(Terminal, ScrollsALongRowSideways)
     startAndWait();
     terminal.press(Key::End);
     expectChosen("A key that is long enough");
-    EXPECT_EQ(terminal.row(7).substr(0, 38), " A key that is long enough     and a v");
-    EXPECT_TRUE(terminal.row(7).ends_with("…"));
+    expectRow(7, StartsWith(" A key that is long enough     and a v"));
+    expectRow(7, EndsWith("…"));
     terminal.press(Key::ShiftRight);
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(7).starts_with("…"); })) << terminal.row(7);
+    expectRow(7, StartsWith("…"));
     terminal.type(">>>>>>>>");
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(7).ends_with("eighty columns"); })) << terminal.row(7);
+    expectRow(7, EndsWith("eighty columns"));
     const auto furthest = terminal.row(7);
     expectRefresh();
-    EXPECT_EQ(terminal.row(7), furthest); // a refresh moves nothing
+    expectRow(7, furthest); // a refresh moves nothing
     terminal.type("<<<<<<<<<");
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(7).starts_with(" A key"); })) << terminal.row(7);
+    expectRow(7, StartsWith(" A key"));
 }
 
 TEST_F(Terminal, OpensRowsAndGoesBackWithArrows)
@@ -190,7 +207,7 @@ TEST_F(Terminal, OpensARowWithoutChildren)
     startAndWait();
     terminal.type("jjl");
     expectTitle("Kestrum › Nothing");
-    EXPECT_EQ(terminal.row(1), "");
+    expectRow(1, "");
     terminal.type("jkl");
     terminal.press(Key::End);
     terminal.press(Key::PageDown);
@@ -219,8 +236,8 @@ TEST_F(Terminal, JumpsToARowByItsName)
     startAndWait();
     terminal.type("jl/LL 3");
     expectChosen("Cell 30");
-    EXPECT_EQ(terminal.row(23), " /LL 3");
-    EXPECT_TRUE(terminal.cursorVisible());
+    expectRow(23, " /LL 3");
+    expectCursor();
     terminal.type("7");
     expectChosen("Cell 37");
     terminal.press(Key::Enter);
@@ -275,13 +292,13 @@ TEST_F(Terminal, FollowsTheMouse)
     terminal.click(2, 10);
     expectTitle("Kestrum › Neighbours");
     terminal.turnWheel(true);
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(1).starts_with(" Cell 03"); })) << terminal.text();
+    expectRow(1, StartsWith(" Cell 03"));
     terminal.turnWheel(false);
     expectChosen("Cell 00");
     terminal.click(0, 3); // the title goes back
     expectTitle("Kestrum");
     expectShown("Serving Cell");
-    terminal.click(23, static_cast<int>(terminal.row(23).find("? help")));
+    clickOn("? help");
     expectShown("choose a row");
 }
 
@@ -299,10 +316,10 @@ TEST_F(Terminal, FitsFortyColumnsAndTwentyLines)
 {
     terminal.resize(20, 40);
     startAndWait();
-    EXPECT_EQ(terminal.row(1), " Serving Cell" + std::string(25, ' ') + "›");
-    EXPECT_EQ(terminal.row(4).size(), 39u);
-    EXPECT_EQ(terminal.row(19).substr(0, 9), " Updated ");
-    EXPECT_TRUE(terminal.row(19).ends_with("? help")) << terminal.row(19);
+    expectRow(1, " Serving Cell" + std::string(25, ' ') + "›");
+    expectRow(4, SizeIs(39));
+    expectRow(19, StartsWith(" Updated "));
+    expectRow(19, EndsWith("? help"));
     terminal.type("?");
     expectShown("jump to a name, again │");
 }
@@ -312,7 +329,7 @@ TEST_F(Terminal, KeepsSaveInSightOnFortyColumns)
     device.offerSave();
     terminal.resize(20, 40);
     startAndWait();
-    EXPECT_TRUE(terminal.row(19).ends_with("s save")) << terminal.row(19);
+    expectRow(19, EndsWith("s save"));
 }
 
 TEST_F(Terminal, FollowsTheTerminalsSize)
@@ -321,14 +338,14 @@ TEST_F(Terminal, FollowsTheTerminalsSize)
     terminal.type("jl/Cell 20\r");
     expectChosen("Cell 20");
     terminal.resize(10, 40);
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(9).starts_with(" Updated"); })) << terminal.text();
+    expectRow(9, StartsWith(" Updated"));
     expectChosen("Cell 20");
-    EXPECT_EQ(terminal.chosen().size(), 39u);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().size() == 39; })) << terminal.text();
     terminal.resize(50, 132);
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.row(49).starts_with(" Updated"); })) << terminal.text();
+    expectRow(49, StartsWith(" Updated"));
     expectChosen("Cell 20");
-    EXPECT_EQ(terminal.rowOf("Cell 00"), 1);
-    EXPECT_EQ(terminal.chosen().size(), 131u);
+    expectRow(1, StartsWith(" Cell 00"));
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().size() == 131; })) << terminal.text();
 }
 
 TEST_F(Terminal, BearsTheSmallestSizes)
@@ -366,7 +383,7 @@ TEST_F(Terminal, GoesBackWhenWhatItShowsIsNoMore)
     terminal.type("jl");
     expectTitle("Kestrum › Neighbours");
     expectShown("alone");
-    EXPECT_EQ(terminal.row(0), " Kestrum");
+    expectRow(0, " Kestrum");
 }
 
 TEST_F(Terminal, ShowsTheValueOfARowThatOpenedBefore)
@@ -377,7 +394,7 @@ TEST_F(Terminal, ShowsTheValueOfARowThatOpenedBefore)
     start();
     expectShown("›");
     expectShown("has a value now");
-    EXPECT_EQ(terminal.row(1), " Changing" + std::string(55, ' ') + "has a value now");
+    expectRow(1, " Changing" + std::string(55, ' ') + "has a value now");
 }
 
 class TerminalSave : public Terminal {
@@ -413,8 +430,8 @@ TEST_F(TerminalSave, WritesTheDescriptionThatWasTyped)
 {
     open();
     expectShown("Snapshot (20");
-    EXPECT_NE(terminal.text().find("✓"), std::string::npos);
-    EXPECT_TRUE(terminal.cursorVisible());
+    expectShown("✓");
+    expectCursor();
     terminal.type("roof, north é 漢");
     expectShown("roof, north é 漢");
     terminal.press(Key::Enter);
@@ -458,8 +475,7 @@ TEST_F(TerminalSave, GoesRoundItsPartsWithTab)
 TEST_F(TerminalSave, IsPressedWithTheMouse)
 {
     open();
-    const int row = terminal.rowOf("[ Save ]");
-    terminal.click(row, static_cast<int>(terminal.row(row).find("[ Save ]")) + 2);
+    clickOn("[ Save ]");
     expectGone("Save Snapshot");
     EXPECT_NE(saved(), "");
 }
@@ -599,15 +615,15 @@ TEST_F(Terminal, LosesNothingOnAMonochromeTerminal)
 TEST_F(Terminal, SpeaksAsciiWhereTheLocaleDoes)
 {
     startAndWait({{"LC_ALL", "POSIX"}});
-    EXPECT_EQ(terminal.row(1), " Serving Cell" + std::string(65, ' ') + ">");
-    EXPECT_EQ(terminal.row(5), " PLMN ????" + std::string(65, ' ') + "????");
-    EXPECT_TRUE(terminal.row(7).ends_with("~"));
+    expectRow(1, " Serving Cell" + std::string(65, ' ') + ">");
+    expectRow(5, " PLMN ????" + std::string(65, ' ') + "????");
+    expectRow(7, EndsWith("~"));
 }
 
 TEST_F(Terminal, TakesUnicodeForGrantedWhereNoLocaleIsNamed)
 {
     startAndWait({{"LC_ALL", ""}, {"LC_CTYPE", ""}, {"LANG", ""}});
-    EXPECT_TRUE(terminal.row(1).ends_with("›"));
+    expectRow(1, EndsWith("›"));
 }
 
 TEST_F(Terminal, NamesAnUnknownKindOfTerminal)
