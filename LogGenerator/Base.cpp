@@ -32,7 +32,7 @@ void Base::updateSectionRef(const Value& node)
 void Base::updateLogCodeDict(CodeDictionary& codeDict)
 {
     const auto codes = getLogCodeArray();
-    roles.log.write(Priority::Warning, format("Array Count: %d", static_cast<int>(codes.size())));
+    roles.log.write(Priority::Warning, "Array Count: %d", static_cast<int>(codes.size()));
     for (const LogCode code : codes)
         codeDict[format("%u", code)].push_back(this);
 }
@@ -47,10 +47,10 @@ void Base::clearElementsInArray(const SectionRef& array)
 
 void Base::replaceArray(const SectionRef& array, std::vector<Value> With)
 {
-    if (const auto node = array.array()) {
-        const ArrayLocked locked;
-        *node = Array(std::move(With));
-    }
+    replaceArray(array, [&With](Array& list) {
+        for (Value& element : With)
+            list.append(std::move(element));
+    });
 }
 
 std::int16_t Base::lookUpECNO(std::uint32_t linear)

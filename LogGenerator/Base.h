@@ -1,14 +1,17 @@
 #pragma once
 
+#include "LogGenerator/ArrayLock.h"
 #include "LogGenerator/Row.h"
 #include "platform/Roles.h"
 #include "platform/SystemLog.h"
 
 #include <algorithm>
+#include <concepts>
 #include <cstdint>
 #include <initializer_list>
 #include <map>
 #include <memory>
+#include <optional>
 #include <span>
 #include <string>
 #include <string_view>
@@ -84,6 +87,17 @@ public:
     /// Both under ArrayLock; nothing happens to a node that is no array.
     static void clearElementsInArray(const SectionRef& array);
     static void replaceArray(const SectionRef& array, std::vector<Value> With);
+    /// The same, by what `append` appends. It is called without a node too: decoding may log.
+    template <std::invocable<Array&> Append>
+    static void replaceArray(const SectionRef& array, Append append)
+    {
+        const auto node = array.array();
+        Array nowhere;
+        Array& list = node ? *node : nowhere;
+        const auto locked = node ? std::make_optional<ArrayLocked>() : std::nullopt;
+        list.clear();
+        append(list);
+    }
 
     /// The Ec/No in whole dB of a linear energy ratio, full scale 2^19. At or above full scale, and at or below 705,
     /// it is 0.
@@ -117,6 +131,13 @@ protected:
     void publish(std::string_view key, Value value) const;
     void publish(std::string_view key, const char* text) const { publish(key, std::string_view(text)); }
     void publish(std::string_view key, const std::string& text) const { publish(key, std::string_view(text)); }
+    /// Sets a list, which `append` fills.
+    template <std::invocable<Array&> Append>
+    void publish(std::string_view key, Append append) const
+    {
+        if (const auto node = sectionRef.dictionary())
+            append(node->setArray(key));
+    }
 
     DecodingRoles& roles;
     SectionRef sectionRef;

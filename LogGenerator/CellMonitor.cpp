@@ -19,15 +19,14 @@ ArrayRef cellsIn(Record data, DecodingRoles& roles)
 
 } // namespace
 
-void showCell(const Value& cell, std::span<const CellRow> rows, const DictionaryRef& into, SystemLog& log)
+void showCell(const Value& cell, std::span<const CellRow> rows, Dictionary* into, SystemLog& log)
 {
     for (const auto& row : rows) {
         const auto number = cellNumber(cell, row.number);
         if (!number && !row.whenMissing.empty())
             log.write(Priority::Error, row.whenMissing);
-        if (number && into)
-            row.conversion.apply(static_cast<std::uint32_t>(*number),
-                                 [&](std::string_view text) { into->setText(row.key, text); });
+        if (number && into != nullptr)
+            row.conversion.set(*into, row.key, static_cast<std::uint32_t>(*number));
     }
 }
 
@@ -43,27 +42,21 @@ Value firstCell(const ArrayRef& cells, std::initializer_list<std::string_view> t
 }
 
 void showServingCell(Record data, std::initializer_list<std::string_view> technologies, std::span<const CellRow> rows,
-                     const DictionaryRef& into, DecodingRoles& roles)
+                     Dictionary* into, DecodingRoles& roles)
 {
     if (const Value cell = firstCell(cellsIn(data, roles), technologies, kVoxCellType_Serving))
         showCell(cell, rows, into, roles.log);
 }
 
-std::vector<Value> listedNeighbors(Record data, std::string_view technology, std::span<const CellRow> rows,
-                                   DecodingRoles& roles)
+void appendNeighbors(Array& list, Record data, std::string_view technology, std::span<const CellRow> rows,
+                     DecodingRoles& roles)
 {
-    std::vector<Value> neighbors;
     const auto cells = cellsIn(data, roles);
     if (!cells)
-        return neighbors;
-    for (const Value& cell : *cells) {
-        if (!isCell(cell, technology, kVoxCellType_Neighbor))
-            continue;
-        auto row = makeDictionary();
-        showCell(cell, rows, row, roles.log);
-        neighbors.emplace_back(std::move(row));
-    }
-    return neighbors;
+        return;
+    for (const Value& cell : *cells)
+        if (isCell(cell, technology, kVoxCellType_Neighbor))
+            showCell(cell, rows, &list.appendRow(), roles.log);
 }
 
 } // namespace kestrum

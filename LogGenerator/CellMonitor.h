@@ -6,7 +6,6 @@
 #include <initializer_list>
 #include <span>
 #include <string_view>
-#include <vector>
 
 namespace kestrum {
 
@@ -23,7 +22,7 @@ struct CellRow {
 
 /// Sets the key of each row whose number the cell has; the other keys keep their values. Without a dictionary it only
 /// logs what is missing.
-void showCell(const Value& cell, std::span<const CellRow> rows, const DictionaryRef& into, SystemLog& log);
+void showCell(const Value& cell, std::span<const CellRow> rows, Dictionary* into, SystemLog& log);
 
 /// The first cell of that type and of one of the technologies; null when there is none.
 Value firstCell(const ArrayRef& cells, std::initializer_list<std::string_view> technologies, std::string_view type);
@@ -31,11 +30,11 @@ Value firstCell(const ArrayRef& cells, std::initializer_list<std::string_view> t
 /// Shows the first serving cell of one of the technologies in a cell-monitor record. Logs when the record holds no
 /// array of cells.
 void showServingCell(Record data, std::initializer_list<std::string_view> technologies, std::span<const CellRow> rows,
-                     const DictionaryRef& into, DecodingRoles& roles);
+                     Dictionary* into, DecodingRoles& roles);
 
-/// A row for each neighbour cell of the technology in a cell-monitor record, those with missing numbers included. Logs
-/// when the record holds no array of cells, and then has none.
-std::vector<Value> listedNeighbors(Record data, std::string_view technology, std::span<const CellRow> rows,
-                                   DecodingRoles& roles);
+/// Appends a row for each neighbour cell of the technology in a cell-monitor record, those with missing numbers
+/// included. Logs when the record holds no array of cells, and then appends none.
+void appendNeighbors(Array& list, Record data, std::string_view technology, std::span<const CellRow> rows,
+                     DecodingRoles& roles);
 
 } // namespace kestrum

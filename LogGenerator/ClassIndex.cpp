@@ -2,8 +2,6 @@
 
 #include "platform/Console.h"
 
-#include <charconv>
-
 namespace kestrum {
 
 ClassIndex::ClassIndex(DecodingRoles& decodingRoles)
@@ -24,10 +22,10 @@ Base* ClassIndex::getClass(std::string_view sectionName) const
 
 const std::vector<Base*>* ClassIndex::getSubscribers(LogCode logCode) const
 {
-    char digits[16];
-    const auto end = std::to_chars(digits, digits + sizeof digits, logCode).ptr;
-    const auto found = codeDictionary.find(std::string_view(digits, static_cast<std::size_t>(end - digits)));
-    return found == codeDictionary.end() ? nullptr : &found->second;
+    if (const auto known = _subscribers.find(logCode); known != _subscribers.end())
+        return known->second;
+    const auto found = codeDictionary.find(format("%u", logCode));
+    return found == codeDictionary.end() ? nullptr : (_subscribers[logCode] = &found->second);
 }
 
 std::vector<std::string> ClassIndex::getAllLogCodes() const
@@ -41,8 +39,8 @@ std::vector<std::string> ClassIndex::getAllLogCodes() const
 void ClassIndex::status() const
 {
     // The registry's type is settled at compile time: it is a dictionary, and no string.
-    roles.log.write(Priority::Warning, format("Dictionary = %d", 1));
-    roles.log.write(Priority::Warning, format("String = %d", 0));
+    roles.log.write(Priority::Warning, "Dictionary = %d", 1);
+    roles.log.write(Priority::Warning, "String = %d", 0);
 }
 
 } // namespace kestrum

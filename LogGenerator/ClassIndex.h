@@ -4,6 +4,7 @@
 #include "LogGenerator/ParsedOnce.h"
 
 #include <memory>
+#include <unordered_map>
 
 namespace kestrum {
 
@@ -26,6 +27,8 @@ public:
 
 private:
     ParsedOnce _parsedOnce;
+    /// What `getSubscribers` found: it is asked for every record, by number.
+    mutable std::unordered_map<LogCode, const std::vector<Base*>*> _subscribers;
 
 protected:
     template <typename Section>

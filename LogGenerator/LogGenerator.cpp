@@ -21,7 +21,7 @@ bool isSameContainer(const Value& left, const Value& right)
 
 LogGenerator::LogGenerator(DecodingRoles& roles) : _roles(roles)
 {
-    _roles.log.write(Priority::Warning, format("Creating Log object: %p", _roles.log.shownAddress(this)));
+    _roles.log.write(Priority::Warning, "Creating Log object: %p", _roles.log.shownAddress(this));
 }
 
 void LogGenerator::updateHistoryInState(State& state) const

@@ -8,9 +8,10 @@
 namespace kestrum {
 namespace {
 
-bool isText(const Value& value, std::string_view text)
+bool holds(const Dictionary& dictionary, std::string_view key, std::string_view text)
 {
-    return value.string() != nullptr && *value.string() == text;
+    const Value* value = dictionary.find(key);
+    return value != nullptr && value->string() != nullptr && *value->string() == text;
 }
 
 } // namespace
@@ -29,15 +30,16 @@ CellInfoArray::CellInfoArray(Record record, DecodingRoles& roles) : _cells(prope
 
 bool isCell(const Value& cell, std::string_view technology, std::string_view type)
 {
-    const auto dictionary = cell.dictionary();
-    return dictionary && isText(dictionary->at(kVoxCell_Technology), technology) &&
-           isText(dictionary->at(kVoxCell_Type), type);
+    const Dictionary* dictionary = cell.borrowedDictionary();
+    return dictionary != nullptr && holds(*dictionary, kVoxCell_Technology, technology) &&
+           holds(*dictionary, kVoxCell_Type, type);
 }
 
 std::optional<std::int32_t> cellNumber(const Value& cell, std::string_view key)
 {
-    const auto dictionary = cell.dictionary();
-    return dictionary ? dictionary->at(key).int32() : std::nullopt;
+    const Dictionary* dictionary = cell.borrowedDictionary();
+    const Value* number = dictionary != nullptr ? dictionary->find(key) : nullptr;
+    return number != nullptr ? number->int32() : std::nullopt;
 }
 
 } // namespace kestrum

@@ -12,7 +12,6 @@
 #include <span>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace kestrum {
 
@@ -25,14 +24,17 @@ public:
     constexpr Conversion(Formatted formatted) : _formatted(formatted) {}
     constexpr Conversion(Named named) : _named(named) {}
 
-    /// Hands the text to `use`; nothing is allocated for a name or a text of up to 15 bytes.
-    template <typename Use>
-    void apply(std::uint32_t raw, Use use) const
+    /// Sets the key to the text of the raw value. Nothing is worded anew that stands there already.
+    void set(Dictionary& into, std::string_view key, std::uint32_t raw) const
     {
-        if (_named != nullptr)
-            use(_named(raw));
-        else
-            use(std::string_view(_formatted(raw)));
+        const Wording wording{
+            _named != nullptr ? reinterpret_cast<const void*>(_named) : reinterpret_cast<const void*>(_formatted), raw};
+        into.setWorded(key, wording, [&](Value& value) {
+            if (_named != nullptr)
+                value.assignText(_named(raw), wording);
+            else
+                value.assignText(_formatted(raw), wording);
+        });
     }
 
 private:
@@ -59,9 +61,6 @@ constexpr std::size_t reach(std::span<const Row> rows)
 /// Sets the key of each row whose field lies inside the record; the other keys keep their values.
 void show(Record record, std::span<const Row> rows, Dictionary& into);
 
-/// A new dictionary with a key for each row.
-DictionaryRef shown(Record record, std::span<const Row> rows);
-
 /// Elements that follow one another inside a record. Where they overlap or leave gaps, `length`, the bytes that an
 /// element's fields take, differs from `stride`.
 struct Elements {
@@ -80,26 +79,40 @@ inline std::optional<Record> elementOf(Record record, Elements elements, std::si
     return record.slice(elements.first + elements.stride * index, elements.length);
 }
 
-/// What `show` makes of each element, up to the first that does not lie inside the record: a count may promise more
-/// than there is. Elements of which it makes null are left out.
-template <std::invocable<Record> Show>
-std::vector<Value> listed(Record record, Elements elements, std::size_t count, Show showElement)
+/// Calls `use` with each element up to the first that does not lie inside the record: a count may promise more than
+/// there is.
+template <std::invocable<Record> Use>
+void forEachElement(Record record, Elements elements, std::size_t count, Use use)
 {
-    std::vector<Value> found;
-    found.reserve(std::min(count, record.size() / elements.stride));
     for (std::size_t i = 0; i < count; ++i) {
         const auto element = elementOf(record, elements, i);
         if (!element)
             break;
-        if (Value value = showElement(*element))
-            found.push_back(std::move(value));
+        use(*element);
     }
-    return found;
 }
 
-inline std::vector<Value> listed(Record record, Elements elements, std::size_t count, std::span<const Row> rows)
+/// For `Base::replaceArray` and `Base::publish`: what is to stand in a list, a row for each element with the keys that
+/// `show` sets.
+template <std::invocable<Record, Dictionary&> Show>
+auto listed(Record record, Elements elements, std::size_t count, Show showElement)
 {
-    return listed(record, elements, count, [rows](Record element) { return Value(shown(element, rows)); });
+    return [=](Array& list) {
+        forEachElement(record, elements, count, [&](Record element) { showElement(element, list.appendRow()); });
+    };
+}
+
+inline auto listed(Record record, Elements elements, std::size_t count, std::span<const Row> rows)
+{
+    return listed(record, elements, count, [rows](Record element, Dictionary& row) { show(element, rows, row); });
+}
+
+/// The same with a text for each element.
+inline auto listed(Record record, Elements elements, std::size_t count, std::string (*text)(Record element))
+{
+    return [=](Array& list) {
+        forEachElement(record, elements, count, [&](Record element) { list.appendText(text(element)); });
+    };
 }
 
 /// The text at `value` in a table of names that begins at 0; "Unknown" beyond its end.

@@ -25,7 +25,9 @@ std::uint64_t packedTime(Date now, Clock::Zone zone)
 
 void ZPHLogGenerator::moveBinDataToState(State& state)
 {
+    const std::size_t size = binData.size();
     state.set("DisplayState", Data(std::exchange(binData, {})));
+    binData.reserve(size); // the next interval will be much like this one
 }
 
 std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) const
@@ -38,7 +40,7 @@ std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) co
         QrelDLFAddVersionReport(stream.data(), static_cast<std::uint32_t>(stream.size()), written, 1, 1, versionText,
                                 "EXECUTABLE_NAME", kBuildText, packedTime(now, _roles.clock.zoneAt(now)));
     if (result != 0) {
-        _roles.log.write(Priority::Raw16, format("Could not write DLF header (result=%d)", result));
+        _roles.log.write(Priority::Raw16, "Could not write DLF header (result=%d)", result);
         return std::nullopt;
     }
     if (const auto history = state.at("History").array()) {

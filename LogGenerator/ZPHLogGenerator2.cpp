@@ -15,7 +15,7 @@ namespace {
 /// Announced before anything is initialised.
 DecodingRoles& announced(DecodingRoles& roles, const ClassIndex* index)
 {
-    roles.log.write(Priority::Error, format("Creating ZPHLogGenerator2 object with %p", roles.log.shownAddress(index)));
+    roles.log.write(Priority::Error, "Creating ZPHLogGenerator2 object with %p", roles.log.shownAddress(index));
     return roles;
 }
 
@@ -27,13 +27,13 @@ ZPHLogGenerator2::ZPHLogGenerator2(DecodingRoles& roles, std::string pListName, 
       _cIndex(std::move(cIndexObj))
 {
     // The index has this one owner.
-    _roles.log.write(Priority::Error, format("Class Index: %ld", 1L));
+    _roles.log.write(Priority::Error, "Class Index: %ld", 1L);
 }
 
 ZPHLogGenerator2::~ZPHLogGenerator2()
 {
     // The text names the GSM generator whatever the concrete class, on purpose.
-    _roles.log.write(Priority::Warning, format("ZPH_GSMLogGenerator is destructed %p", _roles.log.shownAddress(this)));
+    _roles.log.write(Priority::Warning, "ZPH_GSMLogGenerator is destructed %p", _roles.log.shownAddress(this));
 }
 
 void ZPHLogGenerator2::updateState(State& state, Bytes withData)
@@ -50,7 +50,7 @@ void ZPHLogGenerator2::updateWithData(Bytes message)
     if (!read || !_cIndex)
         return;
     if (!read->isOfKnownType()) {
-        _roles.log.write(Priority::Error, format("Invalid log type: %x. Dropping.", read->type));
+        _roles.log.write(Priority::Error, "Invalid log type: %x. Dropping.", read->type);
         return;
     }
     if (const auto* subscribers = _cIndex->getSubscribers(read->logCode))
@@ -117,8 +117,8 @@ Value ZPHLogGenerator2::loadTemplate(State& state) const
 
 Value ZPHLogGenerator2::getDisplayFromState(State& state)
 {
-    if (const Value* display = state.find("Display");
-        display != nullptr && display->dictionary() && display->dictionary() == _display.lock())
+    if (const Value* display = state.find("Display"); display != nullptr && display->borrowedDictionary() != nullptr &&
+                                                      display->borrowedDictionary() == _display.lock().get())
         return *display;
 
     dropForeignDisplay(state);
@@ -133,8 +133,8 @@ Value ZPHLogGenerator2::getDisplayFromState(State& state)
     const Value loaded = loadTemplate(state);
     if (!loaded)
         return {};
-    _roles.log.write(Priority::Warning, format("Initialized class index: %p, Self: %p",
-                                               _roles.log.shownAddress(_cIndex.get()), _roles.log.shownAddress(this)));
+    _roles.log.write(Priority::Warning, "Initialized class index: %p, Self: %p", _roles.log.shownAddress(_cIndex.get()),
+                     _roles.log.shownAddress(this));
     if (_cIndex)
         _cIndex->status();
     const Value built = processTemplate(loaded);

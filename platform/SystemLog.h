@@ -1,6 +1,9 @@
 #pragma once
 
+#include "support/Format.h"
+
 #include <string_view>
+#include <type_traits>
 
 namespace kestrum {
 
@@ -15,6 +18,14 @@ public:
     /// One line, its arguments filled in. Never blocks for long and never fails: a line that cannot be kept is
     /// counted instead. The text is borrowed for the call.
     virtual void write(Priority priority, std::string_view text) = 0;
+    /// The same with arguments, formatted without allocating when the line is of usual length.
+    template <typename... Arguments>
+        requires(sizeof...(Arguments) > 0)
+    void write(Priority priority, FormatString<std::type_identity_t<Arguments>...> format,
+               const Arguments&... arguments)
+    {
+        write(priority, formatting::formatted(format, arguments...).text());
+    }
 
     /// How an object's address is shown in a line. Offline, addresses mean nothing and are shown as null, so that
     /// two runs log the same.

@@ -5,67 +5,53 @@
 #include <cstring>
 #include <iterator>
 
-namespace kestrum {
+namespace kestrum::formatting {
 namespace {
 
-using formatting::Conversion;
+void pad(Output& out, char with, std::size_t count)
+{
+    for (; count > 0; --count)
+        out.append({&with, 1});
+}
 
-/// Text under construction: on the stack while it is short, as all display values are.
-class Output {
+/// A number under construction, its sign before its digits.
+class Number {
 public:
-    void append(std::string_view text)
+    Number(const Conversion& conversion, bool negative)
     {
-        if (_spilled.empty() && text.size() <= sizeof _buffer - _used) {
-            std::memcpy(_buffer + _used, text.data(), text.size());
-            _used += text.size();
-            return;
+        if (negative || conversion.plus)
+            _text[_size++] = negative ? '-' : '+';
+        _signs = _size;
+    }
+
+    char* begin() { return _text + _size; } ///< of the digits still to come
+    char* end() { return std::end(_text); }
+    void endAt(const char* behind) { _size = static_cast<std::size_t>(behind - _text); }
+
+    /// Filled up to the conversion's width: zeros stand behind the sign, blanks before it.
+    void appendTo(Output& out, const Conversion& conversion)
+    {
+        const auto width = static_cast<std::size_t>(conversion.width);
+        const std::size_t fill = width > _size ? width - _size : 0;
+        std::size_t at = 0;
+        if (fill > 0 && conversion.zero) {
+            out.append({_text, _signs});
+            at = _signs;
         }
-        if (_spilled.empty())
-            _spilled.assign(_buffer, _used);
-        _spilled += text;
+        pad(out, conversion.zero ? '0' : ' ', fill);
+        out.append({_text + at, _size - at});
     }
-    void pad(char with, std::size_t count)
-    {
-        for (; count > 0; --count)
-            append({&with, 1});
-    }
-    std::string take() { return _spilled.empty() ? std::string(_buffer, _used) : std::move(_spilled); }
 
 private:
-    char _buffer[128];
-    std::size_t _used = 0;
-    std::string _spilled;
+    char _text[400]; // the largest double has 309 digits before the point, and 60 may stand behind it
+    std::size_t _size = 0, _signs;
 };
 
-/// `digits` with its sign, filled up to the conversion's width. Zeros stand behind the sign, blanks before it.
-void appendNumber(Output& out, const Conversion& conversion, char sign, std::string_view digits, bool finite = true)
+void appendInteger(Output& out, const Conversion& conversion, bool negative, std::uint64_t magnitude, int base = 10)
 {
-    const std::size_t length = digits.size() + (sign != '\0' ? 1 : 0);
-    const auto width = static_cast<std::size_t>(conversion.width);
-    const std::size_t fill = width > length ? width - length : 0;
-    const bool zeros = conversion.zero && finite;
-    if (!zeros)
-        out.pad(' ', fill);
-    if (sign != '\0')
-        out.append({&sign, 1});
-    if (zeros)
-        out.pad('0', fill);
-    out.append(digits);
-}
-
-char signOf(const Conversion& conversion, bool negative)
-{
-    return negative ? '-' : conversion.plus ? '+' : '\0';
-}
-
-void appendInteger(Output& out, const Conversion& conversion, bool negative, std::uint64_t magnitude)
-{
-    char digits[24];
-    const int base = conversion.letter == 'x' ? 16 : 10;
-    const auto end = std::to_chars(digits, digits + sizeof digits, magnitude, base).ptr;
-    // Only a conversion that can show "-" shows "+".
-    const char sign = conversion.letter == 'd' ? signOf(conversion, negative) : '\0';
-    appendNumber(out, conversion, sign, {digits, static_cast<std::size_t>(end - digits)});
+    Number number(conversion, negative);
+    number.endAt(std::to_chars(number.begin(), number.end(), magnitude, base).ptr);
+    number.appendTo(out, conversion);
 }
 
 /// The magnitude with so many digits behind the point, when it has no more than 20 binary places, as measurements in
@@ -87,76 +73,73 @@ char* writeShort(char* to, char* end, double magnitude, int precision)
         ++rounded;
     to = std::to_chars(to, end, rounded / power).ptr;
     *to++ = '.';
-    for (std::uint64_t digit = power / 10; digit > 0; digit /= 10)
-        *to++ = static_cast<char>('0' + rounded / digit % 10);
-    return to;
+    char* const behind = to + precision;
+    std::uint64_t fraction = rounded % power;
+    for (char* digit = behind; digit != to; fraction /= 10)
+        *--digit = static_cast<char>('0' + fraction % 10);
+    return behind;
+}
+
+} // namespace
+
+void Output::spill(std::string_view text)
+{
+    if (_spilled.empty())
+        _spilled.assign(_buffer, _used);
+    _spilled += text;
+}
+
+void appendPercents(Output& out, std::string_view text)
+{
+    for (auto percent = text.find('%'); percent != std::string_view::npos; percent = text.find('%')) {
+        out.append(text.substr(0, percent + 1));
+        text.remove_prefix(percent + 2);
+    }
+    out.append(text);
+}
+
+void appendSigned(Output& out, const Conversion& conversion, std::int64_t value)
+{
+    const auto bits = static_cast<std::uint64_t>(value);
+    appendInteger(out, conversion, value < 0, value < 0 ? 0 - bits : bits);
+}
+
+void appendUnsigned(Output& out, Conversion conversion, std::uint64_t value)
+{
+    conversion.plus = false; // only a conversion that can show "-" shows "+"
+    appendInteger(out, conversion, false, value, conversion.letter == 'x' ? 16 : 10);
 }
 
 void appendReal(Output& out, const Conversion& conversion, double value)
 {
     if (std::isnan(value))
-        return appendNumber(out, conversion, '\0', "nan", false);
-    const char sign = signOf(conversion, std::signbit(value));
-    if (std::isinf(value))
-        return appendNumber(out, conversion, sign, "inf", false);
-    char digits[400]; // the largest double has 309 digits before the point
+        return appendText(out, {.width = conversion.width}, "nan");
+    Number number(conversion, std::signbit(value));
+    const double magnitude = std::fabs(value);
     const int precision = conversion.precision < 0 ? 6 : conversion.precision;
-    const char* end = writeShort(digits, std::end(digits), std::fabs(value), precision);
+    const char* end = writeShort(number.begin(), number.end(), magnitude, precision);
     if (end == nullptr)
-        end = std::to_chars(digits, std::end(digits), std::fabs(value), std::chars_format::fixed, precision).ptr;
-    appendNumber(out, conversion, sign, {digits, static_cast<std::size_t>(end - digits)});
+        end = std::to_chars(number.begin(), number.end(), magnitude, std::chars_format::fixed, precision).ptr;
+    number.endAt(end);
+    Conversion shown = conversion;
+    shown.zero &= std::isfinite(value);
+    number.appendTo(out, shown);
 }
 
-void appendArgument(Output& out, const Conversion& conversion, const FormatArgument& argument)
+void appendText(Output& out, const Conversion& conversion, std::string_view text)
 {
-    switch (argument.kind()) {
-    case FormatArgument::Kind::Signed: {
-        const auto value = argument.signedValue();
-        const auto bits = static_cast<std::uint64_t>(value);
-        return appendInteger(out, conversion, value < 0, value < 0 ? 0 - bits : bits);
-    }
-    case FormatArgument::Kind::Unsigned:
-        return appendInteger(out, conversion, false, argument.unsignedValue());
-    case FormatArgument::Kind::Character: {
-        const char character = static_cast<char>(argument.signedValue());
-        return appendNumber(out, conversion, '\0', {&character, 1});
-    }
-    case FormatArgument::Kind::Real:
-        return appendReal(out, conversion, argument.real());
-    case FormatArgument::Kind::Text: {
-        const bool whole = conversion.precision < 0;
-        const auto length = whole ? std::string_view::npos : static_cast<std::size_t>(conversion.precision);
-        return appendNumber(out, conversion, '\0', argument.text().substr(0, length), false);
-    }
-    case FormatArgument::Kind::Address: {
-        char text[24] = "0x";
-        const auto address = reinterpret_cast<std::uintptr_t>(argument.address());
-        const auto end = std::to_chars(text + 2, text + sizeof text, address, 16).ptr;
-        return appendNumber(out, conversion, '\0', {text, static_cast<std::size_t>(end - text)}, false);
-    }
-    }
+    if (conversion.precision >= 0)
+        text = text.substr(0, static_cast<std::size_t>(conversion.precision));
+    const auto width = static_cast<std::size_t>(conversion.width);
+    pad(out, ' ', width > text.size() ? width - text.size() : 0);
+    out.append(text);
 }
 
-} // namespace
-
-std::string formatArguments(std::string_view format, const FormatArgument* arguments)
+void appendAddress(Output& out, const Conversion& conversion, const void* address)
 {
-    Output out;
-    for (std::size_t at = 0; at < format.size();) {
-        const auto percent = format.find('%', at);
-        out.append(format.substr(at, percent - at));
-        if (percent == std::string_view::npos)
-            break;
-        at = percent + 1;
-        if (at < format.size() && format[at] == '%') {
-            out.append("%");
-            ++at;
-            continue;
-        }
-        const auto conversion = formatting::parse(format, at);
-        appendArgument(out, conversion, *arguments++);
-    }
-    return out.take();
+    char text[24] = "0x";
+    const auto end = std::to_chars(text + 2, text + sizeof text, reinterpret_cast<std::uintptr_t>(address), 16).ptr;
+    appendText(out, conversion, {text, static_cast<std::size_t>(end - text)});
 }
 
-} // namespace kestrum
+} // namespace kestrum::formatting

@@ -4,43 +4,13 @@
 #include <concepts>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <string>
 #include <string_view>
 #include <type_traits>
+#include <utility>
 
 namespace kestrum {
-
-/// One argument of `format`, its type erased.
-class FormatArgument {
-public:
-    enum class Kind { Signed, Unsigned, Character, Real, Text, Address };
-
-    constexpr FormatArgument(std::signed_integral auto value) : _kind(Kind::Signed), _signed(value) {}
-    constexpr FormatArgument(std::unsigned_integral auto value) : _kind(Kind::Unsigned), _unsigned(value) {}
-    constexpr FormatArgument(char value) : _kind(Kind::Character), _signed(value) {}
-    constexpr FormatArgument(std::floating_point auto value) : _kind(Kind::Real), _real(value) {}
-    constexpr FormatArgument(std::string_view value) : _kind(Kind::Text), _text(value) {}
-    FormatArgument(const std::string& value) : _kind(Kind::Text), _text(value) {}
-    constexpr FormatArgument(const char* value) : _kind(Kind::Text), _text(value != nullptr ? value : "(null)") {}
-    constexpr FormatArgument(const void* value) : _kind(Kind::Address), _address(value) {}
-
-    constexpr Kind kind() const { return _kind; }
-    constexpr std::int64_t signedValue() const { return _signed; }
-    constexpr std::uint64_t unsignedValue() const { return _unsigned; }
-    constexpr double real() const { return _real; }
-    constexpr std::string_view text() const { return _text; }
-    constexpr const void* address() const { return _address; }
-
-private:
-    Kind _kind;
-    union {
-        std::int64_t _signed;
-        std::uint64_t _unsigned;
-        double _real;
-        std::string_view _text;
-        const void* _address;
-    };
-};
 
 namespace formatting {
 
@@ -115,44 +85,133 @@ constexpr bool fits(const Conversion& conversion)
     }
 }
 
+/// Text under construction: on the stack while it is short, as all display values are.
+class Output {
+public:
+    void append(std::string_view text)
+    {
+        if (_spilled.empty() && text.size() <= sizeof _buffer - _used) {
+            std::memcpy(_buffer + _used, text.data(), text.size());
+            _used += text.size();
+        } else {
+            spill(text);
+        }
+    }
+    std::string_view text() const { return _spilled.empty() ? std::string_view(_buffer, _used) : _spilled; }
+    std::string take() { return _spilled.empty() ? std::string(_buffer, _used) : std::move(_spilled); }
+
+private:
+    void spill(std::string_view text);
+
+    char _buffer[128];
+    std::size_t _used = 0;
+    std::string _spilled;
+};
+
+/// The text before a conversion of a format, or behind the last one.
+struct Plain {
+    std::string_view text;
+    bool percents = false; ///< holds "%%", which stands for a percent sign
+};
+void appendPercents(Output& out, std::string_view text);
+inline void append(Output& out, const Plain& plain)
+{
+    if (plain.percents)
+        appendPercents(out, plain.text);
+    else
+        out.append(plain.text);
+}
+
+void appendSigned(Output& out, const Conversion& conversion, std::int64_t value);
+void appendUnsigned(Output& out, Conversion conversion, std::uint64_t value);
+void appendReal(Output& out, const Conversion& conversion, double value);
+void appendText(Output& out, const Conversion& conversion, std::string_view text);
+void appendAddress(Output& out, const Conversion& conversion, const void* address);
+
+/// Appends an argument that `fits` the conversion.
+template <typename T>
+void appendArgument(Output& out, const Conversion& conversion, const T& value)
+{
+    if constexpr (std::is_same_v<T, char>)
+        appendText(out, conversion, {&value, 1});
+    else if constexpr (std::is_signed_v<T> && std::is_integral_v<T>)
+        appendSigned(out, conversion, value);
+    else if constexpr (std::is_integral_v<T>)
+        appendUnsigned(out, conversion, value);
+    else if constexpr (std::is_floating_point_v<T>)
+        appendReal(out, conversion, value);
+    else if constexpr (std::is_pointer_v<T> && std::is_convertible_v<T, const char*>)
+        appendText(out, conversion, value != nullptr ? value : "(null)");
+    else if constexpr (std::is_convertible_v<T, std::string_view>)
+        appendText(out, conversion, value);
+    else
+        appendAddress(out, conversion, value);
+}
+
 } // namespace formatting
 
-/// A printf format whose arguments the compiler checks.
+/// A printf format that the compiler reads, and whose arguments it checks.
 template <typename... Arguments>
 class FormatString {
 public:
     template <typename Text>
         requires std::convertible_to<const Text&, std::string_view>
-    consteval FormatString(const Text& text) : _text(text)
+    consteval FormatString(const Text& text)
     {
         using Check = bool (*)(const formatting::Conversion&);
         constexpr std::array<Check, sizeof...(Arguments)> checks{
             formatting::fits<std::remove_cvref_t<std::decay_t<Arguments>>>...};
-        std::size_t used = 0;
-        for (std::size_t at = 0; at < _text.size();) {
-            if (_text[at++] != '%')
+        const std::string_view format = text;
+        std::size_t used = 0, begin = 0;
+        for (std::size_t at = 0; at < format.size();) {
+            if (format[at++] != '%')
                 continue;
-            if (at < _text.size() && _text[at] == '%') {
+            if (at < format.size() && format[at] == '%') {
                 ++at;
+                _plain[used].percents = true;
                 continue;
             }
-            const auto conversion = formatting::parse(_text, at);
             if (used == checks.size())
                 throw "the format wants more arguments";
-            if (!checks[used++](conversion))
+            _plain[used].text = format.substr(begin, at - 1 - begin);
+            _conversions[used] = formatting::parse(format, at);
+            begin = at;
+            if (!checks[used](_conversions[used]))
                 throw "the argument does not fit its conversion";
+            ++used;
         }
         if (used != checks.size())
             throw "the format wants fewer arguments";
+        _plain[used].text = format.substr(begin);
     }
 
-    constexpr std::string_view text() const { return _text; }
+    /// As many as conversions, and one behind them.
+    constexpr const formatting::Plain& plain(std::size_t at) const { return _plain[at]; }
+    constexpr const formatting::Conversion& conversion(std::size_t at) const { return _conversions[at]; }
 
 private:
-    std::string_view _text;
+    std::array<formatting::Plain, sizeof...(Arguments) + 1> _plain;
+    std::array<formatting::Conversion, sizeof...(Arguments)> _conversions;
 };
 
-std::string formatArguments(std::string_view format, const FormatArgument* arguments);
+namespace formatting {
+
+template <typename... Arguments>
+Output formatted(const FormatString<std::type_identity_t<Arguments>...>& format, const Arguments&... arguments)
+{
+    Output out;
+    std::size_t at = 0;
+    [[maybe_unused]] const auto appendNext = [&](const auto& argument) {
+        append(out, format.plain(at));
+        appendArgument(out, format.conversion(at), argument);
+        ++at;
+    };
+    (appendNext(arguments), ...);
+    append(out, format.plain(at));
+    return out;
+}
+
+} // namespace formatting
 
 /// printf, checked by the compiler: %d %u %x %c %f %s %p, with "+", "0", width, precision and "l", and "%@"
 /// for the text of an object. Not-a-number has no sign, whatever the platform; a null pointer is "0x0", a null text
@@ -160,8 +219,7 @@ std::string formatArguments(std::string_view format, const FormatArgument* argum
 template <typename... Arguments>
 std::string format(FormatString<std::type_identity_t<Arguments>...> format, const Arguments&... arguments)
 {
-    const std::array<FormatArgument, sizeof...(Arguments) + 1> erased{FormatArgument(arguments)..., FormatArgument(0)};
-    return formatArguments(format.text(), erased.data());
+    return formatting::formatted(format, arguments...).take();
 }
 
 } // namespace kestrum

@@ -78,11 +78,17 @@ public:
         const auto part = slice(field.offset, field.width);
         if (!part)
             return std::nullopt;
+        const auto byte = [&](std::size_t at) { return std::to_integer<std::uint32_t>(part->_bytes[at]); };
         std::uint32_t word = 0;
-        for (std::size_t i = 0; i < field.width; ++i) {
-            const std::size_t place = field.bigEndian ? i : field.width - 1 - i;
-            word = (word << 8) | std::to_integer<std::uint32_t>(part->_bytes[place]);
-        }
+        if (field.bigEndian)
+            for (std::size_t at = 0; at < field.width; ++at)
+                word = (word << 8) | byte(at);
+        else if (field.width == 4) // written out, each is a single load
+            word = byte(0) | (byte(1) << 8) | (byte(2) << 16) | (byte(3) << 24);
+        else if (field.width == 2)
+            word = byte(0) | (byte(1) << 8);
+        else
+            word = byte(0);
         return (word >> field.first) & (0xFFFF'FFFFu >> (31 - (field.last - field.first)));
     }
 

@@ -11,8 +11,15 @@ namespace {
 
 // Below this many keys a look through them is faster than the index.
 constexpr std::size_t kIndexFrom = 48;
-// Lists are rewritten row by row, thousands of times a second: room for the keys of most rows at once.
-constexpr std::size_t kKeysOfARow = 4;
+// Room for the keys of most rows and cells at once.
+constexpr std::size_t kKeysOfARow = 8;
+
+/// Of a container and the reference in hand: whether nobody else holds it.
+template <typename Container>
+bool isAlone(const std::shared_ptr<Container>& container)
+{
+    return container.use_count() == 2;
+}
 
 } // namespace
 
@@ -80,6 +87,12 @@ DictionaryRef Value::dictionary() const
     return held ? *held : nullptr;
 }
 
+const Dictionary* Value::borrowedDictionary() const
+{
+    const auto* held = std::get_if<DictionaryRef>(&_held);
+    return held ? held->get() : nullptr;
+}
+
 std::optional<std::int32_t> Value::int32() const
 {
     if (const auto whole = integer(); whole && *whole >= INT32_MIN && *whole <= INT32_MAX)
@@ -90,12 +103,14 @@ std::optional<std::int32_t> Value::int32() const
     return std::nullopt;
 }
 
-void Value::assignText(std::string_view text)
+void Value::assignText(std::string_view text, Wording wording)
 {
-    if (auto* held = std::get_if<std::string>(&_held))
-        held->assign(text);
-    else
+    _wording = wording;
+    auto* held = std::get_if<std::string>(&_held);
+    if (held == nullptr)
         _held = std::string(text);
+    else
+        held->assign(text);
 }
 
 bool operator==(const Value& left, const Value& right)
@@ -159,6 +174,36 @@ std::string_view nameOf(Value::Kind kind)
     return "unknown";
 }
 
+Value& Array::added()
+{
+    if (_size == _elements.size())
+        _elements.emplace_back();
+    return _elements[_size++];
+}
+
+void Array::append(Value element)
+{
+    added() = std::move(element);
+}
+
+void Array::appendText(std::string_view text)
+{
+    added().assignText(text);
+}
+
+Dictionary& Array::appendRow()
+{
+    Value& row = added();
+    auto dictionary = row.dictionary();
+    if (dictionary && isAlone(dictionary)) {
+        dictionary->clear();
+    } else {
+        dictionary = makeDictionary();
+        row = dictionary;
+    }
+    return *dictionary;
+}
+
 Dictionary::Dictionary(std::initializer_list<Entry> entries)
 {
     for (const auto& [key, value] : entries)
@@ -167,20 +212,20 @@ Dictionary::Dictionary(std::initializer_list<Entry> entries)
 
 std::size_t Dictionary::indexOf(std::string_view key) const
 {
-    const auto found = [this](std::size_t at) {
-        _next = at + 1;
-        return at;
-    };
-    if (_next < _entries.size() && _entries[_next].key == key)
-        return found(_next);
-    if (!_index.empty()) {
+    std::size_t at = 0;
+    if (_next < _size && _entries[_next].key == key) {
+        at = _next;
+    } else if (!_index.empty()) {
         const auto known = _index.find(key);
-        return known == _index.end() ? kNotThere : found(known->second);
+        at = known == _index.end() ? _size : known->second;
+    } else {
+        while (at < _size && _entries[at].key != key)
+            ++at;
     }
-    for (std::size_t at = 0; at < _entries.size(); ++at)
-        if (_entries[at].key == key)
-            return found(at);
-    return kNotThere;
+    if (at == _size)
+        return kNotThere;
+    _next = at + 1;
+    return at;
 }
 
 const Value* Dictionary::find(std::string_view key) const
@@ -195,26 +240,43 @@ Value Dictionary::at(std::string_view key) const
     return found ? *found : Value();
 }
 
-Value& Dictionary::slot(std::string_view key)
+Array& Dictionary::setArray(std::string_view key)
 {
-    std::size_t at = indexOf(key);
-    if (at == kNotThere) {
-        at = _entries.size();
-        if (at == 0)
-            _entries.reserve(kKeysOfARow);
-        _entries.push_back({std::string(key), Value()});
-        index(at);
+    Value& value = slot(key);
+    auto array = value.array();
+    if (array && isAlone(array)) {
+        array->clear();
+    } else {
+        array = makeArray();
+        value = array;
     }
-    return _entries[at].value;
+    return *array;
 }
 
-void Dictionary::index(std::size_t entry)
+Value& Dictionary::slot(std::string_view key)
 {
-    if (!_index.empty())
-        _index.emplace(_entries[entry].key, entry);
-    else if (_entries.size() > kIndexFrom)
-        for (std::size_t at = 0; at < _entries.size(); ++at)
-            _index.emplace(_entries[at].key, at);
+    // Mostly it is the entry behind the last one, or the first of the spares.
+    const bool expected = _next <= _size && _next < _entries.size() && _entries[_next].key == key;
+    if (expected && _next < _size)
+        return _entries[_next++].value;
+    if (!expected) {
+        if (const std::size_t at = indexOf(key); at != kNotThere)
+            return _entries[at].value;
+        _entries.erase(end(), _entries.end()); // one of the spares may have this key
+        if (_entries.empty())
+            _entries.reserve(kKeysOfARow);
+        _entries.push_back({std::string(key), Value()});
+    }
+    _next = ++_size;
+    if (_size > kIndexFrom)
+        index();
+    return _entries[_size - 1].value;
+}
+
+void Dictionary::index()
+{
+    for (std::size_t at = _index.size(); at < _size; ++at)
+        _index.emplace(_entries[at].key, at);
 }
 
 void Dictionary::remove(std::string_view key)
@@ -223,17 +285,19 @@ void Dictionary::remove(std::string_view key)
     if (at == kNotThere)
         return;
     _entries.erase(begin() + static_cast<std::ptrdiff_t>(at));
+    --_size;
     _next = 0;
     _index.clear();
-    if (!_entries.empty())
-        index(_entries.size() - 1);
+    if (_size > kIndexFrom)
+        index();
 }
 
 void Dictionary::clear()
 {
-    _entries.clear();
-    _index.clear();
+    _size = 0;
     _next = 0;
+    if (!_index.empty())
+        _index.clear();
 }
 
 ArrayRef makeArray(std::vector<Value> elements)

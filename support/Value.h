@@ -25,6 +25,14 @@ class Dictionary;
 using ArrayRef = std::shared_ptr<Array>;
 using DictionaryRef = std::shared_ptr<Dictionary>;
 
+/// What a text was made of: a raw value, by a function. Equal wordings give equal texts.
+struct Wording {
+    const void* function = nullptr; ///< only compared
+    std::uint32_t raw = 0;
+
+    friend bool operator==(const Wording&, const Wording&) = default;
+};
+
 /// A node of the display, of a template, of the generator state or of a property list.
 /// Arrays and dictionaries have identity: copies of the Value share the container. All else is a plain value.
 class Value {
@@ -67,12 +75,17 @@ public:
     const Data* data() const { return std::get_if<Data>(&_held); }
     ArrayRef array() const;
     DictionaryRef dictionary() const;
+    /// The same, borrowed from the value.
+    const Dictionary* borrowedDictionary() const;
 
     /// A 32-bit number: an integer in range, or a real without fraction in range. A boolean is no number.
     std::optional<std::int32_t> int32() const;
 
     /// Makes this a string, reusing the storage of the one it holds.
-    void assignText(std::string_view text);
+    void assignText(std::string_view text, Wording wording = {});
+    /// Whether it is the text that was assigned with this wording: then nothing has to be worded anew. Most fields of
+    /// most records have not changed since the last one.
+    bool isWorded(const Wording& wording) const { return wording == _wording; }
 
     /// Equal kind and contents, containers compared element by element (dictionaries without regard to order).
     /// Not for self-referring structures.
@@ -82,42 +95,54 @@ private:
     std::variant<std::monostate, std::string, std::int64_t, std::uint64_t, double, bool, Date, Data, ArrayRef,
                  DictionaryRef>
         _held;
+    Wording _wording;
 };
 
 /// The kind's name as it is put into messages: "string", "integer", ...
 std::string_view nameOf(Value::Kind kind);
 
-/// Values in order.
+/// Values in order. `clear` keeps what stood there, as spares: `appendRow` and `appendText` then fill the same storage
+/// again. Lists are rewritten thousands of times a second, mostly with as much as before.
 class Array {
 public:
     Array() = default;
-    Array(std::initializer_list<Value> elements) : _elements(elements) {}
-    explicit Array(std::vector<Value> elements) : _elements(std::move(elements)) {}
+    Array(std::initializer_list<Value> elements) : _elements(elements), _size(elements.size()) {}
+    explicit Array(std::vector<Value> elements) : _elements(std::move(elements)), _size(_elements.size()) {}
+    Array(const Array&) = default; // and no move, which would leave a size without elements
+    Array& operator=(const Array&) = default;
 
-    std::size_t size() const { return _elements.size(); }
-    bool empty() const { return _elements.empty(); }
-    void clear() { _elements.clear(); }
+    std::size_t size() const { return _size; }
+    bool empty() const { return _size == 0; }
+    void clear() { _size = 0; }
     void reserve(std::size_t count) { _elements.reserve(count); }
-    void append(Value element) { _elements.push_back(std::move(element)); }
+    void append(Value element);
+    void appendText(std::string_view text);
+    /// Appends a dictionary without entries: a spare one, unless somebody else still holds it.
+    Dictionary& appendRow();
     /// `count` is not above `size()`.
     void removeFirst(std::size_t count)
     {
         _elements.erase(_elements.begin(), _elements.begin() + static_cast<std::ptrdiff_t>(count));
+        _size -= count;
     }
     const Value& operator[](std::size_t index) const { return _elements[index]; }
     Value& operator[](std::size_t index) { return _elements[index]; }
-    const Value& back() const { return _elements.back(); }
+    const Value& back() const { return _elements[_size - 1]; }
 
     auto begin() const { return _elements.begin(); }
-    auto end() const { return _elements.end(); }
+    auto end() const { return _elements.begin() + static_cast<std::ptrdiff_t>(_size); }
     auto begin() { return _elements.begin(); }
-    auto end() { return _elements.end(); }
+    auto end() { return _elements.begin() + static_cast<std::ptrdiff_t>(_size); }
 
 private:
-    std::vector<Value> _elements;
+    Value& added();
+
+    std::vector<Value> _elements; ///< the spares behind the others
+    std::size_t _size = 0;
 };
 
-/// Values under string keys, in the order in which the keys first came.
+/// Values under string keys, in the order in which the keys first came. `clear` keeps the entries as spares; keys that
+/// come again in their order find their storage.
 class Dictionary {
 public:
     struct Entry {
@@ -127,9 +152,11 @@ public:
 
     Dictionary() = default;
     Dictionary(std::initializer_list<Entry> entries);
+    Dictionary(const Dictionary&) = default; // and no move, which would leave a size without entries
+    Dictionary& operator=(const Dictionary&) = default;
 
-    std::size_t size() const { return _entries.size(); }
-    bool empty() const { return _entries.empty(); }
+    std::size_t size() const { return _size; }
+    bool empty() const { return _size == 0; }
 
     /// The value under `key`, null when there is none.
     const Value* find(std::string_view key) const;
@@ -142,22 +169,32 @@ public:
     void set(std::string_view key, Value value) { slot(key) = std::move(value); }
     /// As `set`, without allocating when a text of that length stands there already.
     void setText(std::string_view key, std::string_view text) { slot(key).assignText(text); }
+    /// As `set` with a text: `word` makes it and assigns it to the value it is given, unless it stands there already.
+    template <std::invocable<Value&> Word>
+    void setWorded(std::string_view key, const Wording& wording, Word word)
+    {
+        if (Value& value = slot(key); !value.isWorded(wording))
+            word(value);
+    }
+    /// Sets an empty array: the one that stands there, unless somebody else still holds it.
+    Array& setArray(std::string_view key);
     void remove(std::string_view key);
     void clear();
 
     auto begin() const { return _entries.begin(); }
-    auto end() const { return _entries.end(); }
+    auto end() const { return _entries.begin() + static_cast<std::ptrdiff_t>(_size); }
     auto begin() { return _entries.begin(); }
-    auto end() { return _entries.end(); }
+    auto end() { return _entries.begin() + static_cast<std::ptrdiff_t>(_size); }
 
 private:
     static constexpr std::size_t kNotThere = static_cast<std::size_t>(-1);
 
     std::size_t indexOf(std::string_view key) const;
     Value& slot(std::string_view key);
-    void index(std::size_t entry);
+    void index();
 
-    std::vector<Entry> _entries;
+    std::vector<Entry> _entries; ///< the spares behind the others; no two keys are equal
+    std::size_t _size = 0;
     // Decoders set their keys in the same order each time, so the entry behind the last one found is tried first.
     mutable std::size_t _next = 0;
     // Kept beyond a few dozen keys only: property lists from outside may hold many thousands. Sorted, for keys can be

@@ -82,7 +82,7 @@ void KestrumSaveViewController::savePressed()
         {{"Timestamp", dateText(_timeStamp)}, {"Data", _saveHistory}, {"Description", text ? Value(*text) : Value()}});
     const std::string path = snapshotPath(_roles.files, _roles.clock.now());
     if (!_roles.propertyLists.write(*snapshot, path)) {
-        _roles.log.write(Priority::Error, format("Unable to write snapshot to %s", path));
+        _roles.log.write(Priority::Error, "Unable to write snapshot to %s", path);
         _roles.toolkit.showAlert("File Error", "Unable to write file to disk", "Close");
     }
     postClose();

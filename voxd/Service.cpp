@@ -64,7 +64,7 @@ std::string Service::start()
 void Service::acceptConnection(std::unique_ptr<FrameConnection> connection)
 {
     if (_connections.size() == kMaximumConnections) {
-        _log.write(Priority::Error, format("refused a server connection: %lu stand already", _connections.size()));
+        _log.write(Priority::Error, "refused a server connection: %lu stand already", _connections.size());
         return;
     }
     const auto place = _connections.insert(_connections.end(), std::move(connection));
@@ -92,7 +92,7 @@ void Service::serve(FrameConnection& connection, Connections::iterator place)
 LogChannelAnswer Service::createLogChannel(std::string_view address)
 {
     const auto failed = [&](std::int32_t code, const char* why) {
-        _log.write(Priority::Error, format("refused a log channel to \"%s\": %s", address.substr(0, 200), why));
+        _log.write(Priority::Error, "refused a log channel to \"%s\": %s", address.substr(0, 200), why);
         return LogChannelAnswer{vox::kServiceErrors, code, std::nullopt};
     };
     if (!isPortName(address))
@@ -181,7 +181,7 @@ void Service::streamDue()
 void Service::changeTechnology()
 {
     _technology = _nextTechnology;
-    _log.write(Priority::Notice, format("the technology is now %s", _technology));
+    _log.write(Priority::Notice, "the technology is now %s", _technology);
     for (const auto& connection : _connections)
         connection->send({Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
     retire(_channels.begin(), _channels.end());

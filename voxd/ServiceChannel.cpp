@@ -24,7 +24,7 @@ ServiceChannel::ServiceChannel(const Host& host, std::unique_ptr<FrameConnection
     _listener.accepted = [this](auto connection) { accept(std::move(connection)); };
     _commandTimeout.setSingleShot(true);
     QObject::connect(&_commandTimeout, &QTimer::timeout, &_commandTimeout, [this] {
-        _host.log.write(Priority::Warning, format("Channel %s: nobody came to its command port", _name));
+        _host.log.write(Priority::Warning, "Channel %s: nobody came to its command port", _name);
         end();
     });
 }
@@ -32,8 +32,8 @@ ServiceChannel::ServiceChannel(const Host& host, std::unique_ptr<FrameConnection
 ServiceChannel::~ServiceChannel()
 {
     if (_outbox.dropped() > _reportedDrops)
-        _host.log.write(Priority::Warning, format("Channel %s: its client did not read, %lu messages were dropped",
-                                                  _name, _outbox.dropped() - _reportedDrops));
+        _host.log.write(Priority::Warning, "Channel %s: its client did not read, %lu messages were dropped", _name,
+                        _outbox.dropped() - _reportedDrops);
 }
 
 std::string ServiceChannel::listen(const std::string& path)
@@ -72,8 +72,8 @@ void ServiceChannel::obey(const Frame& frame)
         return;
     const auto command = _host.lists.parse(frame.payload).dictionary();
     if (!command) {
-        _host.log.write(Priority::Error,
-                        format("Channel %s: a command that is no dictionary (%lu bytes)", _name, frame.payload.size()));
+        _host.log.write(Priority::Error, "Channel %s: a command that is no dictionary (%lu bytes)", _name,
+                        frame.payload.size());
         return;
     }
     if (command->contains("GetTechnology") && frame.kind == Frame::Kind::Request) {
@@ -97,8 +97,7 @@ void ServiceChannel::stream(const Data& message)
     const std::size_t before = _outbox.dropped();
     _outbox.add(message);
     if (_outbox.dropped() > before && !std::exchange(_dropping, true))
-        _host.log.write(Priority::Warning,
-                        format("Channel %s: its client does not read, the oldest messages go", _name));
+        _host.log.write(Priority::Warning, "Channel %s: its client does not read, the oldest messages go", _name);
     flush();
 }
 

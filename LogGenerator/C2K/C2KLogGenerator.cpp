@@ -53,7 +53,7 @@ void C2KLogGenerator::updateFromLog(Bytes message, const DictionaryRef& usingLoo
         return;
     // Logged, and routed by its code all the same, on purpose.
     if (read->type != ChannelMessage::kOrdinary)
-        _roles.log.write(Priority::Error, format("Invalid log type: %x. Dropping.", read->type));
+        _roles.log.write(Priority::Error, "Invalid log type: %x. Dropping.", read->type);
     const auto* decoder = std::ranges::find(kDecoders, read->logCode, &Decoder::code);
     if (decoder == std::end(kDecoders))
         return;

@@ -5,26 +5,39 @@
 
 namespace kestrum {
 
-void C2KContext::publish(std::string_view identifier, const Value& value) const
+template <typename Set>
+void C2KContext::atPlacesOf(std::string_view identifier, Set set) const
 {
-    const auto places = _lookup ? _lookup->at(identifier).array() : nullptr;
+    const Value* found = _lookup ? _lookup->find(identifier) : nullptr;
+    const auto places = found != nullptr ? found->array() : nullptr;
     if (!places)
         return;
     for (const auto& place : *places) {
         const auto entry = place.dictionary();
-        const auto dictionary = entry ? entry->at("dict").dictionary() : nullptr;
-        const Value key = entry ? entry->at("key") : Value();
-        if (!dictionary || key.string() == nullptr)
+        const Value* node = entry ? entry->find("dict") : nullptr;
+        const Value* key = entry ? entry->find("key") : nullptr;
+        const auto dictionary = node != nullptr ? node->dictionary() : nullptr;
+        if (!dictionary || key == nullptr || key->string() == nullptr)
             return;
-        dictionary->set(*key.string(), value);
+        set(*dictionary, *key->string());
     }
+}
+
+void C2KContext::publish(std::string_view identifier, std::string_view text) const
+{
+    atPlacesOf(identifier, [text](Dictionary& node, const std::string& key) { node.setText(key, text); });
+}
+
+void C2KContext::publish(std::string_view identifier, const DictionaryRef& list) const
+{
+    atPlacesOf(identifier, [&list](Dictionary& node, const std::string& key) { node.set(key, list); });
 }
 
 void C2KContext::publish(Record record, std::span<const Row> rows) const
 {
     for (const auto& row : rows)
         if (const auto raw = record.read(row.field))
-            row.conversion.apply(*raw, [&](std::string_view text) { publish(row.key, text); });
+            atPlacesOf(row.key, [&](Dictionary& node, const std::string& key) { row.conversion.set(node, key, *raw); });
 }
 
 void C2KContext::rejectLength(std::string_view line) const

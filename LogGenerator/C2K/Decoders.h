@@ -19,8 +19,9 @@ public:
         : state(runState), log(roles.log), _lookup(places), _watch(roles.watch)
     {}
 
-    /// Sets the value at all places of the identifier, up to the first that is none.
-    void publish(std::string_view identifier, const Value& value) const;
+    /// Sets the text, or the list, at all places of the identifier, up to the first that is none.
+    void publish(std::string_view identifier, std::string_view text) const;
+    void publish(std::string_view identifier, const DictionaryRef& list) const;
     /// The rows' keys are the identifiers.
     void publish(Record record, std::span<const Row> rows) const;
 
@@ -31,6 +32,9 @@ public:
     SystemLog& log;
 
 private:
+    template <typename Set>
+    void atPlacesOf(std::string_view identifier, Set set) const;
+
     DictionaryRef _lookup;
     RecordWatch* _watch;
 };

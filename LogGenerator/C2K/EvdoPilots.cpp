@@ -48,7 +48,7 @@ DictionaryRef strengths(Record record, const PilotList& list, std::uint32_t coun
 void publishPilots(C2KContext& context, std::string_view identifier, const DictionaryRef& pilots)
 {
     if (pilots->size() > 1)
-        context.publish(identifier, Value(pilots));
+        context.publish(identifier, pilots);
     else
         context.publish(identifier, "(none)");
 }

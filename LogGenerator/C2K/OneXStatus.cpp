@@ -112,8 +112,8 @@ void decodeOneXStatus(Record record, C2KContext& context)
     const auto activeSet = findSubpacket(record, kActiveSet, context.log);
     const auto fingers = findSubpacket(record, kFingers, context.log); // has to be there, though nothing of it is read
     if (!state || !rf || !activeSet || !fingers) {
-        context.log.write(Priority::Warning, format("Log code 0x119c: missing subpacket (ss=%d,rf=%d,ai=%d,fi=%d).",
-                                                    state ? 1 : 0, rf ? 1 : 0, activeSet ? 1 : 0, fingers ? 1 : 0));
+        context.log.write(Priority::Warning, "Log code 0x119c: missing subpacket (ss=%d,rf=%d,ai=%d,fi=%d).",
+                          state ? 1 : 0, rf ? 1 : 0, activeSet ? 1 : 0, fingers ? 1 : 0);
         return;
     }
     const auto deviceStateNow = state->read(kDeviceState);
@@ -128,7 +128,7 @@ void decodeOneXStatus(Record record, C2KContext& context)
     else
         for (const auto& row : kChain1)
             context.publish(row.key, "N/A");
-    context.publish("k1xActiveSetInfo", Value(pilots(*activeSet)));
+    context.publish("k1xActiveSetInfo", pilots(*activeSet));
 
     // The last call's frame errors, once, after it ended.
     if (const auto ratio = context.state.at("TrafficFER").real(); ratio && !inTraffic) {

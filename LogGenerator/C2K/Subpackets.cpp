@@ -26,8 +26,8 @@ std::optional<Record> findSubpacket(Record record, std::uint32_t identifier, Sys
         // The bound lies 17 bytes beyond the record's end, and comes before the identifier; both are meant so. The
         // reader keeps every read inside the record.
         if (start + *size >= kSubpacketsStart + record.size()) {
-            log.write(Priority::Error, format("Log code error in subpkt#%d: bad size (%d).",
-                                              static_cast<std::int32_t>(index), static_cast<std::int32_t>(*size)));
+            log.write(Priority::Error, "Log code error in subpkt#%d: bad size (%d).", static_cast<std::int32_t>(index),
+                      static_cast<std::int32_t>(*size));
             return std::nullopt;
         }
         if (subpacket->read(kIdentifier) == identifier)

@@ -60,8 +60,8 @@ void decodeSystemIdentity(Record record, C2KContext& context)
     const auto version = record.read(kVersion).value_or(0);
     if (version < kFirstVersion) {
         context.log.write(Priority::Error,
-                          format("Log code 0x134f has version=%d; only version 2 or higher expected; dropping.",
-                                 static_cast<std::int32_t>(version)));
+                          "Log code 0x134f has version=%d; only version 2 or higher expected; dropping.",
+                          static_cast<std::int32_t>(version));
         return;
     }
     context.publish(record, kRoaming);

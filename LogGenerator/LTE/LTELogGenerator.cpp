@@ -23,7 +23,7 @@ LTELogGenerator::LTELogGenerator(DecodingRoles& roles)
 
 LTELogGenerator::~LTELogGenerator()
 {
-    _roles.log.write(Priority::Warning, format("LTELogGenerator is destructed %p", _roles.log.shownAddress(this)));
+    _roles.log.write(Priority::Warning, "LTELogGenerator is destructed %p", _roles.log.shownAddress(this));
 }
 
 std::unique_ptr<LTELogGenerator> LTELogGenerator::generator(DecodingRoles& roles)

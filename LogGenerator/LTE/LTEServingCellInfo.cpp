@@ -85,7 +85,7 @@ void LTEServingCellInfo::updateWithData(Record data, LogCode logCode)
             node->remove("UARFCN");
         return;
     case 0xFF0001:
-        return showServingCell(data, {kVoxCellTechnology_LTE}, kMonitoredCell, sectionRef.dictionary(), roles);
+        return showServingCell(data, {kVoxCellTechnology_LTE}, kMonitoredCell, sectionRef.dictionary().get(), roles);
     default:
         reportUnknown(logCode);
     }

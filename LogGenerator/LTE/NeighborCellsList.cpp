@@ -67,22 +67,21 @@ void NeighborCellsList::updateWithData(Record data, LogCode logCode)
         return;
     clearElementsInArray(sectionRef);
     const std::uint32_t count = data.read(kCountLessOne).value_or(0) + 1;
-    roles.log.write(Priority::Warning,
-                    format("Number of neighboring cells being reported: %d\n", static_cast<std::int32_t>(count)));
-    replaceArray(sectionRef, listed(data, kCells, count, [this](Record cell) {
+    roles.log.write(Priority::Warning, "Number of neighboring cells being reported: %d\n",
+                    static_cast<std::int32_t>(count));
+    replaceArray(sectionRef, listed(data, kCells, count, [this](Record cell, Dictionary& row) {
                      logMeasurements(cell);
-                     return Value(shown(cell, kCell));
+                     show(cell, kCell, row);
                  }));
 }
 
 void NeighborCellsList::logMeasurements(Record cell) const
 {
     const auto raw = [cell](Field field) { return cell.read(field).value_or(0); };
-    roles.log.write(Priority::Warning,
-                    format("Physical Cell ID: %d\n", static_cast<std::int32_t>(raw(kPhysicalCellId))));
+    roles.log.write(Priority::Warning, "Physical Cell ID: %d\n", static_cast<std::int32_t>(raw(kPhysicalCellId)));
     // One label for RSSI, RSRP and RSRQ alike, on purpose.
     for (const auto& [field, quantity] : kLogged)
-        roles.log.write(Priority::Warning, format("Measured RSSI: %lf\n", quantity(raw(field))));
+        roles.log.write(Priority::Warning, "Measured RSSI: %lf\n", quantity(raw(field)));
 }
 
 } // namespace kestrum

@@ -49,19 +49,20 @@ constexpr struct Rat {
 // clang-format on
 constexpr Rat kUnknownRat{"??", {}};
 
-/// The row of the candidate that begins with these bytes; null unless all of its fields are there.
-DictionaryRef shownCandidate(Record candidate)
+/// Appends the row of the candidate that begins with these bytes; false unless all of its fields are there.
+bool appendCandidate(Array& list, Record candidate)
 {
     const auto type = candidate.read(kRatType);
     if (!type)
-        return nullptr;
+        return false;
     const Rat& rat = *type < std::size(kRats) ? kRats[*type] : kUnknownRat;
     if (candidate.size() < std::max(kHeaderSize, reach(rat.payload)))
-        return nullptr;
-    auto row = shown(candidate, kPriority);
-    row->setText("Candidate RAT Type", rat.name);
-    show(candidate, rat.payload, *row);
-    return row;
+        return false;
+    Dictionary& row = list.appendRow();
+    show(candidate, kPriority, row);
+    row.setText("Candidate RAT Type", rat.name);
+    show(candidate, rat.payload, row);
+    return true;
 }
 
 } // namespace
@@ -81,16 +82,14 @@ void ReselectionCandidatesList::updateWithData(Record data, LogCode logCode)
     if (!accepts(data, logCode, 0xB186, kMinimumLength))
         return;
     clearElementsInArray(sectionRef);
-    std::vector<Value> candidates;
     const std::size_t count = data.read(kCount).value_or(0);
-    for (std::size_t i = 0; i < count; ++i) {
-        const auto rest = data.from(kFirst + kStride * i);
-        auto candidate = rest ? shownCandidate(*rest) : nullptr;
-        if (!candidate)
-            break; // The count may promise more candidates than the record holds.
-        candidates.emplace_back(std::move(candidate));
-    }
-    replaceArray(sectionRef, std::move(candidates));
+    replaceArray(sectionRef, [&](Array& list) {
+        for (std::size_t i = 0; i < count; ++i) {
+            const auto rest = data.from(kFirst + kStride * i);
+            if (!rest || !appendCandidate(list, *rest))
+                break; // the count may promise more candidates than the record holds
+        }
+    });
 }
 
 } // namespace kestrum

@@ -24,12 +24,15 @@ constexpr Elements kSirs{2, 1};
 constexpr std::size_t kSirCount = 6;
 static_assert(kSirs.first + kSirs.stride * kSirCount == entries(0).length);
 
-Value shownEntry(Record entry)
+std::string sir(Record entry)
 {
-    auto row = shown(entry, kEntry);
-    row->set("SIR", makeArray(listed(entry, kSirs, kSirCount,
-                                     [](Record sir) { return Value(decimal(sir.read(u8(0)).value_or(0))); })));
-    return row;
+    return decimal(entry.read(u8(0)).value_or(0));
+}
+
+void showEntry(Record entry, Dictionary& row)
+{
+    show(entry, kEntry, row);
+    listed(entry, kSirs, kSirCount, sir)(row.setArray("SIR"));
 }
 
 } // namespace
@@ -50,7 +53,7 @@ void CCTRCHSIRMeasurement::updateWithData(Record data, LogCode logCode)
         return;
     clearElementsInArray(sectionRef);
     const auto channels = data.read(kTransportChannels).value_or(0);
-    replaceArray(sectionRef, listed(data, entries(channels), data.read(kCount).value_or(0), shownEntry));
+    replaceArray(sectionRef, listed(data, entries(channels), data.read(kCount).value_or(0), showEntry));
 }
 
 } // namespace kestrum

@@ -40,8 +40,8 @@ void RRC_State::updateWithData(Record data, LogCode logCode)
         return;
     // A short record is decoded all the same, on purpose: without a mode it says that the mode is not known.
     if (data.size() < kExpectedLength)
-        roles.log.write(Priority::Warning, format("LogCode_0xD0E0 is length is %ld expected size %ld",
-                                                  static_cast<long>(data.size()), static_cast<long>(kExpectedLength)));
+        roles.log.write(Priority::Warning, "LogCode_0xD0E0 is length is %ld expected size %ld",
+                        static_cast<long>(data.size()), static_cast<long>(kExpectedLength));
     const std::uint32_t mode = modeOf(data);
     const std::string_view name = mode < std::size(kModeNames) ? kModeNames[mode] : "Unknown RRC Mode";
     publish("State", name);

@@ -40,12 +40,11 @@ constexpr Row kCell[] = {
 // clang-format on
 static_assert(reach(kCell) == kCells.length);
 
-Value shownCell(Record cell)
+void showCell(Record cell, Dictionary& row)
 {
-    auto row = shown(cell, kCell);
+    show(cell, kCell, row);
     if (cell.read(kCellSet) == kNoCellSet)
-        row->remove("Status");
-    return row;
+        row.remove("Status");
 }
 
 } // namespace
@@ -65,7 +64,7 @@ void UTRANNeighbhorMeasurements::updateWithData(Record data, LogCode logCode)
     if (!accepts(data, logCode, 0xD00A, kMinimumLength, Foreign::Ignored))
         return;
     clearElementsInArray(sectionRef);
-    replaceArray(sectionRef, listed(data, kCells, data.read(kCount).value_or(0), shownCell));
+    replaceArray(sectionRef, listed(data, kCells, data.read(kCount).value_or(0), showCell));
 }
 
 } // namespace kestrum

@@ -28,14 +28,20 @@ int receivedPower(std::int16_t agc)
     return (agc + 512) / 10 - 106; // truncated toward zero
 }
 
-Value rowOf(Record cell, Record measurement, int power)
+std::string decibels(std::uint32_t raw)
+{
+    return format("%d dB", static_cast<std::int32_t>(raw));
+}
+
+constexpr Conversion kNumber = decimal, kDecibels = decibels;
+
+void showCell(Record cell, Record measurement, int power, Dictionary& row)
 {
     const int energyPerChip = Base::lookUpECNO(energyOf(measurement));
-    return makeDictionary({
-        {"Scrambling Code", decimal(cell.read(kScramblingCode).value_or(0))},
-        {"RSCP", format("%d dB", power + energyPerChip)}, // "dB", though it is in dBm: kept on purpose
-        {"Energy Per Chip", format("%d dB", energyPerChip)},
-    });
+    kNumber.set(row, "Scrambling Code", cell.read(kScramblingCode).value_or(0));
+    // "dB", though it is in dBm: kept on purpose.
+    kDecibels.set(row, "RSCP", static_cast<std::uint32_t>(power + energyPerChip));
+    kDecibels.set(row, "Energy Per Chip", static_cast<std::uint32_t>(energyPerChip));
 }
 
 } // namespace
@@ -58,16 +64,16 @@ void ActiveSet::updateWithData(Record data, LogCode logCode)
     const std::size_t count = data.read(searcher::kCount).value_or(0);
     const Elements measurements{searcher::kCells.first + searcher::kCells.stride * count, searcher::kMeasurementSize};
 
-    std::vector<Value> rows;
-    for (std::size_t i = 0; i < count; ++i) {
-        const auto cell = elementOf(data, searcher::kCells, i);
-        const auto measurement = elementOf(data, measurements, i);
-        if (!cell || !measurement)
-            break;
-        if (cell->read(kSetMembership) == kActive)
-            rows.push_back(rowOf(*cell, *measurement, power));
-    }
-    replaceArray(sectionRef, std::move(rows));
+    replaceArray(sectionRef, [&](Array& list) {
+        for (std::size_t i = 0; i < count; ++i) {
+            const auto cell = elementOf(data, searcher::kCells, i);
+            const auto measurement = elementOf(data, measurements, i);
+            if (!cell || !measurement)
+                break;
+            if (cell->read(kSetMembership) == kActive)
+                showCell(*cell, *measurement, power, list.appendRow());
+        }
+    });
 }
 
 } // namespace kestrum

@@ -35,7 +35,7 @@ void BLER::updateWithData(Record data, LogCode logCode)
     if (!accepts(data, logCode, kCode, kMinimumLength))
         return;
     publish(data, kWindow);
-    publish("Transport Channels", makeArray(listed(data, kChannels, data.read(kCount).value_or(0), kChannel)));
+    publish("Transport Channels", listed(data, kChannels, data.read(kCount).value_or(0), kChannel));
 }
 
 } // namespace kestrum

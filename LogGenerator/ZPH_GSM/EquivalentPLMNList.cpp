@@ -20,12 +20,10 @@ std::string number(Record network, std::size_t first)
 }
 
 /// The digits of both numbers take turns.
-Value rowOf(Record network)
+void showNetwork(Record network, Dictionary& row)
 {
-    return makeDictionary({
-        {"Mobile Country Code", number(network, 0)},
-        {"Mobile Network Code", number(network, 1)},
-    });
+    row.setText("Mobile Country Code", number(network, 0));
+    row.setText("Mobile Network Code", number(network, 1));
 }
 
 } // namespace
@@ -43,7 +41,7 @@ std::vector<LogCode> EquivalentPLMNList::getLogCodeArray() const
 void EquivalentPLMNList::updateWithData(Record data, LogCode logCode)
 {
     if (accepts(data, logCode, kCode, kMinimumLength))
-        replaceArray(sectionRef, listed(data, kNetworks, data.read(kCount).value_or(0), rowOf));
+        replaceArray(sectionRef, listed(data, kNetworks, data.read(kCount).value_or(0), showNetwork));
 }
 
 } // namespace kestrum

@@ -54,9 +54,9 @@ void HSDPAInformation::updateWithData(Record data, LogCode logCode)
     const std::size_t secondary = data.read(kSecondaryCount).value_or(0);
     const Elements behind{kPrimary.first + kRoomForPrimary * primary, kPrimary.stride};
     if (primary != 0)
-        publish("Primary HARQ Process", makeArray(listed(data, kPrimary, primary, kProcess)));
+        publish("Primary HARQ Process", listed(data, kPrimary, primary, kProcess));
     if (secondary != 0)
-        publish("Secondary HARQ Process", makeArray(listed(data, behind, secondary, kProcess)));
+        publish("Secondary HARQ Process", listed(data, behind, secondary, kProcess));
 }
 
 } // namespace kestrum

@@ -10,7 +10,7 @@ constexpr Row kHopping[] = {{u8(13), "HSN", decimal}};
 constexpr Field kCount = u8(14);
 constexpr Elements kArfcns{15, 2};
 
-Value arfcn(Record entry)
+std::string arfcn(Record entry)
 {
     return decimal(entry.read(u16(0)).value_or(0));
 }
@@ -32,7 +32,7 @@ void MobileAllocation::updateWithData(Record data, LogCode logCode)
     if (!accepts(data, logCode, kCode, kMinimumLength))
         return;
     publish(data, kHopping);
-    publish("ARFCNs", makeArray(listed(data, kArfcns, data.read(kCount).value_or(0), arfcn)));
+    publish("ARFCNs", listed(data, kArfcns, data.read(kCount).value_or(0), arfcn));
 }
 
 } // namespace kestrum

@@ -26,6 +26,8 @@ constexpr Field kColourCodeCount = u8(14);
 constexpr Elements kColoured{15, 4};
 constexpr Field kBsic = u8(2);
 
+constexpr Conversion kNumber = decimal;
+
 std::string level(std::uint32_t raw)
 {
     constexpr std::int16_t kNotMeasured = 32767;
@@ -63,7 +65,8 @@ void NeighboringCells::updateWithData(Record data, LogCode logCode)
         learnColourCodes(data);
         break;
     case kCellMonitor:
-        replaceArray(sectionRef, listedNeighbors(data, kVoxCellTechnology_GSM, kMonitoredCell, roles));
+        replaceArray(sectionRef,
+                     [&](Array& list) { appendNeighbors(list, data, kVoxCellTechnology_GSM, kMonitoredCell, roles); });
         break;
     default:
         reportUnknown(logCode);
@@ -88,11 +91,10 @@ void NeighboringCells::listMeasurements(Record data) const
 {
     if (!holds(data, kMeasurementsLength))
         return;
-    const auto measured = [this](Record cell) {
-        auto row = shown(cell, kMeasuredCell);
+    const auto measured = [this](Record cell, Dictionary& row) {
+        show(cell, kMeasuredCell, row);
         if (const auto known = arfcnToBsic.find(cell.read(kArfcn).value_or(0)); known != arfcnToBsic.end())
-            row->set("BSIC", decimal(known->second));
-        return Value(std::move(row));
+            kNumber.set(row, "BSIC", known->second);
     };
     replaceArray(sectionRef, listed(data, kMeasured, data.read(kMeasurementCount).value_or(0), measured));
 }

@@ -86,7 +86,8 @@ void ServingPLMN::updateWithData(Record data, LogCode logCode)
 {
     logEntry();
     if (logCode == kCellMonitor)
-        showServingCell(data, {kVoxCellTechnology_GSM, kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
+        showServingCell(data, {kVoxCellTechnology_GSM, kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary().get(),
+                        roles);
     else if (!publish(data, logCode, kLayouts))
         reportUnknown(logCode);
 }

@@ -72,7 +72,7 @@ void UMTSRRInfo::updateWithData(Record data, LogCode logCode)
 {
     logEntry();
     if (logCode == kCellMonitor)
-        showServingCell(data, {kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
+        showServingCell(data, {kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary().get(), roles);
     else if (logCode == kTransmitPower)
         showTransmitPower(data);
     else if (!publish(data, logCode, kLayouts))

@@ -78,7 +78,8 @@ void UMTSSet::updateWithData(Record data, LogCode logCode)
 {
     if (logCode == kCellMonitor) {
         logEntry();
-        replaceArray(sectionRef, listedNeighbors(data, kVoxCellTechnology_UMTS, kMonitoredCell, roles));
+        replaceArray(sectionRef,
+                     [&](Array& list) { appendNeighbors(list, data, kVoxCellTechnology_UMTS, kMonitoredCell, roles); });
     } else if (accepts(data, logCode, ranking::kCode, ranking::kMinimumLength)) {
         replaceArray(sectionRef, listed(data, kRanked, data.read(kCount).value_or(0), kRankedCell));
     }

@@ -23,7 +23,7 @@ ZPH_GSMLogGenerator::ZPH_GSMLogGenerator(DecodingRoles& roles)
 
 ZPH_GSMLogGenerator::~ZPH_GSMLogGenerator()
 {
-    _roles.log.write(Priority::Warning, format("ZPH_GSMLogGenerator is destructed %p", _roles.log.shownAddress(this)));
+    _roles.log.write(Priority::Warning, "ZPH_GSMLogGenerator is destructed %p", _roles.log.shownAddress(this));
 }
 
 std::unique_ptr<ZPH_GSMLogGenerator> ZPH_GSMLogGenerator::generator(DecodingRoles& roles)

@@ -39,8 +39,8 @@ bool isThisUser(const QLocalSocket& socket, const std::string& name, SystemLog& 
     const auto peer = peerOf(socket);
     if (peer && peer->user == ::geteuid())
         return true;
-    log.write(Priority::Error, format("Port %s: refused process %d of user %u", name, peer ? peer->process : 0,
-                                      peer ? peer->user : ~0u));
+    log.write(Priority::Error, "Port %s: refused process %d of user %u", name, peer ? peer->process : 0,
+              peer ? peer->user : ~0u);
     return false;
 }
 
@@ -153,8 +153,8 @@ std::optional<Frame> FrameConnection::next()
         if (!_reader.fault().empty()) {
             if (isOpen()) {
                 const auto peer = peerOf(*_socket);
-                _log.write(Priority::Error, format("Port %s: closed the connection of process %d: %s", _name,
-                                                   peer ? peer->process : 0, _reader.fault()));
+                _log.write(Priority::Error, "Port %s: closed the connection of process %d: %s", _name,
+                           peer ? peer->process : 0, _reader.fault());
                 close();
                 run(closed);
             }

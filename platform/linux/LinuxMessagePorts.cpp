@@ -251,7 +251,7 @@ LinuxMessagePorts::LinuxMessagePorts(std::string directory, MainQueue& queue, Sy
 std::unique_ptr<LocalPort> LinuxMessagePorts::createLocal(std::string_view name, ReceiveHandler handler)
 {
     const auto failed = [&](const std::string& why) {
-        _log.write(Priority::Error, format("Port %s: %s", name, why));
+        _log.write(Priority::Error, "Port %s: %s", name, why);
         return nullptr;
     };
     if (!isPortName(name))

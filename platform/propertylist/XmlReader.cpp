@@ -6,6 +6,7 @@
 
 #include <expat.h>
 
+#include <algorithm>
 #include <charconv>
 #include <cmath>
 #include <memory>
@@ -13,12 +14,18 @@
 namespace kestrum::propertylist {
 namespace {
 
-constexpr std::string_view kBlanks = " \t\n\r";
+constexpr bool isBlank(char character)
+{
+    return character == ' ' || character == '\t' || character == '\n' || character == '\r';
+}
 
 std::string_view trimmed(std::string_view text)
 {
-    const auto first = text.find_first_not_of(kBlanks);
-    return first == std::string_view::npos ? "" : text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
+    while (!text.empty() && isBlank(text.front()))
+        text.remove_prefix(1);
+    while (!text.empty() && isBlank(text.back()))
+        text.remove_suffix(1);
+    return text;
 }
 
 /// The whole text as a number, or nothing.
@@ -81,9 +88,48 @@ Value booleanFrom(std::string_view text, bool value)
     return value;
 }
 
+struct FreeParser {
+    void operator()(XML_Parser parser) const { XML_ParserFree(parser); }
+};
+
+/// A parser that has read nothing. It waits for the thread's next list: a telephony service sends them without end, and
+/// a parser asks for its memory in many pieces.
+class Parser {
+public:
+    explicit Parser(std::size_t bytesToRead) : _parser(std::move(spare())), _isKept(bytesToRead <= kKeptUpTo)
+    {
+        if (_parser == nullptr || XML_ParserReset(_parser.get(), nullptr) != XML_TRUE)
+            _parser.reset(XML_ParserCreate(nullptr));
+    }
+    ~Parser()
+    {
+        if (_isKept)
+            spare() = std::move(_parser);
+    }
+    Parser(const Parser&) = delete;
+    Parser& operator=(const Parser&) = delete;
+
+    XML_Parser get() const { return _parser.get(); }
+
+private:
+    static constexpr std::size_t kKeptUpTo = 1 << 20; // a parser keeps room for what it has read
+
+    using Owner = std::unique_ptr<XML_ParserStruct, FreeParser>;
+    static Owner& spare()
+    {
+        thread_local Owner kept;
+        return kept;
+    }
+
+    Owner _parser;
+    bool _isKept;
+};
+
 class XmlReader {
 public:
-    Value read(Bytes bytes)
+    explicit XmlReader(Bytes bytes) : _bytes(bytes), _parser(bytes.size()) {}
+
+    Value read()
     {
         XML_SetUserData(_parser.get(), this);
         XML_SetElementHandler(
@@ -100,7 +146,7 @@ public:
         XML_SetSkippedEntityHandler(_parser.get(),
                                     [](void* self, const char*, int) { guarded(self, &XmlReader::refuseEntity); });
 
-        const auto status = XML_Parse(_parser.get(), textOf(bytes).data(), static_cast<int>(bytes.size()), XML_TRUE);
+        const auto status = XML_Parse(_parser.get(), textOf(_bytes).data(), static_cast<int>(_bytes.size()), XML_TRUE);
         if (_refusal)
             throw *_refusal;
         if (status != XML_STATUS_OK)
@@ -111,15 +157,12 @@ public:
 private:
     enum class Element { Plist, Dict, Array, Key, String, Integer, Real, Date, Data, True, False };
 
-    struct Open {
-        Element element;
+    /// An element that holds others; <plist> holds the root.
+    struct Container {
         ArrayRef array = nullptr;
         DictionaryRef dictionary = nullptr;
-        std::optional<std::string> key = std::nullopt; ///< read, its value still to come
-    };
-
-    struct FreeParser {
-        void operator()(XML_Parser parser) const { XML_ParserFree(parser); }
+        std::string key = {};
+        bool awaitsValue = false; ///< of the key that was read
     };
 
     /// Runs a handler. Nothing may be thrown through expat, so a refusal waits here until it has returned.
@@ -140,23 +183,23 @@ private:
             XML_StopParser(reader._parser.get(), XML_FALSE);
     }
 
-    std::size_t offset() const { return static_cast<std::size_t>(XML_GetCurrentByteIndex(_parser.get())); }
+    std::size_t offset() const
+    {
+        const XML_Index index = XML_GetCurrentByteIndex(_parser.get());
+        return index < 0 ? 0 : static_cast<std::size_t>(index); // below 0 before the first byte
+    }
 
     static Element elementNamed(std::string_view name)
     {
         constexpr std::pair<std::string_view, Element> kElements[] = {
-            {"plist", Element::Plist},     {"dict", Element::Dict}, {"array", Element::Array}, {"key", Element::Key},
-            {"string", Element::String},   {"real", Element::Real}, {"date", Element::Date},   {"data", Element::Data},
-            {"integer", Element::Integer}, {"true", Element::True}, {"false", Element::False}};
+            {"key", Element::Key},     {"string", Element::String}, {"integer", Element::Integer},
+            {"dict", Element::Dict},   {"array", Element::Array},   {"true", Element::True},
+            {"false", Element::False}, {"real", Element::Real},     {"date", Element::Date},
+            {"data", Element::Data},   {"plist", Element::Plist}};
         for (const auto& [known, element] : kElements)
             if (known == name)
                 return element;
         throw Refusal{format("unknown element <%s>", name)};
-    }
-
-    static bool isContainer(Element element)
-    {
-        return element == Element::Plist || element == Element::Dict || element == Element::Array;
     }
 
     void start(const char* name)
@@ -164,89 +207,101 @@ private:
         const Element element = elementNamed(name);
         if (element == Element::Plist ? !_open.empty() : !mayHold(element))
             throw Refusal{format("<%s> is out of place", name)};
-        Open opened{element};
-        if (element == Element::Dict || element == Element::Array) {
-            checkDepth(_open.size() - 1); // <plist> is no level of its own
-            opened.array = element == Element::Array ? makeArray() : nullptr;
-            opened.dictionary = element == Element::Dict ? makeDictionary() : nullptr;
-        }
         if (element != Element::Plist && element != Element::Key)
             _budget.takeNode();
-        _open.push_back(std::move(opened));
+        if (element == Element::Dict || element == Element::Array)
+            checkDepth(_open.size() - 1); // <plist> is no level of its own
+        if (element == Element::Dict)
+            _open.push_back({.dictionary = makeDictionary()});
+        else if (element == Element::Array)
+            _open.push_back({.array = makeArray()});
+        else if (element == Element::Plist)
+            _open.emplace_back();
+        else
+            _leaf = element;
         _text.clear();
     }
 
     /// Whether the innermost open element may hold the element at this point.
     bool mayHold(Element element) const
     {
-        if (_open.empty())
+        if (_open.empty() || _leaf)
             return false;
-        const Open& inner = _open.back();
-        switch (inner.element) {
-        case Element::Plist:
-            return element != Element::Key && _root.isNull();
-        case Element::Array:
-            return element != Element::Key;
-        case Element::Dict:
-            return (element == Element::Key) != inner.key.has_value();
-        default:
-            return false;
-        }
+        const Container& inner = _open.back();
+        if (inner.dictionary)
+            return (element == Element::Key) != inner.awaitsValue;
+        return element != Element::Key && (inner.array || _root.isNull());
     }
 
     void characters(std::string_view text)
     {
-        if (!_open.empty() && !isContainer(_open.back().element))
+        if (_leaf)
             _text += text;
-        else if (!trimmed(text).empty())
+        else if (!std::ranges::all_of(text, isBlank))
             throw Refusal{"text out of place"};
     }
 
     void end()
     {
-        const Open closed = std::move(_open.back());
+        if (const auto leaf = std::exchange(_leaf, std::nullopt)) {
+            if (*leaf == Element::Key)
+                takeKey();
+            else
+                add(valueOf(*leaf));
+            return;
+        }
+        const Container closed = std::move(_open.back());
         _open.pop_back();
-        switch (closed.element) {
-        case Element::Plist:
-            if (_root.isNull())
-                throw Refusal{"no value inside <plist>"};
-            return;
-        case Element::Key:
-            _open.back().key = std::move(_text);
-            return;
-        case Element::Dict:
-            if (closed.key)
-                throw Refusal{"a key without a value"};
-            return add(closed.dictionary);
-        case Element::Array:
-            return add(closed.array);
-        case Element::String:
-            return add(std::move(_text));
+        if (closed.awaitsValue)
+            throw Refusal{"a key without a value"};
+        if (closed.dictionary)
+            add(closed.dictionary);
+        else if (closed.array)
+            add(closed.array);
+        else if (_root.isNull())
+            throw Refusal{"no value inside <plist>"};
+    }
+
+    /// By exchange: the next text finds room.
+    void takeKey()
+    {
+        Container& inner = _open.back();
+        inner.key.swap(_text);
+        inner.awaitsValue = true;
+    }
+
+    /// Of the text that has been read.
+    Value valueOf(Element leaf)
+    {
+        switch (leaf) {
         case Element::Integer:
-            return add(integerFrom(_text));
+            return integerFrom(_text);
         case Element::Real:
-            return add(realFrom(_text));
+            return realFrom(_text);
         case Element::Date:
-            return add(dateFrom(_text));
+            return dateFrom(_text);
         case Element::Data:
-            return add(dataFrom(_text));
+            return dataFrom(_text);
         case Element::True:
-            return add(booleanFrom(_text, true));
+            return booleanFrom(_text, true);
         case Element::False:
-            return add(booleanFrom(_text, false));
+            return booleanFrom(_text, false);
+        default:
+            return std::move(_text);
         }
     }
 
     /// Gives a complete value to the element that holds it.
     void add(Value value)
     {
-        Open& inner = _open.back();
+        Container& inner = _open.back();
         if (inner.array)
             inner.array->append(std::move(value));
         else if (inner.dictionary)
-            inner.dictionary->set(*std::exchange(inner.key, std::nullopt), std::move(value));
+            inner.dictionary->set(inner.key, std::move(value));
         else
             _root = std::move(value);
+        inner.awaitsValue = false;
     }
 
     void doctype(bool declaresAnything)
@@ -257,10 +312,12 @@ private:
 
     void refuseEntity() { throw Refusal{"entities other than the standard ones are not read"}; }
 
-    std::unique_ptr<XML_ParserStruct, FreeParser> _parser{XML_ParserCreate(nullptr)};
+    Bytes _bytes;
+    Parser _parser;
     std::optional<Refusal> _refusal;
-    std::vector<Open> _open;
-    std::string _text; ///< of the innermost element, when that is no container
+    std::vector<Container> _open;
+    std::optional<Element> _leaf; ///< inside the innermost of those
+    std::string _text;            ///< of the leaf
     Value _root;
     Budget _budget{PropertyListCodec::kMaxNodes, PropertyListCodec::kMaxBytes};
 };
@@ -269,7 +326,7 @@ private:
 
 Value readXml(Bytes bytes)
 {
-    return XmlReader().read(bytes);
+    return XmlReader(bytes).read();
 }
 
 } // namespace kestrum::propertylist

@@ -23,7 +23,9 @@ static_assert(reach(kRows) == 4);
 TEST(Rows, ShowEachFieldUnderItsKey)
 {
     const auto bytes = bytesFrom({7, 0xFE, 0xFF, 1});
-    EXPECT_EQ(Value(shown(Record(bytes), kRows)),
+    Dictionary row;
+    show(Record(bytes), kRows, row);
+    EXPECT_EQ(Value(std::make_shared<Dictionary>(row)),
               Value(makeDictionary({{"Byte", "7"}, {"Word", "-2"}, {"Colour", "green"}})));
 }
 
@@ -48,44 +50,59 @@ TEST(Rows, WordsArePrintedAsTheirSignSays)
     EXPECT_EQ(decimalSigned16(0x8000), "-32768");
 }
 
+std::string word(Record element)
+{
+    return decimal(element.read(u16(0)).value_or(0));
+}
+
+std::string byte(Record element)
+{
+    return decimal(element.read(u8(0)).value_or(0));
+}
+
+/// What the list holds after that.
+template <typename Append>
+Value listOf(Append append)
+{
+    auto list = makeArray();
+    append(*list);
+    return list;
+}
+
 TEST(Lists, EndWhereTheRecordDoes)
 {
     const auto bytes = bytesFrom({9, 1, 2, 3, 4, 5});
-    const auto found =
-        listed(Record(bytes), Elements(1, 2), 200, [](Record each) { return Value(decimal(*each.read(u16(0)))); });
-    EXPECT_EQ(found, (std::vector<Value>{"513", "1027"}));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(1, 2), 200, word)), Value(makeArray({"513", "1027"})));
 }
 
 TEST(Lists, EndAtTheirCount)
 {
     const auto bytes = bytesFrom({1, 2, 3, 4});
-    EXPECT_EQ(listed(Record(bytes), Elements(0, 1), 2, [](Record each) { return Value(decimal(*each.read(u8(0)))); }),
-              (std::vector<Value>{"1", "2"}));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, byte)), Value(makeArray({"1", "2"})));
 }
 
 TEST(Lists, MayOverlap)
 {
-    const auto bytes = bytesFrom({1, 2, 3, 4});
-    const auto found =
-        listed(Record(bytes), Elements(0, 1, 2), 9, [](Record each) { return Value(decimal(*each.read(u8(1)))); });
-    EXPECT_EQ(found, (std::vector<Value>{"2", "3", "4"}));
-}
-
-TEST(Lists, LeaveOutWhatIsNull)
-{
     const auto bytes = bytesFrom({1, 2, 3});
-    const auto found = listed(Record(bytes), Elements(0, 1), 3, [](Record each) {
-        return each.read(u8(0)) == 2u ? Value() : Value(decimal(*each.read(u8(0))));
-    });
-    EXPECT_EQ(found, (std::vector<Value>{"1", "3"}));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1, 2), 9, word)), Value(makeArray({"513", "770"})));
 }
 
 TEST(Lists, ElementsCanBeRows)
 {
     constexpr Row kElement[] = {{u8(0), "Byte", decimal}};
     const auto bytes = bytesFrom({1, 2});
-    EXPECT_EQ(listed(Record(bytes), Elements(0, 1), 2, kElement),
-              (std::vector<Value>{makeDictionary({{"Byte", "1"}}), makeDictionary({{"Byte", "2"}})}));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, kElement)),
+              Value(makeArray({makeDictionary({{"Byte", "1"}}), makeDictionary({{"Byte", "2"}})})));
+}
+
+TEST(Lists, ElementsCanBeShownByAFunction)
+{
+    const auto bytes = bytesFrom({1, 2});
+    const auto twice = [](Record element, Dictionary& row) {
+        row.setText("Twice", decimal(2 * element.read(u8(0)).value_or(0)));
+    };
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, twice)),
+              Value(makeArray({makeDictionary({{"Twice", "2"}}), makeDictionary({{"Twice", "4"}})})));
 }
 
 } // namespace

@@ -43,8 +43,8 @@ public:
     void updateWithData(Record data, LogCode logCode) override
     {
         calls().push_back(format("Neighbors %u %u", logCode, static_cast<std::uint32_t>(data.size())));
-        replaceArray(sectionRef, listed(data, Elements(13, 1), 255,
-                                        [](Record each) { return Value(decimal(each.read(u8(0)).value())); }));
+        replaceArray(sectionRef,
+                     listed(data, Elements(13, 1), 255, [](Record each) { return decimal(each.read(u8(0)).value()); }));
     }
 };
 

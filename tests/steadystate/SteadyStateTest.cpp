@@ -1,3 +1,5 @@
+#include "C2K/C2KRun.h"
+#include "LogGenerator/C2K/Decoders.h"
 #include "LogGenerator/LTE/LTEClassIndex.h"
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/ZPH_GSM/ZPH_GSMClassIndex.h"
@@ -11,6 +13,8 @@
 #include <cstdlib>
 #include <new>
 #include <string>
+#include <string_view>
+#include <vector>
 
 namespace {
 
@@ -64,8 +68,21 @@ struct Subscription {
 };
 
 // A modem sends several of these a second for days.
+template <typename Decode>
+void expectNoAllocation(const std::vector<RecordBuilder>& records, Decode decode)
+{
+    const auto decodeAll = [&] {
+        for (const auto& each : records)
+            decode(Record(each.bytes()));
+    };
+    decodeAll();
+    const long before = allocations;
+    decodeAll();
+    EXPECT_EQ(allocations - before, 0);
+}
+
 template <typename Index>
-void expectNoAllocation(const Subscription& subscription)
+void expectNoAllocation(const Subscription& subscription, const Value& node)
 {
     DecodingDoubles doubles;
     SilentLog log;
@@ -73,19 +90,9 @@ void expectNoAllocation(const Subscription& subscription)
     DecodingRoles roles{log, console, doubles.clock, doubles.bundle, doubles.propertyLists};
     const Index index(roles);
     Base& section = *index.getClass(subscription.section);
-    const Value node = makeDictionary();
     section.updateSectionRef(node);
-    const auto zeros = record(subscription.code, 256), ones = record(subscription.code, 256).fill(13, 0xFF);
-    const auto decodeBoth = [&] {
-        for (const auto* each : {&zeros, &ones})
-            section.updateWithData(Record(each->bytes()), subscription.code);
-    };
-    decodeBoth();
-    ASSERT_FALSE(node.dictionary()->empty());
-
-    const long before = allocations;
-    decodeBoth();
-    EXPECT_EQ(allocations - before, 0);
+    expectNoAllocation({record(subscription.code, 256), record(subscription.code, 256).fill(13, 0xFF)},
+                       [&](Record each) { section.updateWithData(each, subscription.code); });
 }
 
 std::string nameOf(const testing::TestParamInfo<Subscription>& each)
@@ -95,6 +102,24 @@ std::string nameOf(const testing::TestParamInfo<Subscription>& each)
         if (std::isalnum(static_cast<unsigned char>(c)) != 0)
             name += c;
     return name + "_" + format("%x", each.param.code);
+}
+
+/// Of a dictionary section; it has to show something.
+template <typename Index>
+void expectNoAllocation(const Subscription& subscription)
+{
+    const auto node = makeDictionary();
+    expectNoAllocation<Index>(subscription, node);
+    EXPECT_FALSE(node->empty());
+}
+
+/// Of a list section; the record of ones names as many rows as fit.
+template <typename Index>
+void expectNoAllocationInList(const Subscription& subscription)
+{
+    const auto node = makeArray();
+    expectNoAllocation<Index>(subscription, node);
+    EXPECT_FALSE(node->empty());
 }
 
 class GsmDictionarySection : public testing::TestWithParam<Subscription> {};
@@ -146,6 +171,91 @@ TEST_P(UtranDictionarySection, AllocatesNothingInTheSteadyState)
 INSTANTIATE_TEST_SUITE_P(UTRAN, UtranDictionarySection,
                          testing::Values(Subscription{"Serving Cell Info", 0xD0E2}, Subscription{"RRC Info", 0xD0E0}),
                          nameOf);
+
+class GsmListSection : public testing::TestWithParam<Subscription> {};
+
+TEST_P(GsmListSection, AllocatesNothingInTheSteadyState)
+{
+    expectNoAllocationInList<ZPH_GSMClassIndex>(GetParam());
+}
+
+INSTANTIATE_TEST_SUITE_P(ZPH_GSM, GsmListSection,
+                         testing::Values(Subscription{"Neighboring Cells", 0x5137}, Subscription{"UMTS Set", 0x4005},
+                                         Subscription{"GSM Set", 0x4005}, Subscription{"Equivalent PLMN List", 0x7150}),
+                         nameOf);
+
+class GsmListInSection : public testing::TestWithParam<Subscription> {};
+
+TEST_P(GsmListInSection, AllocatesNothingInTheSteadyState)
+{
+    expectNoAllocation<ZPH_GSMClassIndex>(GetParam());
+}
+
+INSTANTIATE_TEST_SUITE_P(ZPH_GSM, GsmListInSection,
+                         testing::Values(Subscription{"Mobile Allocation", 0x51F8}, Subscription{"BLER", 0x4116},
+                                         Subscription{"HSDPA Info", 0x4221}),
+                         nameOf);
+
+class LteListSection : public testing::TestWithParam<Subscription> {};
+
+TEST_P(LteListSection, AllocatesNothingInTheSteadyState)
+{
+    expectNoAllocationInList<LTEClassIndex>(GetParam());
+}
+
+INSTANTIATE_TEST_SUITE_P(LTE, LteListSection,
+                         testing::Values(Subscription{"Measured Neighbor Cells", 0xB179},
+                                         Subscription{"Neighbor Cells List", 0xB180},
+                                         Subscription{"Reselection Candidates List", 0xB186}),
+                         nameOf);
+
+class UtranListSection : public testing::TestWithParam<Subscription> {};
+
+TEST_P(UtranListSection, AllocatesNothingInTheSteadyState)
+{
+    expectNoAllocationInList<UTRANClassIndex>(GetParam());
+}
+
+INSTANTIATE_TEST_SUITE_P(UTRAN, UtranListSection,
+                         testing::Values(Subscription{"Neighbor Cell List", 0xD00A}, Subscription{"TRCH BLER", 0xD00C}),
+                         nameOf);
+
+struct CdmaRecords {
+    std::string_view name;
+    std::vector<RecordBuilder> records;
+    void (*decode)(Record record, C2KContext& context);
+
+    friend void PrintTo(const CdmaRecords& shown, std::ostream* out) { *out << shown.name; }
+};
+
+class CdmaDecoder : public testing::TestWithParam<CdmaRecords> {};
+
+TEST_P(CdmaDecoder, AllocatesNothingInTheSteadyState)
+{
+    C2KRun run;
+    run.generator->getDisplayFromState(run.state);
+    SilentLog log;
+    UnwatchedConsole console;
+    DecodingRoles roles{log, console, run.doubles.clock, run.doubles.bundle, run.doubles.propertyLists};
+    C2KContext context(run.state, run.state.at("Lookup").dictionary(), roles);
+    expectNoAllocation(GetParam().records, [&](Record each) { GetParam().decode(each, context); });
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    C2K, CdmaDecoder,
+    testing::Values(
+        CdmaRecords{"EvdoStatus", {record(0x1183, 50), record(0x1183, 50).fill(13, 1)}, decodeEvdoStatus},
+        CdmaRecords{"SystemIdentity",
+                    {record(0x134F, 186).u8(13, 2).u32(46, 2),
+                     record(0x134F, 186).u8(13, 2).u32(46, 2).u16(50, 0xFFFF).u16(184, 0xFFFF)},
+                    decodeSystemIdentity},
+        CdmaRecords{
+            "TrafficDemodulation", {record(0x119D, 17), record(0x119D, 17).fill(13, 0xFF)}, decodeTrafficDemodulation},
+        CdmaRecords{
+            "ForwardLinkRate", {record(0x1192, 241), record(0x1192, 241).fill(13, 0xFF)}, decodeForwardLinkRate},
+        CdmaRecords{
+            "ReverseLinkRate", {record(0x127E, 1750), record(0x127E, 1750).fill(13, 0xFF)}, decodeReverseLinkRate}),
+    [](const auto& each) { return std::string(each.param.name); });
 
 } // namespace
 } // namespace kestrum

@@ -2,7 +2,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
+#include <random>
+#include <string>
+#include <utility>
+#include <vector>
 
 namespace kestrum {
 namespace {
@@ -200,6 +205,116 @@ TEST(Dictionary, FindsEveryKeyOfMany)
     EXPECT_FALSE(copy.contains("980"));
     copy.set("980", 1);
     EXPECT_EQ(copy.at("980"), Value(1));
+}
+
+TEST(Array, FillsTheRowsAgainThatItHadBeforeItWasCleared)
+{
+    Array list;
+    const Dictionary* first = &list.appendRow();
+    list.clear();
+    EXPECT_TRUE(list.empty());
+    Dictionary& again = list.appendRow();
+    EXPECT_EQ(&again, first);
+    EXPECT_EQ(list.size(), 1u);
+}
+
+TEST(Array, LeavesARowAloneThatSomebodyElseHolds)
+{
+    Array list;
+    list.appendRow().setText("RSSI", "-71 dBm");
+    const auto held = list[0].dictionary();
+    list.clear();
+    list.appendRow().setText("RSSI", "-90 dBm");
+    EXPECT_EQ(held->at("RSSI"), Value("-71 dBm"));
+    EXPECT_EQ(list[0].dictionary()->at("RSSI"), Value("-90 dBm"));
+}
+
+TEST(Array, HoldsWhatCameSinceItWasCleared)
+{
+    Array list{"a", makeDictionary({{"key", "b"}}), "c"};
+    list.clear();
+    list.appendRow().setText("other", "d");
+    list.appendText("e");
+    EXPECT_EQ(Value(std::make_shared<Array>(list)), Value(makeArray({makeDictionary({{"other", "d"}}), "e"})));
+    list.append("f");
+    list.append("g");
+    EXPECT_EQ(list.size(), 4u);
+    EXPECT_EQ(list.back(), Value("g"));
+}
+
+TEST(Dictionary, KeepsAnArrayThatIsSetAgain)
+{
+    Dictionary dictionary;
+    dictionary.setArray("SIR").appendText("4");
+    const Array* first = dictionary.at("SIR").array().get();
+    EXPECT_EQ(&dictionary.setArray("SIR"), first);
+    EXPECT_TRUE(first->empty());
+    const auto held = dictionary.at("SIR").array();
+    EXPECT_NE(&dictionary.setArray("SIR"), held.get());
+}
+
+TEST(Dictionary, WordsOnlyWhatHasChanged)
+{
+    Dictionary dictionary;
+    int worded = 0;
+    const int function = 0, other = 0; // any two addresses
+    const auto set = [&](const Wording& wording, std::string_view text) {
+        dictionary.setWorded("RSSI", wording, [&](Value& value) {
+            value.assignText(text, wording);
+            ++worded;
+        });
+    };
+    set({&function, 71}, "-71 dBm");
+    set({&function, 71}, "not asked for");
+    EXPECT_EQ(worded, 1);
+    EXPECT_EQ(dictionary.at("RSSI"), Value("-71 dBm"));
+    set({&function, 72}, "-72 dBm");
+    set({&other, 72}, "72");
+    EXPECT_EQ(worded, 3);
+    EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
+    dictionary.setText("RSSI", "by hand");
+    set({&other, 72}, "72");
+    EXPECT_EQ(worded, 4);
+    dictionary.set("RSSI", 5);
+    set({&other, 72}, "72");
+    EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
+    dictionary.clear();
+    set({&other, 72}, "not asked for");
+    EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
+    EXPECT_EQ(worded, 5);
+}
+
+TEST(Dictionary, HoldsWhatCameSinceItWasCleared)
+{
+    std::mt19937 random(1);
+    const auto below = [&](unsigned limit) { return static_cast<unsigned>(random() % limit); };
+    Dictionary dictionary;
+    for (int round = 0; round < 2000; ++round) {
+        dictionary.clear();
+        std::vector<std::pair<std::string, std::string>> expected; // in the order in which the keys first came
+        for (unsigned set = below(70); set > 0; --set) {
+            const auto key = "key " + std::to_string(below(round % 2 == 0 ? 5 : 80));
+            const auto known = std::ranges::find(expected, key, &std::pair<std::string, std::string>::first);
+            if (below(8) == 0) {
+                dictionary.remove(key);
+                if (known != expected.end())
+                    expected.erase(known);
+                continue;
+            }
+            const auto text = std::to_string(set);
+            dictionary.setText(key, text);
+            if (known != expected.end())
+                known->second = text;
+            else
+                expected.emplace_back(key, text);
+        }
+        std::vector<std::pair<std::string, std::string>> found;
+        for (const auto& [key, value] : dictionary)
+            found.emplace_back(key, *value.string());
+        ASSERT_EQ(found, expected) << "round " << round;
+        for (const auto& [key, text] : expected)
+            ASSERT_EQ(dictionary.at(key), Value(text)) << "round " << round;
+    }
 }
 
 TEST(Data, SharesItsBytes)
