@@ -3,24 +3,29 @@
 #include "platform/linux/FrameSocket.h"
 #include "platform/linux/LinuxMessagePorts.h"
 #include "platform/linux/QtMainQueue.h"
+#include "scenarios/Drive.h"
 
 #include <QCoreApplication>
 #include <QProcess>
 #include <benchmark/benchmark.h>
 
+#include <algorithm>
 #include <chrono>
 #include <cstring>
 #include <filesystem>
+#include <functional>
 #include <string>
 #include <string_view>
 #include <vector>
 
 #include <unistd.h>
 
+namespace kestrum::bench {
 namespace {
 
-using namespace kestrum;
 using namespace std::chrono;
+
+using Payloads = std::vector<std::vector<std::byte>>;
 
 constexpr std::size_t kMessages = 200'000; // in one measurement
 constexpr std::size_t kKept = 256 << 10;   // as the service lets a socket keep
@@ -29,14 +34,26 @@ struct NoLog final : SystemLog {
     void write(Priority, std::string_view) override {}
 };
 
-int sendAll(const std::string& path, std::size_t size)
+/// What both processes make of the same words: a number is a size, all else is a scenario's name.
+Payloads payloadsOf(const std::string& what)
+{
+    if (std::ranges::all_of(what, [](char c) { return c >= '0' && c <= '9'; }))
+        return Payloads(kMessages, std::vector<std::byte>(std::stoul(what)));
+    const auto scenario = std::ranges::find(scenarios(), what, &Scenario::name);
+    Payloads payloads;
+    for (auto& message : driven(*scenario, minutes(10)))
+        payloads.push_back(std::move(message.bytes));
+    return payloads;
+}
+
+int sendAll(const std::string& path, const std::string& what)
 {
     NoLog log;
+    const auto payloads = payloadsOf(what);
     const auto connection = FrameConnection::connectTo(path, seconds(5), log);
     if (!connection)
         return 1;
-    const std::vector<std::byte> payload(size);
-    for (std::size_t i = 0; i < kMessages; ++i) {
+    for (const auto& payload : payloads) {
         if (!connection->send({Frame::Kind::Message, 0, 0, payload}))
             return 1;
         if (connection->unsent() >= kKept && !connection->waitUntilSent(seconds(10)))
@@ -45,20 +62,30 @@ int sendAll(const std::string& path, std::size_t size)
     return connection->waitUntilSent(seconds(10)) ? 0 : 1;
 }
 
-void copyPlainly(const std::vector<std::byte>& from, std::vector<std::byte>& to)
+duration<double> timeOfCopies(const Payloads& payloads)
 {
-    std::memcpy(to.data(), from.data(), from.size());
-    benchmark::DoNotOptimize(to.data());
-    benchmark::ClobberMemory();
+    const auto longest = std::ranges::max(payloads, {}, &std::vector<std::byte>::size).size();
+    std::vector<std::byte> to(longest);
+    const auto begin = steady_clock::now();
+    for (const auto& from : payloads) {
+        std::memcpy(to.data(), from.data(), from.size());
+        benchmark::DoNotOptimize(to.data());
+        benchmark::ClobberMemory();
+    }
+    return steady_clock::now() - begin;
 }
 
-void throughPorts(benchmark::State& state)
+/// From the first message's arrival to the last one's end; `receive` is called with each.
+void throughPorts(benchmark::State& state, const std::string& what, const std::function<void(Bytes)>& receive)
 {
-    const auto size = static_cast<std::size_t>(state.range(0));
     NoLog log;
     QtMainQueue queue;
     const auto directory = std::filesystem::temp_directory_path() / ("kestrum-bench-" + std::to_string(::getpid()));
     LinuxMessagePorts ports(directory.string(), queue, log);
+    const auto payloads = payloadsOf(what);
+    std::size_t bytes = 0;
+    for (const auto& payload : payloads)
+        bytes += payload.size();
     duration<double> all{0}, copies{0};
     for (auto _ : state) {
         std::size_t received = 0;
@@ -66,8 +93,8 @@ void throughPorts(benchmark::State& state)
         const auto port = ports.createLocal("bench", [&](std::int32_t, Bytes payload) {
             if (received++ == 0)
                 begin = steady_clock::now();
-            benchmark::DoNotOptimize(payload.data());
-            if (received == kMessages)
+            receive(payload);
+            if (received == payloads.size())
                 QCoreApplication::quit();
         });
         if (!port)
@@ -76,43 +103,66 @@ void throughPorts(benchmark::State& state)
         QProcess sender;
         sender.start(QCoreApplication::applicationFilePath(),
                      {"--send", QString::fromStdString((directory / ("bench." + std::to_string(::getpid()))).string()),
-                      QString::number(size)});
+                      QString::fromStdString(what)});
         QCoreApplication::exec();
         const duration<double> took = steady_clock::now() - begin;
         sender.waitForFinished();
         state.SetIterationTime(took.count());
         all += took;
-
-        const std::vector<std::byte> from(size);
-        std::vector<std::byte> to(size);
-        const auto copyBegin = steady_clock::now();
-        for (std::size_t i = 0; i < kMessages; ++i)
-            copyPlainly(from, to);
-        copies += steady_clock::now() - copyBegin;
+        copies += timeOfCopies(payloads);
     }
-    const auto messages = static_cast<double>(state.iterations()) * kMessages;
-    state.counters["messages"] = benchmark::Counter(messages / all.count());
-    state.counters["bytes"] = benchmark::Counter(messages * static_cast<double>(size) / all.count());
-    state.counters["times a plain copy"] = benchmark::Counter(all / copies);
+    const auto runs = static_cast<double>(state.iterations());
+    state.counters["messages/s"] = runs * static_cast<double>(payloads.size()) / all.count();
+    state.counters["bytes/s"] = runs * static_cast<double>(bytes) / all.count();
+    state.counters["plain copies"] = all / copies;
     std::filesystem::remove_all(directory);
 }
 
-BENCHMARK(throughPorts)
-    ->Name("one process to another, message bytes:")
-    ->Arg(64)
-    ->Arg(200)
-    ->Arg(2000)
-    ->UseManualTime()
-    ->Iterations(5)
-    ->Unit(benchmark::kMillisecond);
+void transport(benchmark::State& state)
+{
+    throughPorts(state, std::to_string(state.range(0)),
+                 [](Bytes payload) { benchmark::DoNotOptimize(payload.data()); });
+}
+
+/// The whole way that the application's messages go, up to the display.
+void endToEnd(benchmark::State& state, const Scenario& scenario)
+{
+    constexpr std::size_t kMessagesOfARefresh = 300; // two seconds of a drive
+    Decoding decoding(scenario.technology);
+    std::size_t received = 0;
+    throughPorts(state, std::string(scenario.name), [&](Bytes payload) {
+        decoding.receive(payload);
+        if (++received % kMessagesOfARefresh == 0)
+            decoding.refresh();
+    });
+}
+
+void registerAll()
+{
+    benchmark::RegisterBenchmark("transport, message bytes:", transport)
+        ->Arg(64)
+        ->Arg(200)
+        ->Arg(2000)
+        ->UseManualTime()
+        ->Iterations(5)
+        ->Unit(benchmark::kMillisecond);
+    for (const Scenario& scenario : scenarios())
+        if (scenario.name != "drive") // which changes its technology on the way
+            benchmark::RegisterBenchmark(("to the display: " + std::string(scenario.name)).c_str(), endToEnd, scenario)
+                ->UseManualTime()
+                ->Iterations(5)
+                ->Unit(benchmark::kMillisecond);
+}
 
 } // namespace
+} // namespace kestrum::bench
 
 int main(int argc, char** argv)
 {
     QCoreApplication application(argc, argv);
     if (argc == 4 && std::string_view(argv[1]) == "--send")
-        return sendAll(argv[2], std::stoul(argv[3]));
+        return kestrum::bench::sendAll(argv[2], argv[3]);
     benchmark::Initialize(&argc, argv);
+    kestrum::bench::registerAll();
     benchmark::RunSpecifiedBenchmarks();
 }
