@@ -76,6 +76,7 @@ public:
 
 private:
     void takeIn(int milliseconds);
+    void takeInTheRest();
     void answer();
     void report(int button, int row, int column, char action);
     int rows() const;
