@@ -86,41 +86,21 @@ TEST(LTETemplate, HoldsEverySectionWithItsKeys)
     expectTemplateToHold(TechnologyRun<LTELogGenerator>::resource("LTE"), kShapes);
 }
 
-/// A random record of one of the rules' codes, or of the cell monitor.
-LogCode arbitraryCode()
-{
-    return *rc::gen::element<LogCode>(0xB0C1, 0xB0C2, 0xB179, 0xB17F, 0xB180, 0xB186, 0xFF0001, 0xFF0002);
-}
+const HostileRecords<LTELogGenerator> kHostile{"LTE", kShapes, kRules, 400};
 
 RC_GTEST_PROP(HostileLTERecords, NeverPublishUnderANameThatTheSectionLacks, ())
 {
-    TechnologyRun<LTELogGenerator> run("LTE");
-    for (int i = 0; i < 4; ++i)
-        run.receive(arbitraryRecord(arbitraryCode(), *rc::gen::inRange<std::size_t>(13, 400)).bytes());
-    run.receive(arbitraryCellMonitor(run.codec));
-    for (const auto& shape : kShapes)
-        RC_ASSERT(holdsOnlyKeysOf(shape, run.section(shape.name)));
+    kHostile.neverPublishUnderANameThatTheSectionLacks();
 }
 
 RC_GTEST_PROP(HostileLTERecords, ThatAreShortChangeNothing, ())
 {
-    TechnologyRun<LTELogGenerator> run("LTE");
-    run.receive(arbitraryRecord(0xB180, 61).bytes());
-    const Value before = deepCopy(run.display());
-    const auto& rule = kRules[*rc::gen::inRange<std::size_t>(0, std::size(kRules))];
-    run.receive(arbitraryRecord(rule.code, *rc::gen::inRange<std::size_t>(13, rule.minimumLength)).bytes());
-    RC_ASSERT(run.display() == before);
+    kHostile.changeNothingWhenTheyAreShort();
 }
 
 RC_GTEST_PROP(HostileLTERecords, OfAnyBytesAreHarmless, (const std::vector<std::uint8_t>& bytes))
 {
-    TechnologyRun<LTELogGenerator> run("LTE");
-    try {
-        run.receive(std::as_bytes(std::span(bytes)));
-    } catch (const LogCode_0xFF0000::UnknownDataException&) {
-        // What a SIM record without a dictionary ends in.
-    }
-    RC_ASSERT(!run.display().isNull());
+    kHostile.areHarmlessWhateverTheirBytes(bytes);
 }
 
 } // namespace

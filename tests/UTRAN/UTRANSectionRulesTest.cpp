@@ -63,37 +63,21 @@ TEST(UTRANTemplate, HoldsEverySectionWithItsKeys)
     expectTemplateToHold(TechnologyRun<UTRANLogGenerator>::resource("UTRAN"), kShapes);
 }
 
+const HostileRecords<UTRANLogGenerator> kHostile{"UTRAN", kShapes, kRules, 700};
+
 RC_GTEST_PROP(HostileUTRANRecords, NeverPublishUnderANameThatTheSectionLacks, ())
 {
-    TechnologyRun<UTRANLogGenerator> run("UTRAN");
-    for (int i = 0; i < 4; ++i) {
-        const auto code = *rc::gen::element<LogCode>(0xD0E0, 0xD0E2, 0xD00A, 0xD00E, 0xD00C, 0xFF0001, 0xFF0002);
-        run.receive(arbitraryRecord(code, *rc::gen::inRange<std::size_t>(13, 700)).bytes());
-    }
-    run.receive(arbitraryCellMonitor(run.codec));
-    for (const auto& shape : kShapes)
-        RC_ASSERT(holdsOnlyKeysOf(shape, run.section(shape.name)));
+    kHostile.neverPublishUnderANameThatTheSectionLacks();
 }
 
 RC_GTEST_PROP(HostileUTRANRecords, ThatAreShortChangeNothing, ())
 {
-    TechnologyRun<UTRANLogGenerator> run("UTRAN");
-    run.receive(arbitraryRecord(0xD00A, 200).bytes());
-    const Value before = deepCopy(run.display());
-    const auto& rule = kRules[*rc::gen::inRange<std::size_t>(0, std::size(kRules))];
-    run.receive(arbitraryRecord(rule.code, *rc::gen::inRange<std::size_t>(13, rule.minimumLength)).bytes());
-    RC_ASSERT(run.display() == before);
+    kHostile.changeNothingWhenTheyAreShort();
 }
 
 RC_GTEST_PROP(HostileUTRANRecords, OfAnyBytesAreHarmless, (const std::vector<std::uint8_t>& bytes))
 {
-    TechnologyRun<UTRANLogGenerator> run("UTRAN");
-    try {
-        run.receive(std::as_bytes(std::span(bytes)));
-    } catch (const LogCode_0xFF0000::UnknownDataException&) {
-        // What a SIM record without a dictionary ends in.
-    }
-    RC_ASSERT(!run.display().isNull());
+    kHostile.areHarmlessWhateverTheirBytes(bytes);
 }
 
 } // namespace

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "LogGenerator/ZPH_GSM/SimInfo.h"
 #include "doubles/RecordBuilder.h"
 #include "doubles/TechnologyRun.h"
 
@@ -158,5 +159,51 @@ inline std::vector<std::byte> arbitraryCellMonitor(const PropertyListCodec& code
     bytes.insert(bytes.end(), list->bytes().begin(), list->bytes().end());
     return bytes;
 }
+
+/// What a technology's generator on its shipped template owes to whatever comes over the air.
+template <typename Generator>
+struct HostileRecords {
+    const char* resource;
+    std::span<const SectionShape> shapes;
+    std::span<const SectionRule> rules;
+    std::size_t longest; ///< bytes of a record
+
+    const SectionRule& anyRule() const { return rules[*rc::gen::inRange<std::size_t>(0, rules.size())]; }
+
+    void neverPublishUnderANameThatTheSectionLacks() const
+    {
+        TechnologyRun<Generator> run(resource);
+        for (int i = 0; i < 4; ++i) {
+            const LogCode codes[] = {anyRule().code, anyRule().code, 0xFF0001, 0xFF0002};
+            run.receive(arbitraryRecord(codes[*rc::gen::inRange<std::size_t>(0, std::size(codes))],
+                                        *rc::gen::inRange<std::size_t>(13, longest))
+                            .bytes());
+        }
+        run.receive(arbitraryCellMonitor(run.codec));
+        for (const auto& shape : shapes)
+            RC_ASSERT(holdsOnlyKeysOf(shape, run.section(shape.name)));
+    }
+
+    void changeNothingWhenTheyAreShort() const
+    {
+        TechnologyRun<Generator> run(resource);
+        run.receive(arbitraryRecord(anyRule().code, longest).bytes());
+        const Value before = deepCopy(run.display());
+        const auto& rule = anyRule();
+        run.receive(arbitraryRecord(rule.code, *rc::gen::inRange<std::size_t>(13, rule.minimumLength)).bytes());
+        RC_ASSERT(run.display() == before);
+    }
+
+    void areHarmlessWhateverTheirBytes(const std::vector<std::uint8_t>& bytes) const
+    {
+        TechnologyRun<Generator> run(resource);
+        try {
+            run.receive(std::as_bytes(std::span(bytes)));
+        } catch (const LogCode_0xFF0000::UnknownDataException&) {
+            // What a SIM record without a dictionary ends in.
+        }
+        RC_ASSERT(!run.display().isNull());
+    }
+};
 
 } // namespace kestrum

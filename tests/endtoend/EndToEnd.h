@@ -1,5 +1,6 @@
 #pragma once
 
+#include "doubles/QtTestToolkit.h"
 #include "linux/EventLoop.h"
 #include "linux/Scratch.h"
 #include "platform/Toolkit.h"
@@ -11,9 +12,6 @@
 #include <string>
 
 namespace kestrum {
-
-/// The one toolkit of the test program; it holds the application object.
-Toolkit& toolkit();
 
 /// A device of the test's own, and the real telephony service on it.
 class EndToEnd : public testing::Test {

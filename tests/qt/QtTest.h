@@ -1,5 +1,6 @@
 #pragma once
 
+#include "doubles/QtTestToolkit.h"
 #include "frontends/qt/MainWindow.h"
 #include "platform/Toolkit.h"
 #include "ui/KestrumCell.h"
@@ -19,9 +20,6 @@
 #include <vector>
 
 namespace kestrum {
-
-/// The one toolkit of the test program; it holds the application object.
-Toolkit& toolkit();
 
 /// What a pane's controller does for its table, over rows that the test can change.
 class Rows final : public TableDataSource {

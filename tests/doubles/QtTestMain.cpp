@@ -1,5 +1,10 @@
-#include "EndToEnd.h"
+// The main() of tests with real widgets, on a screen that nobody needs to have.
+#include "doubles/QtTestToolkit.h"
 #include "frontends/qt/QtToolkit.h"
+
+#include <gmock/gmock.h>
+
+#include <cstdlib>
 
 namespace {
 
@@ -15,7 +20,7 @@ kestrum::Toolkit& kestrum::toolkit()
 int main(int argc, char** argv)
 {
     testing::InitGoogleMock(&argc, argv);
-    setenv("QT_QPA_PLATFORM", "offscreen", 1); // real widgets, on a screen that nobody needs to have
+    setenv("QT_QPA_PLATFORM", "offscreen", 1);
     const auto toolkit = kestrum::makeQtToolkit();
     made = toolkit.get();
     return RUN_ALL_TESTS();
