@@ -41,7 +41,7 @@ void Base::clearElementsInArray(const SectionRef& array)
 {
     if (const auto node = array.array()) {
         const ArrayLocked locked;
-        node->clear();
+        node->startOver();
     }
 }
 

@@ -95,7 +95,7 @@ public:
         Array nowhere;
         Array& list = node ? *node : nowhere;
         const auto locked = node ? std::make_optional<ArrayLocked>() : std::nullopt;
-        list.clear();
+        list.startOver();
         append(list);
     }
 

@@ -196,7 +196,7 @@ Dictionary& Array::appendRow()
     Value& row = added();
     auto dictionary = row.dictionary();
     if (dictionary && isAlone(dictionary)) {
-        dictionary->clear();
+        dictionary->startOver();
     } else {
         dictionary = makeDictionary();
         row = dictionary;
@@ -245,7 +245,7 @@ Array& Dictionary::setArray(std::string_view key)
     Value& value = slot(key);
     auto array = value.array();
     if (array && isAlone(array)) {
-        array->clear();
+        array->startOver();
     } else {
         array = makeArray();
         value = array;
@@ -293,6 +293,12 @@ void Dictionary::remove(std::string_view key)
 }
 
 void Dictionary::clear()
+{
+    _entries.clear();
+    startOver();
+}
+
+void Dictionary::startOver()
 {
     _size = 0;
     _next = 0;

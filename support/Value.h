@@ -101,8 +101,8 @@ private:
 /// The kind's name as it is put into messages: "string", "integer", ...
 std::string_view nameOf(Value::Kind kind);
 
-/// Values in order. `clear` keeps what stood there, as spares: `appendRow` and `appendText` then fill the same storage
-/// again. Lists are rewritten thousands of times a second, mostly with as much as before.
+/// Values in order. `startOver` keeps what stood there, as spares: `appendRow` and `appendText` then fill the same
+/// storage again. Lists are rewritten thousands of times a second, mostly with as much as before.
 class Array {
 public:
     Array() = default;
@@ -113,7 +113,12 @@ public:
 
     std::size_t size() const { return _size; }
     bool empty() const { return _size == 0; }
-    void clear() { _size = 0; }
+    void clear()
+    {
+        _elements.clear();
+        _size = 0;
+    }
+    void startOver() { _size = 0; } ///< empty, as after `clear`
     void reserve(std::size_t count) { _elements.reserve(count); }
     void append(Value element);
     void appendText(std::string_view text);
@@ -141,8 +146,8 @@ private:
     std::size_t _size = 0;
 };
 
-/// Values under string keys, in the order in which the keys first came. `clear` keeps the entries as spares; keys that
-/// come again in their order find their storage.
+/// Values under string keys, in the order in which the keys first came. `startOver` keeps the entries as spares; keys
+/// that come again in their order find their storage.
 class Dictionary {
 public:
     struct Entry {
@@ -180,6 +185,7 @@ public:
     Array& setArray(std::string_view key);
     void remove(std::string_view key);
     void clear();
+    void startOver(); ///< empty, as after `clear`
 
     auto begin() const { return _entries.begin(); }
     auto end() const { return _entries.begin() + static_cast<std::ptrdiff_t>(_size); }

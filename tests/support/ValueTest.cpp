@@ -207,11 +207,11 @@ TEST(Dictionary, FindsEveryKeyOfMany)
     EXPECT_EQ(copy.at("980"), Value(1));
 }
 
-TEST(Array, FillsTheRowsAgainThatItHadBeforeItWasCleared)
+TEST(Array, FillsItsRowsAgainWhenItStartsOver)
 {
     Array list;
     const Dictionary* first = &list.appendRow();
-    list.clear();
+    list.startOver();
     EXPECT_TRUE(list.empty());
     Dictionary& again = list.appendRow();
     EXPECT_EQ(&again, first);
@@ -223,16 +223,16 @@ TEST(Array, LeavesARowAloneThatSomebodyElseHolds)
     Array list;
     list.appendRow().setText("RSSI", "-71 dBm");
     const auto held = list[0].dictionary();
-    list.clear();
+    list.startOver();
     list.appendRow().setText("RSSI", "-90 dBm");
     EXPECT_EQ(held->at("RSSI"), Value("-71 dBm"));
     EXPECT_EQ(list[0].dictionary()->at("RSSI"), Value("-90 dBm"));
 }
 
-TEST(Array, HoldsWhatCameSinceItWasCleared)
+TEST(Array, HoldsWhatCameSinceItStartedOver)
 {
     Array list{"a", makeDictionary({{"key", "b"}}), "c"};
-    list.clear();
+    list.startOver();
     list.appendRow().setText("other", "d");
     list.appendText("e");
     EXPECT_EQ(Value(std::make_shared<Array>(list)), Value(makeArray({makeDictionary({{"other", "d"}}), "e"})));
@@ -240,6 +240,20 @@ TEST(Array, HoldsWhatCameSinceItWasCleared)
     list.append("g");
     EXPECT_EQ(list.size(), 4u);
     EXPECT_EQ(list.back(), Value("g"));
+}
+
+TEST(Array, LetsGoOfWhatItHeldWhenItIsCleared)
+{
+    const auto held = makeDictionary();
+    Array list{held, "text"};
+    list.startOver();
+    EXPECT_EQ(held.use_count(), 2);
+    list.clear();
+    EXPECT_EQ(held.use_count(), 1);
+    Dictionary dictionary{{"key", held}};
+    dictionary.clear();
+    EXPECT_TRUE(dictionary.empty());
+    EXPECT_EQ(held.use_count(), 1);
 }
 
 TEST(Dictionary, KeepsAnArrayThatIsSetAgain)
@@ -278,19 +292,19 @@ TEST(Dictionary, WordsOnlyWhatHasChanged)
     dictionary.set("RSSI", 5);
     set({&other, 72}, "72");
     EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
-    dictionary.clear();
+    dictionary.startOver();
     set({&other, 72}, "not asked for");
     EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
     EXPECT_EQ(worded, 5);
 }
 
-TEST(Dictionary, HoldsWhatCameSinceItWasCleared)
+TEST(Dictionary, HoldsWhatCameSinceItStartedOver)
 {
     std::mt19937 random(1);
     const auto below = [&](unsigned limit) { return static_cast<unsigned>(random() % limit); };
     Dictionary dictionary;
     for (int round = 0; round < 2000; ++round) {
-        dictionary.clear();
+        round % 10 == 0 ? dictionary.clear() : dictionary.startOver();
         std::vector<std::pair<std::string, std::string>> expected; // in the order in which the keys first came
         for (unsigned set = below(70); set > 0; --set) {
             const auto key = "key " + std::to_string(below(round % 2 == 0 ? 5 : 80));
