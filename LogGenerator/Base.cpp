@@ -39,7 +39,8 @@ void Base::updateLogCodeDict(CodeDictionary& codeDict)
 
 void Base::clearElementsInArray(const SectionRef& array)
 {
-    if (const auto node = array.array()) {
+    // Three sections have nothing to show, record after record: an empty list needs no lock.
+    if (auto* node = array.array(); node != nullptr && !node->empty()) {
         const ArrayLocked locked;
         node->startOver();
     }
@@ -62,9 +63,10 @@ std::int16_t Base::lookUpECNO(std::uint32_t linear)
                                         1949,   1607,   1336,   1120,   949,    813,    705};
     if (linear >= 524288)
         return 0;
-    const auto* step = std::ranges::find_if(kAbove, [linear](std::uint32_t above) { return linear > above; });
+    // Counted rather than searched for: energies vary too much for a search to be foreseen by the processor.
+    const auto step = std::ranges::count_if(kAbove, [linear](std::uint32_t above) { return linear <= above; });
     // Below the scale 0 stands for "no energy": it is shown like full scale, on purpose.
-    return step == std::end(kAbove) ? std::int16_t{0} : static_cast<std::int16_t>(-1 - (step - std::begin(kAbove)));
+    return step == std::ssize(kAbove) ? std::int16_t{0} : static_cast<std::int16_t>(-1 - step);
 }
 
 void Base::logEntry() const
@@ -113,19 +115,19 @@ bool Base::publish(Record data, LogCode logCode, std::span<const Layout> layouts
 
 void Base::publish(Record data, std::span<const Row> rows) const
 {
-    if (const auto node = sectionRef.dictionary())
+    if (auto* node = sectionRef.dictionary())
         show(data, rows, *node);
 }
 
 void Base::publish(std::string_view key, std::string_view text) const
 {
-    if (const auto node = sectionRef.dictionary())
+    if (auto* node = sectionRef.dictionary())
         node->setText(key, text);
 }
 
 void Base::publish(std::string_view key, Value value) const
 {
-    if (const auto node = sectionRef.dictionary())
+    if (auto* node = sectionRef.dictionary())
         node->set(key, std::move(value));
 }
 

@@ -33,12 +33,32 @@ public:
     SectionRef() = default;
     explicit SectionRef(const Value& node) : _dictionary(node.dictionary()), _array(node.array()) {}
 
-    DictionaryRef dictionary() const { return _dictionary.lock(); }
-    ArrayRef array() const { return _array.lock(); }
+    /// Borrowed: the thread that decodes is the one that lets go of displays.
+    Dictionary* dictionary() const { return _dictionary.borrowed(); }
+    Array* array() const { return _array.borrowed(); }
+    /// Shared; null when there is none.
+    Value node() const
+    {
+        return _dictionary.borrowed() != nullptr ? Value(_dictionary.shared()) : Value(_array.shared());
+    }
 
 private:
-    std::weak_ptr<Dictionary> _dictionary;
-    std::weak_ptr<Array> _array;
+    template <typename Container>
+    class Watched {
+    public:
+        Watched() = default;
+        explicit Watched(const std::shared_ptr<Container>& node) : _owner(node), _node(node.get()) {}
+
+        Container* borrowed() const { return _owner.expired() ? nullptr : _node; }
+        std::shared_ptr<Container> shared() const { return _owner.lock(); }
+
+    private:
+        std::weak_ptr<Container> _owner;
+        Container* _node = nullptr;
+    };
+
+    Watched<Dictionary> _dictionary;
+    Watched<Array> _array;
 };
 
 /// One record of a dictionary section: records of `code` shorter than `minimumLength` bytes (header included) are
@@ -91,10 +111,10 @@ public:
     template <std::invocable<Array&> Append>
     static void replaceArray(const SectionRef& array, Append append)
     {
-        const auto node = array.array();
+        auto* node = array.array();
         Array nowhere;
-        Array& list = node ? *node : nowhere;
-        const auto locked = node ? std::make_optional<ArrayLocked>() : std::nullopt;
+        Array& list = node != nullptr ? *node : nowhere;
+        const auto locked = node != nullptr ? std::make_optional<ArrayLocked>() : std::nullopt;
         list.startOver();
         append(list);
     }
@@ -135,8 +155,8 @@ protected:
     template <std::invocable<Array&> Append>
     void publish(std::string_view key, Append append) const
     {
-        if (const auto node = sectionRef.dictionary())
-            append(node->setArray(key));
+        if (auto* node = sectionRef.dictionary())
+            append(node->slot(key).becomeArray());
     }
 
     DecodingRoles& roles;

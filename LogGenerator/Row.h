@@ -24,16 +24,14 @@ public:
     constexpr Conversion(Formatted formatted) : _formatted(formatted) {}
     constexpr Conversion(Named named) : _named(named) {}
 
-    /// Sets the key to the text of the raw value. Nothing is worded anew that stands there already.
-    void set(Dictionary& into, std::string_view key, std::uint32_t raw) const
+    /// Sets the key to the text of the wording's raw value. Nothing is worded anew that stands there already.
+    void set(Dictionary& into, std::string_view key, const Wording& wording) const
     {
-        const Wording wording{
-            _named != nullptr ? reinterpret_cast<const void*>(_named) : reinterpret_cast<const void*>(_formatted), raw};
         into.setWorded(key, wording, [&](Value& value) {
             if (_named != nullptr)
-                value.assignText(_named(raw), wording);
+                value.assignText(_named(wording.raw), wording);
             else
-                value.assignText(_formatted(raw), wording);
+                value.assignText(_formatted(wording.raw), wording);
         });
     }
 
@@ -42,11 +40,22 @@ private:
     Named _named = nullptr;
 };
 
+/// A line of a layout, without where the raw value comes from. A constant: its address stands for it.
+struct Quantity {
+    std::string_view key;
+    Conversion conversion;
+
+    void set(Dictionary& into, std::uint32_t raw) const
+    {
+        if (const Wording wording{this, raw}; !into.passWorded(wording))
+            conversion.set(into, key, wording);
+    }
+};
+
 /// One line of a record's layout: where the field stands, the key it is shown under, how it is worded.
 struct Row {
     Field field;
-    std::string_view key;
-    Conversion conversion;
+    Quantity shown;
 };
 
 /// Where the last field of a layout ends.

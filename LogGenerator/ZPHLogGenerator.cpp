@@ -27,7 +27,7 @@ void ZPHLogGenerator::moveBinDataToState(State& state)
 {
     const std::size_t size = binData.size();
     state.set("DisplayState", Data(std::exchange(binData, {})));
-    binData.reserve(size); // the next interval will be much like this one
+    binData.reserve(size + size / 8); // the next interval will be much like this one
 }
 
 std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) const

@@ -38,7 +38,8 @@ ZPHLogGenerator2::~ZPHLogGenerator2()
 
 void ZPHLogGenerator2::updateState(State& state, Bytes withData)
 {
-    getDisplayFromState(state);
+    if (!isOwnDisplay(state))
+        getDisplayFromState(state);
     // Kept before it is decoded: the raw message outlives a decoder's failure.
     appendToBinData(withData);
     updateWithData(withData);
@@ -115,17 +116,23 @@ Value ZPHLogGenerator2::loadTemplate(State& state) const
     return loaded;
 }
 
+bool ZPHLogGenerator2::isOwnDisplay(const State& state) const
+{
+    const Value* display = state.find("Display");
+    return display != nullptr && display->borrowedDictionary() != nullptr &&
+           display->borrowedDictionary() == _display.dictionary();
+}
+
 Value ZPHLogGenerator2::getDisplayFromState(State& state)
 {
-    if (const Value* display = state.find("Display"); display != nullptr && display->borrowedDictionary() != nullptr &&
-                                                      display->borrowedDictionary() == _display.lock().get())
-        return *display;
+    if (isOwnDisplay(state))
+        return state.at("Display");
 
     dropForeignDisplay(state);
     const Value existing = state.at("Display");
     if (originOfDisplay(state) == Origin::Own) {
         takeOver(loadTemplate(state), existing);
-        _display = existing.dictionary();
+        _display = SectionRef(existing);
     }
     if (existing)
         return existing;
@@ -141,7 +148,7 @@ Value ZPHLogGenerator2::getDisplayFromState(State& state)
     printDict(built);
     setDisplay(state, built);
     state.set("ExtraInfo", makeDictionary());
-    _display = built.dictionary();
+    _display = SectionRef(built);
     return existing;
 }
 

@@ -37,6 +37,8 @@ protected:
     ZPHLogGenerator2(DecodingRoles& roles, Uninitialized uninitialized) : ZPHLogGenerator(roles, uninitialized) {}
 
 private:
+    /// Whether the display in the state is the one whose nodes the sections hold.
+    bool isOwnDisplay(const State& state) const;
     Value loadTemplate(State& state) const;
     /// Gives the sections the nodes of a display that an earlier generator built from the same template. Walks both
     /// side by side: only keys that the template has can be sections.
@@ -44,7 +46,7 @@ private:
 
     std::string _pListName;
     std::unique_ptr<ClassIndex> _cIndex;
-    std::weak_ptr<Dictionary> _display; ///< whose nodes the sections hold
+    SectionRef _display; ///< whose nodes the sections hold
 };
 
 } // namespace kestrum

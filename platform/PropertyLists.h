@@ -17,6 +17,9 @@ public:
     /// Any form (XML or binary), told apart by the bytes. Null for anything that is no property list; nothing that
     /// the bytes hold can crash, hang or exhaust memory.
     virtual Value parse(Bytes bytes) const = 0;
+    /// The same, possibly made of the containers of a value that is spent: lists of one kind come again and again.
+    /// Containers that somebody else still holds are left alone.
+    virtual Value parseOver(Bytes bytes, [[maybe_unused]] Value spent) const { return parse(bytes); }
 
     /// The XML form, version 1.0. Nulls are left out, characters that XML forbids become U+FFFD.
     /// Nothing when the value is null or nested too deeply.

@@ -9,17 +9,8 @@
 namespace kestrum {
 namespace {
 
-// Below this many keys a look through them is faster than the index.
-constexpr std::size_t kIndexFrom = 48;
 // Room for the keys of most rows and cells at once.
 constexpr std::size_t kKeysOfARow = 8;
-
-/// Of a container and the reference in hand: whether nobody else holds it.
-template <typename Container>
-bool isAlone(const std::shared_ptr<Container>& container)
-{
-    return container.use_count() == 2;
-}
 
 } // namespace
 
@@ -103,6 +94,29 @@ std::optional<std::int32_t> Value::int32() const
     return std::nullopt;
 }
 
+template <typename Container>
+Container& Value::become()
+{
+    auto* held = std::get_if<std::shared_ptr<Container>>(&_held);
+    if (held == nullptr || held->use_count() > 1) {
+        *this = std::make_shared<Container>();
+        held = std::get_if<std::shared_ptr<Container>>(&_held);
+    } else {
+        (*held)->startOver();
+    }
+    return **held;
+}
+
+Array& Value::becomeArray()
+{
+    return become<Array>();
+}
+
+Dictionary& Value::becomeDictionary()
+{
+    return become<Dictionary>();
+}
+
 void Value::assignText(std::string_view text, Wording wording)
 {
     _wording = wording;
@@ -174,34 +188,9 @@ std::string_view nameOf(Value::Kind kind)
     return "unknown";
 }
 
-Value& Array::added()
+void Array::dropSpares()
 {
-    if (_size == _elements.size())
-        _elements.emplace_back();
-    return _elements[_size++];
-}
-
-void Array::append(Value element)
-{
-    added() = std::move(element);
-}
-
-void Array::appendText(std::string_view text)
-{
-    added().assignText(text);
-}
-
-Dictionary& Array::appendRow()
-{
-    Value& row = added();
-    auto dictionary = row.dictionary();
-    if (dictionary && isAlone(dictionary)) {
-        dictionary->startOver();
-    } else {
-        dictionary = makeDictionary();
-        row = dictionary;
-    }
-    return *dictionary;
+    _elements.erase(end(), _elements.end());
 }
 
 Dictionary::Dictionary(std::initializer_list<Entry> entries)
@@ -215,6 +204,8 @@ std::size_t Dictionary::indexOf(std::string_view key) const
     std::size_t at = 0;
     if (_next < _size && _entries[_next].key == key) {
         at = _next;
+    } else if (_next > 0 && _entries[_next - 1].key == key) {
+        at = _next - 1;
     } else if (!_index.empty()) {
         const auto known = _index.find(key);
         at = known == _index.end() ? _size : known->second;
@@ -240,37 +231,17 @@ Value Dictionary::at(std::string_view key) const
     return found ? *found : Value();
 }
 
-Array& Dictionary::setArray(std::string_view key)
+Value& Dictionary::slotElsewhere(std::string_view key)
 {
-    Value& value = slot(key);
-    auto array = value.array();
-    if (array && isAlone(array)) {
-        array->startOver();
-    } else {
-        array = makeArray();
-        value = array;
-    }
-    return *array;
-}
-
-Value& Dictionary::slot(std::string_view key)
-{
-    // Mostly it is the entry behind the last one, or the first of the spares.
-    const bool expected = _next <= _size && _next < _entries.size() && _entries[_next].key == key;
-    if (expected && _next < _size)
-        return _entries[_next++].value;
-    if (!expected) {
-        if (const std::size_t at = indexOf(key); at != kNotThere)
-            return _entries[at].value;
-        _entries.erase(end(), _entries.end()); // one of the spares may have this key
-        if (_entries.empty())
-            _entries.reserve(kKeysOfARow);
-        _entries.push_back({std::string(key), Value()});
-    }
-    _next = ++_size;
-    if (_size > kIndexFrom)
-        index();
-    return _entries[_size - 1].value;
+    if (const std::size_t at = indexOf(key); at != kNotThere)
+        return _entries[at].value;
+    dropSpares(); // one of them may have this key
+    if (_entries.empty())
+        _entries.reserve(kKeysOfARow);
+    _entries.push_back({std::string(key), Value()});
+    takeSpare();
+    _next = _size;
+    return _entries.back().value;
 }
 
 void Dictionary::index()
@@ -298,12 +269,9 @@ void Dictionary::clear()
     startOver();
 }
 
-void Dictionary::startOver()
+void Dictionary::dropSpares()
 {
-    _size = 0;
-    _next = 0;
-    if (!_index.empty())
-        _index.clear();
+    _entries.erase(end(), _entries.end());
 }
 
 ArrayRef makeArray(std::vector<Value> elements)

@@ -25,9 +25,9 @@ class Dictionary;
 using ArrayRef = std::shared_ptr<Array>;
 using DictionaryRef = std::shared_ptr<Dictionary>;
 
-/// What a text was made of: a raw value, by a function. Equal wordings give equal texts.
+/// What a text was made of: a raw value, by a line of a layout. Equal wordings give equal texts.
 struct Wording {
-    const void* function = nullptr; ///< only compared
+    const void* line = nullptr; ///< of a constant layout; only compared
     std::uint32_t raw = 0;
 
     friend bool operator==(const Wording&, const Wording&) = default;
@@ -81,6 +81,10 @@ public:
     /// A 32-bit number: an integer in range, or a real without fraction in range. A boolean is no number.
     std::optional<std::int32_t> int32() const;
 
+    /// Makes this an empty container: the one it holds, started over, unless somebody else holds that too.
+    Array& becomeArray();
+    Dictionary& becomeDictionary();
+
     /// Makes this a string, reusing the storage of the one it holds.
     void assignText(std::string_view text, Wording wording = {});
     /// Whether it is the text that was assigned with this wording: then nothing has to be worded anew. Most fields of
@@ -92,6 +96,9 @@ public:
     friend bool operator==(const Value& left, const Value& right);
 
 private:
+    template <typename Container>
+    Container& become();
+
     std::variant<std::monostate, std::string, std::int64_t, std::uint64_t, double, bool, Date, Data, ArrayRef,
                  DictionaryRef>
         _held;
@@ -101,8 +108,8 @@ private:
 /// The kind's name as it is put into messages: "string", "integer", ...
 std::string_view nameOf(Value::Kind kind);
 
-/// Values in order. `startOver` keeps what stood there, as spares: `appendRow` and `appendText` then fill the same
-/// storage again. Lists are rewritten thousands of times a second, mostly with as much as before.
+/// Values in order. `startOver` keeps what stood there, as spares, whose storage is then filled again. Lists are
+/// rewritten thousands of times a second, mostly with as much as before.
 class Array {
 public:
     Array() = default;
@@ -119,11 +126,19 @@ public:
         _size = 0;
     }
     void startOver() { _size = 0; } ///< empty, as after `clear`
+    void dropSpares();
     void reserve(std::size_t count) { _elements.reserve(count); }
-    void append(Value element);
-    void appendText(std::string_view text);
-    /// Appends a dictionary without entries: a spare one, unless somebody else still holds it.
-    Dictionary& appendRow();
+    /// Appends a value that is still to be set: a spare one as it is, or null.
+    Value& slot()
+    {
+        if (_size == _elements.size())
+            _elements.emplace_back();
+        return _elements[_size++];
+    }
+    void append(Value element) { slot() = std::move(element); }
+    void appendText(std::string_view text) { slot().assignText(text); }
+    /// Appends a dictionary without entries.
+    Dictionary& appendRow() { return slot().becomeDictionary(); }
     /// `count` is not above `size()`.
     void removeFirst(std::size_t count)
     {
@@ -140,8 +155,6 @@ public:
     auto end() { return _elements.begin() + static_cast<std::ptrdiff_t>(_size); }
 
 private:
-    Value& added();
-
     std::vector<Value> _elements; ///< the spares behind the others
     std::size_t _size = 0;
 };
@@ -170,6 +183,17 @@ public:
     Value at(std::string_view key) const;
     bool contains(std::string_view key) const { return find(key) != nullptr; }
 
+    /// The value under `key`. A key that is not there is appended, its value still to be set: a spare one as it is, or
+    /// null.
+    Value& slot(std::string_view key)
+    {
+        const auto expected = _entries.begin() + static_cast<std::ptrdiff_t>(_next);
+        if (expected == _entries.end() || expected->key != key)
+            return slotElsewhere(key);
+        if (_next++ == _size)
+            takeSpare();
+        return expected->value;
+    }
     /// Replaces the value under `key` in its place, or appends the key.
     void set(std::string_view key, Value value) { slot(key) = std::move(value); }
     /// As `set`, without allocating when a text of that length stands there already.
@@ -181,11 +205,25 @@ public:
         if (Value& value = slot(key); !value.isWorded(wording))
             word(value);
     }
-    /// Sets an empty array: the one that stands there, unless somebody else still holds it.
-    Array& setArray(std::string_view key);
+    /// `setWorded` for the usual case, without a look at the key: whether the next entry has this wording, and stays.
+    /// Only for lines that always word the same key.
+    bool passWorded(const Wording& wording)
+    {
+        if (_next == _entries.size() || !_entries[_next].value.isWorded(wording))
+            return false;
+        if (_next++ == _size)
+            takeSpare();
+        return true;
+    }
     void remove(std::string_view key);
     void clear();
-    void startOver(); ///< empty, as after `clear`
+    void startOver() ///< empty, as after `clear`
+    {
+        _size = _next = 0;
+        if (!_index.empty())
+            _index.clear();
+    }
+    void dropSpares();
 
     auto begin() const { return _entries.begin(); }
     auto end() const { return _entries.begin() + static_cast<std::ptrdiff_t>(_size); }
@@ -195,13 +233,22 @@ public:
 private:
     static constexpr std::size_t kNotThere = static_cast<std::size_t>(-1);
 
+    // Below this many keys a look through them is faster than the index.
+    static constexpr std::size_t kIndexFrom = 48;
+
     std::size_t indexOf(std::string_view key) const;
-    Value& slot(std::string_view key);
+    Value& slotElsewhere(std::string_view key);
+    void takeSpare()
+    {
+        if (++_size > kIndexFrom)
+            index();
+    }
     void index();
 
     std::vector<Entry> _entries; ///< the spares behind the others; no two keys are equal
     std::size_t _size = 0;
-    // Decoders set their keys in the same order each time, so the entry behind the last one found is tried first.
+    // Decoders set their keys in the same order each time, or ask for the same one: the entry behind the last one
+    // found is tried first, then that itself. Not above `_size`.
     mutable std::size_t _next = 0;
     // Kept beyond a few dozen keys only: property lists from outside may hold many thousands. Sorted, for keys can be
     // chosen to collide in any hash.

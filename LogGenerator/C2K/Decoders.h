@@ -4,7 +4,9 @@
 #include "LogGenerator/Row.h"
 #include "support/Record.h"
 
+#include <concepts>
 #include <span>
+#include <string>
 #include <string_view>
 
 namespace kestrum {
@@ -19,9 +21,14 @@ public:
         : state(runState), log(roles.log), _lookup(places), _watch(roles.watch)
     {}
 
-    /// Sets the text, or the list, at all places of the identifier, up to the first that is none.
+    /// Sets the text at all places of the identifier, up to the first that is none.
     void publish(std::string_view identifier, std::string_view text) const;
-    void publish(std::string_view identifier, const DictionaryRef& list) const;
+    /// The same with what `set` makes of the value that stands there.
+    template <std::invocable<Value&> Set>
+    void publish(std::string_view identifier, Set set) const
+    {
+        atPlacesOf(identifier, [&set](Dictionary& node, const std::string& key) { set(node.slot(key)); });
+    }
     /// The rows' keys are the identifiers.
     void publish(Record record, std::span<const Row> rows) const;
 
@@ -32,12 +39,30 @@ public:
     SystemLog& log;
 
 private:
-    template <typename Set>
+    template <std::invocable<Dictionary&, const std::string&> Set>
     void atPlacesOf(std::string_view identifier, Set set) const;
 
     DictionaryRef _lookup;
     RecordWatch* _watch;
 };
+
+template <std::invocable<Dictionary&, const std::string&> Set>
+void C2KContext::atPlacesOf(std::string_view identifier, Set set) const
+{
+    const Value* found = _lookup ? _lookup->find(identifier) : nullptr;
+    const auto places = found != nullptr ? found->array() : nullptr;
+    if (!places)
+        return;
+    for (const auto& place : *places) {
+        const auto entry = place.dictionary();
+        const Value* node = entry ? entry->find("dict") : nullptr;
+        const Value* key = entry ? entry->find("key") : nullptr;
+        const auto dictionary = node != nullptr ? node->dictionary() : nullptr;
+        if (!dictionary || key == nullptr || key->string() == nullptr)
+            return;
+        set(*dictionary, *key->string());
+    }
+}
 
 // One decoder for each log code (3GPP2 C.S0005 for 1x, C.S0024 for EV-DO). A record of a wrong length publishes
 // nothing, logs one line, and leaves every value as it was. Offsets count from the record's first byte, header

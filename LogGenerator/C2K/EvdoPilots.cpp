@@ -26,11 +26,12 @@ unsigned lengthOf(Record record)
     return static_cast<unsigned>(record.size());
 }
 
-/// {"_sorted", "0;PN": strength, ...}: the index first, so that the list keeps the record's order. A pilot that is
-/// left out leaves a gap in the index.
-DictionaryRef strengths(Record record, const PilotList& list, std::uint32_t count, std::optional<std::uint32_t> leftOut)
+/// Lists {"_sorted", "0;PN": strength, ...}: the index first, so that the list keeps the record's order. A pilot that
+/// is left out leaves a gap in the index.
+void listStrengths(Record record, const PilotList& list, std::uint32_t count, std::optional<std::uint32_t> leftOut,
+                   Dictionary& shown)
 {
-    auto shownPilots = makeDictionary({{"_sorted", "_sorted"}});
+    shown.setText("_sorted", "_sorted");
     for (std::uint32_t i = 0; i < count; ++i) {
         const auto pilot = record.slice(list.first + list.size * i, list.size);
         if (!pilot)
@@ -39,18 +40,20 @@ DictionaryRef strengths(Record record, const PilotList& list, std::uint32_t coun
         if (leftOut == pn)
             continue;
         const double ratio = pilot->read(list.energy).value_or(0) / 512.0;
-        shownPilots->set(format("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
-                         format("%+.2f dB", 10.0 * std::log10(ratio)));
+        shown.setText(format("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
+                      format("%+.2f dB", 10.0 * std::log10(ratio)));
     }
-    return shownPilots;
 }
 
-void publishPilots(C2KContext& context, std::string_view identifier, const DictionaryRef& pilots)
+void publishPilots(C2KContext& context, std::string_view identifier, Record record, const PilotList& list,
+                   std::uint32_t count, std::optional<std::uint32_t> leftOut = std::nullopt)
 {
-    if (pilots->size() > 1)
-        context.publish(identifier, pilots);
-    else
-        context.publish(identifier, "(none)");
+    context.publish(identifier, [&](Value& shown) {
+        Dictionary& pilots = shown.becomeDictionary();
+        listStrengths(record, list, count, leftOut, pilots);
+        if (pilots.size() == 1)
+            shown = "(none)";
+    });
 }
 
 } // namespace
@@ -68,7 +71,7 @@ void decodeActiveSetPilots(Record record, C2KContext& context)
                                     static_cast<std::int32_t>(count)));
         return;
     }
-    publishPilots(context, "kActiveSetPilots", strengths(record, kActiveSet, count, std::nullopt));
+    publishPilots(context, "kActiveSetPilots", record, kActiveSet, count);
 }
 
 void decodeFingers(Record record, C2KContext& context)
@@ -85,7 +88,7 @@ void decodeFingers(Record record, C2KContext& context)
                                     lengthOf(record), static_cast<std::int32_t>(count), kFingers.first));
         return;
     }
-    publishPilots(context, "kFingerC2I", strengths(record, kFingers, count, kUnusedFinger));
+    publishPilots(context, "kFingerC2I", record, kFingers, count, kUnusedFinger);
 }
 
 } // namespace kestrum

@@ -76,15 +76,15 @@ double strengthDb(double n, double gain, double k, double energy)
     return 10.0 * std::log10(share > kFloor ? share : kFloor);
 }
 
-/// {"_sorted", "0;PN": strength, ...}, up to the first pilot that does not lie inside the record.
-DictionaryRef pilots(Record activeSet)
+/// Lists {"_sorted", "0;PN": strength, ...}, up to the first pilot that does not lie inside the record.
+void listPilots(Record activeSet, Dictionary& shown)
 {
     const auto field = [&](Field which) { return activeSet.read(which).value_or(0); };
     const auto n = field(u16(4)), gain = field(u8(6)), k = field(u8(7)), count = field(u8(8)), m = field(u8(9));
     const auto reference = field(u16(10));
     const std::size_t size = (std::size_t{6} * m + 15) / 4 * 4;
 
-    auto shownPilots = makeDictionary({{"_sorted", "_sorted"}});
+    shown.setText("_sorted", "_sorted");
     for (std::uint32_t j = 0; j < count; ++j) {
         const auto pnField = activeSet.slice(12 + size * j, 2);
         const auto energyField = activeSet.slice(24 + 4 * m + size * j, 2);
@@ -92,10 +92,9 @@ DictionaryRef pilots(Record activeSet)
             break;
         const auto pn = pnField->read(u16(0)).value_or(0);
         const double strength = strengthDb(n, gain, k, energyField->read(u16(0)).value_or(0));
-        shownPilots->set(format("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
-                         pn == reference ? format("(ref pilot) %+.2f dB", strength) : format("%+.2f dB", strength));
+        shown.setText(format("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
+                      pn == reference ? format("(ref pilot) %+.2f dB", strength) : format("%+.2f dB", strength));
     }
-    return shownPilots;
 }
 
 } // namespace
@@ -127,8 +126,8 @@ void decodeOneXStatus(Record record, C2KContext& context)
         context.publish(*rf, kChain1);
     else
         for (const auto& row : kChain1)
-            context.publish(row.key, "N/A");
-    context.publish("k1xActiveSetInfo", pilots(*activeSet));
+            context.publish(row.shown.key, "N/A");
+    context.publish("k1xActiveSetInfo", [&](Value& shown) { listPilots(*activeSet, shown.becomeDictionary()); });
 
     // The last call's frame errors, once, after it ended.
     if (const auto ratio = context.state.at("TrafficFER").real(); ratio && !inTraffic) {

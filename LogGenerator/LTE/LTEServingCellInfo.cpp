@@ -81,11 +81,11 @@ void LTEServingCellInfo::updateWithData(Record data, LogCode logCode)
             return;
         publish(data, kServingCell);
         // The frequencies above stand for the cell monitor's.
-        if (const auto node = sectionRef.dictionary())
+        if (auto* node = sectionRef.dictionary())
             node->remove("UARFCN");
         return;
     case 0xFF0001:
-        return showServingCell(data, {kVoxCellTechnology_LTE}, kMonitoredCell, sectionRef.dictionary().get(), roles);
+        return showServingCell(data, {kVoxCellTechnology_LTE}, kMonitoredCell, sectionRef.dictionary(), roles);
     default:
         reportUnknown(logCode);
     }

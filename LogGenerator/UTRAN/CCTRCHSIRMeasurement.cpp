@@ -32,7 +32,7 @@ std::string sir(Record entry)
 void showEntry(Record entry, Dictionary& row)
 {
     show(entry, kEntry, row);
-    listed(entry, kSirs, kSirCount, sir)(row.setArray("SIR"));
+    listed(entry, kSirs, kSirCount, sir)(row.slot("SIR").becomeArray());
 }
 
 } // namespace

@@ -46,7 +46,7 @@ void RRC_State::updateWithData(Record data, LogCode logCode)
     const std::string_view name = mode < std::size(kModeNames) ? kModeNames[mode] : "Unknown RRC Mode";
     publish("State", name);
     if (roles.console.isDebugWatched())
-        roles.console.debug(format("Display Dict = %@, rrc mode = %d %@", describe(sectionRef.dictionary()),
+        roles.console.debug(format("Display Dict = %@, rrc mode = %d %@", describe(sectionRef.node()),
                                    static_cast<std::int32_t>(mode), name));
 }
 

@@ -61,7 +61,7 @@ void UTRANServingCellInfo::updateWithData(Record data, LogCode logCode)
         // Every serving cell is shown in turn, so that the last one stays, on purpose.
         for (const Value& cell : *cells)
             if (isCell(cell, kVoxCellTechnology_UTRAN2, kVoxCellType_Serving))
-                showCell(cell, kMonitoredCell, sectionRef.dictionary().get(), roles.log);
+                showCell(cell, kMonitoredCell, sectionRef.dictionary(), roles.log);
     }
 }
 

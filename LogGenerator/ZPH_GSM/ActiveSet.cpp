@@ -33,15 +33,18 @@ std::string decibels(std::uint32_t raw)
     return format("%d dB", static_cast<std::int32_t>(raw));
 }
 
-constexpr Conversion kNumber = decimal, kDecibels = decibels;
+// clang-format off
+constexpr Quantity kShownCode{"Scrambling Code", decimal};
+constexpr Quantity kShownRscp{"RSCP",            decibels}; // "dB", though it is in dBm: kept on purpose
+constexpr Quantity kShownEcNo{"Energy Per Chip", decibels};
+// clang-format on
 
 void showCell(Record cell, Record measurement, int power, Dictionary& row)
 {
     const int energyPerChip = Base::lookUpECNO(energyOf(measurement));
-    kNumber.set(row, "Scrambling Code", cell.read(kScramblingCode).value_or(0));
-    // "dB", though it is in dBm: kept on purpose.
-    kDecibels.set(row, "RSCP", static_cast<std::uint32_t>(power + energyPerChip));
-    kDecibels.set(row, "Energy Per Chip", static_cast<std::uint32_t>(energyPerChip));
+    kShownCode.set(row, cell.read(kScramblingCode).value_or(0));
+    kShownRscp.set(row, static_cast<std::uint32_t>(power + energyPerChip));
+    kShownEcNo.set(row, static_cast<std::uint32_t>(energyPerChip));
 }
 
 } // namespace

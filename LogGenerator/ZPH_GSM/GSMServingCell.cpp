@@ -57,7 +57,7 @@ void GSMServingCell::updateWithData(Record data, LogCode logCode)
 {
     logEntry();
     if (logCode == kCellMonitor)
-        showServingCell(data, {kVoxCellTechnology_GSM}, kCell, sectionRef.dictionary().get(), roles);
+        showServingCell(data, {kVoxCellTechnology_GSM}, kCell, sectionRef.dictionary(), roles);
     else if (!publish(data, logCode, kLayouts))
         reportUnknown(logCode);
 }

@@ -26,7 +26,7 @@ constexpr Field kColourCodeCount = u8(14);
 constexpr Elements kColoured{15, 4};
 constexpr Field kBsic = u8(2);
 
-constexpr Conversion kNumber = decimal;
+constexpr Quantity kColourCode{"BSIC", decimal};
 
 std::string level(std::uint32_t raw)
 {
@@ -94,7 +94,7 @@ void NeighboringCells::listMeasurements(Record data) const
     const auto measured = [this](Record cell, Dictionary& row) {
         show(cell, kMeasuredCell, row);
         if (const auto known = arfcnToBsic.find(cell.read(kArfcn).value_or(0)); known != arfcnToBsic.end())
-            kNumber.set(row, "BSIC", known->second);
+            kColourCode.set(row, known->second);
     };
     replaceArray(sectionRef, listed(data, kMeasured, data.read(kMeasurementCount).value_or(0), measured));
 }

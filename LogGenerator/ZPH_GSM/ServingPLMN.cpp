@@ -86,8 +86,7 @@ void ServingPLMN::updateWithData(Record data, LogCode logCode)
 {
     logEntry();
     if (logCode == kCellMonitor)
-        showServingCell(data, {kVoxCellTechnology_GSM, kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary().get(),
-                        roles);
+        showServingCell(data, {kVoxCellTechnology_GSM, kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
     else if (!publish(data, logCode, kLayouts))
         reportUnknown(logCode);
 }

@@ -72,7 +72,7 @@ void UMTSRRInfo::updateWithData(Record data, LogCode logCode)
 {
     logEntry();
     if (logCode == kCellMonitor)
-        showServingCell(data, {kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary().get(), roles);
+        showServingCell(data, {kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
     else if (logCode == kTransmitPower)
         showTransmitPower(data);
     else if (!publish(data, logCode, kLayouts))
@@ -105,7 +105,7 @@ void UMTSRRInfo::showTransmitPower(Record data) const
 void UMTSRRInfo::forgetMonitoredFrequency() const
 {
     // The modem's own downlink frequency replaces it until the cell monitor speaks again.
-    if (const auto node = sectionRef.dictionary())
+    if (auto* node = sectionRef.dictionary())
         node->remove("UARFCN");
 }
 

@@ -57,13 +57,13 @@ std::optional<std::string> xmlText(const Value& value)
 
 } // namespace
 
-PropertyListCodec::Parsed PropertyListCodec::parseWithError(Bytes bytes) const
+PropertyListCodec::Parsed PropertyListCodec::parseWithError(Bytes bytes, Value spent) const
 {
     try {
         if (bytes.size() > kMaxBytes)
             throw propertylist::Refusal{"too many bytes"};
         return {textOf(bytes).starts_with(propertylist::kBinaryMagic) ? propertylist::readBinary(bytes)
-                                                                      : propertylist::readXml(bytes)};
+                                                                      : propertylist::readXml(bytes, std::move(spent))};
     } catch (propertylist::Refusal& refusal) {
         return {Value(), std::move(refusal.reason), refusal.offset};
     }
@@ -72,6 +72,11 @@ PropertyListCodec::Parsed PropertyListCodec::parseWithError(Bytes bytes) const
 Value PropertyListCodec::parse(Bytes bytes) const
 {
     return parseWithError(bytes).value;
+}
+
+Value PropertyListCodec::parseOver(Bytes bytes, Value spent) const
+{
+    return parseWithError(bytes, std::move(spent)).value;
 }
 
 std::optional<Data> PropertyListCodec::toXml(const Value& value) const

@@ -23,6 +23,7 @@ public:
 
     /// Null for what is no property list, as `parseWithError`.
     Value parse(Bytes bytes) const override;
+    Value parseOver(Bytes bytes, Value spent) const override;
 
     /// Also nothing for a date outside the years 0 to 9999, and beyond the limits above, which a list that contains
     /// itself exceeds. Fractions of a second are cut off.
@@ -39,7 +40,7 @@ public:
 
         explicit operator bool() const { return reason.empty(); }
     };
-    Parsed parseWithError(Bytes bytes) const;
+    Parsed parseWithError(Bytes bytes, Value spent = {}) const;
 };
 
 } // namespace kestrum

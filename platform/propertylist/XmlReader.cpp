@@ -127,7 +127,7 @@ private:
 
 class XmlReader {
 public:
-    explicit XmlReader(Bytes bytes) : _bytes(bytes), _parser(bytes.size()) {}
+    XmlReader(Bytes bytes, Value spent) : _bytes(bytes), _parser(bytes.size()), _root(std::move(spent)) {}
 
     Value read()
     {
@@ -157,10 +157,10 @@ public:
 private:
     enum class Element { Plist, Dict, Array, Key, String, Integer, Real, Date, Data, True, False };
 
-    /// An element that holds others; <plist> holds the root.
+    /// An element that holds others; <plist> holds the root. What it fills stands in the root already.
     struct Container {
-        ArrayRef array = nullptr;
-        DictionaryRef dictionary = nullptr;
+        Array* array = nullptr;
+        Dictionary* dictionary = nullptr;
         std::string key = {};
         bool awaitsValue = false; ///< of the key that was read
     };
@@ -191,7 +191,7 @@ private:
 
     static Element elementNamed(std::string_view name)
     {
-        constexpr std::pair<std::string_view, Element> kElements[] = {
+        static constexpr std::pair<std::string_view, Element> kElements[] = {
             {"key", Element::Key},     {"string", Element::String}, {"integer", Element::Integer},
             {"dict", Element::Dict},   {"array", Element::Array},   {"true", Element::True},
             {"false", Element::False}, {"real", Element::Real},     {"date", Element::Date},
@@ -212,9 +212,9 @@ private:
         if (element == Element::Dict || element == Element::Array)
             checkDepth(_open.size() - 1); // <plist> is no level of its own
         if (element == Element::Dict)
-            _open.push_back({.dictionary = makeDictionary()});
+            _open.push_back({.dictionary = &slot().becomeDictionary()});
         else if (element == Element::Array)
-            _open.push_back({.array = makeArray()});
+            _open.push_back({.array = &slot().becomeArray()});
         else if (element == Element::Plist)
             _open.emplace_back();
         else
@@ -228,9 +228,9 @@ private:
         if (_open.empty() || _leaf)
             return false;
         const Container& inner = _open.back();
-        if (inner.dictionary)
+        if (inner.dictionary != nullptr)
             return (element == Element::Key) != inner.awaitsValue;
-        return element != Element::Key && (inner.array || _root.isNull());
+        return element != Element::Key && (inner.array != nullptr || !_hasRoot);
     }
 
     void characters(std::string_view text)
@@ -246,20 +246,22 @@ private:
         if (const auto leaf = std::exchange(_leaf, std::nullopt)) {
             if (*leaf == Element::Key)
                 takeKey();
+            else if (*leaf == Element::String)
+                slot().assignText(_text);
             else
-                add(valueOf(*leaf));
+                slot() = valueOf(*leaf);
             return;
         }
-        const Container closed = std::move(_open.back());
-        _open.pop_back();
+        const Container& closed = _open.back();
         if (closed.awaitsValue)
             throw Refusal{"a key without a value"};
-        if (closed.dictionary)
-            add(closed.dictionary);
-        else if (closed.array)
-            add(closed.array);
-        else if (_root.isNull())
+        if (closed.dictionary != nullptr)
+            closed.dictionary->dropSpares();
+        else if (closed.array != nullptr)
+            closed.array->dropSpares();
+        else if (!_hasRoot)
             throw Refusal{"no value inside <plist>"};
+        _open.pop_back();
     }
 
     /// By exchange: the next text finds room.
@@ -270,7 +272,7 @@ private:
         inner.awaitsValue = true;
     }
 
-    /// Of the text that has been read.
+    /// Of the text that has been read, for all leaves but keys and strings.
     Value valueOf(Element leaf)
     {
         switch (leaf) {
@@ -282,26 +284,22 @@ private:
             return dateFrom(_text);
         case Element::Data:
             return dataFrom(_text);
-        case Element::True:
-            return booleanFrom(_text, true);
-        case Element::False:
-            return booleanFrom(_text, false);
         default:
-            return std::move(_text);
+            return booleanFrom(_text, leaf == Element::True);
         }
     }
 
-    /// Gives a complete value to the element that holds it.
-    void add(Value value)
+    /// Where the innermost open element wants its next value.
+    Value& slot()
     {
         Container& inner = _open.back();
-        if (inner.array)
-            inner.array->append(std::move(value));
-        else if (inner.dictionary)
-            inner.dictionary->set(inner.key, std::move(value));
-        else
-            _root = std::move(value);
         inner.awaitsValue = false;
+        if (inner.array != nullptr)
+            return inner.array->slot();
+        if (inner.dictionary != nullptr)
+            return inner.dictionary->slot(inner.key);
+        _hasRoot = true;
+        return _root;
     }
 
     void doctype(bool declaresAnything)
@@ -318,15 +316,16 @@ private:
     std::vector<Container> _open;
     std::optional<Element> _leaf; ///< inside the innermost of those
     std::string _text;            ///< of the leaf
-    Value _root;
+    Value _root;                  ///< before it is read, the spent one
+    bool _hasRoot = false;
     Budget _budget{PropertyListCodec::kMaxNodes, PropertyListCodec::kMaxBytes};
 };
 
 } // namespace
 
-Value readXml(Bytes bytes)
+Value readXml(Bytes bytes, Value spent)
 {
-    return XmlReader(bytes).read();
+    return XmlReader(bytes, std::move(spent)).read();
 }
 
 } // namespace kestrum::propertylist

@@ -4,7 +4,8 @@
 
 namespace kestrum::propertylist {
 
-/// The value of a property list in XML; throws `Refusal` for anything else.
-Value readXml(Bytes bytes);
+/// The value of a property list in XML; throws `Refusal` for anything else. Made of the containers and texts of the
+/// `spent` one where it can.
+Value readXml(Bytes bytes, Value spent = {});
 
 } // namespace kestrum::propertylist

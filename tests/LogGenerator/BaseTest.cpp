@@ -153,6 +153,16 @@ TEST_F(BaseOf, ListIsClearedUnderTheLock)
     EXPECT_EQ(counts.unlocked, 1);
 }
 
+TEST_F(BaseOf, EmptyListIsClearedWithoutTheLock)
+{
+    const CountedArrayLock counts;
+    auto node = makeArray();
+    section.updateSectionRef(node);
+    Base::clearElementsInArray(section.sectionRef);
+    EXPECT_TRUE(node->empty());
+    EXPECT_EQ(counts.locked, 0);
+}
+
 TEST_F(BaseOf, NodeOfTheOtherShapeIsLeftAlone)
 {
     auto dictionary = makeDictionary({{"a", "x"}});

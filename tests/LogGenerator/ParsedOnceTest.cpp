@@ -2,6 +2,8 @@
 
 #include <gtest/gtest.h>
 
+#include <utility>
+
 namespace kestrum {
 namespace {
 
@@ -13,11 +15,17 @@ public:
         ++parsed;
         return textOf(bytes) == "none" ? Value() : Value(makeArray({Value(textOf(bytes))}));
     }
+    Value parseOver(Bytes bytes, Value spentList) const override
+    {
+        spent = std::move(spentList);
+        return parse(bytes);
+    }
     std::optional<Data> toXml(const Value&) const override { return Data(bytesOf("xml")); }
     Value load(const std::string& path) const override { return path; }
     bool write(const Dictionary&, const std::string& path) const override { return path == "writable"; }
 
     mutable int parsed = 0;
+    mutable Value spent;
 };
 
 TEST(ParsedOnce, ReadsEqualBytesOnce)
@@ -39,6 +47,16 @@ TEST(ParsedOnce, ReadsOtherBytesAtTheSameAddressAnew)
     once.parse(bytesOf(buffer));
     buffer = "files";
     EXPECT_EQ(once.parse(bytesOf(buffer)), Value(makeArray({"files"})));
+}
+
+TEST(ParsedOnce, OffersTheListThatItForgetsToTheNext)
+{
+    const CountingLists lists;
+    const ParsedOnce once(lists);
+    const Value first = once.parse(bytesOf("cells"));
+    EXPECT_TRUE(lists.spent.isNull());
+    once.parse(bytesOf("files"));
+    EXPECT_EQ(lists.spent.array(), first.array());
 }
 
 TEST(ParsedOnce, RemembersThatBytesAreNone)

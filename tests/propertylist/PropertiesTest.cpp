@@ -79,6 +79,21 @@ RC_GTEST_PROP(AnyValue, ComesBackFromXml, ())
     RC_ASSERT(describe(read.value) == describe(value)); // in the same order, too
 }
 
+RC_GTEST_PROP(AnyValue, ComesBackFromXmlWhateverIsSpent, ())
+{
+    const Value value = *values(2), spent = *values(2);
+    const Value held = deepCopy(spent);
+    const std::string xml = xmlOf(value);
+    const auto over = [&xml](Value given) { return PropertyListCodec().parseOver(bytesOf(xml), std::move(given)); };
+    RC_ASSERT(describe(over(deepCopy(spent))) == describe(value));
+    // The own one again, as it is and grown by another.
+    RC_ASSERT(describe(over(over({}))) == describe(value));
+    RC_ASSERT(describe(over(over(makeArray({deepCopy(spent), deepCopy(value)})))) == describe(value));
+    // What somebody else holds stays.
+    RC_ASSERT(describe(over(spent)) == describe(value));
+    RC_ASSERT(spent == held);
+}
+
 TEST(AnyValue, ComesBackFromPeerInBothForms)
 {
     if (!peerIsThere())

@@ -4,6 +4,8 @@
 
 #include <cmath>
 #include <limits>
+#include <memory>
+#include <utility>
 
 namespace kestrum {
 namespace {
@@ -108,6 +110,43 @@ TEST(XmlRead, AKeyThatComesTwiceKeepsItsFirstPlaceAndItsLastValue)
     const auto read = parsed(xmlList("<dict><key>a</key><integer>1</integer><key>b</key><integer>2</integer>"
                                      "<key>a</key><integer>3</integer></dict>"));
     EXPECT_EQ(describe(read.value), R"({"a": 3, "b": 2})");
+}
+
+TEST(XmlRead, FillsTheContainersOfASpentList)
+{
+    const PropertyListCodec codec;
+    const std::string two = xmlList("<array><dict><key>a</key><integer>1</integer></dict>"
+                                    "<dict><key>a</key><integer>2</integer></dict></array>");
+    const std::string one = xmlList("<array><dict><key>a</key><integer>3</integer></dict></array>");
+    Value spent = codec.parse(bytesOf(two));
+    const Array* list = spent.array().get();
+    const Dictionary* first = (*list)[0].borrowedDictionary();
+    const std::weak_ptr second = (*list)[1].dictionary();
+
+    const Value read = codec.parseOver(bytesOf(one), std::exchange(spent, {}));
+    EXPECT_EQ(describe(read), R"([{"a": 3}])");
+    EXPECT_EQ(read.array().get(), list);
+    EXPECT_EQ((*list)[0].borrowedDictionary(), first);
+    EXPECT_TRUE(second.expired()) << "what the list has no use for is let go";
+}
+
+TEST(XmlRead, LeavesWhatSomebodyStillHolds)
+{
+    const PropertyListCodec codec;
+    Value spent = codec.parse(bytesOf(xmlList("<array><dict><key>a</key><integer>1</integer></dict></array>")));
+    const auto held = (*spent.array())[0].dictionary();
+    const Value read = codec.parseOver(bytesOf(xmlList("<array><dict><key>a</key><integer>2</integer></dict></array>")),
+                                       std::exchange(spent, {}));
+    EXPECT_EQ(describe(read), R"([{"a": 2}])");
+    EXPECT_EQ(describe(held), R"({"a": 1})");
+}
+
+TEST(XmlRead, ASpentListDoesNotShowInARefusedOne)
+{
+    const PropertyListCodec codec;
+    EXPECT_TRUE(codec.parseOver(bytesOf(xmlList("")), makeArray({"a"})).isNull());
+    EXPECT_TRUE(codec.parseOver(bytesOf(xmlList("<array><x/></array>")), makeArray({"a"})).isNull());
+    EXPECT_EQ(codec.parseOver(bytesOf(xmlList("<integer>5</integer>")), makeArray({"a"})), Value(5));
 }
 
 // --- refusing --------------------------------------------------------------------------------------------------

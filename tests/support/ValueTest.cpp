@@ -256,46 +256,111 @@ TEST(Array, LetsGoOfWhatItHeldWhenItIsCleared)
     EXPECT_EQ(held.use_count(), 1);
 }
 
-TEST(Dictionary, KeepsAnArrayThatIsSetAgain)
+TEST(Array, DropsItsSparesAndNothingElse)
 {
-    Dictionary dictionary;
-    dictionary.setArray("SIR").appendText("4");
-    const Array* first = dictionary.at("SIR").array().get();
-    EXPECT_EQ(&dictionary.setArray("SIR"), first);
-    EXPECT_TRUE(first->empty());
-    const auto held = dictionary.at("SIR").array();
-    EXPECT_NE(&dictionary.setArray("SIR"), held.get());
+    const auto kept = makeDictionary(), spare = makeDictionary();
+    Array list{kept, spare};
+    list.startOver();
+    EXPECT_EQ(list.slot(), Value(kept));
+    list.dropSpares();
+    EXPECT_EQ(list.size(), 1u);
+    EXPECT_EQ(kept.use_count(), 2);
+    EXPECT_EQ(spare.use_count(), 1);
+}
+
+TEST(Dictionary, DropsItsSparesAndNothingElse)
+{
+    const auto kept = makeDictionary(), spare = makeDictionary();
+    Dictionary dictionary{{"kept", kept}, {"spare", spare}};
+    dictionary.startOver();
+    EXPECT_EQ(dictionary.slot("kept"), Value(kept));
+    dictionary.dropSpares();
+    EXPECT_EQ(dictionary.size(), 1u);
+    EXPECT_EQ(kept.use_count(), 2);
+    EXPECT_EQ(spare.use_count(), 1);
+    EXPECT_TRUE(dictionary.slot("spare").isNull());
+}
+
+TEST(Value, BecomesTheContainerThatItHolds)
+{
+    Value value;
+    value.becomeArray().appendText("4");
+    const Array* array = value.array().get();
+    EXPECT_EQ(&value.becomeArray(), array);
+    EXPECT_TRUE(array->empty());
+    value.becomeDictionary().setText("RSSI", "-71 dBm");
+    EXPECT_EQ(value, Value(makeDictionary({{"RSSI", "-71 dBm"}})));
+    const Dictionary* dictionary = value.borrowedDictionary();
+    EXPECT_EQ(&value.becomeDictionary(), dictionary);
+    EXPECT_TRUE(dictionary->empty());
+}
+
+TEST(Value, LeavesAContainerThatSomebodyElseHolds)
+{
+    Value array = makeArray({"4"}), dictionary = makeDictionary({{"RSSI", "-71 dBm"}});
+    const Value heldArray = array, heldDictionary = dictionary;
+    EXPECT_TRUE(array.becomeArray().empty());
+    EXPECT_TRUE(dictionary.becomeDictionary().empty());
+    EXPECT_EQ(heldArray, Value(makeArray({"4"})));
+    EXPECT_EQ(heldDictionary, Value(makeDictionary({{"RSSI", "-71 dBm"}})));
 }
 
 TEST(Dictionary, WordsOnlyWhatHasChanged)
 {
     Dictionary dictionary;
     int worded = 0;
-    const int function = 0, other = 0; // any two addresses
+    constexpr int kLine = 0, kOther = 0;
     const auto set = [&](const Wording& wording, std::string_view text) {
         dictionary.setWorded("RSSI", wording, [&](Value& value) {
             value.assignText(text, wording);
             ++worded;
         });
     };
-    set({&function, 71}, "-71 dBm");
-    set({&function, 71}, "not asked for");
+    set({&kLine, 71}, "-71 dBm");
+    set({&kLine, 71}, "not asked for");
     EXPECT_EQ(worded, 1);
     EXPECT_EQ(dictionary.at("RSSI"), Value("-71 dBm"));
-    set({&function, 72}, "-72 dBm");
-    set({&other, 72}, "72");
+    set({&kLine, 72}, "-72 dBm");
+    set({&kOther, 72}, "72");
     EXPECT_EQ(worded, 3);
     EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
     dictionary.setText("RSSI", "by hand");
-    set({&other, 72}, "72");
+    set({&kOther, 72}, "72");
     EXPECT_EQ(worded, 4);
     dictionary.set("RSSI", 5);
-    set({&other, 72}, "72");
+    set({&kOther, 72}, "72");
     EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
     dictionary.startOver();
-    set({&other, 72}, "not asked for");
+    set({&kOther, 72}, "not asked for");
     EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
     EXPECT_EQ(worded, 5);
+}
+
+TEST(Dictionary, PassesOnlyWhatIsNextAndWordedSo)
+{
+    constexpr int kRssi = 0, kMode = 0; // lines
+    const Wording rssi{&kRssi, 71}, mode{&kMode, 1};
+    Dictionary dictionary;
+    EXPECT_FALSE(dictionary.passWorded(rssi));
+    dictionary.slot("RSSI").assignText("-71 dBm", rssi);
+    dictionary.slot("Mode").assignText("idle", mode);
+    EXPECT_FALSE(dictionary.passWorded(rssi)) << "behind the last one";
+
+    dictionary.startOver();
+    EXPECT_FALSE(dictionary.passWorded(mode)) << "not the next one";
+    EXPECT_FALSE(dictionary.passWorded({&kRssi, 72}));
+    EXPECT_TRUE(dictionary.passWorded(rssi));
+    EXPECT_EQ(describe(std::make_shared<Dictionary>(dictionary)), R"({"RSSI": "-71 dBm"})");
+    EXPECT_TRUE(dictionary.passWorded(mode));
+    EXPECT_EQ(describe(std::make_shared<Dictionary>(dictionary)), R"({"RSSI": "-71 dBm", "Mode": "idle"})");
+    EXPECT_FALSE(dictionary.passWorded(rssi));
+
+    EXPECT_NE(dictionary.find("RSSI"), nullptr);
+    EXPECT_TRUE(dictionary.passWorded(mode)) << "the next one without starting over";
+    EXPECT_EQ(dictionary.size(), 2u);
+    dictionary.slot("RSSI").becomeArray();
+    dictionary.startOver();
+    EXPECT_FALSE(dictionary.passWorded(rssi)) << "no text any more";
 }
 
 TEST(Dictionary, HoldsWhatCameSinceItStartedOver)
