@@ -6,6 +6,8 @@
 #include "platform/TelephonyService.h"
 #include "support/Format.h"
 
+#include <utility>
+
 namespace kestrum {
 namespace {
 
@@ -34,12 +36,13 @@ std::string_view GSMLogGenerator::technology() const
 
 void GSMLogGenerator::updateState(State& state, Bytes withData)
 {
-    const Value received = _roles.propertyLists.parse(withData);
+    const Value received = _roles.propertyLists.parseOver(withData, std::exchange(_spent, {}));
     if (received.isNull())
         throw AssertionFailure("updateState:withData:", format("<GSMLogGenerator: %p>", _roles.log.shownAddress(this)),
                                kSourceFile, kNoObjectLine, "Could not deserialize the object");
     const Value processed = processObject(received);
     dropForeignDisplay(state);
+    _spent = state.at("DisplayState");
     state.set("DisplayState", received);
     setDisplay(state, processed);
     state.set("ExtraInfo", makeDictionary());

@@ -29,6 +29,8 @@ public:
 
 private:
     using LogGenerator::LogGenerator;
+
+    Value _spent; ///< the message before the last one, for the next to be made of
 };
 
 } // namespace kestrum

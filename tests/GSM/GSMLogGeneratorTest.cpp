@@ -261,6 +261,24 @@ TEST_F(ObjectStream, ShowingRollsTheHistory)
     EXPECT_EQ((*contents)[4].dictionary()->at("Display").dictionary()->at("Count"), Value("6"));
 }
 
+TEST_F(ObjectStream, HistoryKeepsTheMessageOfItsTime)
+{
+    const auto message = [](const std::string& cell) {
+        return Value(makeDictionary({{"RAT", "GSM"}, {"Cells", makeArray({"Head", makeDictionary({{"ID", cell}})})}}));
+    };
+    for (int cell = 1; cell <= 5; ++cell) {
+        receive(message(std::to_string(cell)));
+        generator->generateLogUsingState(state);
+        receive(message("between"));
+        receive(message("the refreshes"));
+    }
+    const auto history = state.at("History").array();
+    ASSERT_EQ(history->size(), 5u);
+    for (int cell = 1; cell <= 5; ++cell)
+        EXPECT_EQ((*history)[static_cast<std::size_t>(cell) - 1].dictionary()->at("DisplayState"),
+                  message(std::to_string(cell)));
+}
+
 TEST_F(ObjectStream, SavingGivesTheHistoryAlone)
 {
     EXPECT_TRUE(generator->getSaveContentsFromState(state)->empty());
