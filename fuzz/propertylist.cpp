@@ -1,4 +1,5 @@
-// Any bytes are a property list or are refused with a reason; what is read can be written, and then reads the same.
+// Any bytes are a property list or are refused with a reason; what is read can be written, and then reads the same,
+// whatever it is read over.
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <cstdint>
@@ -20,7 +21,8 @@ void require(bool condition, const char* what)
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
     const kestrum::PropertyListCodec codec;
-    const auto read = codec.parseWithError(std::as_bytes(std::span(data, size)));
+    const auto bytes = std::as_bytes(std::span(data, size));
+    const auto read = codec.parseWithError(bytes);
     require(read.value.isNull() == !read.reason.empty(), "neither a value nor a reason");
     require(read.offset <= size, "an offset beyond the end");
     if (!read)
@@ -29,6 +31,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     const auto first = codec.toXml(read.value);
     if (!first)
         return 0; // indented, a large one can exceed the limit
+    for (const auto& spent : {codec.parse(bytes), kestrum::Value(kestrum::makeArray({"", codec.parse(bytes)}))}) {
+        const auto over = codec.toXml(codec.parseOver(bytes, kestrum::deepCopy(spent)));
+        require(over && kestrum::textOf(over->bytes()) == kestrum::textOf(first->bytes()), "it reads differently over");
+    }
     const auto second = codec.toXml(codec.parse(first->bytes()));
     require(second.has_value(), "what was written is not read");
     const auto third = codec.toXml(codec.parse(second->bytes()));
