@@ -26,7 +26,7 @@ void showCell(const Value& cell, std::span<const CellRow> rows, Dictionary* into
         if (!number && !row.whenMissing.empty())
             log.write(Priority::Error, row.whenMissing);
         if (number && into != nullptr)
-            row.conversion.set(*into, row.key, {&row, static_cast<std::uint32_t>(*number)});
+            show(row, static_cast<std::uint32_t>(*number), *into);
     }
 }
 

@@ -40,23 +40,27 @@ private:
     Named _named = nullptr;
 };
 
-/// A line of a layout, without where the raw value comes from. A constant: its address stands for it.
-struct Quantity {
-    std::string_view key;
-    Conversion conversion;
-
-    void set(Dictionary& into, std::uint32_t raw) const
-    {
-        if (const Wording wording{this, raw}; !into.passWorded(wording))
-            conversion.set(into, key, wording);
-    }
-};
-
 /// One line of a record's layout: where the field stands, the key it is shown under, how it is worded.
 struct Row {
     Field field;
-    Quantity shown;
+    std::string_view key;
+    Conversion conversion;
 };
+
+/// A line for what is not simply read from a field.
+struct Quantity {
+    std::string_view key;
+    Conversion conversion;
+};
+
+/// Sets the line's key to the text of the raw value. Lines are constants: the address of one stands for its key and its
+/// conversion both.
+template <typename Line>
+void show(const Line& line, std::uint32_t raw, Dictionary& into)
+{
+    if (const Wording wording{&line, raw}; !into.passWorded(wording))
+        line.conversion.set(into, line.key, wording);
+}
 
 /// Where the last field of a layout ends.
 constexpr std::size_t reach(std::span<const Row> rows)

@@ -14,8 +14,8 @@ void C2KContext::publish(Record record, std::span<const Row> rows) const
 {
     for (const auto& row : rows)
         if (const auto raw = record.read(row.field))
-            atPlacesOf(row.shown.key, [&](Dictionary& node, const std::string& key) {
-                row.shown.conversion.set(node, key, {&row, *raw});
+            atPlacesOf(row.key, [&](Dictionary& node, const std::string& key) {
+                row.conversion.set(node, key, {&row, *raw});
             });
 }
 

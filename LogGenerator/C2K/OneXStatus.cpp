@@ -126,7 +126,7 @@ void decodeOneXStatus(Record record, C2KContext& context)
         context.publish(*rf, kChain1);
     else
         for (const auto& row : kChain1)
-            context.publish(row.shown.key, "N/A");
+            context.publish(row.key, "N/A");
     context.publish("k1xActiveSetInfo", [&](Value& shown) { listPilots(*activeSet, shown.becomeDictionary()); });
 
     // The last call's frame errors, once, after it ended.

@@ -71,7 +71,7 @@ void decodeSystemIdentity(Record record, C2KContext& context)
     } else {
         const auto unknown = format("(unknown system type %d)", static_cast<std::int32_t>(systemType));
         for (const auto& row : kIdentifiers)
-            context.publish(row.shown.key, unknown);
+            context.publish(row.key, unknown);
     }
     context.publish(record, kBase);
 }

@@ -42,9 +42,9 @@ constexpr Quantity kShownEcNo{"Energy Per Chip", decibels};
 void showCell(Record cell, Record measurement, int power, Dictionary& row)
 {
     const int energyPerChip = Base::lookUpECNO(energyOf(measurement));
-    kShownCode.set(row, cell.read(kScramblingCode).value_or(0));
-    kShownRscp.set(row, static_cast<std::uint32_t>(power + energyPerChip));
-    kShownEcNo.set(row, static_cast<std::uint32_t>(energyPerChip));
+    show(kShownCode, cell.read(kScramblingCode).value_or(0), row);
+    show(kShownRscp, static_cast<std::uint32_t>(power + energyPerChip), row);
+    show(kShownEcNo, static_cast<std::uint32_t>(energyPerChip), row);
 }
 
 } // namespace

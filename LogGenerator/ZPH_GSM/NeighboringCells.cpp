@@ -94,7 +94,7 @@ void NeighboringCells::listMeasurements(Record data) const
     const auto measured = [this](Record cell, Dictionary& row) {
         show(cell, kMeasuredCell, row);
         if (const auto known = arfcnToBsic.find(cell.read(kArfcn).value_or(0)); known != arfcnToBsic.end())
-            kColourCode.set(row, known->second);
+            show(kColourCode, known->second, row);
     };
     replaceArray(sectionRef, listed(data, kMeasured, data.read(kMeasurementCount).value_or(0), measured));
 }
