@@ -14,6 +14,8 @@ public:
     explicit ParsedOnce(const PropertyLists& lists) : _lists(lists) {}
 
     Value parse(Bytes bytes) const override;
+    /// What it parsed last is spent instead.
+    Value parseOver(Bytes bytes, Value /*spent*/) const override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override { return _lists.toXml(value); }
     Value load(const std::string& path) const override { return _lists.load(path); }
     bool write(const Dictionary& dictionary, const std::string& path) const override

@@ -19,7 +19,7 @@ public:
     virtual Value parse(Bytes bytes) const = 0;
     /// The same, possibly made of the containers of a value that is spent: lists of one kind come again and again.
     /// Containers that somebody else still holds are left alone.
-    virtual Value parseOver(Bytes bytes, [[maybe_unused]] Value spent) const { return parse(bytes); }
+    virtual Value parseOver(Bytes bytes, Value spent) const = 0;
 
     /// The XML form, version 1.0. Nulls are left out, characters that XML forbids become U+FFFD.
     /// Nothing when the value is null or nested too deeply.

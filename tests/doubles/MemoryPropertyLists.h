@@ -11,6 +11,7 @@ namespace kestrum {
 class MemoryPropertyLists final : public PropertyLists {
 public:
     Value parse(Bytes bytes) const override { return find(parsed, std::string(textOf(bytes))); }
+    Value parseOver(Bytes bytes, Value /*spent*/) const override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override
     {
         if (value.isNull() || !writable)
