@@ -39,8 +39,7 @@ void Base::updateLogCodeDict(CodeDictionary& codeDict)
 
 void Base::clearElementsInArray(const SectionRef& array)
 {
-    // Three sections have nothing to show, record after record: an empty list needs no lock.
-    if (auto* node = array.array(); node != nullptr && !node->empty()) {
+    if (auto* node = array.array()) {
         const ArrayLocked locked;
         node->startOver();
     }

@@ -153,14 +153,15 @@ TEST_F(BaseOf, ListIsClearedUnderTheLock)
     EXPECT_EQ(counts.unlocked, 1);
 }
 
-TEST_F(BaseOf, EmptyListIsClearedWithoutTheLock)
+TEST_F(BaseOf, EmptyListIsClearedUnderTheLockToo)
 {
     const CountedArrayLock counts;
     auto node = makeArray();
     section.updateSectionRef(node);
     Base::clearElementsInArray(section.sectionRef);
     EXPECT_TRUE(node->empty());
-    EXPECT_EQ(counts.locked, 0);
+    EXPECT_EQ(counts.locked, 1);
+    EXPECT_EQ(counts.unlocked, 1);
 }
 
 TEST_F(BaseOf, NodeOfTheOtherShapeIsLeftAlone)
