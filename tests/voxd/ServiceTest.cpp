@@ -359,6 +359,8 @@ TEST_F(ServiceTest, KilledItTakesItsPortsWithItAndComesBackOverWhatItLeft)
     voxd.process.kill();
     ASSERT_TRUE(eventually([&] { return !client.remote->isValid(); }));
     EXPECT_TRUE(client.local->isValid());
+    // Its sockets are closed one after the other; all are when it is gone.
+    ASSERT_TRUE(eventually([&] { return voxd.process.state() == QProcess::NotRunning; }));
     EXPECT_FALSE(telephony.connect({}));
     EXPECT_THAT(sockets(), testing::Contains("org.kestrum.vox")) << "killed, it could not remove it";
 
