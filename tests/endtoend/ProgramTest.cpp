@@ -1,8 +1,7 @@
 #include "EndToEnd.h"
+#include "doubles/FileContents.h"
 
 #include <csignal>
-#include <fstream>
-#include <iterator>
 
 namespace kestrum {
 namespace {
@@ -36,12 +35,6 @@ protected:
 
     QProcess program;
 };
-
-std::string contentsOf(const std::filesystem::path& path)
-{
-    std::ifstream file(path);
-    return {std::istreambuf_iterator<char>(file), {}};
-}
 
 class AnyEnd : public TheProgram, public testing::WithParamInterface<int> {
 protected:

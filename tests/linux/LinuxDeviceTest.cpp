@@ -1,4 +1,5 @@
 #include "platform/linux/LinuxDevice.h"
+#include "doubles/FileContents.h"
 #include "linux/EventLoop.h"
 #include "linux/Scratch.h"
 #include "platform/Console.h"
@@ -26,12 +27,6 @@ using namespace std::chrono;
 using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::HasSubstr;
-
-std::string contentsOf(const std::string& path)
-{
-    std::ifstream file(path);
-    return {std::istreambuf_iterator<char>(file), {}};
-}
 
 void write(const std::string& path, std::string_view text)
 {

@@ -1,23 +1,17 @@
 #pragma once
 
+#include "doubles/FileContents.h"
 #include "doubles/ScratchDirectory.h"
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <cstdint>
 #include <cstdlib>
 #include <fstream>
-#include <iterator>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
 namespace kestrum {
-
-inline std::string contentsOf(const std::string& path)
-{
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), {}};
-}
 
 /// What peer.py makes of `input`.
 inline std::string peer(const std::string& arguments, const std::string& input)

@@ -1,12 +1,11 @@
 #include "Pseudoterminal.h"
+#include "doubles/FileContents.h"
 #include "doubles/ScratchDirectory.h"
 
 #include <gmock/gmock.h>
 
 #include <algorithm>
 #include <fcntl.h>
-#include <fstream>
-#include <iterator>
 #include <stdexcept>
 #include <string>
 #include <sys/stat.h>
@@ -24,8 +23,6 @@ class SlowCapture {
 public:
     SlowCapture()
     {
-        std::ifstream file(KESTRUM_SOURCE_DIR "/captures/lte.kcap", std::ios::binary);
-        _rest.assign(std::istreambuf_iterator<char>(file), {});
         if (_rest.empty() || ::mkfifo(path().c_str(), 0600) != 0)
             throw std::runtime_error("no slow capture");
         _pipe = ::open(path().c_str(), O_RDWR | O_CLOEXEC); // for reading too, so that it need not wait for a reader
@@ -49,7 +46,7 @@ public:
 
 private:
     ScratchDirectory _scratch;
-    std::string _rest;
+    std::string _rest = contentsOf(KESTRUM_SOURCE_DIR "/captures/lte.kcap");
     int _pipe = -1;
 };
 

@@ -1,3 +1,4 @@
+#include "doubles/FileContents.h"
 #include "doubles/RecordingLog.h"
 #include "linux/EventLoop.h"
 #include "linux/RawSocket.h"
@@ -43,12 +44,6 @@ std::string kcap(const std::vector<std::string>& messages)
     for (const auto& each : messages)
         bytes += little(each.size(), 4) + each;
     return bytes;
-}
-
-std::string contentsOf(const std::string& path)
-{
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), {}};
 }
 
 /// The real program, and clients of it in this process.
