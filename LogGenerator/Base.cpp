@@ -34,7 +34,7 @@ void Base::updateLogCodeDict(CodeDictionary& codeDict)
     const auto codes = getLogCodeArray();
     roles.log.write(Priority::Warning, "Array Count: %d", static_cast<int>(codes.size()));
     for (const LogCode code : codes)
-        codeDict[format("%u", code)].push_back(this);
+        codeDict[formatted("%u", code)].push_back(this);
 }
 
 void Base::clearElementsInArray(const SectionRef& array)
@@ -80,7 +80,7 @@ void Base::logError(std::string_view text) const
 
 void Base::reportUnknown(LogCode logCode) const
 {
-    logError(format("Received an unknown log message: %d", static_cast<std::int32_t>(logCode)));
+    logError(formatted("Received an unknown log message: %d", static_cast<std::int32_t>(logCode)));
 }
 
 bool Base::accepts(Record data, LogCode logCode, LogCode expected, std::size_t minimumLength, Foreign foreign) const

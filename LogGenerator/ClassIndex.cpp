@@ -24,7 +24,7 @@ const std::vector<Base*>* ClassIndex::getSubscribers(LogCode logCode) const
 {
     if (const auto known = _subscribers.find(logCode); known != _subscribers.end())
         return known->second;
-    const auto found = codeDictionary.find(format("%u", logCode));
+    const auto found = codeDictionary.find(formatted("%u", logCode));
     return found == codeDictionary.end() ? nullptr : (_subscribers[logCode] = &found->second);
 }
 

@@ -15,7 +15,7 @@ std::string fileName(const std::string& file)
 AssertionFailure::AssertionFailure(const std::string& operation, const std::string& object, const std::string& file,
                                    int line, std::string description)
     : std::runtime_error(
-          format("Assertion failure in %s of %s, %s:%d: %s", operation, object, fileName(file), line, description)),
+          formatted("Assertion failure in %s of %s, %s:%d: %s", operation, object, fileName(file), line, description)),
       _file(fileName(file)),
       _line(line),
       _description(std::move(description))

@@ -39,7 +39,7 @@ void LogGenerator::updateHistoryInState(State& state) const
                                              {"Display", shallowCopy(state.at("Display"))},
                                              {"ExtraInfo", shallowCopy(state.at("ExtraInfo"))},
                                              {"Date", date},
-                                             {"Description", format("Snapshot (%@)", date)}}));
+                                             {"Description", formatted("Snapshot (%@)", date)}}));
 }
 
 LogGenerator::Origin LogGenerator::originOfDisplay(const State& state) const

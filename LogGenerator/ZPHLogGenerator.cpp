@@ -33,7 +33,7 @@ void ZPHLogGenerator::moveBinDataToState(State& state)
 std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) const
 {
     std::vector<std::byte> stream(kDlfVersionReportSize);
-    const auto versionText = format("Kestrum %@", _roles.bundle.version().value_or("(none)"));
+    const auto versionText = formatted("Kestrum %@", _roles.bundle.version().value_or("(none)"));
     const Date now = _roles.clock.now();
     std::uint32_t written = 0;
     const int result =
@@ -70,7 +70,7 @@ ArrayRef ZPHLogGenerator::getSaveContentsFromState(const State& state) const
     auto contents = history ? std::make_shared<Array>(*history) : makeArray();
     if (const auto dlf = generateDlfFromState(state))
         contents->append(makeDictionary(
-            {{"Description", format("DLF binary (%d bytes)", static_cast<int>(dlf->size()))}, {"DLF", *dlf}}));
+            {{"Description", formatted("DLF binary (%d bytes)", static_cast<int>(dlf->size()))}, {"DLF", *dlf}}));
     return contents;
 }
 

@@ -58,7 +58,7 @@ std::optional<std::string> KestrumModel::failureOfAttempt()
         return " Could not generate PLIST";
     const auto sent = send(command->bytes(), RemotePort::Reply::None);
     if (sent.status != 0)
-        return format(" ***** Could not send the START command (got error=%d)", sent.status);
+        return formatted(" ***** Could not send the START command (got error=%d)", sent.status);
     return std::nullopt;
 }
 

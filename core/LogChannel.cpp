@@ -42,8 +42,8 @@ bool KestrumModel::createPorts()
     const auto answer = connection->networkMonitorCreateLogChannel(kLogChannelServiceName);
     connection.reset();
     if (answer.errorCode != 0) {
-        logError(format("_VoxServerConnectionNetworkMonitorCreateLogChannel returns error: %ld!",
-                        static_cast<long>(answer.errorCode)));
+        logError(formatted("_VoxServerConnectionNetworkMonitorCreateLogChannel returns error: %ld!",
+                           static_cast<long>(answer.errorCode)));
         return false;
     }
     if (!answer.remotePort || answer.remotePort->empty()) {
@@ -55,8 +55,8 @@ bool KestrumModel::createPorts()
         logError("Could not create the remote port!");
         return false;
     }
-    logError(format(" ***** Created ports (send=%p, recv=%p)", _roles.log.shownAddress(_sendPort.get()),
-                    _roles.log.shownAddress(_recvPort.get())));
+    logError(formatted(" ***** Created ports (send=%p, recv=%p)", _roles.log.shownAddress(_sendPort.get()),
+                       _roles.log.shownAddress(_recvPort.get())));
     return true;
 }
 
@@ -87,7 +87,7 @@ void KestrumModel::configureGenerator()
         return logError(" Could not generate GetTechnology command; cannot configure");
     const auto sent = send(request->bytes(), RemotePort::Reply::Awaited);
     if (sent.status != 0)
-        return logError(format(" ***** Could not send the GetTechnology command (got error=%d)", sent.status));
+        return logError(formatted(" ***** Could not send the GetTechnology command (got error=%d)", sent.status));
     if (!sent.reply)
         return logError(" ***** No response to GetTechnology; cannot configure");
     const Value reply = _roles.propertyLists.parse(sent.reply->bytes());
@@ -103,7 +103,7 @@ void KestrumModel::configureGenerator()
 void KestrumModel::takeGenerator(std::unique_ptr<LogGenerator> generator)
 {
     _logGenerator = std::move(generator);
-    logError(format("Got log generated: %p", _roles.log.shownAddress(_logGenerator.get())));
+    logError(formatted("Got log generated: %p", _roles.log.shownAddress(_logGenerator.get())));
     if (_logGenerator && _logGenerator->replacesDisplayOf(_state)) {
         dropTree();
         notify(&KestrumModelObserver::displayReplaced);
@@ -127,7 +127,7 @@ void KestrumModel::handleMessage(std::int32_t messageId, Bytes payload)
 
 void KestrumModel::handleInvalidation(const Port* port)
 {
-    logError(format(" ***** INVALIDATED %p *****", _roles.log.shownAddress(port)));
+    logError(formatted(" ***** INVALIDATED %p *****", _roles.log.shownAddress(port)));
     restartMonitor();
 }
 

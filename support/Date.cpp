@@ -21,14 +21,14 @@ struct Parts {
 
 std::string dayText(const year_month_day& day)
 {
-    return format("%04d-%02u-%02u", static_cast<int>(day.year()), static_cast<unsigned>(day.month()),
-                  static_cast<unsigned>(day.day()));
+    return formatted("%04d-%02u-%02u", static_cast<int>(day.year()), static_cast<unsigned>(day.month()),
+                     static_cast<unsigned>(day.day()));
 }
 
 std::string clockText(const hh_mm_ss<microseconds>& time)
 {
-    return format("%02ld:%02ld:%02ld", static_cast<long>(time.hours().count()),
-                  static_cast<long>(time.minutes().count()), static_cast<long>(time.seconds().count()));
+    return formatted("%02ld:%02ld:%02ld", static_cast<long>(time.hours().count()),
+                     static_cast<long>(time.minutes().count()), static_cast<long>(time.seconds().count()));
 }
 
 std::optional<int> number(std::string_view digits)
@@ -53,7 +53,7 @@ std::string isoText(Date date, int fractionDigits)
     const Parts parts(date);
     std::string text = dayText(parts.day) + "T" + clockText(parts.time);
     if (fractionDigits > 0) {
-        const auto fraction = format("%06ld", static_cast<long>(parts.time.subseconds().count()));
+        const auto fraction = formatted("%06ld", static_cast<long>(parts.time.subseconds().count()));
         text += "." + fraction.substr(0, static_cast<std::size_t>(fractionDigits));
     }
     return text + "Z";

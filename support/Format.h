@@ -217,7 +217,7 @@ Output formatted(const FormatString<std::type_identity_t<Arguments>...>& format,
 /// for the text of an object. Not-a-number has no sign, whatever the platform; a null pointer is "0x0", a null text
 /// "(null)". Integers take no precision.
 template <typename... Arguments>
-std::string format(FormatString<std::type_identity_t<Arguments>...> format, const Arguments&... arguments)
+std::string formatted(FormatString<std::type_identity_t<Arguments>...> format, const Arguments&... arguments)
 {
     return formatting::formatted(format, arguments...).take();
 }

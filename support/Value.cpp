@@ -329,10 +329,10 @@ void describeInto(std::string& text, const Value& value)
         text += '"' + *value.string() + '"';
         break;
     case Value::Kind::Integer:
-        text += value.integer() ? format("%ld", *value.integer()) : format("%lu", *value.unsignedInteger());
+        text += value.integer() ? formatted("%ld", *value.integer()) : formatted("%lu", *value.unsignedInteger());
         break;
     case Value::Kind::Real:
-        text += format("%f", *value.real());
+        text += formatted("%f", *value.real());
         break;
     case Value::Kind::Boolean:
         text += *value.boolean() ? "true" : "false";
@@ -341,7 +341,7 @@ void describeInto(std::string& text, const Value& value)
         text += dateText(*value.date());
         break;
     case Value::Kind::Data:
-        text += format("<%lu bytes>", value.data()->size());
+        text += formatted("<%lu bytes>", value.data()->size());
         break;
     case Value::Kind::Array:
         text += '[';

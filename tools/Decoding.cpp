@@ -38,7 +38,7 @@ std::set<LogCode> codesIn(const LogGenerator& generator)
 
 std::string codeText(LogCode code)
 {
-    auto digits = format("%04x", code);
+    auto digits = formatted("%04x", code);
     std::ranges::transform(digits, digits.begin(),
                            [](char c) { return c >= 'a' ? static_cast<char>(c - 'a' + 'A') : c; });
     return "0x" + digits;
@@ -113,7 +113,7 @@ void Decoding::take(Bytes message)
         return decode(message);
     _earlyBytes += message.size();
     if (_earlyBytes > kMostEarlyBytes)
-        throw std::runtime_error(format(
+        throw std::runtime_error(formatted(
             "the first %lu messages do not tell their technology: name it with --technology", _early.size() + 1));
     _early.emplace_back(message.begin(), message.end());
 }

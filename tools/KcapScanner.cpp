@@ -90,14 +90,14 @@ MessageScanner::Candidate KcapScanner::due()
     const auto [sound, size] = look(0);
     const std::size_t here = _window.peek(kLengthSize).size();
     if (sound == Sound::No)
-        return {.reason = format("a message of %lu bytes, allowed are %lu", size, CaptureReader::kMaximumMessage)};
+        return {.reason = formatted("a message of %lu bytes, allowed are %lu", size, CaptureReader::kMaximumMessage)};
     if (sound == Sound::Incomplete && size == 0)
-        return {.incomplete = true, .reason = format("the length has only %lu of its 4 bytes", here)};
+        return {.incomplete = true, .reason = formatted("the length has only %lu of its 4 bytes", here)};
     if (sound == Sound::Incomplete)
-        return {.incomplete = true, .reason = format("the last message ends %lu bytes short", size - here)};
+        return {.incomplete = true, .reason = formatted("the last message ends %lu bytes short", size - here)};
     if (sound == Sound::Yes || isFollowed(size, kLinks))
         return {.size = size};
-    return {.reason = format("no message follows the one of %lu bytes", size - kLengthSize)};
+    return {.reason = formatted("no message follows the one of %lu bytes", size - kLengthSize)};
 }
 
 MessageScanner::Candidate KcapScanner::chanced()

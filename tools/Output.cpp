@@ -89,7 +89,7 @@ std::string onOneLine(std::string_view raw)
         const bool shown = character && *character >= 0x20 && (*character < 0x7F || *character > 0x9F);
         for (std::size_t i = begin; i < at; ++i)
             line += shown ? std::string(1, raw[i])
-                          : format("\\x%02x", static_cast<unsigned>(static_cast<unsigned char>(raw[i])));
+                          : formatted("\\x%02x", static_cast<unsigned>(static_cast<unsigned char>(raw[i])));
     }
     return line;
 }
@@ -111,15 +111,15 @@ Json jsonOf(const SnapshotListing& listing)
 
 void list(const SnapshotListing& listing, OutputFile& to)
 {
-    to.write(format("Snapshot %s\n", onOneLine(listing.file)));
-    to.write(format("  Timestamp: %s\n", onOneLine(listing.timestamp.value_or("(none)"))));
-    to.write(format("  Description: %s\n", onOneLine(listing.description.value_or("(none)"))));
+    to.write(formatted("Snapshot %s\n", onOneLine(listing.file)));
+    to.write(formatted("  Timestamp: %s\n", onOneLine(listing.timestamp.value_or("(none)"))));
+    to.write(formatted("  Description: %s\n", onOneLine(listing.description.value_or("(none)"))));
     for (std::size_t i = 0; i < listing.entries.size(); ++i) {
         const auto& entry = listing.entries[i];
-        to.write(format("  Entry %lu: %s; date %s; %s, %lu %s\n", i,
-                        entry.description.empty() ? "(no description)" : onOneLine(entry.description),
-                        entry.date.empty() ? "(none)" : onOneLine(entry.date), entry.content, entry.size,
-                        entry.content == "tree" ? "values" : "bytes"));
+        to.write(formatted("  Entry %lu: %s; date %s; %s, %lu %s\n", i,
+                           entry.description.empty() ? "(no description)" : onOneLine(entry.description),
+                           entry.date.empty() ? "(none)" : onOneLine(entry.date), entry.content, entry.size,
+                           entry.content == "tree" ? "values" : "bytes"));
     }
 }
 

@@ -38,9 +38,9 @@ public:
         if (!_isWatched || now < _next)
             return;
         _next = now + std::chrono::milliseconds(250);
-        const auto part =
-            size && *size != 0 ? format(" (%lu%%)", std::min<std::uint64_t>(100, done * 100 / *size)) : std::string();
-        _to.write(format("\r%s: %lu MB%s\x1b[K", file, done / 1'000'000, part));
+        const auto part = size && *size != 0 ? formatted(" (%lu%%)", std::min<std::uint64_t>(100, done * 100 / *size))
+                                             : std::string();
+        _to.write(formatted("\r%s: %lu MB%s\x1b[K", file, done / 1'000'000, part));
         _to.flush();
         _isShown = true;
     }
@@ -100,12 +100,12 @@ private:
         } catch (const OutputFailure&) {
             throw;
         } catch (const std::runtime_error& error) {
-            complain(format("%s: %s", _file, error.what()));
+            complain(formatted("%s: %s", _file, error.what()));
         }
         _window = nullptr;
         if (_faults.lines > kMostFaultLines)
-            complain(format("%s: %lu more places like these; %lu bytes skipped in them", _file,
-                            _faults.lines - kMostFaultLines, _faults.untold));
+            complain(formatted("%s: %lu more places like these; %lu bytes skipped in them", _file,
+                               _faults.lines - kMostFaultLines, _faults.untold));
     }
 
     void decode(const std::string& file, Input& input, ByteWindow& window)
@@ -165,7 +165,7 @@ private:
         const Bytes all = window.peek(PropertyListCodec::kMaxBytes + 1);
         const auto parsed = _lists.parseWithError(all);
         if (!parsed)
-            throw std::runtime_error(format("at offset %lu: %s", parsed.offset, parsed.reason));
+            throw std::runtime_error(formatted("at offset %lu: %s", parsed.offset, parsed.reason));
         const Snapshot snapshot(file, parsed.value, [this](const Fault& fault) { tell(fault); });
         _output->snapshot(snapshot.listing());
         std::optional<Extraction> extraction;
@@ -180,8 +180,8 @@ private:
             return;
         extraction->finish();
         if (extraction->inKcapAlone() != 0 && snapshot.dlf())
-            remark(format("%s: %lu messages that are no ordinary records stand in the extracted .kcap alone", _file,
-                          extraction->inKcapAlone()));
+            remark(formatted("%s: %lu messages that are no ordinary records stand in the extracted .kcap alone", _file,
+                             extraction->inKcapAlone()));
     }
 
     void finish()
@@ -219,7 +219,7 @@ private:
         for (const auto& [code, tally] : _decoding.statistics())
             row(code ? codeText(*code) : "(none)", tally);
         row("total", _decoding.total());
-        _remarks.write(format("bytes skipped: %lu\n", _skipped));
+        _remarks.write(formatted("bytes skipped: %lu\n", _skipped));
     }
 
     void tell(const Fault& fault)
@@ -230,8 +230,8 @@ private:
             _faults.untold += fault.size;
             return;
         }
-        const auto skipped = fault.size == 0 ? std::string() : format("; %lu bytes skipped", fault.size);
-        complain(format("%s: at offset %lu: %s%s", _file, fault.offset, fault.reason, skipped));
+        const auto skipped = fault.size == 0 ? std::string() : formatted("; %lu bytes skipped", fault.size);
+        complain(formatted("%s: at offset %lu: %s%s", _file, fault.offset, fault.reason, skipped));
     }
     void complain(const std::string& line)
     {

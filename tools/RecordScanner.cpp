@@ -145,12 +145,13 @@ MessageScanner::Candidate RecordScanner::due()
     const std::size_t there = std::min(_window.peek(said + kBeyond).size(), said + kBeyond);
     for (std::size_t at = found.head->lead->size + kHead; at < there; ++at)
         if (look(at, true).size != 0)
-            return {.size = at, .reason = format("the record says that it is %lu bytes long, and is %lu", said, at)};
+            return {.size = at, .reason = formatted("the record says that it is %lu bytes long, and is %lu", said, at)};
     if (said <= there)
         return {.size = said};
     if (_origin == Origin::Interval)
-        return {.size = there, .reason = format("the record says that it is %lu bytes long, and is %lu", said, there)};
-    return {.incomplete = true, .reason = format("the last record ends %lu bytes short", said - there)};
+        return {.size = there,
+                .reason = formatted("the record says that it is %lu bytes long, and is %lu", said, there)};
+    return {.incomplete = true, .reason = formatted("the last record ends %lu bytes short", said - there)};
 }
 
 MessageScanner::Candidate RecordScanner::chanced()

@@ -42,12 +42,12 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, MessageScanner::
     if (!root || (!root->contains("Timestamp") && !root->contains("Data")))
         throw std::runtime_error("the property list is no snapshot");
     const auto wrong = [this](const std::string& what, const Value& held, std::string_view due) {
-        _tell({0, 0, format("%s is of type %@ where %s is due", what, nameOf(held.kind()), due)});
+        _tell({0, 0, formatted("%s is of type %@ where %s is due", what, nameOf(held.kind()), due)});
     };
     _listing = {std::move(file), textAt(*root, "Timestamp"), textAt(*root, "Description"), {}};
     for (const auto key : {"Timestamp", "Description"})
         if (root->contains(key) && root->at(key).string() == nullptr)
-            wrong(format("\"%s\"", key), root->at(key), "a string");
+            wrong(formatted("\"%s\"", key), root->at(key), "a string");
     if (!root->contains("Data"))
         return;
     const auto data = root->at("Data").array();
@@ -68,7 +68,7 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, MessageScanner::
                 _dlf = *dlf.data();
                 _dlfEntry = index;
             } else if (dlf) {
-                wrong(format("entry %lu: \"DLF\"", index), dlf, "data");
+                wrong(formatted("entry %lu: \"DLF\"", index), dlf, "data");
             } else if (state.data() != nullptr) {
                 listed.content = "records";
                 listed.size = state.data()->size();
@@ -78,10 +78,10 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, MessageScanner::
                 listed.size = leavesOf(state);
                 _trees.push_back(state);
             } else if (state) {
-                wrong(format("entry %lu: \"DisplayState\"", index), state, "data");
+                wrong(formatted("entry %lu: \"DisplayState\"", index), state, "data");
             }
         } else {
-            wrong(format("entry %lu", index), element, "a dictionary");
+            wrong(formatted("entry %lu", index), element, "a dictionary");
         }
         _listing.entries.push_back(std::move(listed));
     }
@@ -110,14 +110,14 @@ void Snapshot::recover(const PropertyLists& lists, const std::function<void(Byte
         accounted += interval.size() >= 2 ? interval.size() - 1 : 0;
     if (!_dlf || _dlf->size() <= accounted) {
         for (const auto& [entry, interval] : _intervals)
-            scan(interval.bytes(), 0, false, format("entry %lu", entry), take);
+            scan(interval.bytes(), 0, false, formatted("entry %lu", entry), take);
         return;
     }
     if (!_intervals.empty())
         _tell({0, 0,
-               format("the DLF stream has %lu bytes, of which the other entries account for %lu: it is taken",
-                      _dlf->size(), accounted)});
-    scan(_dlf->bytes().subspan(versionReport().size()), versionReport().size(), true, format("entry %lu", _dlfEntry),
+               formatted("the DLF stream has %lu bytes, of which the other entries account for %lu: it is taken",
+                         _dlf->size(), accounted)});
+    scan(_dlf->bytes().subspan(versionReport().size()), versionReport().size(), true, formatted("entry %lu", _dlfEntry),
          take);
 }
 
@@ -126,7 +126,7 @@ void Snapshot::scan(Bytes bytes, std::uint64_t from, bool isDlf, const std::stri
 {
     ByteWindow window(bytes);
     const auto tell = [&](const Fault& fault) {
-        _tell({fault.offset + from, fault.size, format("%s: %s", place, fault.reason)});
+        _tell({fault.offset + from, fault.size, formatted("%s: %s", place, fault.reason)});
     };
     RecordScanner scanner(window, tell, isDlf ? RecordScanner::Origin::Dlf : RecordScanner::Origin::Interval);
     while (const auto message = scanner.next())

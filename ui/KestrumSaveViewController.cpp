@@ -20,7 +20,7 @@ constexpr Font kRowFont{"Helvetica", 13};
 std::string snapshotPath(const FileSystem& files, Date now)
 {
     const auto seconds = std::chrono::floor<std::chrono::seconds>(now).time_since_epoch().count();
-    return format("%@/KestrumSnapshot-%ld.kestrum", files.diagnosticLogDirectory(), seconds);
+    return formatted("%@/KestrumSnapshot-%ld.kestrum", files.diagnosticLogDirectory(), seconds);
 }
 
 } // namespace

@@ -57,7 +57,7 @@ std::string ReplaySource::fault() const
 {
     if (_reader.fault().empty())
         return {};
-    return format("%s: at offset %lu: %s", _path, _reader.offset(), _reader.fault());
+    return formatted("%s: at offset %lu: %s", _path, _reader.offset(), _reader.fault());
 }
 
 void ReplaySource::rewind()

@@ -102,7 +102,7 @@ LogChannelAnswer Service::createLogChannel(std::string_view address)
     auto logPort = FrameConnection::connectTo(_settings.directory + "/" + std::string(address), kConnectTimeout, _log);
     if (!logPort)
         return failed(vox::kNoReceiver, "nobody listens there");
-    const auto name = format("%s%d.%u", kCommandPorts, ::getpid(), ++_lastChannel);
+    const auto name = formatted("%s%d.%u", kCommandPorts, ::getpid(), ++_lastChannel);
     auto channel = std::make_unique<ServiceChannel>(_host, std::move(logPort));
     if (const auto wrong = channel->listen(_settings.directory + "/" + name); !wrong.empty())
         return failed(vox::kNoReceiver, wrong.c_str());

@@ -114,7 +114,7 @@ void ServiceChannel::flush()
                 const std::size_t dropped = _outbox.dropped() - std::exchange(_reportedDrops, _outbox.dropped());
                 _host.log.write(
                     Priority::Warning,
-                    format("Channel %s: its client reads again, %lu messages were dropped", _name, dropped));
+                    formatted("Channel %s: its client reads again, %lu messages were dropped", _name, dropped));
             }
             return;
         }

@@ -33,7 +33,7 @@ std::string scenarioNames()
 {
     std::string lines = "The live scenario:";
     for (const auto& each : scenarios())
-        lines += format("\n%s: %s", each.name, each.summary);
+        lines += formatted("\n%s: %s", each.name, each.summary);
     return lines;
 }
 

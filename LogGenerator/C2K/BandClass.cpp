@@ -23,7 +23,7 @@ std::string bandClassName(std::uint32_t bandClass)
     };
     if (bandClass < std::size(kNames))
         return std::string(kNames[bandClass]);
-    return format("[Bad Value %d]", static_cast<std::int32_t>(bandClass));
+    return formatted("[Bad Value %d]", static_cast<std::int32_t>(bandClass));
 }
 
 } // namespace kestrum

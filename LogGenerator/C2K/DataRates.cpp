@@ -38,7 +38,7 @@ void publishRate(C2KContext& context, const Link& link, std::uint32_t sequence, 
         // Across the wrap of the number nothing is published: the difference alone would not show it.
         if (sequence > before && elapsed >= 1) {
             const auto bits = static_cast<double>(static_cast<std::int64_t>(bitsSent - *previousSent));
-            context.publish(link.identifier, format("%.2f kbps", bits / (elapsed * 1024.0)));
+            context.publish(link.identifier, formatted("%.2f kbps", bits / (elapsed * 1024.0)));
         }
         note(link.previousSequence, before);
         note(link.previousSent, *previousSent);
@@ -62,8 +62,8 @@ bool isLongEnough(Record record, std::size_t minimum, std::string_view code, C2K
 {
     if (record.size() >= minimum)
         return true;
-    context.rejectLength(format("Log code %s is %d bytes long but must be at least %ld bytes.", code,
-                                static_cast<int>(record.size()), static_cast<long>(minimum)));
+    context.rejectLength(formatted("Log code %s is %d bytes long but must be at least %ld bytes.", code,
+                                   static_cast<int>(record.size()), static_cast<long>(minimum)));
     return false;
 }
 

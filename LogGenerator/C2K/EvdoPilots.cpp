@@ -40,8 +40,8 @@ void listStrengths(Record record, const PilotList& list, std::uint32_t count, st
         if (leftOut == pn)
             continue;
         const double ratio = pilot->read(list.energy).value_or(0) / 512.0;
-        shown.setText(format("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
-                      format("%+.2f dB", 10.0 * std::log10(ratio)));
+        shown.setText(formatted("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
+                      formatted("%+.2f dB", 10.0 * std::log10(ratio)));
     }
 }
 
@@ -61,14 +61,14 @@ void publishPilots(C2KContext& context, std::string_view identifier, Record reco
 void decodeActiveSetPilots(Record record, C2KContext& context)
 {
     if (record.size() < kActiveSet.first) {
-        context.rejectLength(format("Log code 0x12b6 is %u bytes long but must be at least %lu bytes.",
-                                    lengthOf(record), kActiveSet.first));
+        context.rejectLength(formatted("Log code 0x12b6 is %u bytes long but must be at least %lu bytes.",
+                                       lengthOf(record), kActiveSet.first));
         return;
     }
     const auto count = record.read(kActiveSet.count).value_or(0);
     if (record.size() < kActiveSet.first + kActiveSet.size * count) {
-        context.rejectLength(format("Log code 0x12b6 is %u bytes long, but has %d substructs.", lengthOf(record),
-                                    static_cast<std::int32_t>(count)));
+        context.rejectLength(formatted("Log code 0x12b6 is %u bytes long, but has %d substructs.", lengthOf(record),
+                                       static_cast<std::int32_t>(count)));
         return;
     }
     publishPilots(context, "kActiveSetPilots", record, kActiveSet, count);
@@ -77,15 +77,15 @@ void decodeActiveSetPilots(Record record, C2KContext& context)
 void decodeFingers(Record record, C2KContext& context)
 {
     if (record.size() < kFingers.first) {
-        context.rejectLength(format("Log code 0x108a is %u bytes long but must be at least %lu bytes.",
-                                    lengthOf(record), kFingers.first));
+        context.rejectLength(formatted("Log code 0x108a is %u bytes long but must be at least %lu bytes.",
+                                       lengthOf(record), kFingers.first));
         return;
     }
     const auto count = record.read(kFingers.count).value_or(0);
     if (record.size() != kFingers.first + kFingers.size * count) {
         // "size" is the fixed part's, not a finger's; kept so.
-        context.rejectLength(format("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%lu).",
-                                    lengthOf(record), static_cast<std::int32_t>(count), kFingers.first));
+        context.rejectLength(formatted("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%lu).",
+                                       lengthOf(record), static_cast<std::int32_t>(count), kFingers.first));
         return;
     }
     publishPilots(context, "kFingerC2I", record, kFingers, count, kUnusedFinger);

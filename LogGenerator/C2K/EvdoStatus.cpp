@@ -10,7 +10,7 @@ constexpr std::uint32_t kFirstStateWithLink = 4; // Access, Connected
 
 std::string named(std::uint32_t raw, std::span<const std::string_view> names)
 {
-    return raw < names.size() ? std::string(names[raw]) : format("[Reserved %d]", static_cast<std::int32_t>(raw));
+    return raw < names.size() ? std::string(names[raw]) : formatted("[Reserved %d]", static_cast<std::int32_t>(raw));
 }
 
 std::string deviceState(std::uint32_t raw)
@@ -29,7 +29,7 @@ std::string sessionState(std::uint32_t raw)
 
 std::string signedDbm(std::uint32_t raw)
 {
-    return format("%+d dBm", static_cast<std::int8_t>(raw));
+    return formatted("%+d dBm", static_cast<std::int8_t>(raw));
 }
 
 std::string_view withoutLink(std::uint32_t)
@@ -39,12 +39,12 @@ std::string_view withoutLink(std::uint32_t)
 
 std::string pnOffset(std::uint32_t raw)
 {
-    return raw == 0xFFFF ? "Invalid Value" : format("%d × 64chips", static_cast<std::int32_t>(raw));
+    return raw == 0xFFFF ? "Invalid Value" : formatted("%d × 64chips", static_cast<std::int32_t>(raw));
 }
 
 std::string uati(std::uint32_t raw)
 {
-    return format("0x%06x", raw);
+    return formatted("0x%06x", raw);
 }
 
 // clang-format off
@@ -79,8 +79,8 @@ static_assert(reach(kTuning) <= kLength && reach(kLink) <= kLength && reach(kSes
 void decodeEvdoStatus(Record record, C2KContext& context)
 {
     if (record.size() != kLength) {
-        context.rejectLength(format("Log code 0x1183 is %u bytes long but should be %lu bytes.",
-                                    static_cast<unsigned>(record.size()), kLength));
+        context.rejectLength(formatted("Log code 0x1183 is %u bytes long but should be %lu bytes.",
+                                       static_cast<unsigned>(record.size()), kLength));
         return;
     }
     context.publish(record, kTuning);

@@ -30,19 +30,19 @@ std::string deviceState(std::uint32_t raw)
                                            "Powerup state [11]"};
     if (raw < std::size(kNames))
         return std::string(kNames[raw]);
-    return format("[Bad Value %d]", static_cast<std::int32_t>(raw));
+    return formatted("[Bad Value %d]", static_cast<std::int32_t>(raw));
 }
 
 /// Receive AGC: 334/1000 dB a step, 0 at -63.248 dBm.
 std::string receiveAgc(std::uint32_t raw)
 {
-    return format("%+.2f dBm", static_cast<std::int8_t>(raw) * 334 / 1000.0 - 63.248);
+    return formatted("%+.2f dBm", static_cast<std::int8_t>(raw) * 334 / 1000.0 - 63.248);
 }
 
 /// Transmit AGC in tenths of dBm.
 std::string transmitAgc(std::uint32_t raw)
 {
-    return format("%+.2f dBm", static_cast<std::int16_t>(raw) / 10.0);
+    return formatted("%+.2f dBm", static_cast<std::int16_t>(raw) / 10.0);
 }
 
 // clang-format off
@@ -92,8 +92,8 @@ void listPilots(Record activeSet, Dictionary& shown)
             break;
         const auto pn = pnField->read(u16(0)).value_or(0);
         const double strength = strengthDb(n, gain, k, energyField->read(u16(0)).value_or(0));
-        shown.setText(format("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
-                      pn == reference ? format("(ref pilot) %+.2f dB", strength) : format("%+.2f dB", strength));
+        shown.setText(formatted("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
+                      pn == reference ? formatted("(ref pilot) %+.2f dB", strength) : formatted("%+.2f dB", strength));
     }
 }
 
@@ -102,8 +102,8 @@ void listPilots(Record activeSet, Dictionary& shown)
 void decodeOneXStatus(Record record, C2KContext& context)
 {
     if (record.size() < kMinimumLength) {
-        context.rejectLength(format("Log code 0x119c is %u bytes long but must be at least %lu bytes.",
-                                    static_cast<unsigned>(record.size()), kMinimumLength));
+        context.rejectLength(formatted("Log code 0x119c is %u bytes long but must be at least %lu bytes.",
+                                       static_cast<unsigned>(record.size()), kMinimumLength));
         return;
     }
     const auto state = findSubpacket(record, kState, context.log);
@@ -131,7 +131,7 @@ void decodeOneXStatus(Record record, C2KContext& context)
 
     // The last call's frame errors, once, after it ended.
     if (const auto ratio = context.state.at("TrafficFER").real(); ratio && !inTraffic) {
-        context.publish("k1xTrafficFER", format("%.02f%% (old)", *ratio * 100.0));
+        context.publish("k1xTrafficFER", formatted("%.02f%% (old)", *ratio * 100.0));
         context.state.remove("TrafficFER");
     }
 }

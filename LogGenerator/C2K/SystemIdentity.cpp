@@ -26,7 +26,7 @@ std::string roamingIndicator(std::uint32_t raw)
                                            "Banner OFF [12]"};
     if (raw < std::size(kNames))
         return std::string(kNames[raw]);
-    return format("ERI - %d", static_cast<std::int32_t>(raw));
+    return formatted("ERI - %d", static_cast<std::int32_t>(raw));
 }
 
 // clang-format off
@@ -53,8 +53,8 @@ static_assert(reach(kRoaming) <= kMinimumLength && reach(kIdentifiers) <= kMinim
 void decodeSystemIdentity(Record record, C2KContext& context)
 {
     if (record.size() < kMinimumLength) {
-        context.rejectLength(format("Log code 0x134f is %d bytes long but must be at least %lu bytes.",
-                                    static_cast<int>(record.size()), kMinimumLength));
+        context.rejectLength(formatted("Log code 0x134f is %d bytes long but must be at least %lu bytes.",
+                                       static_cast<int>(record.size()), kMinimumLength));
         return;
     }
     const auto version = record.read(kVersion).value_or(0);
@@ -69,7 +69,7 @@ void decodeSystemIdentity(Record record, C2KContext& context)
     if (systemType == kKnownSystemType) {
         context.publish(record, kIdentifiers);
     } else {
-        const auto unknown = format("(unknown system type %d)", static_cast<std::int32_t>(systemType));
+        const auto unknown = formatted("(unknown system type %d)", static_cast<std::int32_t>(systemType));
         for (const auto& row : kIdentifiers)
             context.publish(row.key, unknown);
     }

@@ -19,8 +19,8 @@ constexpr float kOldWeight = 0.984375F;
 void decodeTrafficDemodulation(Record record, C2KContext& context)
 {
     if (record.size() < kMinimumLength) {
-        context.rejectLength(format("Log code 0x119d is %d bytes long but must be at least %ld bytes.",
-                                    static_cast<int>(record.size()), static_cast<long>(kMinimumLength)));
+        context.rejectLength(formatted("Log code 0x119d is %d bytes long but must be at least %ld bytes.",
+                                       static_cast<int>(record.size()), static_cast<long>(kMinimumLength)));
         return;
     }
     const auto subpacket = findSubpacket(record, kDemodulationSubpacket, context.log);
@@ -35,7 +35,7 @@ void decodeTrafficDemodulation(Record record, C2KContext& context)
     if (const auto previous = context.state.at("TrafficFER").real())
         ratio += static_cast<float>(*previous) * kOldWeight;
     context.state.set("TrafficFER", ratio);
-    context.publish("k1xTrafficFER", format("%.02f%%", ratio * 100.0F));
+    context.publish("k1xTrafficFER", formatted("%.02f%%", ratio * 100.0F));
 }
 
 } // namespace kestrum

@@ -38,8 +38,9 @@ void GSMLogGenerator::updateState(State& state, Bytes withData)
 {
     const Value received = _roles.propertyLists.parseOver(withData, std::exchange(_spent, {}));
     if (received.isNull())
-        throw AssertionFailure("updateState:withData:", format("<GSMLogGenerator: %p>", _roles.log.shownAddress(this)),
-                               kSourceFile, kNoObjectLine, "Could not deserialize the object");
+        throw AssertionFailure(
+            "updateState:withData:", formatted("<GSMLogGenerator: %p>", _roles.log.shownAddress(this)), kSourceFile,
+            kNoObjectLine, "Could not deserialize the object");
     const Value processed = processObject(received);
     dropForeignDisplay(state);
     _spent = state.at("DisplayState");
@@ -66,7 +67,7 @@ Value GSMLogGenerator::processObject(const Value& object)
         return processed;
     }
     throw AssertionFailure("processObject:", "GSMLogGenerator", kSourceFile, kUnknownObjectLine,
-                           format("Unknown object of type %@ encountered", nameOf(object.kind())));
+                           formatted("Unknown object of type %@ encountered", nameOf(object.kind())));
 }
 
 Value GSMLogGenerator::canCollapse(const Value& object)

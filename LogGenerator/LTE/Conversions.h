@@ -39,17 +39,17 @@ inline int qrxlevmin(std::uint32_t raw)
 template <double (*Quantity)(std::uint32_t)>
 std::string inDbm(std::uint32_t raw)
 {
-    return format("%4.2f dBm", Quantity(raw));
+    return formatted("%4.2f dBm", Quantity(raw));
 }
 template <double (*Quantity)(std::uint32_t)>
 std::string inDb(std::uint32_t raw)
 {
-    return format("%4.2f dB", Quantity(raw));
+    return formatted("%4.2f dB", Quantity(raw));
 }
 template <int (*Quantity)(std::uint32_t)>
 std::string inWholeDbm(std::uint32_t raw)
 {
-    return format("%d dBm", Quantity(raw));
+    return formatted("%d dBm", Quantity(raw));
 }
 
 } // namespace kestrum

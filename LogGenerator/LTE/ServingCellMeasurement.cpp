@@ -25,7 +25,7 @@ int threshold(std::uint32_t raw)
 
 std::string intraSearch(std::uint32_t raw)
 {
-    return raw == 32 ? "Not Present" : format("%d dB", threshold(raw));
+    return raw == 32 ? "Not Present" : formatted("%d dB", threshold(raw));
 }
 
 /// A ratio like the other threshold, yet worded as a power, on purpose.

@@ -46,8 +46,8 @@ void RRC_State::updateWithData(Record data, LogCode logCode)
     const std::string_view name = mode < std::size(kModeNames) ? kModeNames[mode] : "Unknown RRC Mode";
     publish("State", name);
     if (roles.console.isDebugWatched())
-        roles.console.debug(format("Display Dict = %@, rrc mode = %d %@", describe(sectionRef.node()),
-                                   static_cast<std::int32_t>(mode), name));
+        roles.console.debug(formatted("Display Dict = %@, rrc mode = %d %@", describe(sectionRef.node()),
+                                      static_cast<std::int32_t>(mode), name));
 }
 
 } // namespace kestrum

@@ -15,7 +15,7 @@ constexpr std::uint32_t kNoCellSet = 3;
 /// A 256th of the raw value and no offset, on purpose.
 std::string filteredRscp(std::uint32_t raw)
 {
-    return format("%f", raw / 256.0);
+    return formatted("%f", raw / 256.0);
 }
 
 std::string_view cellSet(std::uint32_t raw)

@@ -30,7 +30,7 @@ int receivedPower(std::int16_t agc)
 
 std::string decibels(std::uint32_t raw)
 {
-    return format("%d dB", static_cast<std::int32_t>(raw));
+    return formatted("%d dB", static_cast<std::int32_t>(raw));
 }
 
 // clang-format off

@@ -16,7 +16,7 @@ std::string number(Record network, std::size_t first)
     std::uint32_t value = 0;
     for (std::size_t i = 0; i < 3; ++i)
         value = 10 * value + std::to_integer<std::uint32_t>(network.bytes()[first + 2 * i]);
-    return format("%d", static_cast<std::uint16_t>(value));
+    return formatted("%d", static_cast<std::uint16_t>(value));
 }
 
 /// The digits of both numbers take turns.

@@ -45,7 +45,7 @@ std::string_view onOrOff(std::uint32_t raw)
 
 std::string seconds(std::uint32_t raw)
 {
-    return format("%d sec", static_cast<std::int32_t>(raw));
+    return formatted("%d sec", static_cast<std::int32_t>(raw));
 }
 
 // clang-format off

@@ -10,7 +10,7 @@ constexpr LogCode kCellMonitor = 0xFF0001;
 
 std::string dbm(std::uint32_t raw)
 {
-    return format("%d dBm", static_cast<std::int32_t>(raw)); // not negated, on purpose
+    return formatted("%d dBm", static_cast<std::int32_t>(raw)); // not negated, on purpose
 }
 
 // clang-format off

@@ -11,7 +11,7 @@ constexpr Elements kCells{ranking::kFirstCell, 7};
 
 std::string dbm(std::uint32_t raw)
 {
-    return format("%d dBm", static_cast<std::int8_t>(raw));
+    return formatted("%d dBm", static_cast<std::int8_t>(raw));
 }
 
 // clang-format off

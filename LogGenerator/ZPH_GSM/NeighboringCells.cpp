@@ -32,7 +32,7 @@ std::string level(std::uint32_t raw)
 {
     constexpr std::int16_t kNotMeasured = 32767;
     const auto rssi = static_cast<std::int16_t>(raw);
-    return rssi == kNotMeasured ? "" : format("%d dBm", 2 * rssi); // doubled on purpose
+    return rssi == kNotMeasured ? "" : formatted("%d dBm", 2 * rssi); // doubled on purpose
 }
 
 // clang-format off

@@ -38,12 +38,12 @@ constexpr Field kIdentity = u32(15).bits(0, 23);
 
 std::string countryCode(std::uint32_t identity)
 {
-    return format("%c%c%c", digit(identity, 0), digit(identity, 1), digit(identity, 2));
+    return formatted("%c%c%c", digit(identity, 0), digit(identity, 1), digit(identity, 2));
 }
 
 std::string networkCode(std::uint32_t identity)
 {
-    return format("%c%c%c", digit(identity, 4), digit(identity, 5), digit(identity, 3));
+    return formatted("%c%c%c", digit(identity, 4), digit(identity, 5), digit(identity, 3));
 }
 
 // clang-format off

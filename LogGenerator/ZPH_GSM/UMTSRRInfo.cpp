@@ -99,7 +99,7 @@ void UMTSRRInfo::showTransmitPower(Record data) const
         sum += power;
         ++values;
     }
-    publish("Transmit Power", format("%4.2lf dBm", sum / values)); // not a number without any value
+    publish("Transmit Power", formatted("%4.2lf dBm", sum / values)); // not a number without any value
 }
 
 void UMTSRRInfo::forgetMonitoredFrequency() const

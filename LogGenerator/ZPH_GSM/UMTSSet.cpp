@@ -14,17 +14,17 @@ constexpr Elements kRanked{ranking::kFirstCell, 10};
 
 std::string rscp(std::uint32_t raw)
 {
-    return format("%d dB", static_cast<std::int8_t>(raw) - 21);
+    return formatted("%d dB", static_cast<std::int8_t>(raw) - 21);
 }
 
 std::string rankedRscp(std::uint32_t raw)
 {
-    return format("%d dB", static_cast<std::int16_t>(raw));
+    return formatted("%d dB", static_cast<std::int16_t>(raw));
 }
 
 std::string halfDb(std::uint32_t raw)
 {
-    return format("%f dB", static_cast<std::int8_t>(raw) * 0.5);
+    return formatted("%f dB", static_cast<std::int8_t>(raw) * 0.5);
 }
 
 // clang-format off
@@ -44,13 +44,13 @@ constexpr std::int16_t kNotMeasured = 32767;
 std::string monitoredRscp(std::uint32_t raw)
 {
     const auto value = static_cast<std::int16_t>(raw);
-    return value == kNotMeasured ? "" : format("%d dBm", value);
+    return value == kNotMeasured ? "" : formatted("%d dBm", value);
 }
 
 std::string monitoredEcNo(std::uint32_t raw)
 {
     const auto value = static_cast<std::int16_t>(raw);
-    return value == kNotMeasured ? "" : format("%d dB", value);
+    return value == kNotMeasured ? "" : formatted("%d dB", value);
 }
 
 // clang-format off

@@ -15,7 +15,7 @@ Value display()
     for (int i = 0; i < 8; ++i)
         neighbors->append(makeDictionary({{"ARFCN", std::to_string(512 + i)},
                                           {"BSIC", wrapped("37")},
-                                          {"RxLev", format("-%d dBm", 70 + i)},
+                                          {"RxLev", formatted("-%d dBm", 70 + i)},
                                           {"C1", "24"}}));
     return makeDictionary({{"Serving Cell", makeDictionary({{"MCC", "262"},
                                                             {"MNC", "01"},

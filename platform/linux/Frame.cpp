@@ -58,12 +58,12 @@ std::optional<Frame> FrameReader::next()
     const std::size_t length = number(at);
     // Judged as soon as it is there, lest a peer have us wait for bytes that mean nothing.
     if (length < kFrameHeader - kLengthSize || length > kFrameHeader - kLengthSize + kMaximumPayload) {
-        _fault = format("a frame of %lu bytes, allowed are %lu to %lu", length, kFrameHeader - kLengthSize,
-                        kFrameHeader - kLengthSize + kMaximumPayload);
+        _fault = formatted("a frame of %lu bytes, allowed are %lu to %lu", length, kFrameHeader - kLengthSize,
+                           kFrameHeader - kLengthSize + kMaximumPayload);
         return std::nullopt;
     }
     if (_end - _begin > kLengthSize && (at[4] < std::byte{1} || at[4] > std::byte{3})) {
-        _fault = format("a frame of the unknown kind %u", std::to_integer<unsigned>(at[4]));
+        _fault = formatted("a frame of the unknown kind %u", std::to_integer<unsigned>(at[4]));
         return std::nullopt;
     }
     if (_end - _begin < kLengthSize + length)

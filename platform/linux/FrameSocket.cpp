@@ -206,8 +206,8 @@ bool FrameConnection::waitForBytes(std::chrono::milliseconds timeout)
 std::string FrameListener::listen(const std::string& path)
 {
     if (path.size() >= sizeof sockaddr_un::sun_path)
-        return format("the path %s is too long for a socket (%lu bytes at most)", path,
-                      sizeof sockaddr_un::sun_path - 1);
+        return formatted("the path %s is too long for a socket (%lu bytes at most)", path,
+                         sizeof sockaddr_un::sun_path - 1);
     _name = nameAt(path);
     const DirectoryLock lock(std::filesystem::path(path).parent_path().string());
     if (isStaleSocket(path))
@@ -216,8 +216,8 @@ std::string FrameListener::listen(const std::string& path)
     if (_server.listen(QString::fromStdString(path)))
         return {};
     if (_server.serverError() == QAbstractSocket::AddressInUseError)
-        return format("another process listens at %s", path);
-    return format("cannot listen at %s: %s", path, _server.errorString().toStdString());
+        return formatted("another process listens at %s", path);
+    return formatted("cannot listen at %s: %s", path, _server.errorString().toStdString());
 }
 
 void FrameListener::accept()

@@ -27,7 +27,7 @@ LinuxBundle::LinuxBundle()
 std::optional<std::string> LinuxBundle::pathForResource(std::string_view name, std::string_view type) const
 {
     for (const auto& directory : _directories) {
-        const auto path = files::path(directory) / format("%s.%s", name, type);
+        const auto path = files::path(directory) / formatted("%s.%s", name, type);
         std::error_code unreachable;
         if (files::is_regular_file(path, unreachable))
             return path.string();
@@ -39,7 +39,7 @@ std::vector<std::string> LinuxBundle::pathsForResourcesOfType(std::string_view t
 {
     // By file name: what stands in an earlier directory hides its namesakes.
     std::map<std::string, std::string> found;
-    const std::string ending = format(".%s", type);
+    const std::string ending = formatted(".%s", type);
     for (const auto& directory : _directories) {
         std::error_code unreachable;
         for (const auto& entry : files::directory_iterator(directory, unreachable))

@@ -46,7 +46,7 @@ struct LinuxSystemLog::Shared {
             sink(line.first, line.second);
             lock.lock();
             if (lines.empty() && lost > 0)
-                lines.emplace_back(LOG_WARNING, format("%lu log lines were lost", std::exchange(lost, 0)));
+                lines.emplace_back(LOG_WARNING, formatted("%lu log lines were lost", std::exchange(lost, 0)));
         }
         ended = true;
         changed.notify_all();

@@ -19,7 +19,7 @@ std::string runtimeDirectory()
         return named;
     if (const char* session = std::getenv("XDG_RUNTIME_DIR"); session != nullptr && *session != '\0')
         return std::string(session) + "/kestrum";
-    return format("/tmp/kestrum-%u", ::getuid());
+    return formatted("/tmp/kestrum-%u", ::getuid());
 }
 
 std::string secureRuntimeDirectory(const std::string& directory)
@@ -27,17 +27,17 @@ std::string secureRuntimeDirectory(const std::string& directory)
     std::error_code ignored; // mkdir below tells what is wrong with a parent that could not be made
     std::filesystem::create_directories(std::filesystem::path(directory).parent_path(), ignored);
     if (::mkdir(directory.c_str(), 0700) != 0 && errno != EEXIST)
-        return format("cannot create %s: %s", directory, std::strerror(errno));
+        return formatted("cannot create %s: %s", directory, std::strerror(errno));
     struct stat found {};
     // lstat: in a directory that others can write, a link may have been laid.
     if (::lstat(directory.c_str(), &found) != 0)
-        return format("cannot look at %s: %s", directory, std::strerror(errno));
+        return formatted("cannot look at %s: %s", directory, std::strerror(errno));
     if (!S_ISDIR(found.st_mode))
-        return format("%s is no directory", directory);
+        return formatted("%s is no directory", directory);
     if (found.st_uid != ::geteuid())
-        return format("%s belongs to another user", directory);
+        return formatted("%s belongs to another user", directory);
     if ((found.st_mode & 0777) != 0700 && ::chmod(directory.c_str(), 0700) != 0)
-        return format("cannot close %s to others: %s", directory, std::strerror(errno));
+        return formatted("cannot close %s to others: %s", directory, std::strerror(errno));
     return {};
 }
 

@@ -7,7 +7,7 @@ namespace kestrum::vox {
 
 std::string addressOfPort(std::string_view name, int process)
 {
-    return format("%s.%d", name, process);
+    return formatted("%s.%d", name, process);
 }
 
 std::vector<std::byte> encode(const LogChannelAnswer& answer)

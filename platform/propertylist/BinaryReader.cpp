@@ -158,7 +158,7 @@ private:
         default:
             break;
         }
-        throw Refusal{format("an object of unknown kind 0x%02x", marker)};
+        throw Refusal{formatted("an object of unknown kind 0x%02x", marker)};
     }
 
     Value open(std::size_t object, std::size_t count, const ArrayRef& array, const DictionaryRef& dictionary)

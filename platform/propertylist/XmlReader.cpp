@@ -199,14 +199,14 @@ private:
         for (const auto& [known, element] : kElements)
             if (known == name)
                 return element;
-        throw Refusal{format("unknown element <%s>", name)};
+        throw Refusal{formatted("unknown element <%s>", name)};
     }
 
     void start(const char* name)
     {
         const Element element = elementNamed(name);
         if (element == Element::Plist ? !_open.empty() : !mayHold(element))
-            throw Refusal{format("<%s> is out of place", name)};
+            throw Refusal{formatted("<%s> is out of place", name)};
         if (element != Element::Plist && element != Element::Key)
             _budget.takeNode();
         if (element == Element::Dict || element == Element::Array)

@@ -94,8 +94,8 @@ private:
         case Value::Kind::String:
             return element("string", *value.string());
         case Value::Kind::Integer:
-            return element("integer",
-                           value.integer() ? format("%ld", *value.integer()) : format("%lu", *value.unsignedInteger()));
+            return element("integer", value.integer() ? formatted("%ld", *value.integer())
+                                                      : formatted("%lu", *value.unsignedInteger()));
         case Value::Kind::Real:
             return element("real", realText(*value.real()));
         case Value::Kind::Boolean:

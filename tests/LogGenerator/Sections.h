@@ -27,7 +27,7 @@ public:
     std::vector<LogCode> getLogCodeArray() const override { return {0x4001, 0xFF0002, 0x4003}; }
     void updateWithData(Record data, LogCode logCode) override
     {
-        calls().push_back(format("Cell %u %u", logCode, static_cast<std::uint32_t>(data.size())));
+        calls().push_back(formatted("Cell %u %u", logCode, static_cast<std::uint32_t>(data.size())));
         if (logCode == 0x4003)
             throw std::runtime_error("broken record");
         static constexpr Row kRows[] = {{u8(13), "Channel", decimal}};
@@ -42,7 +42,7 @@ public:
     std::vector<LogCode> getLogCodeArray() const override { return {0x4002, 0x4001}; }
     void updateWithData(Record data, LogCode logCode) override
     {
-        calls().push_back(format("Neighbors %u %u", logCode, static_cast<std::uint32_t>(data.size())));
+        calls().push_back(formatted("Neighbors %u %u", logCode, static_cast<std::uint32_t>(data.size())));
         replaceArray(sectionRef,
                      listed(data, Elements(13, 1), 255, [](Record each) { return decimal(each.read(u8(0)).value()); }));
     }

@@ -101,7 +101,7 @@ std::string nameOf(const testing::TestParamInfo<Subscription>& each)
     for (const char c : each.param.section)
         if (std::isalnum(static_cast<unsigned char>(c)) != 0)
             name += c;
-    return name + "_" + format("%x", each.param.code);
+    return name + "_" + formatted("%x", each.param.code);
 }
 
 /// Of a dictionary section; it has to show something.

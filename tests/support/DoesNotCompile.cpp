@@ -6,35 +6,35 @@
 using namespace kestrum;
 
 const int number = -1;
-const std::string text = format("%d %s %lu %+.2f %c %p %@ 100%%", number, "text", 1ul, 0.5, 'c', &number, "object")
+const std::string text = formatted("%d %s %lu %+.2f %c %p %@ 100%%", number, "text", 1ul, 0.5, 'c', &number, "object")
 #if defined TEXT_FOR_A_NUMBER
-                         + format("%d", "12")
+                         + formatted("%d", "12")
 #elif defined NUMBER_FOR_A_TEXT
-                         + format("%s", 12)
+                         + formatted("%s", 12)
 #elif defined SIGNED_FOR_UNSIGNED
-                         + format("%u", -1)
+                         + formatted("%u", -1)
 #elif defined UNSIGNED_FOR_SIGNED
-                         + format("%d", 1u)
+                         + formatted("%d", 1u)
 #elif defined LONG_WITHOUT_L
-                         + format("%d", 1l)
+                         + formatted("%d", 1l)
 #elif defined INTEGER_FOR_A_REAL
-                         + format("%f", 1)
+                         + formatted("%f", 1)
 #elif defined REAL_FOR_AN_INTEGER
-                         + format("%d", 1.0)
+                         + formatted("%d", 1.0)
 #elif defined BOOLEAN_FOR_A_NUMBER
-                         + format("%d", true)
+                         + formatted("%d", true)
 #elif defined CHARACTER_FOR_A_NUMBER
-                         + format("%d", 'c')
+                         + formatted("%d", 'c')
 #elif defined PRECISION_FOR_AN_INTEGER
-                         + format("%.2d", 1)
+                         + formatted("%.2d", 1)
 #elif defined UNKNOWN_CONVERSION
-                         + format("%q", 1)
+                         + formatted("%q", 1)
 #elif defined UNFINISHED_CONVERSION
-                         + format("100 %", 1)
+                         + formatted("100 %", 1)
 #elif defined TOO_FEW_ARGUMENTS
-                         + format("%d %d", 1)
+                         + formatted("%d %d", 1)
 #elif defined TOO_MANY_ARGUMENTS
-                         + format("%d", 1, 2)
+                         + formatted("%d", 1, 2)
 #endif
     ;
 

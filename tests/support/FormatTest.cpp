@@ -23,7 +23,7 @@ namespace {
 }
 
 // One text for both: a format that differs between them would prove nothing.
-#define EXPECT_AS_PRINTF(...) EXPECT_EQ(format(__VA_ARGS__), printed(__VA_ARGS__))
+#define EXPECT_AS_PRINTF(...) EXPECT_EQ(formatted(__VA_ARGS__), printed(__VA_ARGS__))
 
 TEST(Format, SignedIntegersAsPrintf)
 {
@@ -60,7 +60,7 @@ TEST(Format, UnsignedIntegersAsPrintf)
 
 TEST(Format, OnlySignedConversionsShowAPlus)
 {
-    EXPECT_EQ(format("%+u %+x", 5u, 5u), "5 5");
+    EXPECT_EQ(formatted("%+u %+x", 5u, 5u), "5 5");
 }
 
 TEST(Format, RealsAsPrintf)
@@ -86,7 +86,7 @@ TEST(Format, RealsAsPrintf)
         for (const double step : {1.0 / 2, 1.0 / 8, 1.0 / 16, 1.0 / 256, 0.01, 0.1})
             EXPECT_AS_PRINTF("%4.2f", raw * step);
     EXPECT_AS_PRINTF("%.3f", static_cast<double>(0.1f));
-    EXPECT_EQ(format("%.9f", 0.1f), "0.100000001");
+    EXPECT_EQ(formatted("%.9f", 0.1f), "0.100000001");
 }
 
 TEST(Format, BinaryFractionsRoundHalfToEvenAsPrintf)
@@ -120,12 +120,12 @@ TEST(Format, InfinityAsPrintf)
 TEST(Format, NotANumberNeverHasASign)
 {
     constexpr double nan = std::numeric_limits<double>::quiet_NaN();
-    EXPECT_EQ(format("%f", nan), "nan");
-    EXPECT_EQ(format("%f", -nan), "nan");
-    EXPECT_EQ(format("%4.2lf dBm", nan), " nan dBm");
-    EXPECT_EQ(format("%4.2lf dBm", -nan), " nan dBm");
-    EXPECT_EQ(format("%+.2f dB", nan), "nan dB");
-    EXPECT_EQ(format("%06.2f", nan), "   nan");
+    EXPECT_EQ(formatted("%f", nan), "nan");
+    EXPECT_EQ(formatted("%f", -nan), "nan");
+    EXPECT_EQ(formatted("%4.2lf dBm", nan), " nan dBm");
+    EXPECT_EQ(formatted("%4.2lf dBm", -nan), " nan dBm");
+    EXPECT_EQ(formatted("%+.2f dB", nan), "nan dB");
+    EXPECT_EQ(formatted("%06.2f", nan), "   nan");
 }
 
 TEST(Format, TextsAsPrintf)
@@ -135,44 +135,44 @@ TEST(Format, TextsAsPrintf)
     EXPECT_AS_PRINTF("<%.2s> <%5.1s> <%.9s> <%.0s>", "LTE", "LTE", "LTE", "LTE");
     EXPECT_AS_PRINTF("%c%c", 'A', '\x7F');
     EXPECT_AS_PRINTF("100%% of %s%%", "it");
-    EXPECT_EQ(format("%@ and %s", std::string("a string"), std::string_view("a view")), "a string and a view");
+    EXPECT_EQ(formatted("%@ and %s", std::string("a string"), std::string_view("a view")), "a string and a view");
     const char* const none = nullptr;
-    EXPECT_EQ(format("%s", none), "(null)");
+    EXPECT_EQ(formatted("%s", none), "(null)");
 }
 
 TEST(Format, PercentsInArgumentsStayAsTheyAre)
 {
-    EXPECT_EQ(format("%s", "%d %s %n"), "%d %s %n");
+    EXPECT_EQ(formatted("%s", "%d %s %n"), "%d %s %n");
 }
 
 TEST(Format, NulInsideATextStays)
 {
-    EXPECT_EQ(format("%s!", std::string("a\0b", 3)), std::string("a\0b!", 4));
+    EXPECT_EQ(formatted("%s!", std::string("a\0b", 3)), std::string("a\0b!", 4));
 }
 
 TEST(Format, LongTextsStayWhole)
 {
     for (const std::size_t length : {127u, 128u, 129u, 1000u, 100000u}) {
         const std::string text(length, 'x');
-        EXPECT_EQ(format("%s", text), text);
-        EXPECT_EQ(format("%s%d", text, 12), text + "12");
-        EXPECT_EQ(format("%d%s%s", 12, text, text), "12" + text + text);
+        EXPECT_EQ(formatted("%s", text), text);
+        EXPECT_EQ(formatted("%s%d", text, 12), text + "12");
+        EXPECT_EQ(formatted("%d%s%s", 12, text, text), "12" + text + text);
     }
-    EXPECT_EQ(format("%300d", 1), std::string(299, ' ') + "1");
+    EXPECT_EQ(formatted("%300d", 1), std::string(299, ' ') + "1");
 }
 
 TEST(Format, Addresses)
 {
-    EXPECT_EQ(format("%p", static_cast<const void*>(nullptr)), "0x0");
+    EXPECT_EQ(formatted("%p", static_cast<const void*>(nullptr)), "0x0");
     const int here = 0;
     EXPECT_AS_PRINTF("%p", static_cast<const void*>(&here));
-    EXPECT_EQ(format("%20p", static_cast<const void*>(nullptr)), std::string(17, ' ') + "0x0");
+    EXPECT_EQ(formatted("%20p", static_cast<const void*>(nullptr)), std::string(17, ' ') + "0x0");
 }
 
 TEST(Format, WithoutArguments)
 {
-    EXPECT_EQ(format(" Could not generate PLIST"), " Could not generate PLIST");
-    EXPECT_EQ(format(""), "");
+    EXPECT_EQ(formatted(" Could not generate PLIST"), " Could not generate PLIST");
+    EXPECT_EQ(formatted(""), "");
 }
 
 } // namespace

@@ -38,9 +38,9 @@ std::optional<std::vector<std::byte>> CaptureReader::next()
     if (_format == CaptureFormat::Kcap) {
         const auto count = length.read(u32(0));
         if (!count)
-            _fault = format("the length has only %lu of its 4 bytes", got);
+            _fault = formatted("the length has only %lu of its 4 bytes", got);
         else if (*count > kMaximumMessage)
-            _fault = format("a message of %u bytes, allowed are %lu", *count, kMaximumMessage);
+            _fault = formatted("a message of %u bytes, allowed are %lu", *count, kMaximumMessage);
         else if (auto message = take(*count, {})) {
             _offset += kKcapLength + *count;
             return message;
@@ -51,7 +51,7 @@ std::optional<std::vector<std::byte>> CaptureReader::next()
     if (!count)
         _fault = "the length has only 1 of its 2 bytes";
     else if (*count < kDlfHeader)
-        _fault = format("a record of %u bytes, less than its header's %lu", *count, kDlfHeader);
+        _fault = formatted("a record of %u bytes, less than its header's %lu", *count, kDlfHeader);
     else if (auto message = take(*count - kDlfLength, {kOrdinaryRecord, bytes[0], bytes[1]})) {
         _offset += *count;
         return message;
@@ -68,8 +68,8 @@ std::optional<std::vector<std::byte>> CaptureReader::take(std::size_t length, st
         into.resize(at + piece);
         _from->read(reinterpret_cast<char*>(into.data() + at), static_cast<std::streamsize>(piece));
         if (static_cast<std::size_t>(_from->gcount()) < piece) {
-            _fault = format("the last message ends %lu bytes short",
-                            wanted - at - static_cast<std::size_t>(_from->gcount()));
+            _fault = formatted("the last message ends %lu bytes short",
+                               wanted - at - static_cast<std::size_t>(_from->gcount()));
             return std::nullopt;
         }
     }

@@ -128,7 +128,7 @@ private:
     int phaseLength() { return _random.whole(phase().shortest, phase().longest); }
     const CallPhase& phase() const { return kPhases[static_cast<std::size_t>(_call)]; }
 
-    static std::string dbm(double level) { return format("%d dBm", static_cast<int>(std::lround(level))); }
+    static std::string dbm(double level) { return formatted("%d dBm", static_cast<int>(std::lround(level))); }
 
     // The modem wraps what it groups into dictionaries of one entry, and begins every array with the number of
     // what follows: a display is to drop both.
@@ -138,7 +138,7 @@ private:
     }
     static Value counted(std::vector<Value> elements)
     {
-        elements.insert(elements.begin(), Value(format("%lu", elements.size())));
+        elements.insert(elements.begin(), Value(formatted("%lu", elements.size())));
         return makeArray(std::move(elements));
     }
 
@@ -158,13 +158,13 @@ private:
         const Cell& cell = _cells[_serving];
         return makeDictionary({{"MCC", Value("001")},
                                {"MNC", Value("01")},
-                               {"LAC", Value(format("0x%04x", static_cast<unsigned>(cell.area)))},
-                               {"Cell ID", Value(format("0x%04x", static_cast<unsigned>(cell.identity)))},
-                               {"ARFCN", Value(format("%d", cell.arfcn))},
-                               {"BSIC", Value(format("%d", cell.bsic))},
+                               {"LAC", Value(formatted("0x%04x", static_cast<unsigned>(cell.area)))},
+                               {"Cell ID", Value(formatted("0x%04x", static_cast<unsigned>(cell.identity)))},
+                               {"ARFCN", Value(formatted("%d", cell.arfcn))},
+                               {"BSIC", Value(formatted("%d", cell.bsic))},
                                {"RSSI", Value(dbm(cell.level))},
-                               {"C1", Value(format("%d", cell.c1()))},
-                               {"C2", Value(format("%d", cell.c1()))}});
+                               {"C1", Value(formatted("%d", cell.c1()))},
+                               {"C2", Value(formatted("%d", cell.c1()))}});
     }
 
     Value neighbors()
@@ -177,10 +177,10 @@ private:
         std::vector<Value> shown;
         for (const auto* each : order)
             if (shown.size() < kShownNeighbors)
-                shown.push_back(makeDictionary({{"ARFCN", Value(format("%d", each->arfcn))},
-                                                {"BSIC", Value(format("%d", each->bsic))},
+                shown.push_back(makeDictionary({{"ARFCN", Value(formatted("%d", each->arfcn))},
+                                                {"BSIC", Value(formatted("%d", each->bsic))},
                                                 {"RSSI", Value(dbm(each->level))},
-                                                {"C1", Value(format("%d", each->c1()))}}));
+                                                {"C1", Value(formatted("%d", each->c1()))}}));
         return counted(std::move(shown));
     }
 
@@ -193,9 +193,9 @@ private:
         if (dedicated) {
             const double apart = std::fabs(_place - cell.place);
             // A step of the timing advance is 554 m there and back halved (3GPP TS 45.010).
-            status->set("Timing Advance", format("%d", static_cast<int>(apart / 554)));
-            status->set("Tx Power", format("%d dBm", std::clamp(static_cast<int>(-cell.level) / 2 - 18, 5, 33)));
-            status->set("RxQual", format("%d", std::clamp((-80 - static_cast<int>(cell.level)) / 4, 0, 7)));
+            status->set("Timing Advance", formatted("%d", static_cast<int>(apart / 554)));
+            status->set("Tx Power", formatted("%d dBm", std::clamp(static_cast<int>(-cell.level) / 2 - 18, 5, 33)));
+            status->set("RxQual", formatted("%d", std::clamp((-80 - static_cast<int>(cell.level)) / 4, 0, 7)));
         }
         return makeDictionary(
             {{"Status", Value(status)},
@@ -205,7 +205,7 @@ private:
 
     Value mobility()
     {
-        const std::string area = format("001-01-%04x", static_cast<unsigned>(_cells[_serving].area));
+        const std::string area = formatted("001-01-%04x", static_cast<unsigned>(_cells[_serving].area));
         return makeDictionary({{"MM State", Value(phase().connection)},
                                {"GMM State", Value(_packetData ? "Registered, ready" : "Registered, standby")},
                                {"Location Area", Value(area)},
@@ -222,20 +222,20 @@ private:
                                                {"QoS Class", Value("Interactive")}}));
         return makeDictionary({{"Attached", Value("Yes")},
                                {"PDP Contexts", counted(std::move(contexts))},
-                               {"Bytes Sent", Value(format("%ld", _sent))},
-                               {"Bytes Received", Value(format("%ld", _received))}});
+                               {"Bytes Sent", Value(formatted("%ld", _sent))},
+                               {"Bytes Received", Value(formatted("%ld", _received))}});
     }
 
     Value cellChanges()
     {
         std::vector<Value> left;
         for (const int identity : _left)
-            left.push_back(Value(format("0x%04x", static_cast<unsigned>(identity))));
+            left.push_back(Value(formatted("0x%04x", static_cast<unsigned>(identity))));
         return makeDictionary({{"_sorted", Value("_sorted")},
-                               {"0;Reselections", Value(format("%d", _reselections))},
-                               {"1;Handovers", Value(format("%d", _handovers))},
-                               {"2;Location Updates", Value(format("%d", _areaUpdates))},
-                               {"3;Calls", Value(format("%d", _calls))},
+                               {"0;Reselections", Value(formatted("%d", _reselections))},
+                               {"1;Handovers", Value(formatted("%d", _handovers))},
+                               {"2;Location Updates", Value(formatted("%d", _areaUpdates))},
+                               {"3;Calls", Value(formatted("%d", _calls))},
                                {"4;Cells Left", counted(std::move(left))}});
     }
 

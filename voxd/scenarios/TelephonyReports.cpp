@@ -10,7 +10,7 @@ std::string plmnHex(const Plmn& plmn)
 {
     std::string text;
     for (const int octet : plmnOctets(plmn))
-        text += format("%02x", static_cast<unsigned>(octet));
+        text += formatted("%02x", static_cast<unsigned>(octet));
     return text;
 }
 
@@ -28,14 +28,15 @@ DictionaryRef cellReport(std::string_view technology, std::string_view type,
 
 DictionaryRef simReport(const Plmn& registered, int locationArea, int routingArea)
 {
-    const auto area = plmnHex(registered) + format("%04x", static_cast<unsigned>(locationArea));
+    const auto area = plmnHex(registered) + formatted("%04x", static_cast<unsigned>(locationArea));
     return makeDictionary({
         {"kSimFile_ICCID", Value("8900101000000012345")},
         {"kSimFile_MSISDN", Value("+00100012345678")},
         {"kSimFile_MBDN", Value("+001000999")},
         {"kSimFile_HPPLMN", Value("06")},
         {"kSimFile_LOCI", Value("5a0f3c21" + area + "0000")},
-        {"kSimFile_PSLOCI", Value("c1a60b7e00d41c" + area + format("%02x", static_cast<unsigned>(routingArea)) + "00")},
+        {"kSimFile_PSLOCI",
+         Value("c1a60b7e00d41c" + area + formatted("%02x", static_cast<unsigned>(routingArea)) + "00")},
         {"kSimFile_ACC", Value("0020")},
         {"kSimFile_AD", Value("00000002")},
         {"kSimFile_FPLMN", Value("99f999ffffffffffffffffff")},
@@ -65,7 +66,8 @@ ArrayRef pdpReport(std::string_view radioAccess, bool userData)
 
 std::string plmnText(const Plmn& plmn)
 {
-    return format("%03d", plmn.mcc) + (plmn.mncDigits == 2 ? format("%02d", plmn.mnc) : format("%03d", plmn.mnc));
+    return formatted("%03d", plmn.mcc) +
+           (plmn.mncDigits == 2 ? formatted("%02d", plmn.mnc) : formatted("%03d", plmn.mnc));
 }
 
 std::vector<int> plmnOctets(const Plmn& plmn)

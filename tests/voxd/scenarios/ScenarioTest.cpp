@@ -102,7 +102,7 @@ TEST_P(Scenarios, EveryCodeOfTheStartCommandComes)
     ScenarioRun run(name());
     std::set<std::string> seen, wanted;
     const auto entry = [&](std::int64_t code) {
-        return std::string(run.generator->technology()) + format(" 0x%lx", static_cast<unsigned long>(code));
+        return std::string(run.generator->technology()) + formatted(" 0x%lx", static_cast<unsigned long>(code));
     };
     run.decodeFor(5min, [&] {
         if (!seen.insert(entry(run.code)).second)
