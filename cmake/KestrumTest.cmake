@@ -2,15 +2,25 @@
 #
 #   kestrum_test(tests_lte USES loggenerator_lte test_support SOURCES ServingCellMeasurementTest.cpp)
 find_package(GTest)
+find_package(rapidcheck REQUIRED)
+
+# The headers of the test libraries take most of a test's compile time, so they are compiled once for all of them.
+# What is tested is optimised as it ships; the tests themselves are not.
+add_library(test_headers OBJECT EXCLUDE_FROM_ALL ${CMAKE_SOURCE_DIR}/tests/doubles/Headers.cpp)
+target_precompile_headers(test_headers PRIVATE <gmock/gmock.h> <gtest/gtest.h> <rapidcheck.h> <rapidcheck/gtest.h>
+    <algorithm> <chrono> <filesystem> <fstream> <functional> <map> <memory> <set> <sstream> <string> <vector>)
+function(kestrum_test_options name)
+    target_compile_options(${name} PRIVATE -fPIC $<$<CONFIG:Release>:-O0>)
+    target_link_libraries(${name} PRIVATE GTest::gmock GTest::gtest rapidcheck rapidcheck_gtest)
+endfunction()
+kestrum_test_options(test_headers)
 
 function(kestrum_test name)
     cmake_parse_arguments(arg "" "" "USES;SOURCES;LIBRARIES" ${ARGN})
     add_executable(${name} ${arg_SOURCES})
-    target_link_libraries(${name} PRIVATE ${arg_USES} ${arg_LIBRARIES} GTest::gmock GTest::gtest GTest::gtest_main)
-    target_compile_definitions(${name} PRIVATE KESTRUM_SOURCE_DIR="${CMAKE_SOURCE_DIR}"
-        KESTRUM_BINARY_DIR="${CMAKE_RUNTIME_OUTPUT_DIRECTORY}")
-    # What is tested is optimised as it ships; the tests themselves need not wait for it.
-    target_compile_options(${name} PRIVATE $<$<CONFIG:Release>:-O0>)
+    target_link_libraries(${name} PRIVATE ${arg_USES} ${arg_LIBRARIES} test_places GTest::gtest_main)
+    kestrum_test_options(${name})
+    target_precompile_headers(${name} REUSE_FROM test_headers)
     add_test(NAME ${name} COMMAND ${name})
     set_tests_properties(${name} PROPERTIES TIMEOUT 300)
 endfunction()

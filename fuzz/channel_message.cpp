@@ -9,6 +9,7 @@
 #include "Require.h"
 #include "core/KestrumModelNode.h"
 #include "doubles/MemoryBundle.h"
+#include "doubles/Places.h"
 #include "doubles/RecordingConsole.h"
 #include "doubles/RecordingLog.h"
 #include "doubles/VirtualClock.h"
@@ -67,7 +68,7 @@ const Technology kTechnologies[] = {
 
 std::string pathOf(std::string_view templateName)
 {
-    return std::string(KESTRUM_SOURCE_DIR "/resources/").append(templateName).append(".plist");
+    return inCheckout("resources/").append(templateName).append(".plist");
 }
 
 const PropertyListCodec kCodec;

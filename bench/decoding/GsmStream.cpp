@@ -1,6 +1,7 @@
 // GSM and UMTS by the real generator: a mix of records as a drive gives them, and each dictionary section's record alone.
 #include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
 #include "decoding/Messages.h"
+#include "doubles/Places.h"
 #include "doubles/RecordBuilder.h"
 
 namespace kestrum::bench {
@@ -18,7 +19,7 @@ class Gsm {
 public:
     Gsm()
     {
-        _surroundings.bundle.paths = {std::string(KESTRUM_SOURCE_DIR) + "/resources/ZPH_GSM.plist"};
+        _surroundings.bundle.paths = {inCheckout("resources/ZPH_GSM.plist")};
         _generator = ZPH_GSMLogGenerator::generator(_surroundings.roles);
     }
 

@@ -1,4 +1,5 @@
 #include "scenarios/Drive.h"
+#include "doubles/Places.h"
 
 #include "core/KestrumModelNode.h"
 
@@ -32,8 +33,7 @@ std::vector<Source::Message> driven(const Scenario& scenario, std::chrono::minut
 Decoding::Decoding(std::string_view technology)
 {
     for (const char* name : {"ZPH_GSM", "C2KTemplate", "LTE", "UTRAN"})
-        _surroundings.bundle.paths.push_back(
-            std::string(KESTRUM_SOURCE_DIR "/resources/").append(name).append(".plist"));
+        _surroundings.bundle.paths.push_back(inCheckout("resources/").append(name).append(".plist"));
     _generator = LogGenerator::generatorFromTechnology(Value(technology), _surroundings.roles);
 }
 

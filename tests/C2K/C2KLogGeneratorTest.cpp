@@ -1,4 +1,5 @@
 #include "C2K/C2KRun.h"
+#include "doubles/Places.h"
 
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"
@@ -75,7 +76,7 @@ TEST(C2KTemplate, ThatIsMissingIsReportedAndTriedAgain)
 TEST(C2KTemplate, OfTheApplicationNamesEveryIdentifierAndNoOther)
 {
     const PropertyListCodec codec;
-    const Value shipped = codec.load(std::string(KESTRUM_SOURCE_DIR) + "/resources/C2KTemplate.plist");
+    const Value shipped = codec.load(inCheckout("resources/C2KTemplate.plist"));
     ASSERT_TRUE(shipped.dictionary());
     std::set<std::string> named;
     const auto collect = [&](const auto& self, const Dictionary& level) -> void {

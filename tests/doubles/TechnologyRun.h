@@ -2,6 +2,7 @@
 
 #include "LogGenerator/ZPHLogGenerator2.h"
 #include "doubles/DecodingDoubles.h"
+#include "doubles/Places.h"
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <memory>
@@ -53,7 +54,7 @@ public:
 
     static std::string resource(std::string_view templateName)
     {
-        return std::string(KESTRUM_SOURCE_DIR) + "/resources/" + std::string(templateName) + ".plist";
+        return inCheckout("resources/").append(templateName).append(".plist");
     }
 
     void receive(Bytes message) { generator->updateState(state, message); }

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "doubles/Places.h"
 #include "doubles/QtTestToolkit.h"
 #include "linux/EventLoop.h"
 #include "linux/Scratch.h"
@@ -29,7 +30,7 @@ protected:
     /// Until it serves.
     bool startService(const QStringList& arguments = {"--scenario", "ifx"})
     {
-        service.start(KESTRUM_BINARY_DIR "/voxd", arguments);
+        service.start(QString::fromStdString(builtProgram("voxd")), arguments);
         return eventually([&] { return service.canReadLine(); });
     }
     void killService()

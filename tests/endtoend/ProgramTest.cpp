@@ -1,5 +1,6 @@
 #include "EndToEnd.h"
 #include "doubles/FileContents.h"
+#include "doubles/Places.h"
 
 #include <csignal>
 
@@ -26,7 +27,7 @@ protected:
             else
                 environment.insert(name, value);
         program.setProcessEnvironment(environment);
-        program.start(KESTRUM_BINARY_DIR "/kestrum", QStringList());
+        program.start(QString::fromStdString(builtProgram("kestrum")), QStringList());
     }
     bool ends()
     {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "doubles/FileContents.h"
+#include "doubles/Places.h"
 #include "doubles/ScratchDirectory.h"
 #include "platform/propertylist/PropertyListCodec.h"
 
@@ -18,7 +19,7 @@ inline std::string peer(const std::string& arguments, const std::string& input)
 {
     const ScratchDirectory scratch;
     std::ofstream(scratch.file("in"), std::ios::binary) << input;
-    const std::string command = "python3 '" KESTRUM_SOURCE_DIR "/tests/propertylist/peer.py' " + arguments + " <'" +
+    const std::string command = "python3 '" + inCheckout("tests/propertylist/peer.py") + "' " + arguments + " <'" +
                                 scratch.file("in") + "' >'" + scratch.file("out") + "'";
     if (std::system(command.c_str()) != 0)
         throw std::runtime_error("Python's plistlib refuses");

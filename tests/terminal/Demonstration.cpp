@@ -1,4 +1,5 @@
 #include "Demonstration.h"
+#include "doubles/Places.h"
 
 #include <csignal>
 #include <cstdint>
@@ -38,7 +39,7 @@ void Demonstration::serve(const std::vector<std::string>& displays, const std::v
         file << each;
     }
     file.close();
-    _arguments = {KESTRUM_BINARY_DIR "/voxd", "--replay", capture};
+    _arguments = {builtProgram("voxd"), "--replay", capture};
     _arguments.insert(_arguments.end(), options.begin(), options.end());
     restartService();
 }

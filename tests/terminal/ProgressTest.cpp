@@ -1,5 +1,6 @@
 #include "Pseudoterminal.h"
 #include "doubles/FileContents.h"
+#include "doubles/Places.h"
 #include "doubles/ScratchDirectory.h"
 
 #include <gmock/gmock.h>
@@ -46,7 +47,7 @@ public:
 
 private:
     ScratchDirectory _scratch;
-    std::string _rest = contentsOf(KESTRUM_SOURCE_DIR "/captures/lte.kcap");
+    std::string _rest = contentsOf(inCheckout("captures/lte.kcap"));
     int _pipe = -1;
 };
 
@@ -70,7 +71,7 @@ TEST(Progress, IsShownOfALongRunAndGivesWayToTheDisplay)
 TEST(Progress, IsNotShownOfAShortRun)
 {
     Pseudoterminal screen(300, 100);
-    screen.start("kestrum-decode", {KESTRUM_SOURCE_DIR "/captures/lte.kcap"}, {});
+    screen.start("kestrum-decode", {inCheckout("captures/lte.kcap")}, {});
     ASSERT_TRUE(screen.waitForEnd());
     EXPECT_EQ(screen.exitStatus(), 0);
     EXPECT_EQ(screen.written().find(" MB"), std::string::npos);

@@ -1,4 +1,5 @@
 #include "Pseudoterminal.h"
+#include "doubles/Places.h"
 
 #include "support/Utf8.h"
 
@@ -75,7 +76,7 @@ Pseudoterminal::~Pseudoterminal()
 void Pseudoterminal::start(const std::string& program, const std::vector<std::string>& arguments,
                            const std::map<std::string, std::string>& environment)
 {
-    const std::string path = KESTRUM_BINARY_DIR "/" + program;
+    const std::string path = builtProgram(program);
     _program = fork();
     if (_program != 0)
         return;

@@ -1,6 +1,7 @@
 #include "Demonstration.h"
 #include "Pseudoterminal.h"
 #include "core/KestrumModelNode.h"
+#include "doubles/Places.h"
 #include "frontends/terminal/TextDisplay.h"
 
 #include <gtest/gtest.h>
@@ -21,8 +22,8 @@ Outcome run(const Demonstration& device, const std::string& arguments)
 {
     std::string command = "env";
     for (const auto& [name, value] : device.environment())
-        command += " " + name + "=" + value;
-    command += " " KESTRUM_BINARY_DIR "/kestrum-terminal " + arguments + " </dev/null";
+        command += " " + name + "='" + value + "'";
+    command += " '" + builtProgram("kestrum-terminal") + "' " + arguments + " </dev/null";
     const auto output = [](const std::string& shell, int& status) {
         std::string text;
         auto* pipe = popen(shell.c_str(), "r");

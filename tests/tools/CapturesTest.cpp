@@ -11,7 +11,7 @@ namespace {
 std::vector<std::string> captures()
 {
     std::vector<std::string> names;
-    for (const auto& file : std::filesystem::directory_iterator(sourceFile("captures")))
+    for (const auto& file : std::filesystem::directory_iterator(inCheckout("captures")))
         if (file.path().extension() == ".kcap")
             names.push_back(file.path().stem().string());
     std::ranges::sort(names);
@@ -20,7 +20,7 @@ std::vector<std::string> captures()
 
 class Capture : public testing::TestWithParam<std::string> {
 protected:
-    const std::string stem = sourceFile("captures/" + GetParam());
+    const std::string stem = inCheckout("captures/" + GetParam());
 };
 
 TEST_P(Capture, GivesTheTreeBesideIt)

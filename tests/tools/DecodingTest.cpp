@@ -22,7 +22,7 @@ protected:
             [this](const Decoding::Decoded& decoded) { seen.push_back(decoded); });
     }
 
-    LinuxBundle bundle{{sourceFile("resources")}};
+    LinuxBundle bundle{{inCheckout("resources")}};
     PropertyListCodec codec;
     std::vector<std::string> log;
     std::vector<Decoding::Decoded> seen;

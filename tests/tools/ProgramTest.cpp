@@ -1,5 +1,6 @@
 #include "Messages.h"
 #include "Tool.h"
+#include "doubles/Places.h"
 #include "doubles/ScratchDirectory.h"
 
 #include <gmock/gmock.h>
@@ -254,7 +255,7 @@ TEST_F(ProgramTest, AClosedPipeEndsItQuietly)
 TEST_F(ProgramTest, AFullDiskIsTold)
 {
     const auto file = capture(kcap(antennas(1))), told = scratch.file("told");
-    const auto command = std::string(KESTRUM_BINARY_DIR) + "/kestrum-decode " + file + " >/dev/full 2>" + told;
+    const auto command = "'" + builtProgram("kestrum-decode") + "' '" + file + "' >/dev/full 2>'" + told + "'";
     EXPECT_EQ(WEXITSTATUS(std::system(command.c_str())), 1);
     EXPECT_EQ(contentsOf(told), "kestrum-decode: standard output: No space left on device\n");
 }

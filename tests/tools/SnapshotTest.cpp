@@ -55,7 +55,7 @@ public:
     Value display() const { return state.at("Display"); }
 
     DecodingDoubles doubles;
-    LinuxBundle bundle{{sourceFile("resources")}};
+    LinuxBundle bundle{{inCheckout("resources")}};
     PropertyListCodec codec;
     DecodingRoles roles{doubles.log, doubles.console, doubles.clock, bundle, codec};
     State state;
@@ -71,7 +71,7 @@ struct Recovered {
 
 Recovered recovered(const Value& snapshot)
 {
-    LinuxBundle bundle({sourceFile("resources")});
+    LinuxBundle bundle({inCheckout("resources")});
     PropertyListCodec codec;
     Recovered result;
     const Snapshot opened("a.kestrum", snapshot, [&](const Fault& fault) { result.faults.push_back(fault.reason); });

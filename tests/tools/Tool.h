@@ -1,5 +1,7 @@
 #pragma once
 
+#include "doubles/Places.h"
+
 #include <csignal>
 #include <cstdlib>
 #include <fcntl.h>
@@ -32,11 +34,6 @@ inline void writeFile(const std::string& path, std::string_view contents, std::i
         throw std::runtime_error(path + " cannot be written");
 }
 
-inline std::string sourceFile(const std::string& path)
-{
-    return std::string(KESTRUM_SOURCE_DIR) + "/" + path;
-}
-
 /// kestrum-decode as a process, with pipes on all its ends.
 class Tool {
 public:
@@ -45,7 +42,7 @@ public:
         int in[2], out[2], error[2];
         if (::pipe2(in, O_CLOEXEC) != 0 || ::pipe2(out, O_CLOEXEC) != 0 || ::pipe2(error, O_CLOEXEC) != 0)
             throw std::runtime_error("no pipes");
-        arguments.insert(arguments.begin(), std::string(KESTRUM_BINARY_DIR) + "/kestrum-decode");
+        arguments.insert(arguments.begin(), builtProgram("kestrum-decode"));
         std::vector<char*> list;
         for (auto& each : arguments)
             list.push_back(each.data());

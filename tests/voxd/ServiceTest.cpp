@@ -1,4 +1,5 @@
 #include "doubles/FileContents.h"
+#include "doubles/Places.h"
 #include "doubles/RecordingLog.h"
 #include "linux/EventLoop.h"
 #include "linux/RawSocket.h"
@@ -67,7 +68,10 @@ protected:
             process.kill();
             process.waitForFinished();
         }
-        void launch(const QStringList& arguments) { process.start(KESTRUM_BINARY_DIR "/voxd", arguments); }
+        void launch(const QStringList& arguments)
+        {
+            process.start(QString::fromStdString(builtProgram("voxd")), arguments);
+        }
         /// Until it takes connections.
         bool start(const QStringList& arguments)
         {

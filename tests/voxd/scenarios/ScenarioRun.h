@@ -2,6 +2,7 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "doubles/MemoryBundle.h"
+#include "doubles/Places.h"
 #include "doubles/VirtualClock.h"
 #include "platform/ChannelMessage.h"
 #include "platform/Console.h"
@@ -52,7 +53,7 @@ public:
         : source(makeScenario(scenario, {seed, kStart, kLists}))
     {
         for (const char* name : {"ZPH_GSM", "LTE", "UTRAN", "C2KTemplate"})
-            bundle.paths.push_back(std::string(KESTRUM_SOURCE_DIR) + "/resources/" + name + ".plist");
+            bundle.paths.push_back(inCheckout("resources/").append(name).append(".plist"));
     }
 
     /// Decodes the next message. The generator changes with the technology, as when a display connects again.

@@ -1,0 +1,12 @@
+#include "doubles/Places.h"
+
+// The one file that is compiled with paths of the machine: the others can come from a compiler's cache in any checkout.
+std::string kestrum::inCheckout(std::string_view path)
+{
+    return std::string(KESTRUM_SOURCE_DIR "/").append(path);
+}
+
+std::string kestrum::builtProgram(std::string_view name)
+{
+    return std::string(KESTRUM_PROGRAMS_DIR "/").append(name);
+}

@@ -1,0 +1,14 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace kestrum {
+
+/// The path of a file of the checkout: inCheckout("captures/lte.kcap").
+std::string inCheckout(std::string_view path);
+
+/// The path of a built program: builtProgram("voxd"). It may hold blanks.
+std::string builtProgram(std::string_view name);
+
+} // namespace kestrum
