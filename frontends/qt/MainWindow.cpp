@@ -4,7 +4,6 @@
 #include "frontends/qt/Type.h"
 
 #include <QGuiApplication>
-#include <QIcon>
 #include <QScreen>
 
 namespace kestrum::qt {

@@ -2,12 +2,12 @@
 
 #include "frontends/qt/Accessibility.h"
 #include "frontends/qt/Appearance.h"
+#include "frontends/qt/Icon.h"
 #include "frontends/qt/MainWindow.h"
 #include "frontends/qt/TerminationSignals.h"
 #include "frontends/qt/Type.h"
 
 #include <QApplication>
-#include <QIcon>
 #include <cstdio>
 #include <cstdlib>
 
@@ -60,6 +60,7 @@ public:
         QApplication::setApplicationName(QStringLiteral("kestrum"));
         QApplication::setApplicationDisplayName(QStringLiteral("Kestrum"));
         QGuiApplication::setDesktopFileName(QStringLiteral("kestrum"));
+        QApplication::setWindowIcon(windowIcon());
         installAccessibility();
     }
 
