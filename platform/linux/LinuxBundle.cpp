@@ -19,9 +19,8 @@ LinuxBundle::LinuxBundle()
     const auto program = files::read_symlink("/proc/self/exe", unknown).parent_path();
     if (!program.empty()) {
         _directories.push_back((program / "resources").string());
-        _directories.push_back((program.parent_path() / "share/kestrum").string());
+        _directories.push_back((program / KESTRUM_RESOURCES_FROM_PROGRAM).lexically_normal().string());
     }
-    _directories.emplace_back(KESTRUM_SOURCE_RESOURCES);
 }
 
 std::optional<std::string> LinuxBundle::pathForResource(std::string_view name, std::string_view type) const

@@ -7,8 +7,8 @@
 
 namespace kestrum {
 
-/// Resources as files. Looked for in $KESTRUM_RESOURCES, in "resources" beside the program, in the install prefix's
-/// share/kestrum, and in the source tree that the program was built from, in this order.
+/// Resources as files. Looked for in $KESTRUM_RESOURCES, in "resources" beside the program (a build folder has a link
+/// there), and in share/kestrum of the prefix in which the program stands, wherever that is; in this order.
 class LinuxBundle final : public Bundle {
 public:
     LinuxBundle();
