@@ -1,0 +1,16 @@
+# bash completion for voxd
+_voxd() {
+    local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
+    COMPREPLY=()
+    case $previous in
+        --scenario)
+            mapfile -t COMPREPLY < <(compgen -W 'lte gsm cdma utran drive ifx' -- "$current") ;;
+        --replay | --record | --write)
+            compopt -o filenames 2>/dev/null
+            mapfile -t COMPREPLY < <(compgen -f -- "$current") ;;
+        --speed | --seed | --start | --seconds) ;;
+        *)
+            mapfile -t COMPREPLY < <(compgen -W '-h --help --version --scenario --replay --loop --speed --seed --start
+                --record --write --seconds' -- "$current") ;;
+    esac
+} && complete -F _voxd voxd

@@ -1,0 +1,12 @@
+complete -c voxd -f
+complete -c voxd -s h -l help -d 'Show the options'
+complete -c voxd -l version -d 'Show the version'
+complete -c voxd -l scenario -x -a 'lte gsm cdma utran drive ifx' -d 'Live scenario'
+complete -c voxd -l replay -r -F -d 'Capture to replay'
+complete -c voxd -l loop -d 'Begin the capture again at its end'
+complete -c voxd -l speed -x -d 'Times real time'
+complete -c voxd -l seed -x -d 'Equal seeds give equal scenarios'
+complete -c voxd -l start -x -d 'Moment at which the scenario begins'
+complete -c voxd -l record -r -F -d 'Write what is streamed'
+complete -c voxd -l write -r -F -d 'Write a capture at once and end'
+complete -c voxd -l seconds -x -d 'How much --write writes'
