@@ -10,6 +10,8 @@ readonly test_packages=(
     libgtest-dev libgmock-dev librapidcheck-dev libbenchmark-dev
     python3 dbus libvterm-dev
 )
+# To make the package, and to look it over.
+readonly package_packages=(dpkg-dev file lintian desktop-file-utils appstream mandoc systemd)
 readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev git)
 
 # Installs those of the given packages that are missing.

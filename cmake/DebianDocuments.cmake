@@ -1,0 +1,18 @@
+# Run by CPack over what it is about to pack: the documents as Debian wants them, in its places and compressed.
+set(usr ${CPACK_TEMPORARY_INSTALL_DIRECTORY}/usr)
+set(documents ${usr}/share/doc/${CPACK_PACKAGE_NAME})
+set(source ${CMAKE_CURRENT_LIST_DIR}/..)
+
+file(COPY ${source}/resources/debian/copyright ${source}/CHANGELOG.md DESTINATION ${documents}
+    FILE_PERMISSIONS OWNER_READ OWNER_WRITE GROUP_READ WORLD_READ)
+string(TIMESTAMP date "%a, %d %b %Y %H:%M:%S +0000" UTC)
+file(WRITE ${documents}/changelog
+"${CPACK_PACKAGE_NAME} (${CPACK_PACKAGE_VERSION}) unstable; urgency=medium
+
+  * Version ${CPACK_PACKAGE_VERSION}. CHANGELOG.md.gz beside this file tells what is new.
+
+ -- ${CPACK_PACKAGE_CONTACT}  ${date}
+")
+
+file(GLOB compressed ${usr}/share/man/man*/* ${documents}/changelog ${documents}/CHANGELOG.md)
+execute_process(COMMAND gzip -9n ${compressed} COMMAND_ERROR_IS_FATAL ANY)
