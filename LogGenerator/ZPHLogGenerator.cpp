@@ -25,9 +25,11 @@ std::uint64_t packedTime(Date now, Clock::Zone zone)
 
 void ZPHLogGenerator::moveBinDataToState(State& state)
 {
-    const std::size_t size = binData.size();
-    state.set("DisplayState", Data(std::exchange(binData, {})));
-    binData.reserve(size + size / 8); // the next interval will be much like this one
+    auto interval = binData.take();
+    if (interval.dropped > 0)
+        _roles.log.write(Priority::Warning, "Too many raw records for one interval: the oldest %lu were dropped",
+                         interval.dropped);
+    state.set("DisplayState", Data(std::move(interval.bytes)));
 }
 
 std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) const

@@ -1,9 +1,9 @@
 #pragma once
 
 #include "LogGenerator/LogGenerator.h"
+#include "LogGenerator/RawRecords.h"
 
 #include <optional>
-#include <vector>
 
 namespace kestrum {
 
@@ -21,12 +21,12 @@ public:
 protected:
     using LogGenerator::LogGenerator;
 
-    void appendToBinData(Bytes bytes) { binData.insert(binData.end(), bytes.begin(), bytes.end()); }
-    /// Hands the interval's raw messages over to the state, and begins a new interval.
+    void appendToBinData(Bytes bytes) { binData.append(bytes); }
+    /// Hands the interval's raw messages over to the state, and begins a new interval. Logs how many were dropped.
     void moveBinDataToState(State& state);
 
 private:
-    std::vector<std::byte> binData;
+    RawRecords binData;
 };
 
 } // namespace kestrum

@@ -47,6 +47,23 @@ TEST_F(TemplateGenerator, DestructionIsLoggedUnderOneNameForAll)
     EXPECT_THAT(doubles.console.printed, ElementsAre("Deallocing ClassIndex"));
 }
 
+TEST_F(TemplateGenerator, KeepsABoundedIntervalOfRawRecordsAndLogsWhatItDrops)
+{
+    const std::vector<std::byte> invalid(1 << 20, std::byte{7});
+    for (int i = 0; i < 80; ++i)
+        generator->updateState(doubles.state, invalid);
+    generator->generateLogUsingState(doubles.state);
+    EXPECT_EQ(rawOfLastInterval().size(), 64u << 20);
+    EXPECT_EQ(doubles.log.texts(Priority::Warning).back(),
+              "Too many raw records for one interval: the oldest 16 were dropped");
+
+    doubles.log.lines.clear();
+    generator->updateState(doubles.state, message(1, 0x4001, {7}));
+    generator->generateLogUsingState(doubles.state);
+    EXPECT_EQ(rawOfLastInterval(), message(1, 0x4001, {7}));
+    EXPECT_EQ(doubles.log.count("Too many raw records for one interval: the oldest 0 were dropped"), 0u);
+}
+
 TEST_F(TemplateGenerator, WithoutInitialisationEveryCallIsHarmless)
 {
     const auto bare = sample::Generator::uninitialized(doubles.roles);
