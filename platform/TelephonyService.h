@@ -33,8 +33,11 @@ public:
     using NotificationHandler = std::function<void(std::string_view name)>;
 
     /// Null when the service cannot be reached within 1 s. Notifications arrive on the main queue, until the
-    /// connection is destroyed.
+    /// connection is destroyed; equal ones that wait there together arrive once.
     virtual std::unique_ptr<VoxServerConnection> connect(NotificationHandler handler) = 0;
+
+    /// Why the last connection or log channel could not be had, in words for a person; empty when it could.
+    virtual std::string problem() const { return {}; }
 };
 
 /// The service's baseband-state-report log channel; the local port that receives the log bears the same name.

@@ -3,9 +3,12 @@
 #include "platform/SystemLog.h"
 #include "support/Format.h"
 
+#include <QTimer>
+
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
+#include <thread>
 
 #include <fcntl.h>
 #include <sys/file.h>
@@ -16,6 +19,11 @@
 namespace kestrum {
 namespace {
 
+using namespace std::chrono;
+
+constexpr milliseconds kLockTimeout{1000}, kLockInterval{10};
+// How long until a listener whose backlog was full is tried again.
+constexpr milliseconds kRetryInterval{20};
 constexpr std::size_t kChunk = 64 << 10;
 // What Qt reads ahead while a receiver is busy; the rest stays with the sender.
 constexpr qint64 kReadAhead = 256 << 10;
@@ -77,11 +85,16 @@ private:
 // Keeps two processes from clearing and taking the same address at the same time.
 class DirectoryLock {
 public:
-    explicit DirectoryLock(const std::string& directory)
+    // A process may hold it for as long as it likes, so there is no wait without an end.
+    DirectoryLock(const std::string& directory, milliseconds patience)
         : _descriptor(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC))
     {
-        if (_descriptor >= 0)
-            ::flock(_descriptor, LOCK_EX);
+        for (const auto end = steady_clock::now() + patience; _descriptor >= 0;) {
+            _held = ::flock(_descriptor, LOCK_EX | LOCK_NB) == 0;
+            if (_held || steady_clock::now() >= end)
+                break;
+            std::this_thread::sleep_for(kLockInterval);
+        }
     }
     DirectoryLock(const DirectoryLock&) = delete;
     DirectoryLock& operator=(const DirectoryLock&) = delete;
@@ -91,23 +104,53 @@ public:
             ::close(_descriptor);
     }
 
+    bool isHeld() const { return _held; }
+
 private:
     int _descriptor;
+    bool _held = false;
 };
 
 } // namespace
 
-std::unique_ptr<FrameConnection> FrameConnection::connectTo(const std::string& path, std::chrono::milliseconds timeout,
+std::unique_ptr<FrameConnection> FrameConnection::connectTo(const std::string& path, milliseconds timeout,
                                                             SystemLog& log)
 {
     auto socket = std::make_unique<QLocalSocket>();
     socket->connectToServer(QString::fromStdString(path));
     if (!socket->waitForConnected(static_cast<int>(timeout.count())))
         return nullptr;
+    return ofThisUser(std::move(socket), path, log);
+}
+
+std::unique_ptr<FrameConnection> FrameConnection::ofThisUser(std::unique_ptr<QLocalSocket> socket,
+                                                             const std::string& path, SystemLog& log)
+{
     auto name = nameAt(path);
     if (!isThisUser(*socket, name, log))
         return nullptr;
     return std::make_unique<FrameConnection>(std::move(socket), std::move(name), log);
+}
+
+FrameConnectionAttempt::FrameConnectionAttempt(std::string path, milliseconds timeout, SystemLog& log, Done done)
+    : _path(std::move(path)), _end(steady_clock::now() + timeout), _log(log), _done(std::move(done))
+{
+    QTimer::singleShot(0, &_context, [this] { attempt(); });
+}
+
+void FrameConnectionAttempt::attempt()
+{
+    // A Unix socket connects at once, or not at all, or its listener's backlog is full. Qt would then try without a
+    // pause.
+    auto socket = std::make_unique<QLocalSocket>();
+    socket->connectToServer(QString::fromStdString(_path));
+    if (socket->state() == QLocalSocket::ConnectingState && steady_clock::now() < _end) {
+        QTimer::singleShot(kRetryInterval, &_context, [this] { attempt(); });
+        return;
+    }
+    const auto done = std::move(_done); // it may destroy this object
+    done(socket->state() == QLocalSocket::ConnectedState ? FrameConnection::ofThisUser(std::move(socket), _path, _log)
+                                                         : nullptr);
 }
 
 FrameConnection::FrameConnection(std::unique_ptr<QLocalSocket> socket, std::string name, SystemLog& log)
@@ -184,20 +227,20 @@ void FrameConnection::push()
     _socket->flush();
 }
 
-bool FrameConnection::waitUntilSent(std::chrono::milliseconds timeout)
+bool FrameConnection::waitUntilSent(milliseconds timeout)
 {
-    const auto end = std::chrono::steady_clock::now() + timeout;
+    const auto end = steady_clock::now() + timeout;
     const ScopedFlag waiting(_waiting);
     _socket->flush();
     while (unsent() > 0) {
-        const auto left = std::chrono::ceil<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
+        const auto left = ceil<milliseconds>(end - steady_clock::now());
         if (left.count() <= 0 || !_socket->waitForBytesWritten(static_cast<int>(left.count())))
             return false;
     }
     return isOpen();
 }
 
-bool FrameConnection::waitForBytes(std::chrono::milliseconds timeout)
+bool FrameConnection::waitForBytes(milliseconds timeout)
 {
     const ScopedFlag waiting(_waiting);
     return timeout.count() > 0 && _socket->waitForReadyRead(static_cast<int>(timeout.count()));
@@ -209,7 +252,10 @@ std::string FrameListener::listen(const std::string& path)
         return formatted("the path %s is too long for a socket (%lu bytes at most)", path,
                          sizeof sockaddr_un::sun_path - 1);
     _name = nameAt(path);
-    const DirectoryLock lock(std::filesystem::path(path).parent_path().string());
+    const auto directory = std::filesystem::path(path).parent_path().string();
+    const DirectoryLock lock(directory, kLockTimeout);
+    if (!lock.isHeld())
+        return formatted("another process keeps %s locked", directory);
     if (isStaleSocket(path))
         ::unlink(path.c_str());
     QObject::connect(&_server, &QLocalServer::newConnection, &_server, [this] { accept(); });
@@ -232,7 +278,9 @@ void FrameListener::accept()
 
 void removeStaleSockets(const std::string& directory, std::string_view prefix)
 {
-    const DirectoryLock lock(directory);
+    const DirectoryLock lock(directory, milliseconds(0));
+    if (!lock.isHeld())
+        return;
     std::error_code error;
     for (const auto& entry : std::filesystem::directory_iterator(directory, error))
         if (entry.path().filename().string().starts_with(prefix) && isStaleSocket(entry.path().string()))

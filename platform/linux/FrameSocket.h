@@ -20,6 +20,9 @@ public:
     /// Connects to the socket at `path`; null when nobody of this user listens there.
     static std::unique_ptr<FrameConnection> connectTo(const std::string& path, std::chrono::milliseconds timeout,
                                                       SystemLog& log);
+    /// Of a connected socket; null, with a log line, when the other side is another user's process.
+    static std::unique_ptr<FrameConnection> ofThisUser(std::unique_ptr<QLocalSocket> socket, const std::string& path,
+                                                       SystemLog& log);
     FrameConnection(std::unique_ptr<QLocalSocket> socket, std::string name, SystemLog& log);
     ~FrameConnection();
 
@@ -59,13 +62,32 @@ private:
     bool _waiting = false;
 };
 
+/// Connects without blocking. A listener whose backlog is full is tried again until the time is up.
+class FrameConnectionAttempt {
+public:
+    using Done = std::function<void(std::unique_ptr<FrameConnection>)>;
+
+    /// `done` runs once, from the event loop: with the connection, or with null when no process of this user listens
+    /// at the path. It may destroy the attempt, which cancels it.
+    FrameConnectionAttempt(std::string path, std::chrono::milliseconds timeout, SystemLog& log, Done done);
+
+private:
+    void attempt();
+
+    std::string _path;
+    std::chrono::steady_clock::time_point _end;
+    SystemLog& _log;
+    Done _done;
+    QObject _context; // ends the retries with the attempt
+};
+
 /// Listens for connections of this user's processes.
 class FrameListener {
 public:
     explicit FrameListener(SystemLog& log) : _log(log) {}
 
     /// Listens at the path, from which it removes the socket of a process that has gone. Empty on success, else
-    /// what is wrong; the socket of a process that lives is left alone.
+    /// what is wrong; the socket of a process that lives is left alone. Waits up to 1 s for the directory's lock.
     std::string listen(const std::string& path);
     /// Stops, and removes the socket.
     void close() { _server.close(); }
@@ -81,7 +103,8 @@ private:
     std::string _name;
 };
 
-/// Removes the sockets in a directory whose names begin so and whose processes have gone.
+/// Removes the sockets in a directory whose names begin so and whose processes have gone. Does nothing while another
+/// process keeps the directory locked.
 void removeStaleSockets(const std::string& directory, std::string_view prefix);
 
 } // namespace kestrum

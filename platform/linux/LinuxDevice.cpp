@@ -30,7 +30,7 @@ struct LinuxDevice::Adapters {
     LinuxFileSystem files;
     QtMainQueue queue;
     LinuxMessagePorts ports{runtimeDirectory(), queue, log};
-    LinuxTelephonyService telephony{runtimeDirectory(), queue, log};
+    LinuxTelephonyService telephony{runtimeDirectory(), ports, queue, log};
 };
 
 LinuxDevice::LinuxDevice(const std::string& program, Output output)

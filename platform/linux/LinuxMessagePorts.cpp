@@ -113,12 +113,14 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
     void close()
     {
         open = false;
+        listening.reset();
         listener.close();
         senders.clear();
     }
 
     MessagePorts::ReceiveHandler handler;
     FrameListener listener;
+    std::shared_ptr<const void> listening; // there while new senders can come
     std::vector<std::shared_ptr<FrameConnection>> senders;
     MainQueue* queue = nullptr;
     bool open = true, scheduled = false, delivering = false;
@@ -219,7 +221,7 @@ public:
             return {EPIPE, std::nullopt};
         if (!sender->connection->waitUntilSent(sendTimeout)) {
             const bool gone = !sender->connection || !sender->connection->isOpen();
-            // Half a frame cannot be taken back, and whoever reads nothing for so long is of no use.
+            // Half a frame cannot be taken back, and a peer that reads nothing for so long is of no use.
             sender->end();
             return {gone ? EPIPE : ETIMEDOUT, std::nullopt};
         }
@@ -251,6 +253,7 @@ LinuxMessagePorts::LinuxMessagePorts(std::string directory, MainQueue& queue, Sy
 std::unique_ptr<LocalPort> LinuxMessagePorts::createLocal(std::string_view name, ReceiveHandler handler)
 {
     const auto failed = [&](const std::string& why) {
+        _problem = why;
         _log.write(Priority::Error, "Port %s: %s", name, why);
         return nullptr;
     };
@@ -264,7 +267,17 @@ std::unique_ptr<LocalPort> LinuxMessagePorts::createLocal(std::string_view name,
     const auto path = _directory + "/" + vox::addressOfPort(name, ::getpid());
     if (const auto wrong = receiver->listener.listen(path); !wrong.empty())
         return failed(wrong);
+    _problem.clear();
+    // Of the listening alone: a receiver that is closed may live on in a task.
+    receiver->listening = std::make_shared<int>();
+    _listening.insert_or_assign(std::string(name), receiver->listening);
     return std::make_unique<SocketLocalPort>(std::move(receiver), _queue);
+}
+
+bool LinuxMessagePorts::isListening(std::string_view name) const
+{
+    const auto found = _listening.find(name);
+    return found != _listening.end() && !found->second.expired();
 }
 
 std::unique_ptr<RemotePort> LinuxMessagePorts::createRemote(std::string_view name)

@@ -2,6 +2,9 @@
 
 #include "platform/MessagePorts.h"
 
+#include <functional>
+#include <map>
+#include <memory>
 #include <string>
 
 namespace kestrum {
@@ -19,10 +22,17 @@ public:
     /// `name` is an address as the telephony service gives it.
     std::unique_ptr<RemotePort> createRemote(std::string_view name) override;
 
+    /// Whether messages can reach a local port of this name.
+    bool isListening(std::string_view name) const;
+    /// Why the last local port could not be made; empty when it could.
+    const std::string& problem() const { return _problem; }
+
 private:
     std::string _directory;
     MainQueue& _queue;
     SystemLog& _log;
+    std::map<std::string, std::weak_ptr<const void>, std::less<>> _listening; // by name
+    std::string _problem;
 };
 
 } // namespace kestrum

@@ -25,28 +25,60 @@ int levelOf(Priority priority)
 
 // Outlives the log when the thread hangs in its sink at the end.
 struct LinuxSystemLog::Shared {
+    struct Line {
+        std::size_t number;
+        int level;
+        std::string text;
+    };
+
     Sink sink;
     std::size_t capacity;
     std::mutex mutex;
     std::condition_variable changed;
-    std::deque<std::pair<int, std::string>> lines;
+    std::deque<Line> errors, others; // each in the order written
+    std::size_t written = 0;
     std::size_t lost = 0;
     bool ending = false, ended = false;
+
+    void add(int level, std::string_view text)
+    {
+        if (errors.size() + others.size() >= capacity) {
+            ++lost;
+            // A failure is worth more than the trace of a record.
+            if (level > LOG_ERR || others.empty())
+                return;
+            others.pop_front();
+        }
+        (level > LOG_ERR ? others : errors).push_back({written++, level, std::string(text)});
+    }
+
+    Line next()
+    {
+        auto& from =
+            others.empty() || (!errors.empty() && errors.front().number < others.front().number) ? errors : others;
+        auto line = std::move(from.front());
+        from.pop_front();
+        return line;
+    }
 
     void run()
     {
         std::unique_lock lock(mutex);
-        for (;;) {
-            changed.wait(lock, [&] { return !lines.empty() || ending; });
-            if (lines.empty())
+        for (std::size_t sinceReport = 0;;) {
+            changed.wait(lock, [&] { return !errors.empty() || !others.empty() || ending; });
+            if (errors.empty() && others.empty())
                 break;
-            const auto line = std::move(lines.front());
-            lines.pop_front();
+            const auto line = next();
+            // Also during a flood without an end, in which the queue is never empty.
+            const bool report = lost > 0 && (++sinceReport >= capacity || (errors.empty() && others.empty()));
+            const std::size_t count = report ? std::exchange(lost, 0) : 0;
             lock.unlock();
-            sink(line.first, line.second);
+            sink(line.level, line.text);
+            if (report) {
+                sinceReport = 0;
+                sink(LOG_WARNING, formatted("%lu log lines were lost", count));
+            }
             lock.lock();
-            if (lines.empty() && lost > 0)
-                lines.emplace_back(LOG_WARNING, formatted("%lu log lines were lost", std::exchange(lost, 0)));
         }
         ended = true;
         changed.notify_all();
@@ -80,11 +112,7 @@ void LinuxSystemLog::write(Priority priority, std::string_view text)
 {
     {
         const std::lock_guard lock(_shared->mutex);
-        if (_shared->lines.size() >= _shared->capacity) {
-            ++_shared->lost;
-            return;
-        }
-        _shared->lines.emplace_back(levelOf(priority), text);
+        _shared->add(levelOf(priority), text);
     }
     _shared->changed.notify_one();
 }

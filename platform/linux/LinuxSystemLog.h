@@ -10,7 +10,8 @@
 namespace kestrum {
 
 /// syslog(3), written by a thread of its own: a daemon that stops reading never stops the program. What the queue
-/// cannot take is counted, and the count is logged as soon as there is room.
+/// cannot take is counted, and the count is logged, during a lasting flood too. Lines of error priority take the places
+/// of others.
 class LinuxSystemLog final : public SystemLog {
 public:
     /// Where the thread writes a line: syslog's level (0 to 7), text.

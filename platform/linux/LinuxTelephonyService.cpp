@@ -2,9 +2,17 @@
 
 #include "platform/MainQueue.h"
 #include "platform/linux/FrameSocket.h"
+#include "platform/linux/LinuxMessagePorts.h"
 #include "platform/linux/VoxProtocol.h"
+#include "support/Format.h"
 
+#include <QTimer>
+
+#include <algorithm>
 #include <cerrno>
+#include <cstring>
+#include <utility>
+#include <vector>
 
 #include <unistd.h>
 
@@ -15,78 +23,154 @@ using namespace std::chrono;
 
 constexpr milliseconds kTimeout{1000};
 
+// A peer that sends more of them than the main queue serves gets one task, not one for each.
+class Notifications : public std::enable_shared_from_this<Notifications> {
+public:
+    Notifications(TelephonyService::NotificationHandler handler, MainQueue& queue)
+        : _handler(std::move(handler)), _queue(queue)
+    {}
+
+    void take(const Frame& frame)
+    {
+        if (frame.kind != Frame::Kind::Message || frame.messageId != vox::kNotification ||
+            frame.payload.size() > kLongestName)
+            return;
+        auto name = std::string(textOf(frame.payload));
+        if (_names.size() == kMostNames || std::ranges::find(_names, name) != _names.end())
+            return;
+        _names.push_back(std::move(name));
+        if (_names.size() == 1)
+            _queue.post([weak = weak_from_this()] {
+                if (const auto self = weak.lock())
+                    self->handOver();
+            });
+    }
+
+private:
+    static constexpr std::size_t kLongestName = 256, kMostNames = 16;
+
+    void handOver()
+    {
+        // The handler may end the connection, and with it what is left.
+        const auto self = weak_from_this();
+        constexpr int kThisTask = 1;
+        for (const auto& name : std::exchange(_names, {}))
+            if (_handler && self.use_count() > kThisTask)
+                _handler(name);
+    }
+
+    TelephonyService::NotificationHandler _handler;
+    MainQueue& _queue;
+    std::vector<std::string> _names; // that wait for their turn
+};
+
+std::string inWords(const LogChannelAnswer& answer)
+{
+    if (answer.errorDomain == vox::kSystemErrors)
+        return answer.errorCode == ETIMEDOUT ? "the telephony service does not answer"
+                                             : std::string("the telephony service: ") + std::strerror(answer.errorCode);
+    switch (answer.errorCode) {
+    case vox::kTooManyChannels:
+        return "the telephony service has no channel left for this display";
+    case vox::kNoReceiver:
+        return "the telephony service cannot reach this display";
+    default:
+        return formatted("the telephony service refuses (error %d)", answer.errorCode);
+    }
+}
+
 class SocketServerConnection final : public VoxServerConnection {
 public:
     SocketServerConnection(std::unique_ptr<FrameConnection> connection, TelephonyService::NotificationHandler handler,
-                           MainQueue& queue)
+                           const LinuxMessagePorts& ports, MainQueue& queue, std::string& problem)
         : _connection(std::move(connection)),
-          _handler(std::make_shared<TelephonyService::NotificationHandler>(std::move(handler))),
-          _queue(queue)
+          _notifications(std::make_shared<Notifications>(std::move(handler), queue)),
+          _ports(ports),
+          _problem(problem)
     {
         _connection->readable = [this] { readNotifications(); };
     }
 
     LogChannelAnswer networkMonitorCreateLogChannel(std::string_view serviceName) override
     {
-        const auto end = steady_clock::now() + kTimeout;
-        const auto left = [&] { return ceil<milliseconds>(end - steady_clock::now()); };
-        const auto address = vox::addressOfPort(serviceName, ::getpid());
-        auto answer = [&]() -> LogChannelAnswer {
-            if (!_connection->send({Frame::Kind::Request, vox::kCreateLogChannel, ++_serial, bytesOf(address)}) ||
-                !_connection->waitUntilSent(left()))
-                return {vox::kSystemErrors, EPIPE, std::nullopt};
-            do {
-                while (const auto frame = _connection->next()) {
-                    if (frame->kind != Frame::Kind::Reply || frame->serial != _serial)
-                        notify(*frame);
-                    else if (auto decoded = vox::decodeAnswer(frame->payload))
-                        return *std::move(decoded);
-                    else
-                        return {vox::kSystemErrors, EBADMSG, std::nullopt};
-                }
-            } while (_connection->waitForBytes(left()));
-            return {vox::kSystemErrors, _connection->isOpen() ? ETIMEDOUT : EPIPE, std::nullopt};
-        }();
+        // Without its port the display would run and hear nothing.
+        if (!_ports.isListening(serviceName)) {
+            _problem = _ports.problem();
+            return {vox::kSystemErrors, ENOTCONN, std::nullopt};
+        }
+        auto answer = request(vox::addressOfPort(serviceName, ::getpid()));
+        _problem = answer.errorCode == 0 ? "" : inWords(answer);
         readNotifications(); // what came behind the answer
         return answer;
     }
 
 private:
+    LogChannelAnswer request(const std::string& address)
+    {
+        const auto end = steady_clock::now() + kTimeout;
+        const auto left = [&] { return ceil<milliseconds>(end - steady_clock::now()); };
+        if (!_connection->send({Frame::Kind::Request, vox::kCreateLogChannel, ++_serial, bytesOf(address)}) ||
+            !_connection->waitUntilSent(left()))
+            return {vox::kSystemErrors, EPIPE, std::nullopt};
+        do {
+            // A flood of other frames takes no longer than silence.
+            while (const auto frame = left().count() > 0 ? _connection->next() : std::nullopt) {
+                if (frame->kind != Frame::Kind::Reply || frame->serial != _serial)
+                    _notifications->take(*frame);
+                else if (auto decoded = vox::decodeAnswer(frame->payload))
+                    return *std::move(decoded);
+                else
+                    return {vox::kSystemErrors, EBADMSG, std::nullopt};
+            }
+        } while (_connection->waitForBytes(left()));
+        return {vox::kSystemErrors, _connection->isOpen() ? ETIMEDOUT : EPIPE, std::nullopt};
+    }
+
     void readNotifications()
     {
-        while (const auto frame = _connection->next())
-            notify(*frame);
+        // In turns: what is left comes with the next event.
+        for (int i = 0; i < kTurn; ++i) {
+            const auto frame = _connection->next();
+            if (!frame)
+                return;
+            _notifications->take(*frame);
+        }
+        if (!std::exchange(_scheduled, true))
+            QTimer::singleShot(0, &_context, [this] {
+                _scheduled = false;
+                readNotifications();
+            });
     }
 
-    void notify(const Frame& frame)
-    {
-        if (frame.kind != Frame::Kind::Message || frame.messageId != vox::kNotification)
-            return;
-        // The connection's end lets go of the handler, and so of what is still queued.
-        _queue.post([weak = std::weak_ptr(_handler), name = std::string(textOf(frame.payload))] {
-            if (const auto handler = weak.lock(); handler && *handler)
-                (*handler)(name);
-        });
-    }
+    static constexpr int kTurn = 256;
 
     std::unique_ptr<FrameConnection> _connection;
-    std::shared_ptr<TelephonyService::NotificationHandler> _handler;
-    MainQueue& _queue;
+    std::shared_ptr<Notifications> _notifications;
+    const LinuxMessagePorts& _ports;
+    std::string& _problem;
     std::uint32_t _serial = 0;
+    bool _scheduled = false; // more reading
+    QObject _context;        // ends the reading with the connection
 };
 
 } // namespace
 
-LinuxTelephonyService::LinuxTelephonyService(std::string directory, MainQueue& queue, SystemLog& log)
-    : _directory(std::move(directory)), _queue(queue), _log(log)
+LinuxTelephonyService::LinuxTelephonyService(std::string directory, const LinuxMessagePorts& ports, MainQueue& queue,
+                                             SystemLog& log)
+    : _directory(std::move(directory)), _ports(ports), _queue(queue), _log(log)
 {}
 
 std::unique_ptr<VoxServerConnection> LinuxTelephonyService::connect(NotificationHandler handler)
 {
     auto connection = FrameConnection::connectTo(_directory + "/" + std::string(vox::kServerPort), kTimeout, _log);
-    if (!connection)
+    if (!connection) {
+        _problem = !_ports.problem().empty() ? _ports.problem()
+                                             : formatted("no telephony service can be reached in %s", _directory);
         return nullptr;
-    return std::make_unique<SocketServerConnection>(std::move(connection), std::move(handler), _queue);
+    }
+    _problem.clear();
+    return std::make_unique<SocketServerConnection>(std::move(connection), std::move(handler), _ports, _queue,
+                                                    _problem);
 }
 
 } // namespace kestrum

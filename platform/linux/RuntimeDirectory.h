@@ -9,8 +9,9 @@ namespace kestrum {
 /// /tmp/kestrum-<uid>.
 std::string runtimeDirectory();
 
-/// Creates the directory, for this user alone. Empty on success, else what is wrong: it cannot be made, belongs to
-/// somebody else, or is no directory.
+/// Creates the directory with mode 0700 where there is none. Empty on success, else what is wrong: the path is
+/// relative or leaves no room for a display's socket in it, the directory cannot be made, belongs to another user, is
+/// open to others, or is no directory. The mode of a directory that exists is never changed.
 std::string secureRuntimeDirectory(const std::string& directory);
 
 /// Whether a name may stand for a port: letters, digits, ".", "-" and "_", not beginning with ".".

@@ -240,6 +240,64 @@ TEST(LinuxSystemLog, NeverWaitsForADaemonThatHangsAndCountsWhatIsLost)
     EXPECT_EQ(sink.state->lines[11].second, "990 log lines were lost");
 }
 
+TEST(LinuxSystemLog, ErrorsTakeThePlacesOfTheOldestTraceLines)
+{
+    const StuckSink sink;
+    LinuxSystemLog log(sink, 4);
+    log.write(Priority::Error, "stuck");
+    ASSERT_TRUE(sink.waitForLines(1));
+    for (const auto* each : {"trace 1", "trace 2", "trace 3"})
+        log.write(Priority::Warning, each);
+    for (const auto* each : {"error 1", "error 2", "error 3"})
+        log.write(Priority::Error, each);
+    log.write(Priority::Warning, "trace 4");
+    log.write(Priority::Error, "error 4");
+    sink.open();
+    ASSERT_TRUE(sink.waitForLines(6));
+    const std::lock_guard lock(sink.state->mutex);
+    std::vector<std::string> texts;
+    for (const auto& line : sink.state->lines)
+        texts.push_back(line.second);
+    EXPECT_THAT(texts, ElementsAre("stuck", "error 1", "error 2", "error 3", "error 4", "4 log lines were lost"));
+}
+
+TEST(LinuxSystemLog, KeepsTheOrderOfErrorsAndOthers)
+{
+    const StuckSink sink;
+    {
+        LinuxSystemLog log(sink);
+        for (const auto priority : {Priority::Warning, Priority::Error, Priority::Notice, Priority::Error})
+            log.write(priority, std::to_string(static_cast<int>(priority)));
+        sink.open();
+    }
+    std::string order;
+    for (const auto& line : sink.state->lines)
+        order += line.second;
+    EXPECT_EQ(order, "4353");
+}
+
+TEST(LinuxSystemLog, TellsOfLostLinesDuringAFloodThatDoesNotEnd)
+{
+    std::mutex mutex;
+    std::condition_variable changed;
+    std::size_t reports = 0;
+    LinuxSystemLog log(
+        [&](int, const std::string& text) {
+            const std::lock_guard lock(mutex);
+            reports += text.ends_with("log lines were lost");
+            changed.notify_all();
+        },
+        10);
+    const auto end = steady_clock::now() + 20s;
+    for (bool told = false; !told && steady_clock::now() < end;) {
+        for (int i = 0; i < 100; ++i)
+            log.write(Priority::Error, "line");
+        const std::lock_guard lock(mutex);
+        told = reports >= 2;
+    }
+    EXPECT_GE(reports, 2u);
+}
+
 TEST(LinuxSystemLog, EndsThoughItsDaemonHangs)
 {
     const StuckSink sink;
@@ -283,6 +341,24 @@ TEST(RuntimeDirectory, SaysWhyItCannotBeMade)
     write(scratch / "file", "");
     EXPECT_THAT(secureRuntimeDirectory(scratch / "file/inside"), HasSubstr("cannot create"));
     EXPECT_THAT(secureRuntimeDirectory(scratch / "file"), HasSubstr("is no directory"));
+}
+
+TEST(RuntimeDirectory, MayNotBeRelative)
+{
+    EXPECT_EQ(secureRuntimeDirectory("run"), "the runtime directory run is not an absolute path");
+    EXPECT_THAT(secureRuntimeDirectory(""), HasSubstr("is not an absolute path"));
+}
+
+TEST(RuntimeDirectory, LeavesRoomForTheLongestSocketOfADisplay)
+{
+    const ScratchDirectory scratch;
+    const auto ofLength = [&](std::size_t length) {
+        return scratch / std::string(length - scratch.path().size() - 1, 'd');
+    };
+    // "/org.kestrum.vox.baseband-state-report.log.4194304" and the zero, of 108 bytes.
+    EXPECT_EQ(secureRuntimeDirectory(ofLength(57)), "");
+    EXPECT_THAT(secureRuntimeDirectory(ofLength(58)), HasSubstr("too long: 58 bytes, sockets in it leave room for 57"));
+    EXPECT_FALSE(std::filesystem::exists(ofLength(58)));
 }
 
 class TerminationSignal : public testing::TestWithParam<int> {};

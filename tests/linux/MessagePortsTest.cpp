@@ -8,6 +8,8 @@
 
 #include <gmock/gmock.h>
 
+#include <fcntl.h>
+#include <sys/file.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 
@@ -80,21 +82,29 @@ TEST_F(LocalPortTest, StandsInADirectoryForThisUserAlone)
     EXPECT_EQ(found.st_mode & 0777, 0700u);
 }
 
-TEST_F(LocalPortTest, ClosesADirectoryThatWasOpenToOthers)
+TEST_F(LocalPortTest, LeavesADirectoryThatIsOpenToOthersAsItIsAndRefusesIt)
 {
-    ::chmod(directory.path().c_str(), 0755);
-    ASSERT_TRUE(makeLocal());
-    struct stat found {};
-    ASSERT_EQ(::stat(directory.path().c_str(), &found), 0);
-    EXPECT_EQ(found.st_mode & 0777, 0700u);
+    for (const unsigned mode : {0755u, 0770u, 01777u, 0500u}) {
+        ::chmod(directory.path().c_str(), mode);
+        log.lines.clear();
+        EXPECT_FALSE(makeLocal());
+        EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("but 0700 is needed")));
+        struct stat found {};
+        ASSERT_EQ(::stat(directory.path().c_str(), &found), 0);
+        EXPECT_EQ(found.st_mode & 07777, mode);
+    }
+    ::chmod(directory.path().c_str(), 0700);
 }
 
 TEST_F(LocalPortTest, IsNotMadeBehindALink)
 {
     std::filesystem::create_directory_symlink(scratch.path(), directory / "link");
-    LinuxMessagePorts linked(directory / "link", queue, log);
-    EXPECT_FALSE(linked.createLocal("log", [](auto, auto) {}));
-    EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("is no directory")));
+    for (const auto* name : {"link", "link/", "link//"}) {
+        log.lines.clear();
+        LinuxMessagePorts linked(directory / name, queue, log);
+        EXPECT_FALSE(linked.createLocal("log", [](auto, auto) {})) << name;
+        EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("is no directory")));
+    }
 }
 
 TEST_F(LocalPortTest, IsNotMadeUnderANameThatLeavesTheDirectory)
@@ -108,6 +118,16 @@ TEST_F(LocalPortTest, SaysThatAPathIsTooLongForASocket)
 {
     EXPECT_FALSE(makeLocal(std::string(120, 'x')));
     EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("too long for a socket")));
+}
+
+TEST_F(LocalPortTest, GivesUpOnALockThatAnotherProcessKeeps)
+{
+    const int kept = ::open(directory.path().c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    ASSERT_EQ(::flock(kept, LOCK_EX), 0);
+    EXPECT_FALSE(makeLocal()); // would hang here
+    EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("keeps " + directory.path() + " locked")));
+    ::close(kept);
+    EXPECT_TRUE(makeLocal());
 }
 
 TEST_F(LocalPortTest, IsNotMadeTwiceInAProcess)
@@ -574,6 +594,76 @@ TEST_F(RemotePortTest, MayBeDestroyedInItsInvalidationHandler)
     });
     service.reset();
     EXPECT_TRUE(eventually([&] { return ran; }));
+}
+
+class FrameConnectionAttemptTest : public MessagePortsTest {
+protected:
+    std::unique_ptr<FrameConnectionAttempt> attempt(std::chrono::milliseconds timeout)
+    {
+        return std::make_unique<FrameConnectionAttempt>(directory / "port", timeout, log, [this](auto connection) {
+            made = std::move(connection);
+            ++ended;
+        });
+    }
+
+    std::unique_ptr<FrameConnection> made;
+    int ended = 0;
+};
+
+TEST_F(FrameConnectionAttemptTest, ConnectsFromTheEventLoop)
+{
+    const auto listening = RawSocket::listenAt(directory / "port");
+    const auto running = attempt(1s);
+    EXPECT_EQ(ended, 0);
+    ASSERT_TRUE(eventually([&] { return ended > 0; }));
+    ASSERT_TRUE(made);
+    const auto peer = listening.accept();
+    made->send({Frame::Kind::Message, 7, 0, {}});
+    ASSERT_TRUE(made->waitUntilSent(1s));
+    EXPECT_EQ(peer.receive(13), frame(kMessage, 7, 0, ""));
+}
+
+TEST_F(FrameConnectionAttemptTest, EndsWithoutAConnectionWhereNobodyListens)
+{
+    const auto running = attempt(20s);
+    ASSERT_TRUE(eventually([&] { return ended > 0; }));
+    EXPECT_FALSE(made);
+}
+
+TEST_F(FrameConnectionAttemptTest, WaitsForRoomInAFullBacklogAndServesTheLoopMeanwhile)
+{
+    const auto listening = RawSocket::listenAt(directory / "port", 0);
+    const auto first = RawSocket::connectTo(directory / "port");
+    const auto running = attempt(20s);
+    settle();
+    EXPECT_EQ(ended, 0);
+    const auto accepted = listening.accept();
+    ASSERT_TRUE(eventually([&] { return ended > 0; }));
+    EXPECT_TRUE(made);
+}
+
+TEST_F(FrameConnectionAttemptTest, GivesUpOnABacklogThatStaysFull)
+{
+    const auto listening = RawSocket::listenAt(directory / "port", 0);
+    const auto first = RawSocket::connectTo(directory / "port");
+    const auto running = attempt(50ms);
+    ASSERT_TRUE(eventually([&] { return ended > 0; }));
+    EXPECT_FALSE(made);
+}
+
+TEST_F(FrameConnectionAttemptTest, MayBeCancelledAndMayEndWithinItsOwnCall)
+{
+    const auto listening = RawSocket::listenAt(directory / "port");
+    attempt(1s).reset();
+    settle();
+    EXPECT_EQ(ended, 0);
+
+    std::unique_ptr<FrameConnectionAttempt> running;
+    running = std::make_unique<FrameConnectionAttempt>(directory / "port", 1s, log, [&](auto) {
+        running.reset();
+        ++ended;
+    });
+    EXPECT_TRUE(eventually([&] { return ended == 1; }));
 }
 
 } // namespace

@@ -32,11 +32,12 @@ public:
         }
         return RawSocket(made);
     }
-    static RawSocket listenAt(const std::string& path)
+    static RawSocket listenAt(const std::string& path, int backlog = 8)
     {
         const int made = ::socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
         const auto address = at(path);
-        if (::bind(made, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 || ::listen(made, 8) != 0) {
+        if (::bind(made, reinterpret_cast<const sockaddr*>(&address), sizeof address) != 0 ||
+            ::listen(made, backlog) != 0) {
             ::close(made);
             return RawSocket(-1);
         }

@@ -2,6 +2,7 @@
 #include "linux/EventLoop.h"
 #include "linux/RawSocket.h"
 #include "linux/Scratch.h"
+#include "platform/linux/LinuxMessagePorts.h"
 #include "platform/linux/LinuxTelephonyService.h"
 #include "platform/linux/QtMainQueue.h"
 
@@ -45,7 +46,9 @@ protected:
     ScratchDirectory directory;
     RecordingLog log;
     QtMainQueue queue;
-    LinuxTelephonyService telephony{directory.path(), queue, log};
+    LinuxMessagePorts ports{directory.path(), queue, log};
+    LinuxTelephonyService telephony{directory.path(), ports, queue, log};
+    std::unique_ptr<LocalPort> local = ports.createLocal("log", [](auto, auto) {});
     RawSocket listening = RawSocket::listenAt(directory / "org.kestrum.vox");
     std::thread played;
 };
@@ -190,6 +193,90 @@ TEST_F(TelephonyServiceTest, ItsEndCancelsNotificationsStillQueued)
     bool settled = false;
     queue.post(10ms, [&] { settled = true; });
     EXPECT_TRUE(eventually([&] { return settled; }));
+}
+
+TEST_F(TelephonyServiceTest, AFloodOfNotificationsTakesOneTaskAndNoLongerThanSilence)
+{
+    std::atomic<bool> over = false;
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        std::string flood;
+        for (int i = 0; i < 5000; ++i)
+            flood += frame(kMessage, 2, 0, "kVoxTechnologyChangedNotification");
+        while (client.send(flood))
+            continue;
+        over = true;
+    });
+    int heard = 0;
+    auto connection = telephony.connect([&](std::string_view) { ++heard; });
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("log").errorCode, ETIMEDOUT);
+    bool settled = false;
+    queue.post([&] { settled = true; });
+    EXPECT_TRUE(eventually([&] { return settled; }));
+    EXPECT_EQ(heard, 1);
+    connection.reset();
+    EXPECT_TRUE(eventually([&] { return over.load(); }));
+}
+
+TEST_F(TelephonyServiceTest, NotificationsOfManyNamesAreBounded)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        std::string many = frame(kMessage, 2, 0, std::string(1000, 'x'));
+        for (int i = 0; i < 5000; ++i)
+            many += frame(kMessage, 2, 0, "name " + std::to_string(i));
+        client.send(many + frame(kReply, 1, 1, words(0, 0) + "port"));
+        client.receive(1);
+    });
+    std::vector<std::string> names;
+    auto connection = telephony.connect([&](std::string_view name) { names.emplace_back(name); });
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("log").remotePort, "port");
+    ASSERT_TRUE(eventually([&] { return !names.empty(); }));
+    EXPECT_EQ(names.size(), 16u);
+    EXPECT_EQ(names.front(), "name 0");
+}
+
+TEST_F(TelephonyServiceTest, AsksForNoLogToAPortThatDoesNotListen)
+{
+    std::string asked;
+    play([&](RawSocket& client) { asked = client.receive(1); });
+    auto connection = telephony.connect({});
+    ASSERT_TRUE(connection);
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("other").errorCode, ENOTCONN);
+    local.reset();
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("log").errorCode, ENOTCONN);
+    connection.reset();
+    played.join();
+    EXPECT_EQ(asked, "");
+}
+
+TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
+{
+    EXPECT_EQ(telephony.problem(), "");
+    const auto refusedWith = [&](std::uint32_t code) {
+        play([&](RawSocket& client) {
+            client.receive(kRequestSize);
+            client.send(frame(kReply, 1, 1, words(1, code)));
+        });
+        telephony.connect({})->networkMonitorCreateLogChannel("log");
+        played.join();
+        return telephony.problem();
+    };
+    EXPECT_EQ(refusedWith(2), "the telephony service has no channel left for this display");
+    EXPECT_EQ(refusedWith(3), "the telephony service cannot reach this display");
+    EXPECT_EQ(refusedWith(77), "the telephony service refuses (error 77)");
+    EXPECT_EQ(refusedWith(0), "");
+    listening.close();
+    telephony.connect({});
+    EXPECT_EQ(telephony.problem(), "no telephony service can be reached in " + directory.path());
+}
+
+TEST_F(TelephonyServiceTest, SaysThatTheReceivePortCouldNotBeMade)
+{
+    EXPECT_FALSE(ports.createLocal("log", [](auto, auto) {}));
+    local.reset();
+    telephony.connect({})->networkMonitorCreateLogChannel("log");
+    EXPECT_THAT(telephony.problem(), testing::HasSubstr("another process listens at"));
 }
 
 TEST_F(TelephonyServiceTest, MayBeDestroyedWithinItsNotification)

@@ -173,7 +173,7 @@ protected:
     RecordingLog log;
     QtMainQueue queue;
     LinuxMessagePorts ports{directory.path(), queue, log};
-    LinuxTelephonyService telephony{directory.path(), queue, log};
+    LinuxTelephonyService telephony{directory.path(), ports, queue, log};
     Voxd voxd{directory.path()};
 };
 
