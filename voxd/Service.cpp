@@ -21,6 +21,7 @@ using namespace std::chrono;
 constexpr milliseconds kBatch{10};
 constexpr milliseconds kConnectTimeout{1000};
 constexpr hours kLongestWait{1};
+constexpr std::size_t kUnsentReplies = 256 << 10;
 constexpr std::string_view kCommandPorts = "org.kestrum.vox.command.";
 constexpr std::string_view kTechnologyChanged = "kVoxTechnologyChangedNotification";
 
@@ -63,51 +64,78 @@ std::string Service::start()
 
 void Service::acceptConnection(std::unique_ptr<FrameConnection> connection)
 {
-    if (_connections.size() == kMaximumConnections) {
-        _log.write(Priority::Error, "refused a server connection: %lu stand already", _connections.size());
+    if (_clients.size() == kMaximumConnections) {
+        _log.write(Priority::Error, "refused a server connection: %lu stand already", _clients.size());
         return;
     }
-    const auto place = _connections.insert(_connections.end(), std::move(connection));
-    auto& accepted = **place;
-    accepted.closed = [this, place] { _connections.erase(place); };
-    accepted.readable = [this, place, &accepted] { serve(accepted, place); };
+    const auto client = _clients.insert(_clients.end(), Client{std::move(connection), nullptr});
+    client->connection->closed = [this, client] { _clients.erase(client); };
+    client->connection->readable = client->connection->written = [this, client] { serve(client); };
 }
 
-void Service::serve(FrameConnection& connection, Connections::iterator place)
+void Service::serve(Clients::iterator client)
 {
-    // A malformed frame closes the connection within `next`; nothing of it is touched then.
-    while (const auto frame = connection.next()) {
+    // A malformed frame closes the connection within `next`; nothing of it is touched then. Requests of a client that
+    // does not read its replies wait in its own socket.
+    while (!client->connecting && client->connection->unsent() < kUnsentReplies) {
+        const auto frame = client->connection->next();
+        if (!frame)
+            return;
         if (frame->kind != Frame::Kind::Request)
             continue;
-        const auto answer = frame->messageId == vox::kCreateLogChannel
-                                ? createLogChannel(textOf(frame->payload))
-                                : LogChannelAnswer{vox::kServiceErrors, vox::kBadRequest, std::nullopt};
-        if (!connection.send({Frame::Kind::Reply, frame->messageId, frame->serial, vox::encode(answer)})) {
-            _connections.erase(place);
-            return;
-        }
+        if (frame->messageId == vox::kCreateLogChannel)
+            createLogChannel(client, frame->serial, std::string(textOf(frame->payload)));
+        else
+            reply(client, frame->messageId, frame->serial, {vox::kServiceErrors, vox::kBadRequest, std::nullopt});
     }
 }
 
-LogChannelAnswer Service::createLogChannel(std::string_view address)
+// A connection that closed meanwhile is forgotten by its own handler.
+void Service::reply(Clients::iterator client, std::int32_t messageId, std::uint32_t serial,
+                    const LogChannelAnswer& answer)
 {
-    const auto failed = [&](std::int32_t code, const char* why) {
-        _log.write(Priority::Error, "refused a log channel to \"%s\": %s", address.substr(0, 200), why);
-        return LogChannelAnswer{vox::kServiceErrors, code, std::nullopt};
+    client->connection->send({Frame::Kind::Reply, messageId, serial, vox::encode(answer)});
+}
+
+void Service::createLogChannel(Clients::iterator client, std::uint32_t serial, const std::string& address)
+{
+    const auto refused = [&](std::int32_t code, std::string_view why) {
+        reply(client, vox::kCreateLogChannel, serial, refuse(address, code, why));
     };
     if (!isPortName(address))
-        return failed(vox::kBadRequest, "not an address");
-    if (_channels.size() == kMaximumChannels)
-        return failed(vox::kTooManyChannels, "too many channels");
-    auto logPort = FrameConnection::connectTo(_settings.directory + "/" + std::string(address), kConnectTimeout, _log);
+        return refused(vox::kBadRequest, "not an address");
+    if (_channels.size() >= kMaximumChannels)
+        return refused(vox::kTooManyChannels, "too many channels");
+    client->connecting = std::make_unique<FrameConnectionAttempt>(
+        _settings.directory + "/" + address, kConnectTimeout, _log,
+        [this, client, serial, address](std::unique_ptr<FrameConnection> logPort) {
+            client->connecting.reset();
+            reply(client, vox::kCreateLogChannel, serial, openChannel(address, std::move(logPort)));
+            serve(client);
+        });
+}
+
+LogChannelAnswer Service::openChannel(std::string_view address, std::unique_ptr<FrameConnection> logPort)
+{
     if (!logPort)
-        return failed(vox::kNoReceiver, "nobody listens there");
+        return refuse(address, vox::kNoReceiver, "no process listens there");
+    if (_channels.size() >= kMaximumChannels) // others may have come first
+        return refuse(address, vox::kTooManyChannels, "too many channels");
     const auto name = formatted("%s%d.%u", kCommandPorts, ::getpid(), ++_lastChannel);
     auto channel = std::make_unique<ServiceChannel>(_host, std::move(logPort));
     if (const auto wrong = channel->listen(_settings.directory + "/" + name); !wrong.empty())
-        return failed(vox::kNoReceiver, wrong.c_str());
+        return refuse(address, vox::kNoReceiver, wrong);
     _channels.push_back(std::move(channel));
+    _toldRefusals.clear();
     return {0, 0, name};
+}
+
+// Displays that are refused try again every 5 s: one line for each reason is enough until something changes.
+LogChannelAnswer Service::refuse(std::string_view address, std::int32_t code, std::string_view why)
+{
+    if (_toldRefusals.insert(code).second)
+        _log.write(Priority::Error, "refused a log channel to \"%s\": %s", address.substr(0, 200), why);
+    return {vox::kServiceErrors, code, std::nullopt};
 }
 
 bool Service::isStreamed() const
@@ -182,8 +210,9 @@ void Service::changeTechnology()
 {
     _technology = _nextTechnology;
     _log.write(Priority::Notice, "the technology is now %s", _technology);
-    for (const auto& connection : _connections)
-        connection->send({Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
+    for (const auto& client : _clients)
+        if (client.connection->unsent() < kUnsentReplies) // a client that reads nothing misses nothing
+            client.connection->send({Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
     retire(_channels.begin(), _channels.end());
 }
 
@@ -191,6 +220,7 @@ void Service::changeTechnology()
 void Service::retire(Channels::iterator first, Channels::iterator last)
 {
     _retired.splice(_retired.end(), _channels, first, last);
+    _toldRefusals.clear();
     QTimer::singleShot(0, &_due, [this] { _retired.clear(); });
 }
 

@@ -13,6 +13,7 @@
 #include <list>
 #include <memory>
 #include <optional>
+#include <set>
 #include <string>
 
 namespace kestrum {
@@ -42,12 +43,20 @@ public:
 
 private:
     using Moment = std::chrono::steady_clock::time_point;
-    using Connections = std::list<std::unique_ptr<FrameConnection>>;
+    // A server connection. It is served one request at a time, so that one client's slow port stops only itself.
+    struct Client {
+        std::unique_ptr<FrameConnection> connection;
+        std::unique_ptr<FrameConnectionAttempt> connecting; ///< to the port that the current request names
+    };
+    using Clients = std::list<Client>;
     using Channels = std::list<std::unique_ptr<ServiceChannel>>;
 
     void acceptConnection(std::unique_ptr<FrameConnection> connection);
-    void serve(FrameConnection& connection, Connections::iterator place);
-    LogChannelAnswer createLogChannel(std::string_view address);
+    void serve(Clients::iterator client);
+    void reply(Clients::iterator client, std::int32_t messageId, std::uint32_t serial, const LogChannelAnswer& answer);
+    void createLogChannel(Clients::iterator client, std::uint32_t serial, const std::string& address);
+    LogChannelAnswer openChannel(std::string_view address, std::unique_ptr<FrameConnection> logPort);
+    LogChannelAnswer refuse(std::string_view address, std::int32_t code, std::string_view why);
 
     bool isStreamed() const;
     void pace();
@@ -63,8 +72,9 @@ private:
     std::function<void(Bytes)> _streamed;
     ServiceChannel::Host _host;
     FrameListener _listener;
-    Connections _connections;
+    Clients _clients;
     Channels _channels, _retired;
+    std::set<std::int32_t> _toldRefusals; ///< since the last channel was opened or closed
     unsigned _lastChannel = 0;
 
     std::string _technology;              // of the message streamed last

@@ -11,6 +11,7 @@ namespace {
 
 // What the socket is given to keep; the rest waits in the outbox, where whole messages can still be dropped.
 constexpr std::size_t kSocketBytes = 256 << 10;
+constexpr std::size_t kUnsentReplies = 256 << 10;
 constexpr std::int32_t kLogMessage = 0;
 
 } // namespace
@@ -50,13 +51,18 @@ void ServiceChannel::accept(std::unique_ptr<FrameConnection> connection)
     _commandTimeout.stop();
     _commands = std::move(connection);
     _commands->closed = [this] { end(); };
-    _commands->readable = [this] { readCommands(); };
+    _commands->readable = _commands->written = [this] { readCommands(); };
 }
 
 void ServiceChannel::readCommands()
 {
-    while (const auto frame = _ended ? std::nullopt : _commands->next())
+    // Commands of a client that does not read its replies wait in its own socket.
+    while (!_ended && _commands->unsent() < kUnsentReplies) {
+        const auto frame = _commands->next();
+        if (!frame)
+            return;
         obey(*frame);
+    }
 }
 
 // The client has nothing to say here; reading tells a malformed peer, and keeps the socket from filling up.

@@ -47,6 +47,13 @@ std::string kcap(const std::vector<std::string>& messages)
     return bytes;
 }
 
+/// The service's reply to a request for a log channel that it does not open.
+std::string refusal(std::uint32_t serial, std::uint32_t code)
+{
+    return frame(kReply, 1, serial, little(1, 4) + little(code, 4));
+}
+constexpr std::size_t kRefusalSize = 13 + 8;
+
 /// The real program, and clients of it in this process.
 class ServiceTest : public testing::Test {
 protected:
@@ -462,15 +469,92 @@ TEST_F(ServiceTest, IgnoresOtherMessageIds)
 TEST_F(ServiceTest, RefusesALogChannelToNobody)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
-    const auto connection = telephony.connect({});
-    ASSERT_TRUE(connection);
-    const auto answer = connection->networkMonitorCreateLogChannel("nobody");
-    EXPECT_EQ(answer.errorDomain, 1);
-    EXPECT_EQ(answer.errorCode, 3);
-    EXPECT_FALSE(answer.remotePort);
-    EXPECT_EQ(connection->networkMonitorCreateLogChannel("../../etc/passwd").errorCode, 1);
+    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
+    server.send(frame(kRequest, 1, 1, "nobody"));
+    EXPECT_EQ(server.receive(kRefusalSize), refusal(1, 3));
+    server.send(frame(kRequest, 1, 2, "../../etc/passwd"));
+    EXPECT_EQ(server.receive(kRefusalSize), refusal(2, 1));
     Client client{*this, "log"};
     EXPECT_EQ(client.open().errorCode, 0);
+}
+
+TEST_F(ServiceTest, AListenerThatAcceptsNobodyStopsItsOwnClientAlone)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
+    const auto full = RawSocket::listenAt(directory / "full.1", 0);
+    const auto first = RawSocket::connectTo(directory / "full.1");
+    std::vector<RawSocket> askers;
+    for (int i = 0; i < 20; ++i) {
+        askers.push_back(RawSocket::connectTo(directory / "org.kestrum.vox"));
+        for (std::uint32_t serial = 1; serial <= 10; ++serial)
+            askers.back().send(frame(kRequest, 1, serial, "full.1"));
+    }
+    // Each of those requests takes a second, during which the others are served.
+    Client client{*this, "log"};
+    EXPECT_EQ(client.open().errorCode, 0);
+    client.startStreaming();
+    EXPECT_TRUE(client.hasReceived(3));
+    EXPECT_EQ(askers.front().received(), "");
+    EXPECT_EQ(askers.back().receive(kRefusalSize), refusal(1, 3));
+}
+
+TEST_F(ServiceTest, TellsARefusalOnceUntilSomethingChanges)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
+    const auto askForNobody = [&](std::uint32_t serial) {
+        server.send(frame(kRequest, 1, serial, "nobody." + std::to_string(serial)));
+        EXPECT_EQ(server.receive(kRefusalSize), refusal(serial, 3));
+    };
+    for (std::uint32_t serial = 1; serial <= 50; ++serial)
+        askForNobody(serial);
+    EXPECT_TRUE(voxd.logs("refused a log channel to \"nobody.1\": no process listens there"));
+    Client client{*this, "log"};
+    EXPECT_EQ(client.open().errorCode, 0);
+    askForNobody(51);
+    EXPECT_TRUE(voxd.logs("refused a log channel to \"nobody.51\""));
+    EXPECT_EQ(voxd.log().find("nobody.2"), std::string::npos);
+}
+
+TEST_F(ServiceTest, RepliesThatAreNotReadCostBoundedMemory)
+{
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
+    Client client{*this, "log"};
+    ASSERT_EQ(client.open().errorCode, 0);
+    const auto before = voxd.memory();
+    const auto flood = [&](const RawSocket& socket, const std::string& request) {
+        std::string requests;
+        for (int i = 0; i < 2000; ++i)
+            requests += request;
+        // Until the service takes no more, which is proven by answers to another client.
+        std::size_t sent = 0;
+        for (int refused = 0; refused < 20;) {
+            const auto n = socket.sendSome(std::string_view(requests).substr(sent % requests.size()));
+            if (n > 0) {
+                sent += static_cast<std::size_t>(n);
+                refused = 0;
+            } else {
+                ++refused;
+                EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_IFX");
+            }
+            if (sent > (std::size_t{64} << 20))
+                break;
+        }
+        EXPECT_FALSE(socket.isAbandoned());
+        return sent;
+    };
+    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
+    EXPECT_LT(flood(server, frame(kRequest, 99, 1, "")), std::size_t{16} << 20);
+
+    const auto receiving = RawSocket::listenAt(directory / "mute.1");
+    const auto asking = RawSocket::connectTo(directory / "org.kestrum.vox");
+    asking.send(frame(kRequest, 1, 1, "mute.1"));
+    const auto answer =
+        asking.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".2").size());
+    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    const auto question = lists.toXml(makeDictionary({{"GetTechnology", Value("GetTechnology")}}));
+    EXPECT_LT(flood(command, frame(kRequest, 0, 1, textOf(question->bytes()))), std::size_t{16} << 20);
+    EXPECT_LT(voxd.memory(), before + (std::size_t{16} << 20));
 }
 
 TEST_F(ServiceTest, SilentConnectionsHarmNobody)
