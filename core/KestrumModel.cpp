@@ -3,6 +3,7 @@
 #include "platform/MainQueue.h"
 #include "platform/PropertyLists.h"
 #include "platform/SystemLog.h"
+#include "platform/TelephonyService.h"
 #include "support/Format.h"
 
 #include <chrono>
@@ -35,6 +36,7 @@ void KestrumModel::startMonitor()
     _starting = true;
     const auto failure = failureOfAttempt();
     _starting = false;
+    _problem = failure ? problemOfAttempt() : "";
     if (failure) {
         logError(*failure);
         destroyPorts();
@@ -60,6 +62,13 @@ std::optional<std::string> KestrumModel::failureOfAttempt()
     if (sent.status != 0)
         return formatted(" ***** Could not send the START command (got error=%d)", sent.status);
     return std::nullopt;
+}
+
+std::string KestrumModel::problemOfAttempt() const
+{
+    if (auto problem = _roles.telephony.problem(); !problem.empty())
+        return problem;
+    return "the telephony service does not say which technology the modem runs";
 }
 
 void KestrumModel::scheduleRetry()
@@ -121,6 +130,12 @@ KestrumModelNodeRef KestrumModel::nodeAtPath(const std::string& path)
         return nullptr;
     const auto found = _nodesByPath->find(path);
     return found == _nodesByPath->end() ? nullptr : found->second;
+}
+
+std::string KestrumModel::lossNotice() const
+{
+    return formatted("The telephony service dropped %lu messages: this display was too slow for them",
+                     static_cast<unsigned long>(_lostMessages));
 }
 
 ArrayRef KestrumModel::getSaveContents() const

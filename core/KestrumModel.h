@@ -27,6 +27,8 @@ public:
     virtual void updateStatus() = 0;
     /// The modem runs another technology than the one whose display was shown: nothing of that is current.
     virtual void displayReplaced() = 0;
+    /// The service has dropped messages that this display did not take in time; see `lostMessages`.
+    virtual void messagesLost() = 0;
 };
 
 /// The one object between the telephony service and the screens: owns the log channel, the generator, its state and
@@ -53,6 +55,12 @@ public:
 
     /// The log channel is open in both directions.
     bool isConnected() const;
+    /// Why the last attempt to connect failed, in words for a person; empty when it did not.
+    const std::string& connectionProblem() const { return _problem; }
+    /// Log messages that the service has dropped because this display did not take them in time, since the start.
+    std::uint64_t lostMessages() const { return _lostMessages; }
+    /// The same in words for a person.
+    std::string lossNotice() const;
 
     /// Takes one log message. What it holds can be nonsense: it is logged, and the next message is served.
     void updateWithData(Bytes data);
@@ -82,9 +90,11 @@ public:
 private:
     /// Why an attempt to start failed; nothing when it did not.
     std::optional<std::string> failureOfAttempt();
+    std::string problemOfAttempt() const;
     void scheduleRetry();
 
     void handleMessage(std::int32_t messageId, Bytes payload);
+    void countLost(Bytes payload);
     void handleInvalidation(const Port* port);
     RemotePort::Sent send(Bytes payload, RemotePort::Reply reply);
     void takeGenerator(std::unique_ptr<LogGenerator> generator);
@@ -106,7 +116,10 @@ private:
     KestrumModelNodeRef _nodes;
     std::optional<PathDictionary> _nodesByPath; ///< there when `_nodes` is
 
-    bool _starting = false; ///< an attempt is on the stack
+    std::string _problem;
+    std::uint64_t _lostMessages = 0;
+    bool _lossPending = false; ///< the observer has not been told yet
+    bool _starting = false;    ///< an attempt is on the stack
     bool _retryPending = false;
 };
 

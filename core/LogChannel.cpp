@@ -6,8 +6,10 @@
 #include "platform/SystemLog.h"
 #include "platform/TelephonyService.h"
 #include "support/Format.h"
+#include "support/Record.h"
 
 #include <chrono>
+#include <limits>
 #include <utility>
 
 namespace kestrum {
@@ -15,7 +17,8 @@ namespace {
 
 using namespace std::chrono_literals;
 
-constexpr std::int32_t kMessageId = 0; // the only one in either direction
+constexpr std::int32_t kMessageId = 0; // of all that travels in either direction, but for:
+constexpr std::int32_t kLossId = 1;    // how many messages the service dropped before the next one
 constexpr auto kSendTimeout = 1s;
 constexpr auto kReplyTimeout = 1s;
 constexpr std::int32_t kNoPort = -1; // the status of a message for which no port is open
@@ -123,6 +126,30 @@ void KestrumModel::handleMessage(std::int32_t messageId, Bytes payload)
 {
     if (messageId == kMessageId)
         updateWithData(payload);
+    else if (messageId == kLossId)
+        countLost(payload);
+}
+
+// Never a record: the history, the raw records and the DLF stay what the modem sent.
+void KestrumModel::countLost(Bytes payload)
+{
+    const auto low = Record(payload).read(u32(0)), high = Record(payload).read(u32(4));
+    const std::uint64_t count = low && high ? std::uint64_t{*high} << 32 | *low : 0;
+    if (count == 0)
+        return;
+    const auto most = std::numeric_limits<std::uint64_t>::max();
+    _lostMessages = count > most - _lostMessages ? most : _lostMessages + count;
+    // A slow display gets many of these. One task is enough for all that come before it runs.
+    if (std::exchange(_lossPending, true))
+        return;
+    _roles.queue.post([model = weak_from_this()] {
+        const auto self = model.lock();
+        if (!self)
+            return;
+        self->_lossPending = false;
+        if (self->_observer != nullptr)
+            self->_observer->messagesLost();
+    });
 }
 
 void KestrumModel::handleInvalidation(const Port* port)

@@ -46,6 +46,7 @@ public:
     void updateStatus() override;
     /// Another technology's display: nothing that was opened in the old one stays open.
     void displayReplaced() override;
+    void messagesLost() override;
     void willShowViewController(NavigationStack& navigationController, KestrumPaneController& viewController,
                                 bool animated) override;
 

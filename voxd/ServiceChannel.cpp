@@ -3,6 +3,7 @@
 #include "platform/SystemLog.h"
 #include "support/Format.h"
 
+#include <array>
 #include <filesystem>
 #include <utility>
 
@@ -12,7 +13,7 @@ namespace {
 // What the socket is given to keep; the rest waits in the outbox, where whole messages can still be dropped.
 constexpr std::size_t kSocketBytes = 256 << 10;
 constexpr std::size_t kUnsentReplies = 256 << 10;
-constexpr std::int32_t kLogMessage = 0;
+constexpr std::int32_t kLogMessage = 0, kLossMessage = 1;
 
 } // namespace
 
@@ -115,6 +116,7 @@ void ServiceChannel::flush()
         if (_logPort->unsent() >= kSocketBytes)
             return; // `written` goes on
         const auto message = _outbox.take();
+        tellLosses();
         if (!message) {
             if (std::exchange(_dropping, false)) {
                 const std::size_t dropped = _outbox.dropped() - std::exchange(_reportedDrops, _outbox.dropped());
@@ -126,6 +128,18 @@ void ServiceChannel::flush()
         }
         _logPort->send({Frame::Kind::Message, kLogMessage, 0, message->bytes()});
     }
+}
+
+// At its place in the stream: so many messages are missing before the next one.
+void ServiceChannel::tellLosses()
+{
+    const std::uint64_t missing = _outbox.dropped() - std::exchange(_toldDrops, _outbox.dropped());
+    if (missing == 0)
+        return;
+    std::array<std::byte, sizeof missing> payload;
+    for (std::size_t i = 0; i < payload.size(); ++i)
+        payload[i] = static_cast<std::byte>(missing >> (8 * i));
+    _logPort->send({Frame::Kind::Message, kLossMessage, 0, payload});
 }
 
 void ServiceChannel::end()

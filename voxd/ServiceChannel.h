@@ -51,6 +51,7 @@ private:
     void readLogPort();
     void obey(const Frame& frame);
     void flush();
+    void tellLosses();
     void end();
 
     const Host& _host;
@@ -60,7 +61,8 @@ private:
     QTimer _commandTimeout;
     std::optional<Subscription> _subscription; // nothing: not streaming
     Outbox _outbox;
-    std::size_t _reportedDrops = 0;
+    std::size_t _reportedDrops = 0; ///< in the system's log
+    std::size_t _toldDrops = 0;     ///< to the client
     bool _dropping = false;
     bool _ended = false;
 };

@@ -59,6 +59,11 @@ int TextDisplay::run()
     return QCoreApplication::exec();
 }
 
+void TextDisplay::messagesLost()
+{
+    std::cerr << "kestrum-terminal: " << _model->lossNotice() << '\n';
+}
+
 void TextDisplay::updateViewControllerFromModel()
 {
     const auto root = _model->topLevelNodes();

@@ -27,6 +27,7 @@ public:
 private:
     void updateViewControllerFromModel() override;
     void updateStatus() override {}
+    void messagesLost() override;
     void displayReplaced() override {}
 
     ApplicationRoles& _roles;

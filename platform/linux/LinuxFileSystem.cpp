@@ -1,22 +1,16 @@
 #include "platform/linux/LinuxFileSystem.h"
 
+#include "platform/linux/UserDirectories.h"
+
 #include <cstdlib>
 #include <filesystem>
 
 namespace kestrum {
-namespace {
 
-// Empty when it is not set.
-std::string environment(const char* name)
+LinuxFileSystem::LinuxFileSystem()
 {
-    const char* const value = std::getenv(name);
-    return value == nullptr ? std::string() : std::string(value);
-}
-
-} // namespace
-
-LinuxFileSystem::LinuxFileSystem() : _root(environment("KESTRUM_DEVICE_ROOT"))
-{
+    if (const char* const root = std::getenv("KESTRUM_DEVICE_ROOT"))
+        _root = root;
     while (_root.ends_with('/'))
         _root.pop_back();
 }
@@ -31,8 +25,7 @@ std::string LinuxFileSystem::diagnosticLogDirectory() const
 {
     if (!_root.empty())
         return _root + "/var/log/diagnostics";
-    const auto state = environment("XDG_STATE_HOME");
-    return (state.empty() ? environment("HOME") + "/.local/state" : state) + "/kestrum/DiagnosticLogs";
+    return userDirectory("XDG_STATE_HOME", ".local/state") + "/kestrum/DiagnosticLogs";
 }
 
 } // namespace kestrum

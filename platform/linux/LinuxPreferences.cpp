@@ -1,10 +1,11 @@
 #include "platform/linux/LinuxPreferences.h"
 
+#include "platform/linux/UserDirectories.h"
+
 #include <QDBusConnection>
 #include <QDBusMessage>
 #include <QFile>
 #include <QSettings>
-#include <QStandardPaths>
 
 namespace kestrum {
 namespace {
@@ -33,8 +34,8 @@ void LinuxPreferences::setApplicationValue(std::string_view domain, std::string_
 bool LinuxPreferences::synchronize(std::string_view domain)
 {
     const auto pending = _set.extract(std::string(domain));
-    const auto directory = QStandardPaths::writableLocation(QStandardPaths::GenericConfigLocation);
-    QSettings file(directory + "/" + text(domain) + ".ini", QSettings::IniFormat);
+    const auto directory = userDirectory("XDG_CONFIG_HOME", ".config");
+    QSettings file(QFile::decodeName(directory.c_str()) + "/" + text(domain) + ".ini", QSettings::IniFormat);
     if (!pending.empty())
         for (const auto& [key, value] : pending.mapped())
             file.setValue("preferences/" + text(key), value);

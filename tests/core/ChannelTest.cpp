@@ -244,5 +244,62 @@ TEST_F(Channel, RefreshOfADeadChannelInvalidatesOnce)
     EXPECT_EQ(attempts(), 1u);
 }
 
+// What the service says beside the log.
+
+TEST_F(Channel, CountsTheMessagesThatTheServiceDroppedAndTellsOnceForSeveral)
+{
+    using namespace std::string_view_literals;
+    startRunning();
+    stream(display("GSM"));
+    seconds(2);
+    told.clear();
+
+    ports.send(kLogPort, 1, "\x05\0\0\0\0\0\0\0"sv);
+    ports.send(kLogPort, 1, "\x02\0\0\0\x01\0\0\0"sv);
+    queue.run();
+    EXPECT_EQ(model->lostMessages(), (std::uint64_t{1} << 32) + 7);
+    EXPECT_THAT(told, ElementsAre("lost 4294967303"));
+    seconds(2);
+    EXPECT_THAT(told, ElementsAre("lost 4294967303")) << "no record has come";
+
+    ports.send(kLogPort, 1, "\xFF\xFF\xFF\xFF\xFF\xFF\xFF\xFF"sv);
+    queue.run();
+    EXPECT_EQ(model->lostMessages(), std::numeric_limits<std::uint64_t>::max()) << "does not wrap";
+}
+
+TEST_F(Channel, IgnoresALossThatSaysNothingAndMessagesOfOtherIds)
+{
+    using namespace std::string_view_literals;
+    startRunning();
+    ports.send(kLogPort, 1, ""sv);
+    ports.send(kLogPort, 1, "\x05\0\0\0\0\0\0"sv);
+    ports.send(kLogPort, 1, "\0\0\0\0\0\0\0\0"sv);
+    ports.send(kLogPort, 2, "\x05\0\0\0\0\0\0\0"sv);
+    ports.send(kLogPort, -1, "\x05\0\0\0\0\0\0\0"sv);
+    queue.run();
+    EXPECT_EQ(model->lostMessages(), 0u);
+    EXPECT_THAT(told, IsEmpty());
+}
+
+TEST_F(Channel, SaysWhyThereIsNoConnection)
+{
+    EXPECT_EQ(model->connectionProblem(), "");
+    ports.kill(kCommandPort);
+    telephony.why = "no telephony service can be reached";
+    model->startMonitor();
+    EXPECT_EQ(model->connectionProblem(), "no telephony service can be reached");
+
+    telephony.why.clear();
+    serve();
+    replyIs({});
+    seconds(5);
+    EXPECT_EQ(model->connectionProblem(), "the telephony service does not say which technology the modem runs");
+
+    modemRuns("kVoxLogChannelTechnology_IFX");
+    seconds(5);
+    EXPECT_TRUE(model->isConnected());
+    EXPECT_EQ(model->connectionProblem(), "");
+}
+
 } // namespace
 } // namespace kestrum

@@ -90,6 +90,7 @@ private:
     void updateViewControllerFromModel() override { told.push_back("update"); }
     void updateStatus() override { told.push_back("status"); }
     void displayReplaced() override { told.push_back("replaced"); }
+    void messagesLost() override { told.push_back("lost " + std::to_string(model->lostMessages())); }
 };
 
 } // namespace kestrum

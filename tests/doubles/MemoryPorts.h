@@ -189,7 +189,10 @@ public:
         return reachable ? std::make_unique<Connection>(*this, std::move(handler)) : nullptr;
     }
 
+    std::string problem() const override { return why; }
+
     bool reachable = true;
+    std::string why; ///< there is no channel
     LogChannelAnswer answer{0, 0, "vox.commands"};
     /// Runs while a log channel is being created, with the connection's notification handler.
     std::function<void(const NotificationHandler&)> whileCreating;

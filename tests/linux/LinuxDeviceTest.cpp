@@ -11,6 +11,7 @@
 #include "platform/linux/LinuxSystemLog.h"
 #include "platform/linux/RuntimeDirectory.h"
 #include "platform/linux/TerminationSignals.h"
+#include "platform/linux/UserDirectories.h"
 
 #include <QProcess>
 #include <gmock/gmock.h>
@@ -19,6 +20,8 @@
 #include <csignal>
 #include <fstream>
 #include <mutex>
+
+#include <pwd.h>
 
 namespace kestrum {
 namespace {
@@ -85,6 +88,22 @@ TEST(LinuxFileSystem, LooksInTheSystemWithoutADeviceRoot)
     }
     const ScopedVariable state("XDG_STATE_HOME", std::nullopt);
     EXPECT_EQ(LinuxFileSystem().diagnosticLogDirectory(), "/home/x/.local/state/kestrum/DiagnosticLogs");
+}
+
+TEST(UserDirectories, IgnoreRelativePathsAndAMissingHome)
+{
+    const ScopedVariable state("XDG_STATE_HOME", "relative");
+    {
+        const ScopedVariable home("HOME", "/home/x");
+        EXPECT_EQ(userDirectory("XDG_STATE_HOME", ".local/state"), "/home/x/.local/state");
+    }
+    const passwd* const user = ::getpwuid(::geteuid());
+    const std::string own = user != nullptr ? user->pw_dir : "/nonexistent";
+    for (const auto& unusable :
+         {std::optional<std::string>(), std::optional<std::string>(""), std::optional<std::string>("here")}) {
+        const ScopedVariable home("HOME", unusable);
+        EXPECT_EQ(userDirectory("XDG_STATE_HOME", ".local/state"), own + "/.local/state");
+    }
 }
 
 TEST(LinuxBundle, FindsResourcesInItsDirectoriesTheFirstHidingTheLater)
