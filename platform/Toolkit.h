@@ -162,6 +162,8 @@ public:
     /// Left to right. An item equal to the one at its place stays the same object.
     virtual void setToolbarItems(std::vector<ToolbarItem> items, bool animated) = 0;
     virtual void resignFirstResponder() = 0;
+    /// Lines that stand, in muted text, where the rows would be while there are none; empty for nothing.
+    virtual void setHint(std::string_view text) = 0;
 };
 
 /// A single line that the user edits.
@@ -212,6 +214,9 @@ public:
     /// The titles changed, the pane did not.
     virtual void setTitles(std::vector<std::string> titles) = 0;
     virtual void setToolbarHidden(bool hidden) = 0;
+    /// One line that says what was done, over whichever pane is shown, until another text replaces it; empty for
+    /// none. It takes no input.
+    virtual void setNotice(std::string_view text) = 0;
 
     /// A modal screen over the panes, and its end. At most one.
     virtual void present(SaveInterface& screen, bool animated) = 0;

@@ -2,9 +2,9 @@
 
 #include "core/KestrumModelNode.h"
 #include "platform/FileSystem.h"
-#include "platform/MainQueue.h"
 #include "platform/Preferences.h"
 #include "platform/Time.h"
+#include "ui/ConnectionHint.h"
 
 #include <utility>
 
@@ -15,6 +15,7 @@ constexpr std::string_view kInternalInstallMarker =
     "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 constexpr std::string_view kShowGSMRSSI = "HXShowGSMRSSI";
 constexpr std::string_view kConnecting = "Connecting...";
+constexpr std::chrono::seconds kNoticeTime{8}; // to read a path in
 
 } // namespace
 
@@ -45,6 +46,7 @@ void KestrumApp::applicationDidFinishLaunching()
     _navController->setDelegate(this);
     _window->setRoot(_navController->view());
     _window->makeKeyAndVisible();
+    followConnection();
 
     // The first screen is up before anything is opened.
     _roles.queue.post([self = shared_from_this()] {
@@ -57,6 +59,8 @@ void KestrumApp::applicationWillTerminate()
 {
     _setGSMRSSI(false);
     setUpdateMessage(std::nullopt);
+    _unconnected.reset();
+    _noticeEnd.reset();
     _dateFormatter.reset();
     setSaveViewController(nullptr);
     if (_window)
@@ -93,6 +97,17 @@ void KestrumApp::closeSaveView()
     _saveViewController.reset();
 }
 
+void KestrumApp::showNotice(std::string_view text)
+{
+    if (!_navController)
+        return;
+    _navController->view().setNotice(text);
+    _noticeEnd = _roles.queue.repeat(kNoticeTime, [this] {
+        _navController->view().setNotice("");
+        _noticeEnd.reset();
+    });
+}
+
 void KestrumApp::updateStatusForViewController(KestrumPaneController& viewController)
 {
     if (isConnected())
@@ -122,8 +137,21 @@ void KestrumApp::updateViewControllerFromModel()
 
 void KestrumApp::updateStatus()
 {
-    if (_navController)
-        updateStatusForViewController(_navController->topViewController());
+    if (!_navController)
+        return;
+    updateStatusForViewController(_navController->topViewController());
+    followConnection();
+}
+
+void KestrumApp::followConnection()
+{
+    TableScreen& root = _navController->viewControllers().front()->screen();
+    if (!_model || isConnected()) {
+        _unconnected.reset();
+        root.setHint("");
+    } else if (!_unconnected) {
+        _unconnected = _roles.queue.repeat(kConnectionPatience, [&root] { root.setHint(connectionHint()); });
+    }
 }
 
 void KestrumApp::displayReplaced()

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "core/KestrumModel.h"
+#include "platform/MainQueue.h"
 #include "platform/Roles.h"
 #include "platform/Toolkit.h"
 #include "ui/DateFormatter.h"
@@ -37,6 +38,7 @@ public:
 
     void showSaveView() override;
     void closeSaveView() override;
+    void showNotice(std::string_view text) override;
 
     /// Gives the pane the status as it is now.
     void updateStatusForViewController(KestrumPaneController& viewController);
@@ -70,6 +72,8 @@ private:
 
     bool isConnected() const { return _model && _model->isConnected(); }
     void releaseModel();
+    /// Keeps the root pane's hint: there once a connection has been missing for `kConnectionPatience`.
+    void followConnection();
 
     ApplicationRoles& _roles;
     // In this order, so that at the end what borrows goes before what it borrows.
@@ -78,6 +82,8 @@ private:
     std::shared_ptr<KestrumSaveViewController> _saveViewController;
     std::unique_ptr<NavigationStack> _navController;
     std::shared_ptr<Window> _window;
+    std::unique_ptr<Timer> _unconnected; ///< there while no connection is
+    std::unique_ptr<Timer> _noticeEnd;   ///< there while a notice is shown
 
     // The properties have storage of their own. Those for the window and the save screen are only ever cleared, which
     // leaves the window and the save screen in use alone: kept so on purpose.

@@ -81,7 +81,9 @@ void KestrumSaveViewController::savePressed()
     const auto snapshot = makeDictionaryUntilNull(
         {{"Timestamp", dateText(_timeStamp)}, {"Data", _saveHistory}, {"Description", text ? Value(*text) : Value()}});
     const std::string path = snapshotPath(_roles.files, _roles.clock.now());
-    if (!_roles.propertyLists.write(*snapshot, path)) {
+    if (_roles.propertyLists.write(*snapshot, path)) {
+        _application.showNotice("Saved to " + path);
+    } else {
         _roles.log.write(Priority::Error, "Unable to write snapshot to %s", path);
         _roles.toolkit.showAlert("File Error", "Unable to write file to disk", "Close");
     }

@@ -38,6 +38,7 @@ public:
     void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) override;
     void setTitles(std::vector<std::string> titles) override;
     void setToolbarHidden(bool hidden) override;
+    void setNotice(std::string_view) override {}
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 

@@ -15,6 +15,7 @@ public:
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool) override { _toolbar.setItems(std::move(items)); }
     void resignFirstResponder() override { _table.clearFocus(); }
+    void setHint(std::string_view) override {}
 
     Toolbar& toolbar() { return _toolbar; }
 

@@ -26,6 +26,7 @@ public:
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool animated) override;
     void resignFirstResponder() override {} // nothing in a pane is typed into
+    void setHint(std::string_view) override {}
 
     bool isSpinning() const;
     std::string status() const;
@@ -49,6 +50,7 @@ public:
     void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) override;
     void setTitles(std::vector<std::string> titles) override;
     void setToolbarHidden(bool hidden) override;
+    void setNotice(std::string_view) override {}
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 

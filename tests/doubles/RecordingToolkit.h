@@ -244,6 +244,7 @@ public:
         toolbarAnimated = animated;
     }
     void resignFirstResponder() override { ++resigned; }
+    void setHint(std::string_view text) override { hint = text; }
 
     std::string status() const { return std::get<LabelItem>(*toolbar.at(1)).text; }
     bool isLoading() const { return std::get<ActivityIndicatorItem>(*toolbar.at(0)).running; }
@@ -260,6 +261,7 @@ public:
     std::vector<std::shared_ptr<const ToolbarItem>> toolbar; ///< the very objects: an equal item stays the same one
     std::optional<bool> toolbarAnimated;
     int resigned = 0;
+    std::string hint;
 
 private:
     ToolkitRecord& _record;
@@ -311,6 +313,7 @@ public:
     }
     void setTitles(std::vector<std::string> titles) override { path = std::move(titles); }
     void setToolbarHidden(bool hidden) override { toolbarHidden = hidden; }
+    void setNotice(std::string_view text) override { notice = text; }
     void present(SaveInterface& screen, bool animated) override
     {
         ++presentations;
@@ -331,6 +334,7 @@ public:
     std::vector<std::string> path; ///< the titles, root first
     std::vector<std::pair<Transition, bool>> transitions;
     bool toolbarHidden = true;
+    std::string notice;
     RecordingSaveInterface* presented = nullptr;
     int presentations = 0;
     std::optional<bool> presentedAnimated;

@@ -1,6 +1,7 @@
 #include "ui/KestrumApp.h"
 
 #include "doubles/ApplicationDoubles.h"
+#include "ui/ConnectionHint.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -169,6 +170,99 @@ TEST_F(KestrumAppTest, PaneThatIsOpenedOrRevealedShowsTheStatusOfTheMoment)
     EXPECT_EQ(top().title(), "Kestrum");
     EXPECT_EQ(top().status(), "Connecting...");
     EXPECT_TRUE(top().isLoading());
+}
+
+// A connection that does not come
+
+TEST_F(KestrumAppTest, RootPaneSaysAfterTenSecondsWhatItWaitsFor)
+{
+    launch();
+    doubles.queue.advance(9999ms);
+    EXPECT_EQ(top().hint, "");
+    doubles.queue.advance(1ms);
+    EXPECT_EQ(top().hint, connectionHint());
+    EXPECT_EQ(top().status(), "Connecting...") << "the status is as it was";
+    EXPECT_TRUE(top().isLoading());
+    EXPECT_EQ(top().title(), "Kestrum");
+
+    serve();
+    doubles.queue.advance(5s);
+    EXPECT_FALSE(top().isLoading());
+    EXPECT_EQ(top().hint, "");
+}
+
+TEST_F(KestrumAppTest, ConnectionThatComesInTimeLeavesNoHint)
+{
+    launch();
+    doubles.queue.advance(7s);
+    serve();
+    doubles.queue.advance(20s);
+    EXPECT_EQ(top().hint, "");
+}
+
+TEST_F(KestrumAppTest, LostConnectionIsWaitedForTenSecondsAnew)
+{
+    launchConnected();
+    doubles.queue.advance(60s);
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(2s); // the refresh that finds it
+    doubles.queue.advance(9999ms);
+    EXPECT_EQ(top().hint, "");
+    doubles.queue.advance(1ms);
+    EXPECT_EQ(top().hint, connectionHint());
+}
+
+TEST_F(KestrumAppTest, HintIsTheRootPanesWhateverIsOpen)
+{
+    launchConnected();
+    showCells();
+    open("Serving");
+    doubles.ports.kill(kCommands);
+    doubles.queue.advance(20s);
+    EXPECT_EQ(top().hint, "");
+    doubles.toolkit.navigation->pressBack();
+    EXPECT_EQ(top().hint, connectionHint());
+}
+
+TEST_F(KestrumAppTest, EndedApplicationWaitsForNothing)
+{
+    launch();
+    doubles.queue.run();
+    app->applicationWillTerminate();
+    app->updateStatus();
+    EXPECT_EQ(doubles.queue.timers(), 0u);
+}
+
+TEST(ConnectionHintTest, SaysWhatIsMissingAndHowToStartIt)
+{
+    EXPECT_EQ(connectionHint(), "Waiting for the telephony service.\nTo start a simulated one: voxd --scenario lte");
+    EXPECT_EQ(connectionHint("It belongs to another user."),
+              "Waiting for the telephony service.\nIt belongs to another user.\n"
+              "To start a simulated one: voxd --scenario lte");
+}
+
+// Notices
+
+TEST_F(KestrumAppTest, NoticeGoesAwayByItself)
+{
+    launch();
+    app->showNotice("first");
+    doubles.queue.advance(5s);
+    app->showNotice("second");
+    doubles.queue.advance(7999ms);
+    EXPECT_EQ(doubles.toolkit.navigation->notice, "second") << "each has its own time";
+    doubles.queue.advance(1ms);
+    EXPECT_EQ(doubles.toolkit.navigation->notice, "");
+}
+
+TEST_F(KestrumAppTest, NoticeThatIsShownAtTheEndGoesWithTheApplication)
+{
+    launch();
+    app->showNotice("first");
+    app->applicationWillTerminate();
+    app.reset();
+    doubles.queue.advance(10s);
+    EXPECT_EQ(doubles.toolkit.record.windows, 0);
 }
 
 // Panes
@@ -347,6 +441,7 @@ TEST_F(KestrumAppSaveTest, ListsAndWritesTheHistoryOfTheMoment)
     EXPECT_NE(navigation().presented, nullptr) << "the screen is closed after its button has returned";
     doubles.queue.run();
     EXPECT_EQ(navigation().presented, nullptr);
+    EXPECT_EQ(navigation().notice, "Saved to /logs/KestrumSnapshot-1794809148.kestrum");
 
     // 2026-11-16 06:05:48 UTC
     const auto snapshot = file("/logs/KestrumSnapshot-1794809148.kestrum").dictionary();

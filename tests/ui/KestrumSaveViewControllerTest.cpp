@@ -184,6 +184,14 @@ TEST_F(KestrumSaveViewControllerTest, FailedWriteIsLoggedAndTold)
                 ElementsAre(RecordingToolkit::Alert{"File Error", "Unable to write file to disk", "Close"}));
     doubles.queue.run();
     EXPECT_EQ(application.closed, 1);
+    EXPECT_THAT(application.notices, IsEmpty());
+}
+
+TEST_F(KestrumSaveViewControllerTest, SavedSnapshotIsConfirmedWithItsPath)
+{
+    open(makeArray());
+    controller->savePressed();
+    EXPECT_THAT(application.notices, ElementsAre(std::string("Saved to ") + kFirstPath));
 }
 
 TEST_F(KestrumSaveViewControllerTest, SaveClosesAfterItsButtonHasReturned)

@@ -22,9 +22,11 @@ public:
     bool allowSaveButton() const override { return allowed; }
     void showSaveView() override { ++shown; }
     void closeSaveView() override { ++closed; }
+    void showNotice(std::string_view text) override { notices.emplace_back(text); }
 
     bool allowed = false;
     int shown = 0, closed = 0;
+    std::vector<std::string> notices;
 };
 
 using Node = KestrumModelNodeRef;

@@ -1,0 +1,13 @@
+#include "ui/ConnectionHint.h"
+
+namespace kestrum {
+
+std::string connectionHint(std::optional<std::string_view> reason)
+{
+    std::string text = "Waiting for the telephony service.\n";
+    if (reason)
+        text.append(*reason).append("\n");
+    return text + "To start a simulated one: voxd --scenario lte";
+}
+
+} // namespace kestrum
