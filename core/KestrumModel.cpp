@@ -68,7 +68,7 @@ std::string KestrumModel::problemOfAttempt() const
 {
     if (auto problem = _roles.telephony.problem(); !problem.empty())
         return problem;
-    return "the telephony service does not say which technology the modem runs";
+    return _sendPort ? "The telephony service does not say which technology the modem runs." : "";
 }
 
 void KestrumModel::scheduleRetry()

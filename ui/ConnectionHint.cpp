@@ -2,11 +2,11 @@
 
 namespace kestrum {
 
-std::string connectionHint(std::optional<std::string_view> reason)
+std::string connectionHint(std::string_view reason)
 {
     std::string text = "Waiting for the telephony service.\n";
-    if (reason)
-        text.append(*reason).append("\n");
+    if (!reason.empty())
+        text.append(reason).append("\n");
     return text + "To start a simulated one: voxd --scenario lte";
 }
 

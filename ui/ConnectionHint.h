@@ -1,7 +1,6 @@
 #pragma once
 
 #include <chrono>
-#include <optional>
 #include <string>
 #include <string_view>
 
@@ -10,7 +9,7 @@ namespace kestrum {
 /// How long a connection may take before an empty root pane says what is missing.
 inline constexpr std::chrono::seconds kConnectionPatience{10};
 
-/// What the pane says then, in lines: what is waited for, why it does not come where that is known, and what to do.
-std::string connectionHint(std::optional<std::string_view> reason = std::nullopt);
+/// What the pane says then, in lines: what is waited for, why it does not come (a sentence, or nothing), what to do.
+std::string connectionHint(std::string_view reason = {});
 
 } // namespace kestrum

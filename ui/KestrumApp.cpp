@@ -150,7 +150,9 @@ void KestrumApp::followConnection()
         _unconnected.reset();
         root.setHint("");
     } else if (!_unconnected) {
-        _unconnected = _roles.queue.repeat(kConnectionPatience, [&root] { root.setHint(connectionHint()); });
+        _unconnected = _roles.queue.repeat(kConnectionPatience, [this, &root] {
+            root.setHint(connectionHint(_model ? _model->connectionProblem() : ""));
+        });
     }
 }
 
@@ -160,6 +162,11 @@ void KestrumApp::displayReplaced()
         return;
     _navController->popToRootViewController(true);
     _navController->topViewController().reloadWithNode(nullptr);
+}
+
+void KestrumApp::messagesLost()
+{
+    showNotice(_model->lossNotice());
 }
 
 void KestrumApp::releaseModel()

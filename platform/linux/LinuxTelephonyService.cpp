@@ -64,18 +64,24 @@ private:
     std::vector<std::string> _names; // that wait for their turn
 };
 
+std::string ofPorts(const LinuxMessagePorts& ports)
+{
+    return formatted("This display cannot be reached: %s.", ports.problem());
+}
+
 std::string inWords(const LogChannelAnswer& answer)
 {
     if (answer.errorDomain == vox::kSystemErrors)
-        return answer.errorCode == ETIMEDOUT ? "the telephony service does not answer"
-                                             : std::string("the telephony service: ") + std::strerror(answer.errorCode);
+        return answer.errorCode == ETIMEDOUT
+                   ? "The telephony service does not answer."
+                   : formatted("The telephony service fails: %s.", std::strerror(answer.errorCode));
     switch (answer.errorCode) {
     case vox::kTooManyChannels:
-        return "the telephony service has no channel left for this display";
+        return "The telephony service has no channel left for this display.";
     case vox::kNoReceiver:
-        return "the telephony service cannot reach this display";
+        return "The telephony service cannot reach this display.";
     default:
-        return formatted("the telephony service refuses (error %d)", answer.errorCode);
+        return formatted("The telephony service refuses, error %d.", answer.errorCode);
     }
 }
 
@@ -95,7 +101,7 @@ public:
     {
         // Without its port the display would run and hear nothing.
         if (!_ports.isListening(serviceName)) {
-            _problem = _ports.problem();
+            _problem = ofPorts(_ports);
             return {vox::kSystemErrors, ENOTCONN, std::nullopt};
         }
         auto answer = request(vox::addressOfPort(serviceName, ::getpid()));
@@ -164,8 +170,8 @@ std::unique_ptr<VoxServerConnection> LinuxTelephonyService::connect(Notification
 {
     auto connection = FrameConnection::connectTo(_directory + "/" + std::string(vox::kServerPort), kTimeout, _log);
     if (!connection) {
-        _problem = !_ports.problem().empty() ? _ports.problem()
-                                             : formatted("no telephony service can be reached in %s", _directory);
+        _problem = !_ports.problem().empty() ? ofPorts(_ports)
+                                             : formatted("No telephony service can be reached in %s.", _directory);
         return nullptr;
     }
     _problem.clear();

@@ -285,15 +285,15 @@ TEST_F(Channel, SaysWhyThereIsNoConnection)
 {
     EXPECT_EQ(model->connectionProblem(), "");
     ports.kill(kCommandPort);
-    telephony.why = "no telephony service can be reached";
+    telephony.why = "No telephony service can be reached.";
     model->startMonitor();
-    EXPECT_EQ(model->connectionProblem(), "no telephony service can be reached");
+    EXPECT_EQ(model->connectionProblem(), "No telephony service can be reached.");
 
     telephony.why.clear();
     serve();
     replyIs({});
     seconds(5);
-    EXPECT_EQ(model->connectionProblem(), "the telephony service does not say which technology the modem runs");
+    EXPECT_EQ(model->connectionProblem(), "The telephony service does not say which technology the modem runs.");
 
     modemRuns("kVoxLogChannelTechnology_IFX");
     seconds(5);

@@ -262,13 +262,13 @@ TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
         played.join();
         return telephony.problem();
     };
-    EXPECT_EQ(refusedWith(2), "the telephony service has no channel left for this display");
-    EXPECT_EQ(refusedWith(3), "the telephony service cannot reach this display");
-    EXPECT_EQ(refusedWith(77), "the telephony service refuses (error 77)");
+    EXPECT_EQ(refusedWith(2), "The telephony service has no channel left for this display.");
+    EXPECT_EQ(refusedWith(3), "The telephony service cannot reach this display.");
+    EXPECT_EQ(refusedWith(77), "The telephony service refuses, error 77.");
     EXPECT_EQ(refusedWith(0), "");
     listening.close();
     telephony.connect({});
-    EXPECT_EQ(telephony.problem(), "no telephony service can be reached in " + directory.path());
+    EXPECT_EQ(telephony.problem(), "No telephony service can be reached in " + directory.path() + ".");
 }
 
 TEST_F(TelephonyServiceTest, SaysThatTheReceivePortCouldNotBeMade)
@@ -276,7 +276,7 @@ TEST_F(TelephonyServiceTest, SaysThatTheReceivePortCouldNotBeMade)
     EXPECT_FALSE(ports.createLocal("log", [](auto, auto) {}));
     local.reset();
     telephony.connect({})->networkMonitorCreateLogChannel("log");
-    EXPECT_THAT(telephony.problem(), testing::HasSubstr("another process listens at"));
+    EXPECT_THAT(telephony.problem(), testing::StartsWith("This display cannot be reached: another process listens at"));
 }
 
 TEST_F(TelephonyServiceTest, MayBeDestroyedWithinItsNotification)

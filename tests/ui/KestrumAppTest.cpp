@@ -233,6 +233,31 @@ TEST_F(KestrumAppTest, EndedApplicationWaitsForNothing)
     EXPECT_EQ(doubles.queue.timers(), 0u);
 }
 
+TEST_F(KestrumAppTest, HintFollowsTheReasonThatIsKnown)
+{
+    doubles.telephony.reachable = false;
+    doubles.telephony.why = "No telephony service can be reached in /run.";
+    launch();
+    doubles.queue.advance(10s);
+    EXPECT_EQ(top().hint, connectionHint("No telephony service can be reached in /run."));
+    doubles.telephony.why = "The telephony service has no channel left for this display.";
+    doubles.queue.advance(10s);
+    EXPECT_EQ(top().hint, connectionHint("The telephony service has no channel left for this display."));
+}
+
+TEST_F(KestrumAppTest, LostMessagesAreToldInALineThatGoesAway)
+{
+    using namespace std::string_view_literals;
+    launchConnected();
+    showCells();
+    doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 1, "\x11\0\0\0\0\0\0\0"sv);
+    doubles.queue.run();
+    EXPECT_EQ(doubles.toolkit.navigation->notice,
+              "The telephony service dropped 17 messages: this display was too slow for them");
+    doubles.queue.advance(8s);
+    EXPECT_EQ(doubles.toolkit.navigation->notice, "");
+}
+
 TEST(ConnectionHintTest, SaysWhatIsMissingAndHowToStartIt)
 {
     EXPECT_EQ(connectionHint(), "Waiting for the telephony service.\nTo start a simulated one: voxd --scenario lte");
