@@ -7,6 +7,11 @@
 # platform_propertylist, headers <platform/propertylist/...>).
 find_package(Threads REQUIRED)
 
+# Off where people work: a header that a file forgot to include would not be noticed.
+option(KESTRUM_PRECOMPILED "Compile the standard library's headers once" OFF)
+set(standard_headers <algorithm> <array> <chrono> <cmath> <cstdint> <filesystem> <functional> <map> <memory> <optional>
+    <span> <string> <string_view> <variant> <vector>)
+
 function(kestrum_folder name)
     cmake_parse_arguments(arg "" "FOLDER" "USES;SOURCES;LIBRARIES" ${ARGN})
     if(NOT arg_FOLDER)
@@ -29,6 +34,12 @@ function(kestrum_folder name)
         endif()
         target_link_libraries(${name} PUBLIC ${lower})
     endforeach()
+    # Adapters are compiled with their libraries' own options, which a precompiled header would have to share.
+    if(KESTRUM_PRECOMPILED AND name STREQUAL support)
+        target_precompile_headers(support PRIVATE ${standard_headers})
+    elseif(KESTRUM_PRECOMPILED AND NOT arg_LIBRARIES)
+        target_precompile_headers(${name} REUSE_FROM support)
+    endif()
     # Libraries of the adapters stay private: who uses the folder does not see their headers.
     target_link_libraries(${name} PRIVATE ${arg_LIBRARIES})
 endfunction()
