@@ -1,47 +1,95 @@
+# shellcheck shell=bash
 # What the project needs of the system, and how it gets there. Sourced by ./run, ./test and .ci/run.
 
+# shellcheck disable=SC2034  # for those who source this
 readonly run_packages=(
-    g++ cmake ninja-build pkg-config
+    g++ cmake ninja-build
     qt6-base-dev libqt6svg6 fonts-liberation2
     libncurses-dev libexpat1-dev
     libcli11-dev nlohmann-json3-dev
 )
+# shellcheck disable=SC2034
 readonly test_packages=(
-    libgtest-dev libgmock-dev librapidcheck-dev libbenchmark-dev
+    libgtest-dev libgmock-dev librapidcheck-dev
     python3 dbus libvterm-dev
 )
 # To make the package, and to look it over.
+# shellcheck disable=SC2034
 readonly package_packages=(dpkg-dev file lintian desktop-file-utils appstream mandoc systemd)
-readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev git)
+# shellcheck disable=SC2034
+readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev libbenchmark-dev git)
 
-# Installs those of the given packages that are missing.
-install_packages() {
-    if ! command -v apt-get >/dev/null; then
-        echo "Kestrum is set up for Debian 12. Here, please install what these packages hold, then start again" \
-             "with KESTRUM_SKIP_INSTALL=1:" >&2
-        printf '  %s\n' "$@" >&2
-        exit 1
-    fi
-    local missing=()
-    for package in "$@"; do
-        dpkg-query -W -f '${Status}' "$package" 2>/dev/null | grep -q 'install ok installed' || missing+=("$package")
-    done
-    [ ${#missing[@]} -eq 0 ] && return
-    echo "Installing ${#missing[@]} packages: ${missing[*]}" >&2
-    local as_root=()
-    if [ "$(id -u)" -ne 0 ]; then
-        if ! command -v sudo >/dev/null; then
-            echo "These packages are missing, and there is no sudo to install them with:" >&2
-            echo "  apt-get install ${missing[*]}" >&2
-            exit 1
-        fi
-        as_root=(sudo)
-    fi
-    "${as_root[@]}" apt-get update -qq
-    "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get install -qq -y --no-install-recommends "${missing[@]}" \
-        >/dev/null
+fail() { echo "${0##*/}: $*" >&2; exit 1; }
+
+# Whether a line that is rewritten shows there.
+on_terminal() { [ -t 2 ] && [ "${TERM:-dumb}" != dumb ]; }
+
+missing_packages() {
+    # shellcheck disable=SC2016  # dpkg-query puts in the values
+    dpkg-query -W -f '${db:Status-Abbrev} ${Package}\n' "$@" 2>/dev/null | sed -n 's/^ii  *//p' |
+        sort -u | comm -13 - <(printf '%s\n' "$@" | sort -u)
 }
 
+# Apt's output goes to the given log, its progress to a line that is rewritten. It reads to the end whatever signal
+# comes: apt finishes what it unpacks, and dies half-way when its output goes nowhere.
+follow_apt() {
+    trap '' HUP INT TERM
+    local line percent what
+    while IFS= read -r line; do
+        case $line in
+            dlstatus:*|pmstatus:*)
+                IFS=: read -r _ _ percent what <<<"$line"
+                ! on_terminal || printf '\r\e[K%3.0f %%  %.65s' "${percent%.*}" "$what" >&2
+                ;;
+            *) echo "$line" >>"$1" ;;
+        esac
+    done
+    ! on_terminal || printf '\r\e[K' >&2
+}
+
+# One line on what went wrong, and what to do.
+explain_apt() {
+    local log=$1
+    shift
+    grep -h '^E: ' "$log" | sort -u >&2 || true
+    if grep -qE 'No space left|enough free space' "$log"; then
+        fail "the disk is full: make room for 2 GB of packages and their build, then start again"
+    elif grep -qE 'Unable to locate|no installation candidate' "$log" && ! grep -q 'Failed to fetch' "$log"; then
+        fail "this system's package source lacks what Kestrum needs; it is set up for Debian 12 and 13"
+    elif grep -qE 'Failed to fetch|Unable to locate' "$log"; then
+        fail "the package source cannot be reached: look at the network, then start again"
+    fi
+    fail "the packages could not be installed: put right what apt says above, then start again (its output: $log)"
+}
+
+# Installs those of the given packages that are missing. Where none is, it needs no network and no root.
 ensure_packages() {
-    [ -n "${KESTRUM_SKIP_INSTALL:-}" ] || install_packages "$@"
+    [ -z "${KESTRUM_SKIP_INSTALL:-}" ] || return 0
+    if ! command -v apt-get >/dev/null; then
+        printf '  %s\n' "$@" >&2
+        fail "Kestrum is set up for Debian 12 and 13. Here, please install what the packages above hold, then start" \
+             "again with KESTRUM_SKIP_INSTALL=1"
+    fi
+    local missing as_root=() log
+    mapfile -t missing < <(missing_packages "$@")
+    [ ${#missing[@]} -gt 0 ] || return 0
+    if [ "$(id -u)" -ne 0 ]; then
+        as_root=(sudo)
+        if ! command -v sudo >/dev/null || ! sudo true; then
+            echo "  apt-get install --no-install-recommends ${missing[*]}" >&2
+            fail "packages are missing, and installing them needs root: have root run the line above, then start again"
+        fi
+    fi
+    echo "Installing ${#missing[@]} packages and what they need: ${missing[*]}" >&2
+    log=$(mktemp) || fail "no temporary file can be written: is the disk full?"
+    as_root+=(env LC_ALL=C DEBIAN_FRONTEND=noninteractive)
+    # The first mends what an earlier installation left when the machine was switched off. A source that fails to
+    # update may be one that nothing is needed from.
+    {
+        "${as_root[@]}" dpkg --configure -a || true
+        "${as_root[@]}" apt-get update -q -o APT::Status-Fd=1 || true
+        "${as_root[@]}" apt-get install -q -y --fix-broken --no-install-recommends -o APT::Status-Fd=1 \
+            -o DPkg::Lock::Timeout=300 "${missing[@]}"
+    } 2>&1 </dev/null | follow_apt "$log" || explain_apt "$log"
+    rm -f "$log"
 }
