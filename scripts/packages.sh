@@ -51,7 +51,7 @@ follow_apt() {
 explain_apt() {
     local log=$1
     shift
-    grep -h '^E: ' "$log" | sort -u >&2 || true
+    grep -h '^E: ' "$log" | sort -u | tail -n 3 >&2 || true
     if grep -qE 'No space left|enough free space' "$log"; then
         fail "the disk is full: make room for 2 GB of packages and their build, then start again"
     elif grep -qE 'Unable to locate|no installation candidate' "$log" && ! grep -q 'Failed to fetch' "$log"; then
