@@ -20,6 +20,8 @@ kestrum::Toolkit& kestrum::toolkit()
 int main(int argc, char** argv)
 {
     testing::InitGoogleMock(&argc, argv);
+    // A forked copy would wait for threads of Qt that it does not have.
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
     setenv("QT_QPA_PLATFORM", "offscreen", 1);
     const auto toolkit = kestrum::makeQtToolkit();
     made = toolkit.get();

@@ -1,0 +1,51 @@
+// What every test program starts with, and hands on to the programs that it starts: nothing of the machine's settings,
+// the user's or the shell's. Linked into each of them, it runs ahead of main() and of other objects' constructors.
+#include "doubles/Places.h"
+
+#include <csignal>
+#include <cstdlib>
+#include <string>
+#include <string_view>
+#include <sys/stat.h>
+#include <unistd.h>
+#include <vector>
+
+namespace {
+
+/// Where programs and scratch space are, and what steers the test libraries and the sanitizers.
+bool isKept(std::string_view variable)
+{
+    for (const std::string_view kept : {"PATH=", "TMPDIR=", "LD_LIBRARY_PATH=", "GTEST_",
+                                        "RC_PARAMS=", "ASAN_OPTIONS=", "LSAN_OPTIONS=", "UBSAN_OPTIONS="})
+        if (variable.starts_with(kept))
+            return true;
+    return false;
+}
+
+[[gnu::constructor(101)]] void leanOnNothingOfTheHost()
+{
+    std::vector<std::string> kept;
+    for (char** each = environ; *each != nullptr; ++each)
+        if (isKept(*each))
+            kept.emplace_back(*each);
+    ::clearenv();
+    for (const auto& each : kept)
+        ::setenv(each.substr(0, each.find('=')).c_str(), each.c_str() + each.find('=') + 1, 1);
+
+    ::setenv("LC_ALL", "C.UTF-8", 1);
+    ::setenv("TZ", "UTC", 1);
+    ::setenv("HOME", "/nonexistent", 1);
+    ::setenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent/session", 1);
+    ::setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/nonexistent/system", 1);
+    ::setenv("FONTCONFIG_FILE", kestrum::inCheckout("tests/doubles/fonts.conf").c_str(), 1);
+    ::umask(022);
+
+    // A shell's background jobs and nohup start with some of them ignored, which would be handed on.
+    for (const int each : {SIGHUP, SIGINT, SIGQUIT, SIGPIPE, SIGTERM})
+        std::signal(each, SIG_DFL);
+    sigset_t none;
+    sigemptyset(&none);
+    sigprocmask(SIG_SETMASK, &none, nullptr);
+}
+
+} // namespace
