@@ -62,6 +62,7 @@ public:
         QGuiApplication::setDesktopFileName(QStringLiteral("kestrum"));
         QApplication::setWindowIcon(windowIcon());
         installAccessibility();
+        chooseSansSerif();
     }
 
     Rect mainScreenBounds() const override

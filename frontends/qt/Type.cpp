@@ -1,15 +1,57 @@
 #include "frontends/qt/Type.h"
 
+#include <QApplication>
+#include <QFontDatabase>
+#include <QFontInfo>
 #include <QFontMetricsF>
-#include <QGuiApplication>
+#include <QRawFont>
 
 namespace kestrum::qt {
+
+namespace {
+
+const QString kLiberationSans = QStringLiteral("Liberation Sans");
+
+/// Whether the face that stands for the font is a proportional one without serifs.
+bool isSansSerif(const QFont& font)
+{
+    if (QFontInfo(font).fixedPitch())
+        return false;
+    // The PANOSE of the OpenType table OS/2: the serif styles 2 to 10 of Latin text (2) have serifs. Fonts that say
+    // nothing there are given the benefit of the doubt.
+    constexpr qsizetype kFamilyType = 32, kSerifStyle = 33;
+    const QByteArray table = QRawFont::fromFont(font).fontTable("OS/2");
+    return table.size() <= kSerifStyle || table[kFamilyType] != 2 || table[kSerifStyle] < 2 || table[kSerifStyle] > 10;
+}
+
+} // namespace
+
+void chooseSansSerif()
+{
+    if (isSansSerif(QGuiApplication::font()))
+        return;
+    for (const QString& each :
+         QStringList{QStringLiteral("Noto Sans"), QStringLiteral("DejaVu Sans"), kLiberationSans} +
+             QFontDatabase::families()) {
+        QFont font = QGuiApplication::font();
+        font.setFamilies({each});
+        if (QFontDatabase::hasFamily(each) && isSansSerif(font)) {
+            QApplication::setFont(font);
+            return;
+        }
+    }
+}
 
 QFont fontOf(const Font& font)
 {
     QFont result = QGuiApplication::font();
-    if (!font.family.empty())
-        result.setFamilies({QString::fromUtf8(font.family.data(), static_cast<qsizetype>(font.family.size()))});
+    if (!font.family.empty()) {
+        QStringList families{QString::fromUtf8(font.family.data(), static_cast<qsizetype>(font.family.size())),
+                             QFontInfo(result).family()};
+        if (font.family == "Helvetica")
+            families.prepend(kLiberationSans); // as wide on every machine, whatever stands in for Helvetica there
+        result.setFamilies(families);
+    }
     result.setPixelSize(qRound(font.size));
     result.setBold(font.bold);
     return result;

@@ -9,6 +9,10 @@
 /// Text as the window draws and measures it.
 namespace kestrum::qt {
 
+/// Has the window set in a sans-serif face: the desktop's own font where it is one, else one that is installed. A
+/// toolkit without a desktop may well choose a typewriter's. Called once there is an application.
+void chooseSansSerif();
+
 /// The font at its size in points; an empty family is the system's sans.
 QFont fontOf(const Font& font);
 /// Of bars and cards: heavier than the text around it, lighter than a row's key.

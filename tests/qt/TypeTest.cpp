@@ -1,11 +1,19 @@
 #include "QtTest.h"
 
+#include "doubles/Places.h"
+#include "doubles/ScratchDirectory.h"
 #include "frontends/qt/Type.h"
 
+#include <QFontDatabase>
 #include <QFontInfo>
 #include <QFontMetricsF>
 #include <QImage>
 #include <QPainter>
+#include <QProcess>
+
+#include <filesystem>
+#include <fstream>
+#include <stdexcept>
 
 namespace kestrum {
 namespace {
@@ -92,12 +100,117 @@ TEST(Digits, AreEquallyWide)
         EXPECT_EQ(metrics.horizontalAdvance(QLatin1Char(digit)), metrics.horizontalAdvance(u'0')) << digit;
 }
 
+TEST(TheTestsFonts, AreTheInstalledLiberationFontsAlone)
+{
+    // Qt adds generic names to what is there.
+    for (const QString& family : QFontDatabase::families())
+        EXPECT_TRUE(
+            QStringList({"Liberation Mono", "Liberation Sans", "Liberation Serif", "Monospace", "Sans Serif", "Serif"})
+                .contains(family))
+            << family.toStdString();
+}
+
 TEST(Helvetica, IsLiberationSansWhereItIsInstalled)
 {
-    const QString family = QFontInfo(qt::fontOf({"Helvetica", 13})).family();
-    EXPECT_TRUE(family == "Liberation Sans" || family == "Helvetica" || family == "Nimbus Sans" || family == "Arial")
-        << family.toStdString();
+    EXPECT_EQ(QFontInfo(qt::fontOf({"Helvetica", 13})).family(), "Liberation Sans");
 }
+
+/// A machine's fonts, which are Liberation's under the names that the machine has them by.
+struct Machine {
+    const char* name;
+    std::vector<std::pair<const char*, const char*>> fonts; ///< a file of the Liberation fonts, and its name
+    const char* desktops;                                   ///< the family that is the desktop's; null: it names none
+    std::string window, helvetica;                          ///< what they are to be set in
+    friend void PrintTo(const Machine& shown, std::ostream* out) { *out << shown.name; }
+};
+
+class AMachinesWindow : public testing::TestWithParam<Machine> {
+protected:
+    /// The fonts that `tell-fonts` says on that machine.
+    std::string told() const
+    {
+        std::ofstream settings(_scratch.file("fonts.conf"));
+        settings << "<fontconfig>";
+        for (const auto& [face, family] : GetParam().fonts) {
+            const std::filesystem::path folder = _scratch.file(family);
+            std::filesystem::create_directory(folder);
+            std::filesystem::create_symlink(installed(face), folder / "face.ttf");
+            settings << "<dir>" << folder.string() << "</dir><match target='scan'><test name='file' compare='contains'>"
+                     << "<string>/" << family << "/</string></test><edit name='family' mode='assign'><string>" << family
+                     << "</string></edit></match>";
+        }
+        if (GetParam().desktops != nullptr)
+            settings << "<match target='pattern'><edit name='family' mode='append'><string>" << GetParam().desktops
+                     << "</string></edit></match>";
+        settings << "<cachedir>" << _scratch.file("cache") << "</cachedir></fontconfig>";
+        settings.close();
+
+        auto environment = QProcessEnvironment::systemEnvironment();
+        environment.insert("FONTCONFIG_FILE", QString::fromStdString(_scratch.file("fonts.conf")));
+        QProcess program;
+        program.setProcessEnvironment(environment);
+        program.start(QString::fromStdString(builtProgram("tell-fonts")), QStringList());
+        EXPECT_TRUE(program.waitForFinished());
+        return program.readAllStandardOutput().toStdString();
+    }
+
+private:
+    static std::filesystem::path installed(const std::string& face)
+    {
+        for (const char* folder : {"liberation2", "liberation"})
+            if (const auto path = std::filesystem::path("/usr/share/fonts/truetype") / folder / (face + ".ttf");
+                exists(path))
+                return path;
+        throw std::runtime_error("the Liberation fonts are not installed");
+    }
+
+    ScratchDirectory _scratch;
+};
+
+TEST_P(AMachinesWindow, IsSetInASansSerif)
+{
+    const auto& [name, fonts, desktops, window, helvetica] = GetParam();
+    EXPECT_EQ(told(), window + '\n' + window + '\n' + helvetica + '\n');
+}
+
+constexpr const char *kSans = "LiberationSans-Regular", *kSerif = "LiberationSerif-Regular",
+                     *kMono = "LiberationMono-Regular";
+
+INSTANTIATE_TEST_SUITE_P(
+    On, AMachinesWindow,
+    testing::Values(
+        Machine{"ABareMachine",
+                {{kMono, "Liberation Mono"}, {kSans, "Liberation Sans"}, {kSerif, "Liberation Serif"}},
+                nullptr,
+                "Liberation Sans",
+                "Liberation Sans"},
+        Machine{"OneWithBetterFonts",
+                {{kMono, "A Mono"}, {kSans, "DejaVu Sans"}, {kSans, "Liberation Sans"}, {kSans, "Noto Sans"}},
+                "A Mono",
+                "Noto Sans",
+                "Liberation Sans"},
+        Machine{"ADesktopWithAFontOfItsOwn",
+                {{kMono, "A Mono"}, {kSans, "Desktop Sans"}, {kSans, "Liberation Sans"}, {kSans, "Noto Sans"}},
+                "Desktop Sans",
+                "Desktop Sans",
+                "Liberation Sans"},
+        Machine{"ADesktopWithASerif",
+                {{kSerif, "Desktop Serif"}, {kSans, "Liberation Sans"}},
+                "Desktop Serif",
+                "Liberation Sans",
+                "Liberation Sans"},
+        Machine{"ADesktopWithATypewriter",
+                {{kMono, "Desktop Mono"}, {kSans, "Liberation Sans"}},
+                "Desktop Mono",
+                "Liberation Sans",
+                "Liberation Sans"},
+        Machine{"OneWithoutAnyOfTheList",
+                {{kMono, "A Mono"}, {kSerif, "B Serif"}, {kSans, "C Sans"}},
+                "A Mono",
+                "C Sans",
+                "C Sans"},
+        Machine{"OneWithATypewriterAlone", {{kMono, "A Mono"}}, nullptr, "A Mono", "A Mono"}),
+    [](const auto& each) { return std::string(each.param.name); });
 
 TEST(ALabel, CutsWhatWouldPassTheEndOfItsRow)
 {
