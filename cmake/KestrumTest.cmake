@@ -1,6 +1,10 @@
 # One test program for each folder of tests/.
 #
-#   kestrum_test(tests_lte USES loggenerator_lte test_support SOURCES ServingCellMeasurementTest.cpp)
+#   kestrum_test(tests_lte USES loggenerator_lte test_doubles
+#       SOURCES ServingCellMeasurementTest.cpp
+#       WITH_PROPERTY_LISTS LTELogGeneratorTest.cpp)
+#
+# The sources behind WITH_PROPERTY_LISTS are left out of a build that has no platform_propertylist.
 find_package(GTest)
 find_package(rapidcheck REQUIRED)
 
@@ -18,8 +22,12 @@ kestrum_test_options(test_headers)
 # With SHARDS n the tests of a program run as n processes side by side. A processor of ctest is a quarter of a real one
 # (./test says so): a program takes a whole one, each shard of one that WAITS for real time a quarter.
 function(kestrum_test name)
-    cmake_parse_arguments(arg "WAITS" "SHARDS" "USES;SOURCES;LIBRARIES" ${ARGN})
+    cmake_parse_arguments(arg "WAITS" "SHARDS" "USES;SOURCES;WITH_PROPERTY_LISTS;LIBRARIES" ${ARGN})
     add_executable(${name} ${arg_SOURCES})
+    if(arg_WITH_PROPERTY_LISTS AND TARGET platform_propertylist)
+        target_sources(${name} PRIVATE ${arg_WITH_PROPERTY_LISTS})
+        target_link_libraries(${name} PRIVATE platform_propertylist)
+    endif()
     target_link_libraries(${name} PRIVATE ${arg_USES} ${arg_LIBRARIES} test_surroundings test_places GTest::gtest_main)
     kestrum_test_options(${name})
     target_precompile_headers(${name} REUSE_FROM test_headers)
