@@ -185,7 +185,11 @@ private:
 
     std::size_t offset() const
     {
-        const XML_Index index = XML_GetCurrentByteIndex(_parser.get());
+#if XML_MAJOR_VERSION > 2 || XML_MINOR_VERSION >= 9 // where the other name is deprecated
+        const auto index = XML_GetCurrentByteIndex64(_parser.get());
+#else
+        const auto index = XML_GetCurrentByteIndex(_parser.get());
+#endif
         return index < 0 ? 0 : static_cast<std::size_t>(index); // below 0 before the first byte
     }
 
