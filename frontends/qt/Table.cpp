@@ -229,6 +229,7 @@ Cell* Table::cellAt(std::size_t row) const
 std::vector<Cell*> Table::cellsInView() const
 {
     std::vector<Cell*> cells;
+    cells.reserve(_shown.size());
     for (const auto& [row, reusable] : _shown)
         cells.push_back(&cellOf(*reusable));
     return cells;

@@ -200,7 +200,7 @@ void Screen::put(int row, int column, const Glyph& glyph, Style style)
     if (row < 0 || row >= rows() || column < 0 || column + glyph.columns > columns())
         return;
     attr_t attributes = A_NORMAL;
-    short pair = _coloured ? static_cast<short>(style.colour) : 0;
+    short pair = _coloured ? static_cast<short>(style.colour) : short{0};
     if (_dimmed) {
         attributes = A_DIM;
         pair = 0;
