@@ -46,6 +46,7 @@ std::vector<std::string> LinuxBundle::pathsForResourcesOfType(std::string_view t
                 found.emplace(entry.path().filename().string(), entry.path().string());
     }
     std::vector<std::string> paths;
+    paths.reserve(found.size());
     for (const auto& [name, path] : found)
         paths.push_back(path);
     std::ranges::sort(paths);
