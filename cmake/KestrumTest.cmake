@@ -20,9 +20,9 @@ endfunction()
 kestrum_test_options(test_headers)
 
 # With SHARDS n the tests of a program run as n processes side by side. A processor of ctest is a quarter of a real one
-# (./test says so): a program takes a whole one, each shard of one that WAITS for real time a quarter.
+# (./test says so): a program takes a whole one, one that WAITS for real time a quarter.
 function(kestrum_test name)
-    cmake_parse_arguments(arg "WAITS" "SHARDS" "USES;SOURCES;WITH_PROPERTY_LISTS;LIBRARIES" ${ARGN})
+    cmake_parse_arguments(arg "WAITS;MEASURES_MEMORY" "SHARDS" "USES;SOURCES;WITH_PROPERTY_LISTS;LIBRARIES" ${ARGN})
     add_executable(${name} ${arg_SOURCES})
     if(arg_WITH_PROPERTY_LISTS AND TARGET platform_propertylist)
         target_sources(${name} PRIVATE ${arg_WITH_PROPERTY_LISTS})
@@ -31,20 +31,26 @@ function(kestrum_test name)
     target_link_libraries(${name} PRIVATE ${arg_USES} ${arg_LIBRARIES} test_surroundings test_places GTest::gtest_main)
     kestrum_test_options(${name})
     target_precompile_headers(${name} REUSE_FROM test_headers)
-    if(NOT arg_SHARDS)
-        add_test(NAME ${name} COMMAND ${name})
-        set_tests_properties(${name} PROPERTIES TIMEOUT 300 PROCESSORS 4)
-        return()
-    endif()
     set(processors 4)
     if(arg_WAITS)
         set(processors 1)
+    endif()
+    set(environment)
+    if(arg_MEASURES_MEMORY)
+        # Freed blocks which the address sanitizer keeps would count, by default hundreds of MB.
+        set(environment ASAN_OPTIONS=quarantine_size_mb=1:thread_local_quarantine_size_kb=64)
+    endif()
+    # The time limit is for a test that hangs: the slowest takes minutes under the sanitizers on a slow machine.
+    if(NOT arg_SHARDS)
+        add_test(NAME ${name} COMMAND ${name})
+        set_tests_properties(${name} PROPERTIES TIMEOUT 1800 PROCESSORS ${processors} ENVIRONMENT "${environment}")
+        return()
     endif()
     foreach(shard RANGE 1 ${arg_SHARDS})
         math(EXPR index "${shard} - 1")
         add_test(NAME ${name}_${shard} COMMAND ${name})
         # The longest ones start first.
-        set_tests_properties(${name}_${shard} PROPERTIES TIMEOUT 300 PROCESSORS ${processors} COST 100
-            ENVIRONMENT "GTEST_TOTAL_SHARDS=${arg_SHARDS};GTEST_SHARD_INDEX=${index}")
+        set_tests_properties(${name}_${shard} PROPERTIES TIMEOUT 1800 PROCESSORS ${processors} COST 100
+            ENVIRONMENT "GTEST_TOTAL_SHARDS=${arg_SHARDS};GTEST_SHARD_INDEX=${index};${environment}")
     endforeach()
 endfunction()
