@@ -229,6 +229,7 @@ private:
     Value cellChanges()
     {
         std::vector<Value> left;
+        left.reserve(_left.size());
         for (const int identity : _left)
             left.push_back(Value(formatted("0x%04x", static_cast<unsigned>(identity))));
         return makeDictionary({{"_sorted", Value("_sorted")},
