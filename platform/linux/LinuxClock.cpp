@@ -29,7 +29,11 @@ std::string LinuxClock::localText(Date date, std::string_view pattern) const
     // The offset is ours: Qt need not find the same zone as the C library.
     const auto milliseconds = floor<std::chrono::milliseconds>(date).time_since_epoch().count();
     const auto offset = static_cast<int>(zoneAt(date).offset.count());
+#if QT_VERSION >= QT_VERSION_CHECK(6, 5, 0) // newer versions deprecate the other way
+    const auto local = QDateTime::fromMSecsSinceEpoch(milliseconds, QTimeZone::fromSecondsAheadOfUtc(offset));
+#else
     const auto local = QDateTime::fromMSecsSinceEpoch(milliseconds, Qt::OffsetFromUTC, offset);
+#endif
     return QLocale::system()
         .toString(local, QString::fromUtf8(pattern.data(), static_cast<qsizetype>(pattern.size())))
         .toStdString();
