@@ -61,8 +61,10 @@ TEST(LinuxClock, WritesLocalDatesByThePattern)
 TEST(LinuxClock, RunsWithTheSystems)
 {
     const auto before = floor<microseconds>(system_clock::now());
-    EXPECT_GE(LinuxClock().now(), before);
-    EXPECT_LE(LinuxClock().now(), system_clock::now());
+    const auto now = LinuxClock().now();
+    const auto after = system_clock::now();
+    EXPECT_GE(now, before);
+    EXPECT_LE(now, after);
 }
 
 TEST(LinuxFileSystem, LooksUnderTheDeviceRoot)
