@@ -15,8 +15,8 @@ namespace {
 /// Where programs and scratch space are, and what steers the test libraries and the sanitizers.
 bool isKept(std::string_view variable)
 {
-    for (const std::string_view kept : {"PATH=", "TMPDIR=", "LD_LIBRARY_PATH=", "GTEST_",
-                                        "RC_PARAMS=", "ASAN_OPTIONS=", "LSAN_OPTIONS=", "UBSAN_OPTIONS="})
+    for (const std::string_view kept : {"PATH=", "TMPDIR=", "LD_LIBRARY_PATH=", "GTEST_", "RC_PARAMS=", "ASAN_OPTIONS=",
+                                        "LSAN_OPTIONS=", "UBSAN_OPTIONS=", "QT_NO_GLIB="})
         if (variable.starts_with(kept))
             return true;
     return false;
