@@ -30,6 +30,15 @@ std::string_view mark(Accessory accessory)
 
 } // namespace
 
+void TerminalLabel::setText(std::optional<std::string_view> text)
+{
+    if (text)
+        _text = beginning(*text);
+    else
+        _text.reset();
+    _columns = columns(_text.value_or(""));
+}
+
 void TerminalLabel::draw(const Line& line) const
 {
     if (_text)
@@ -38,7 +47,7 @@ void TerminalLabel::draw(const Line& line) const
 
 int TerminalLabel::end() const
 {
-    return column(_frame.x) + (_text ? columns(*_text) : 0);
+    return column(_frame.x) + _columns;
 }
 
 void Subviews::add(std::shared_ptr<View> view)
@@ -72,12 +81,18 @@ const std::string* Subviews::name() const
     return nullptr;
 }
 
-bool Subviews::scrollSideways(int columns)
+int Subviews::sideways() const
 {
-    bool moved = false;
+    int sideways = 0;
+    for (const auto* each : _drawn)
+        sideways = std::max(sideways, each->sideways());
+    return sideways;
+}
+
+void Subviews::setSideways(int columns)
+{
     for (auto* each : _drawn)
-        moved |= each->scrollSideways(columns);
-    return moved;
+        each->setSideways(columns);
 }
 
 int TerminalScrollView::furthest() const
@@ -90,7 +105,7 @@ int TerminalScrollView::furthest() const
 
 void TerminalScrollView::draw(const Line& line) const
 {
-    const int scrolled = std::min(_scrolled, furthest());
+    const int scrolled = sideways();
     auto strip = line.part(column(_frame.x), column(_frame.width), scrolled);
     _content.draw(strip);
     strip.markCut(scrolled > 0, scrolled < furthest());
@@ -101,11 +116,9 @@ int TerminalScrollView::end() const
     return column(_frame.x + _frame.width);
 }
 
-bool TerminalScrollView::scrollSideways(int columns)
+int TerminalScrollView::sideways() const
 {
-    const int before = std::min(_scrolled, furthest());
-    _scrolled = std::clamp(before + columns, 0, furthest());
-    return _scrolled != before;
+    return std::clamp(_scrolled, 0, furthest());
 }
 
 int TerminalCell::contentColumns() const

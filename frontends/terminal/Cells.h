@@ -19,16 +19,17 @@ class Drawn {
 public:
     virtual ~Drawn() = default;
     virtual void draw(const Line& line) const = 0;
-    virtual int end() const = 0;                  ///< the column after its content
-    virtual const std::string* name() const = 0;  ///< the first text in it
-    virtual bool scrollSideways(int columns) = 0; ///< false when it does not move
+    virtual int end() const = 0;                 ///< the column after its content
+    virtual const std::string* name() const = 0; ///< the first text in it
+    virtual int sideways() const = 0;            ///< the columns by which it is moved to the left
+    virtual void setSideways(int columns) = 0;
 };
 
 class TerminalLabel final : public Label, public Drawn {
 public:
     void setFrame(Rect frame) override { _frame = frame; }
     Rect frame() const override { return _frame; }
-    void setText(std::optional<std::string_view> text) override { _text = text; }
+    void setText(std::optional<std::string_view> text) override;
     std::optional<std::string> text() const override { return _text; }
     void setFont(Font font) override { _font = font; }
     Font font() const override { return _font; }
@@ -36,11 +37,13 @@ public:
     void draw(const Line& line) const override;
     int end() const override;
     const std::string* name() const override { return _text ? &*_text : nullptr; }
-    bool scrollSideways(int) override { return false; }
+    int sideways() const override { return 0; }
+    void setSideways(int) override {}
 
 private:
     Rect _frame;
-    std::optional<std::string> _text;
+    std::optional<std::string> _text; // its beginning, where it is longer than anybody scrolls
+    int _columns = 0;                 // of the text
     Font _font = systemFont(15);
 };
 
@@ -51,7 +54,8 @@ public:
     void draw(const Line& line) const;
     int end() const;
     const std::string* name() const;
-    bool scrollSideways(int columns);
+    int sideways() const;
+    void setSideways(int columns);
 
 private:
     std::vector<std::shared_ptr<View>> _views;
@@ -68,7 +72,8 @@ public:
     void draw(const Line& line) const override;
     int end() const override;
     const std::string* name() const override { return _content.name(); }
-    bool scrollSideways(int columns) override;
+    int sideways() const override;
+    void setSideways(int columns) override { _scrolled = columns; }
 
 private:
     int furthest() const;
@@ -92,7 +97,8 @@ public:
     Accessory accessory() const { return _accessory; }
     void setColumns(int columns) { _columns = columns; }
     std::string name() const;
-    bool scrollSideways(int columns) { return _content.scrollSideways(columns); }
+    int sideways() const { return _content.sideways(); }
+    void setSideways(int columns) { _content.setSideways(columns); }
     void draw(const Line& line) const;
 
 private:

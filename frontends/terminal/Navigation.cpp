@@ -73,7 +73,9 @@ void TerminalNavigationView::show(TableScreen& pane, std::vector<std::string> ti
 
 void TerminalNavigationView::setTitles(std::vector<std::string> titles)
 {
-    _titles = std::move(titles);
+    _titles.clear();
+    for (const auto& title : titles)
+        _titles.push_back(beginning(title));
     _repaint.repaintLater();
 }
 
@@ -204,6 +206,7 @@ void TerminalNavigationView::handle(const Input& input)
 void TerminalNavigationView::handleJump(const Input& input)
 {
     auto& table = _pane->table();
+    const auto from = table.find(_jump->from).value_or(_jump->from.row);
     switch (input.key) {
     case Key::Enter:
         _lastJump = _jump->name.text();
@@ -211,7 +214,7 @@ void TerminalNavigationView::handleJump(const Input& input)
         return;
     case Key::Escape:
     case Key::Press:
-        table.choose(_jump->from);
+        table.choose(from);
         _jump.reset();
         return;
     case Key::Backspace:
@@ -225,9 +228,9 @@ void TerminalNavigationView::handleJump(const Input& input)
     }
     if (!_jump->name.handle(input))
         return;
-    _jump->found = table.choose(_jump->name.text(), _jump->from);
+    _jump->found = table.choose(_jump->name.text(), from);
     if (!_jump->found || _jump->name.isEmpty())
-        table.choose(_jump->from);
+        table.choose(from);
 }
 
 void TerminalNavigationView::handlePane(const Input& input)
@@ -288,7 +291,7 @@ void TerminalNavigationView::handleCommand(wchar_t key)
         table.handle({Key::ShiftRight});
         return;
     case L'/':
-        _jump = Jump{{}, table.chosen()};
+        _jump = Jump{{}, table.placeOf(table.chosen())};
         return;
     case L'n':
         if (!_lastJump.empty())

@@ -87,7 +87,7 @@ private:
     /// While a name is typed to jump to.
     struct Jump {
         EditedLine name;
-        std::size_t from; // the row chosen before
+        TerminalTable::Place from; // the row chosen before
         bool found = true;
     };
     std::optional<Jump> _jump;

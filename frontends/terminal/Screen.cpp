@@ -300,9 +300,13 @@ void Line::put(int column, const Glyph& glyph, Style style) const
 
 int Line::put(int column, std::string_view text, Style style) const
 {
-    for (const auto& each : glyphs(text)) {
-        put(_origin + column, each, style);
-        column += each.columns;
+    Glyphs glyphs(text);
+    while (_origin + column <= _end) {
+        const auto each = glyphs.next();
+        if (!each)
+            break;
+        put(_origin + column, *each, style);
+        column += each->columns;
     }
     return column;
 }

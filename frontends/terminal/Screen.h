@@ -117,8 +117,9 @@ public:
     Line chosen() const;
 
     int width() const { return _end - _first; }
-    int put(int column, std::string_view text, Style style = {}) const; ///< the column after the text
-    void putRight(std::string_view text, Style style = {}) const;       ///< against the right edge
+    int put(int column, std::string_view text,
+            Style style = {}) const; ///< the column after the text, as far as it can be seen
+    void putRight(std::string_view text, Style style = {}) const; ///< against the right edge
     void fill(Style style = {}) const;
     /// Marks the ends at which the content goes on.
     void markCut(bool left, bool right) const;

@@ -54,8 +54,11 @@ std::shared_ptr<ReusableCell> TerminalTable::cellFor(std::size_t row)
 
 void TerminalTable::load()
 {
-    if (!_loaded)
+    const bool anew = !_loaded;
+    if (anew) {
         _rows = _source.numberOfRowsInSection(*this, 0);
+        followChosen();
+    }
     if (_chosenInSight && _rows > 0) {
         const auto at = chosen();
         if (at < top())
@@ -64,10 +67,60 @@ void TerminalTable::load()
             _top = at - height() + 1;
     }
     std::map<std::size_t, std::shared_ptr<ReusableCell>> cells;
-    for (std::size_t row = top(); row < std::min(_rows, top() + height()); ++row)
-        cells[row] = _loaded && _cells.contains(row) ? _cells[row] : cellFor(row);
+    for (std::size_t row = top(); row < std::min(_rows, top() + height()); ++row) {
+        if (_loaded && _cells.contains(row)) {
+            cells[row] = _cells[row];
+            continue;
+        }
+        cells[row] = cellFor(row);
+        auto& cell = terminalCell(*cells[row]);
+        const auto moved = _sideways.find(cell.name());
+        cell.setSideways(moved == _sideways.end() ? 0 : moved->second);
+    }
     _cells = std::move(cells);
     _loaded = true;
+    if (anew)
+        rememberChosen();
+}
+
+void TerminalTable::followChosen()
+{
+    if (_rows == 0)
+        return;
+    for (const auto& each : _heirs)
+        if (const auto row = find(each)) {
+            // Rows that come or go above it leave it on its line, unless the table shows its first row.
+            if (top() > 0 && _chosen < top() + height())
+                _top = std::max(*row + _top, _chosen) - _chosen;
+            _chosen = *row;
+            return;
+        }
+}
+
+void TerminalTable::rememberChosen()
+{
+    if (_rows == 0)
+        return;
+    const auto at = chosen();
+    _heirs = {placeOf(at)};
+    if (at + 1 < _rows)
+        _heirs.push_back(placeOf(at + 1));
+    if (at > 0)
+        _heirs.push_back(placeOf(at - 1));
+}
+
+TerminalTable::Place TerminalTable::placeOf(std::size_t row)
+{
+    return {row, nameOf(row)};
+}
+
+std::optional<std::size_t> TerminalTable::find(const Place& place)
+{
+    for (std::size_t distance = 0; distance <= std::max(place.row, _rows); ++distance)
+        for (const auto row : {place.row + distance, place.row - distance}) // one below 0 is far beyond the last
+            if (row < _rows && nameOf(row) == place.name)
+                return row;
+    return std::nullopt;
 }
 
 void TerminalTable::draw(Screen& screen, Area area, bool focused)
@@ -116,21 +169,28 @@ bool TerminalTable::handle(const Input& input)
         return open(chosen());
     case Key::ShiftLeft:
     case Key::ShiftRight:
-        if (const auto cell = _cells.find(chosen()); cell != _cells.end())
-            terminalCell(*cell->second)
-                .scrollSideways(input.key == Key::ShiftLeft ? -kSidewaysColumns : kSidewaysColumns);
+        if (const auto found = _cells.find(chosen()); found != _cells.end()) {
+            auto& cell = terminalCell(*found->second);
+            cell.setSideways(cell.sideways() + (input.key == Key::ShiftLeft ? -kSidewaysColumns : kSidewaysColumns));
+            if (cell.sideways() > 0)
+                _sideways[cell.name()] = cell.sideways();
+            else
+                _sideways.erase(cell.name());
+        }
         _repaint.repaintLater();
         return true;
     case Key::Press:
-        _pressed = _area.holds(input.row, input.column) ? rowAt(input.row) : kNowhere;
-        if (_pressed == kNowhere)
-            return false;
-        choose(_pressed);
-        return true;
+        _pressed.reset();
+        if (const auto row = rowAt(input); row < _rows) {
+            _pressed = placeOf(row);
+            choose(row);
+        }
+        return _pressed.has_value();
     case Key::Release: {
-        const bool same = _area.holds(input.row, input.column) && rowAt(input.row) == _pressed;
-        const auto pressed = std::exchange(_pressed, kNowhere);
-        return same && pressed != kNowhere && open(pressed);
+        // A refresh may have put another row there.
+        const auto pressed = std::exchange(_pressed, std::nullopt);
+        const auto row = rowAt(input);
+        return pressed && row < _rows && find(*pressed) == row && open(row);
     }
     default:
         return false;
@@ -161,6 +221,7 @@ bool TerminalTable::choose(std::string_view part, std::size_t from)
 void TerminalTable::choose(std::size_t row)
 {
     _chosen = row;
+    rememberChosen();
     _chosenInSight = true;
     _repaint.repaintLater();
 }
@@ -184,8 +245,12 @@ std::string TerminalTable::position() const
 
 std::string TerminalTable::nameOf(std::size_t row)
 {
-    const auto inSight = _cells.find(row);
-    return terminalCell(*(inSight == _cells.end() ? cellFor(row) : inSight->second)).name();
+    if (const auto inSight = _cells.find(row); _loaded && inSight != _cells.end())
+        return terminalCell(*inSight->second).name();
+    _offered = _reader;
+    _reader = _source.cellForRowAtIndexPath(*this, {0, row});
+    _offered = nullptr;
+    return terminalCell(*_reader).name();
 }
 
 void TerminalTable::move(std::ptrdiff_t rows)
@@ -204,10 +269,11 @@ void TerminalTable::scroll(std::ptrdiff_t rows)
     _repaint.repaintLater();
 }
 
-std::size_t TerminalTable::rowAt(int line) const
+std::size_t TerminalTable::rowAt(const Input& mouse) const
 {
-    const auto row = top() + static_cast<std::size_t>(line - _area.row);
-    return row < _rows ? row : kNowhere;
+    if (!_area.holds(mouse.row, mouse.column))
+        return kNowhere;
+    return top() + static_cast<std::size_t>(mouse.row - _area.row);
 }
 
 std::size_t TerminalTable::top() const

@@ -9,8 +9,8 @@
 #include <cwctype>
 #include <iterator>
 #include <langinfo.h>
-#include <numeric>
 #include <utility>
+#include <vector>
 
 namespace kestrum {
 
@@ -18,7 +18,9 @@ namespace {
 
 constexpr const char* kLocaleVariables[] = {"LC_ALL", "LC_CTYPE", "LANG"};
 constexpr char32_t kReplacement = 0xFFFD;
-constexpr std::size_t kLongestGlyph = 5; // A cell of the terminal library holds no more.
+constexpr std::size_t kLongestGlyph = 5;     // characters; a cell of the terminal library holds no more
+constexpr std::size_t kLongestCharacter = 4; // bytes
+constexpr std::size_t kMostKept = 16 << 10;  // bytes
 
 // Embeddings, overrides and isolates (Unicode Standard Annex 9) would turn the rest of the line around.
 bool turnsDirection(wchar_t c)
@@ -51,41 +53,71 @@ std::wstring folded(std::string_view text)
     return folded;
 }
 
-int sum(const std::vector<Glyph>& text)
+// Where the character begins in which `at` lies.
+std::size_t characterAt(std::string_view text, std::size_t at)
 {
-    return std::accumulate(text.begin(), text.end(), 0, [](int sum, const Glyph& each) { return sum + each.columns; });
+    const auto isInside = [&](std::size_t i) { return (static_cast<unsigned char>(text[i]) & 0xC0) == 0x80; };
+    for (std::size_t back = 0; back < kLongestCharacter && back < at; ++back)
+        if (!isInside(at - back))
+            return at - back;
+    return at; // no UTF-8 anyway
 }
 
-// The first of `text` in at most `width` columns.
-template <typename Iterator>
-std::pair<Iterator, int> taken(Iterator first, Iterator end, int width)
-{
-    int used = 0;
-    while (first != end && used + first->columns <= width)
-        used += first++->columns;
-    return {first, used};
-}
-
-template <typename Iterator>
-std::wstring joined(Iterator first, Iterator end)
-{
+// What stands in at most so many columns, a wide character less than they could hold.
+struct Piece {
     std::wstring text;
-    for (; first != end; ++first)
-        text += first->text;
-    return text;
+    int columns = 0;
+};
+
+Piece first(std::string_view text, int width)
+{
+    Piece piece;
+    Glyphs glyphs(text);
+    for (auto each = glyphs.next(); each && piece.columns + each->columns <= width; each = glyphs.next()) {
+        piece.text += each->text;
+        piece.columns += each->columns;
+    }
+    return piece;
+}
+
+Piece last(std::string_view text, int width)
+{
+    Piece piece;
+    if (width <= 0)
+        return piece;
+    // All glyphs that may fit, and one more that the cut may have gone through.
+    const auto bytes = kLongestGlyph * kLongestCharacter * static_cast<std::size_t>(width + 1);
+    Glyphs glyphs(bytes < text.size() ? text.substr(characterAt(text, text.size() - bytes)) : text);
+    std::vector<Glyph> all;
+    while (auto each = glyphs.next())
+        all.push_back(std::move(*each));
+    for (auto each = all.rbegin(); each != all.rend() && piece.columns + each->columns <= width; ++each) {
+        piece.text.insert(0, each->text);
+        piece.columns += each->columns;
+    }
+    return piece;
+}
+
+bool fits(std::string_view text, int width)
+{
+    Glyphs glyphs(text);
+    while (width >= 0)
+        if (const auto each = glyphs.next())
+            width -= each->columns;
+        else
+            return true;
+    return false;
 }
 
 // `back` columns at most are kept of the end.
 std::string cut(std::string_view text, int width, int back)
 {
-    const auto all = glyphs(text);
-    if (sum(all) <= width)
+    if (fits(text, width))
         return std::string(text);
     if (width < 1)
         return {};
-    const auto [tail, tailColumns] = taken(all.rbegin(), all.rend(), back);
-    const auto [head, headColumns] = taken(all.begin(), all.end(), width - 1 - tailColumns);
-    return utf8(joined(all.begin(), head) + L'…' + joined(tail.base(), all.end()));
+    const auto tail = last(text, back);
+    return utf8(first(text, width - 1 - tail.columns).text + L'…' + tail.text);
 }
 
 } // namespace
@@ -112,31 +144,52 @@ Charset chooseLocale()
     return known && named ? Charset::Ascii : Charset::Unicode;
 }
 
-std::vector<Glyph> glyphs(std::string_view text)
+wchar_t Glyphs::shownAt(std::size_t& at) const
 {
-    std::vector<Glyph> result;
-    for (const wchar_t each : decoded(text)) {
-        const wchar_t c = shown(each);
-        const int width = wcwidth(c);
-        if (width > 0)
-            result.push_back({{c}, width});
-        else if (result.empty())
-            result.push_back({{L'\u25CC', c}, 1}); // a mark with nothing before it stands on a dotted circle
-        else if (result.back().text.size() < kLongestGlyph)
-            result.back().text += c;
+    return shown(static_cast<wchar_t>(nextCharacter(_text, at).value_or(kReplacement)));
+}
+
+std::optional<Glyph> Glyphs::next()
+{
+    if (_read == _text.size())
+        return std::nullopt;
+    const wchar_t c = shownAt(_read);
+    const int width = wcwidth(c);
+    // A mark with nothing before it stands on a dotted circle.
+    Glyph glyph = width > 0 ? Glyph{{c}, width} : Glyph{{L'\u25CC', c}, 1};
+    const auto isAscii = [&](std::size_t at) { return static_cast<unsigned char>(_text[at]) < 0x80; }; // no mark
+    for (std::size_t at = _read; at < _text.size() && !isAscii(at); _read = at) {
+        const wchar_t mark = shownAt(at);
+        if (wcwidth(mark) > 0)
+            break;
+        if (glyph.text.size() < kLongestGlyph)
+            glyph.text += mark;
     }
-    return result;
+    return glyph;
 }
 
 std::string harmless(std::string_view text)
 {
-    const auto all = glyphs(text);
-    return utf8(joined(all.begin(), all.end()));
+    std::string harmless;
+    harmless.reserve(text.size());
+    for (Glyphs glyphs(text); const auto each = glyphs.next();)
+        harmless += utf8(each->text);
+    return harmless;
 }
 
 int columns(std::string_view text)
 {
-    return sum(glyphs(text));
+    int columns = 0;
+    for (Glyphs glyphs(text); const auto each = glyphs.next();)
+        columns += each->columns;
+    return columns;
+}
+
+std::string beginning(std::string_view text)
+{
+    if (text.size() <= kMostKept)
+        return std::string(text);
+    return std::string(text.substr(0, characterAt(text, kMostKept))) + "…";
 }
 
 std::string cutInTheMiddle(std::string_view text, int width)

@@ -397,6 +397,108 @@ TEST_F(Terminal, ShowsTheValueOfARowThatOpenedBefore)
     expectRow(1, " Changing" + std::string(55, ' ') + "has a value now");
 }
 
+/// A pane whose rows come and go: `rows` are shown one after the other.
+class TerminalRows : public Terminal {
+protected:
+    static std::string list(const std::vector<std::string>& names)
+    {
+        std::string entries = text("_sorted", "_sorted");
+        int number = 100;
+        for (const auto& each : names)
+            entries += dictionary(std::to_string(number++) + ";" + each,
+                                  text("Name", "this is " + each) + text("Number", "1"));
+        return propertyList(entries);
+    }
+    static std::vector<std::string> numbered(const std::string& name, int count)
+    {
+        std::vector<std::string> names;
+        for (int i = 0; i < count; ++i)
+            names.push_back(name + " " + std::to_string(100 + i));
+        return names;
+    }
+    void show(const std::vector<std::string>& before, const std::vector<std::string>& after)
+    {
+        device.serve({list(before), list(after)}, {"--speed", "0.1"}); // the second display comes after 5 s
+        start();
+        expectShown(before.back().substr(0, 4));
+    }
+};
+
+TEST_F(TerminalRows, KeepTheChoiceWhenOneIsInsertedAbove)
+{
+    show({"Neighbours", "State"}, {"Serving", "Neighbours", "State"});
+    expectChosen("Neighbours");
+    expectRow(1, StartsWith(" Serving"));
+    expectRow(2, StartsWith(" Neighbours"));
+    expectChosen("Neighbours");
+    terminal.press(Key::Enter);
+    expectTitle("Kestrum › Neighbours");
+}
+
+TEST_F(TerminalRows, HandTheChoiceToTheirNeighbour)
+{
+    show({"Serving", "Neighbours", "State", "Timers"}, {"Beacon", "Serving", "State", "Timers"});
+    terminal.type("j");
+    expectChosen("Neighbours");
+    expectRow(1, StartsWith(" Beacon"));
+    expectChosen("State");
+}
+
+TEST_F(TerminalRows, HandTheChoiceUpWhenTheLastGoes)
+{
+    show({"Serving", "Neighbours", "State"}, {"Serving", "Neighbours"});
+    terminal.type("G");
+    expectChosen("State");
+    expectGone("State");
+    expectChosen("Neighbours");
+}
+
+TEST_F(TerminalRows, StayOnTheirLinesWhenSomeAreInsertedOutOfSight)
+{
+    auto before = numbered("Row", 60), after = numbered("New", 5);
+    after.insert(after.end(), before.begin(), before.end());
+    show(before, after);
+    terminal.type("/Row 140\r");
+    expectChosen("Row 140");
+    const auto rows = terminal.row(1);
+    const int line = terminal.rowOf("Row 140");
+    expectShown("46/65"); // the new rows are there
+    EXPECT_EQ(terminal.rowOf("Row 140"), line) << terminal.text();
+    EXPECT_EQ(terminal.row(1), rows);
+    expectChosen("Row 140");
+}
+
+TEST_F(TerminalRows, KeepTheirPlaceSideways)
+{
+    const std::string far(90, 'x');
+    const auto row = [&](const std::string& name) { return text(name, "from " + far + " to"); };
+    device.serve({propertyList(row("Long") + row("Other")), propertyList(row("Extra") + row("Long") + row("Other"))},
+                 {"--speed", "0.1"});
+    start();
+    expectShown("Long");
+    terminal.type(">>>>>>>>");
+    expectRow(1, EndsWith("x to"));
+    expectShown("Extra");
+    expectRow(1, StartsWith(" Extra"));
+    expectRow(2, EndsWith("x to"));
+    expectRow(3, StartsWith(" Other"));
+}
+
+TEST_F(Terminal, IsNotHeldUpByValuesOfMegabytes)
+{
+    const std::string huge(7 << 20, 'h');
+    device.serve({propertyList(text("Huge", huge) + text("Other", "1"))});
+    start();
+    expectRow(1, StartsWith(" Huge     hhh"));
+    expectRow(1, EndsWith("…"));
+    terminal.type("jk>>j");
+    expectChosen("Other");
+    expectRow(1, StartsWith("…"));
+    terminal.type("q");
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 0);
+}
+
 class TerminalSave : public Terminal {
 protected:
     void open()

@@ -3,6 +3,11 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
+#include <stdexcept>
+#include <sys/mman.h>
+#include <unistd.h>
+
 namespace kestrum {
 namespace {
 
@@ -53,9 +58,67 @@ TEST_F(TerminalText, DropsMarksThatNoCellCanHold)
     std::string tower = "a";
     for (int i = 0; i < 100; ++i)
         tower += "\xCC\x81";
-    const auto shown = glyphs(tower);
-    ASSERT_EQ(shown.size(), 1u);
-    EXPECT_LE(shown[0].text.size(), 5u);
+    Glyphs glyphs(tower);
+    const auto shown = glyphs.next();
+    ASSERT_TRUE(shown);
+    EXPECT_LE(shown->text.size(), 5u);
+    EXPECT_FALSE(glyphs.next());
+}
+
+/// Megabytes of text of which only the first page may be looked at.
+class MostlyForbiddenText {
+public:
+    MostlyForbiddenText()
+    {
+        void* const memory = ::mmap(nullptr, kSize, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS, -1, 0);
+        if (memory == MAP_FAILED)
+            throw std::runtime_error("no memory");
+        _bytes = static_cast<char*>(memory);
+        std::memset(_bytes, 'a', _page);
+        ::mprotect(_bytes + _page, kSize - _page, PROT_NONE);
+    }
+    ~MostlyForbiddenText() { ::munmap(_bytes, kSize); }
+    MostlyForbiddenText(const MostlyForbiddenText&) = delete;
+    MostlyForbiddenText& operator=(const MostlyForbiddenText&) = delete;
+
+    std::string_view whole() const { return {_bytes, kSize}; }
+
+private:
+    static constexpr std::size_t kSize = 16 << 20;
+    std::size_t _page = static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
+    char* _bytes;
+};
+
+TEST_F(TerminalText, IsLookedAtOnlyAsFarAsItIsShown)
+{
+    const MostlyForbiddenText text;
+    EXPECT_EQ(cutAtTheEnd(text.whole(), 5), "aaaa…");
+    EXPECT_EQ(cutAtTheEnd(text.whole(), 1000).size(), 999 + sizeof("…") - 1);
+    Glyphs glyphs(text.whole());
+    for (int i = 0; i < 1000; ++i)
+        glyphs.next();
+    EXPECT_EQ(glyphs.read(), 1000u);
+}
+
+TEST_F(TerminalText, IsKeptOnlyAsFarAsAnybodyScrolls)
+{
+    EXPECT_EQ(beginning("RSRP"), "RSRP");
+    const std::string most(16 << 10, 'a');
+    EXPECT_EQ(beginning(most), most);
+    EXPECT_EQ(beginning(most + "a"), most + "…");
+    // Cut between characters.
+    EXPECT_EQ(beginning(most.substr(2) + "漢漢"), most.substr(2) + "…");
+    EXPECT_EQ(columns(beginning(std::string(16 << 20, '\xBF'))), (16 << 10) + 1);
+}
+
+TEST_F(TerminalText, KeepsItsEndWhenItIsCutInTheMiddle)
+{
+    std::string towers;
+    for (int i = 0; i < 100; ++i)
+        towers += "a\u0301\u0301\u0301\u0301";
+    towers += "bc";
+    EXPECT_EQ(cutInTheMiddle(towers, 5), towers.substr(0, 18) + "…bc");
+    EXPECT_EQ(cutInTheMiddle("Kestrum › " + std::string(1 << 20, 'x') + "yz", 13), "Kestru…xxxxyz");
 }
 
 TEST_F(TerminalText, IsCutInTheMiddleOrAtItsEnd)
