@@ -183,6 +183,9 @@ public:
     virtual bool textFieldShouldReturn() = 0; ///< Return was pressed in the field
 };
 
+/// What the description field shows while it is empty: ASCII.
+inline constexpr std::string_view kDescriptionPlaceholder = "What was seen, and where";
+
 /// The interface "KestrumSaveViewController": a table of what is saved, a description, Save and Cancel.
 class SaveInterface {
 public:

@@ -12,6 +12,9 @@
 #include <CLI/CLI.hpp>
 #include <QCoreApplication>
 
+#include <cmath>
+#include <csignal>
+#include <cstdlib>
 #include <fstream>
 #include <iostream>
 #include <stdexcept>
@@ -53,6 +56,12 @@ std::ofstream openForWriting(const std::string& path)
     return file;
 }
 
+// CLI11's ranges hold for what compares with nothing.
+std::string notFinite(const std::string& text)
+{
+    return std::isfinite(std::strtod(text.c_str(), nullptr)) ? std::string() : text + " is no finite number";
+}
+
 // The source's first seconds, at once and without a service.
 void writeCapture(Source& source, const Options& options)
 {
@@ -66,6 +75,8 @@ void writeCapture(Source& source, const Options& options)
 
 int serve(QCoreApplication& application, const Options& options)
 {
+    // A log or an output that nobody reads any more stops nothing.
+    std::signal(SIGPIPE, SIG_IGN);
     const TerminationSignals termination([&] { application.quit(); });
     LinuxSystemLog log(standardErrorSink("voxd"));
     const PropertyListCodec lists;
@@ -106,6 +117,7 @@ int main(int argc, char** argv)
     auto* const replay = commands.add_option("--replay", options.replay, "A capture, .kcap or .dlf");
     commands.add_flag("--loop", options.loop, "Begin the capture again at its end")->needs(replay);
     commands.add_option("--speed", options.speed, "Times real time")
+        ->check(notFinite)
         ->check(CLI::Range(0.001, 1e6))
         ->capture_default_str();
     commands.add_option("--seed", options.seed, "Equal seeds give equal scenarios")
@@ -120,7 +132,8 @@ int main(int argc, char** argv)
     auto* const write = commands.add_option("--write", options.write, "Write a capture at once, serve nobody, and end");
     commands.add_option("--seconds", options.seconds, "How much of the source --write writes")
         ->needs(write)
-        ->check(CLI::PositiveNumber)
+        ->check(notFinite)
+        ->check(CLI::Range(0.001, 1e9))
         ->capture_default_str();
     scenario->excludes(replay)->check([](const std::string& name) {
         for (const auto& each : scenarios())

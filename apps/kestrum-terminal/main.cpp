@@ -6,12 +6,16 @@
 #include <CLI/CLI.hpp>
 #include <QCoreApplication>
 
+#include <fcntl.h>
 #include <iostream>
+#include <unistd.h>
 
 using namespace kestrum;
 
 int main(int argc, char** argv)
 {
+    // What the program opens first would take the place of a closed output.
+    const bool hasOutput = fcntl(STDOUT_FILENO, F_GETFD) != -1;
     const auto charset = chooseLocale();
     const QCoreApplication loop(argc, argv);
 
@@ -22,7 +26,7 @@ int main(int argc, char** argv)
     const auto* text = arguments.add_option("--text", refreshes, "Print the tree of the first N refreshes, then end")
                            ->option_text("[N=3]")
                            ->expected(0, 1)
-                           ->check(CLI::PositiveNumber);
+                           ->check(CLI::Range(1, 1'000'000'000));
     try {
         arguments.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
@@ -35,6 +39,10 @@ int main(int argc, char** argv)
         return 1;
     }
 
+    if (*text && !hasOutput) {
+        std::cerr << "kestrum-terminal: standard output is closed\n";
+        return 1;
+    }
     if (refreshes == 0)
         refreshes = kRefreshes;
 
@@ -43,7 +51,7 @@ int main(int argc, char** argv)
     auto roles = device.applicationRoles(toolkit);
     int status = 0;
     if (*text) {
-        status = TextDisplay(roles, std::cout, refreshes).run();
+        status = printDisplay(roles, refreshes);
     } else {
         const auto application = KestrumApp::make(roles);
         status = toolkit.run(*application);

@@ -61,7 +61,7 @@ SaveSheet::SaveSheet(SaveInterfaceOwner& owner)
     _description.setFont(fontOf(systemFont(kTextSize)));
     _description.setFrame(false);
     _description.setTextMargins(-2, 0, -2, 0); // in line with the rows
-    _description.setPlaceholderText(QStringLiteral("Description"));
+    _description.setPlaceholderText(QLatin1String(kDescriptionPlaceholder.data()));
     _description.setAccessibleName(QStringLiteral("Description"));
     _table.setParent(&_card);
     _table.setAccessibleName(QStringLiteral("What is saved"));

@@ -9,8 +9,9 @@ Area drawBox(Screen& screen, int rows, int columns)
 {
     constexpr Style kFrame{.dim = true};
     rows = std::min(rows + 2, screen.rows());
-    columns = std::min(columns + 4, screen.columns());
-    const int top = (screen.rows() - rows) / 2, left = (screen.columns() - columns) / 2;
+    const int width = std::min(screen.columns(), kColumn);
+    columns = std::min(columns + 4, width);
+    const int top = (screen.rows() - rows) / 2, left = (width - columns) / 2;
     for (int row = 0; row < rows; ++row) {
         const Line line(screen, top + row, left, columns);
         const bool first = row == 0, last = row == rows - 1;

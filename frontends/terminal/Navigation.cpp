@@ -39,6 +39,14 @@ void TerminalTableScreen::setToolbarItems(std::vector<ToolbarItem> items, bool)
     _repaint.repaintLater();
 }
 
+void TerminalTableScreen::setHint(std::string_view text)
+{
+    if (text == _hint)
+        return;
+    _hint = text;
+    _repaint.repaintLater();
+}
+
 bool TerminalTableScreen::isSpinning() const
 {
     return std::ranges::any_of(_items, [](const ToolbarItem& each) {
@@ -85,6 +93,12 @@ void TerminalNavigationView::setToolbarHidden(bool hidden)
     _repaint.repaintLater();
 }
 
+void TerminalNavigationView::setNotice(std::string_view text)
+{
+    _notice = text;
+    _repaint.repaintLater();
+}
+
 void TerminalNavigationView::present(SaveInterface& screen, bool)
 {
     _save = static_cast<TerminalSaveInterface*>(&screen);
@@ -107,11 +121,17 @@ void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool
         _save->draw(screen);
         return;
     }
-    const int rows = screen.rows(), columns = screen.columns();
+    const int rows = screen.rows(), columns = std::min(screen.columns(), kColumn);
     _bottom = rows - 1;
     int cursorRow = _bottom, cursorColumn = 0;
+    if (!_notice.empty() && rows > 2)
+        Line(screen, _bottom - 1, 0, columns)
+            .put(kInset, cutInTheMiddle(_notice, columns - 2 * kInset), {.colour = Colour::Accent});
     if (_pane) {
-        _pane->table().draw(screen, {1, 0, std::max(0, rows - 2), columns}, true);
+        const Area area{1, 0, std::max(0, rows - (_notice.empty() ? 2 : 3)), columns};
+        _pane->table().draw(screen, area, true);
+        if (_pane->table().rows() == 0)
+            drawHint(screen, area);
         cursorRow = _pane->table().chosenLine();
     }
     drawTitle({screen, 0, 0, columns});
@@ -130,6 +150,14 @@ void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool
         drawHelp(screen);
     }
     screen.placeCursor(cursorRow, cursorColumn, _jump.has_value());
+}
+
+void TerminalNavigationView::drawHint(Screen& screen, Area area) const
+{
+    int row = area.row + 1;
+    for (const auto& each : wrapped(_pane->hint(), area.columns - 2 * kInset))
+        if (row < area.row + area.rows)
+            Line(screen, row++, 0, area.columns).put(kInset, each, {.dim = true});
 }
 
 void TerminalNavigationView::drawTitle(const Line& line) const

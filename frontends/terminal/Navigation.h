@@ -26,16 +26,17 @@ public:
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool animated) override;
     void resignFirstResponder() override {} // nothing in a pane is typed into
-    void setHint(std::string_view) override {}
+    void setHint(std::string_view text) override;
 
     bool isSpinning() const;
     std::string status() const;
     const SaveItem* saveItem() const;
+    const std::string& hint() const { return _hint; }
 
 private:
     TerminalTable _table;
     Repaint& _repaint;
-    std::string _title;
+    std::string _title, _hint;
     std::vector<ToolbarItem> _items;
 };
 
@@ -50,7 +51,7 @@ public:
     void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) override;
     void setTitles(std::vector<std::string> titles) override;
     void setToolbarHidden(bool hidden) override;
-    void setNotice(std::string_view) override {}
+    void setNotice(std::string_view text) override;
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 
@@ -70,6 +71,7 @@ private:
     void handleJump(const Input& input);
     void handlePane(const Input& input);
     void handleCommand(wchar_t key);
+    void drawHint(Screen& screen, Area area) const;
     void drawTitle(const Line& line) const;
     void drawToolbar(const Line& line, std::string_view spinner);
     void drawHelp(Screen& screen) const;
@@ -80,6 +82,7 @@ private:
     TerminalTableScreen* _pane = nullptr;
     TerminalSaveInterface* _save = nullptr;
     std::vector<std::string> _titles;
+    std::string _notice;
     bool _toolbarHidden = false, _helpShown = false;
     std::vector<Hint> _hints;
     int _bottom = 0; // the toolbar's line

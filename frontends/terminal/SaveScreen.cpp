@@ -16,7 +16,7 @@ int TerminalTextField::draw(const Line& line, bool focused) const
 {
     line.fill({.underlined = true});
     if (_line.isEmpty() && !focused) {
-        line.put(0, "What was seen, and where", {.dim = true, .underlined = true});
+        line.put(0, kDescriptionPlaceholder, {.dim = true, .underlined = true});
         return 0;
     }
     // Before the cursor everything is shown that fits.
@@ -44,7 +44,7 @@ void TerminalSaveInterface::focus(Focus focus)
 
 void TerminalSaveInterface::draw(Screen& screen)
 {
-    const int rows = screen.rows(), columns = screen.columns(), inner = std::max(0, columns - 2 * kInset);
+    const int rows = screen.rows(), columns = std::min(screen.columns(), kColumn), inner = std::max(0, columns - 2 * kInset);
     const Line title(screen, 0, 0, columns);
     title.put(kInset, "Save Snapshot", {.bold = true});
     Line(screen, kFieldRow - 1, 0, columns).put(kInset, "Description", {.dim = _focus != Focus::Description});

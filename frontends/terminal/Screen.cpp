@@ -114,6 +114,8 @@ void Screen::open()
         dup2(nowhere, STDERR_FILENO);
         ::close(nowhere);
     }
+    termios before{};
+    tcgetattr(STDOUT_FILENO, &before);
     initscr();
     cbreak();
     noecho();
@@ -131,6 +133,7 @@ void Screen::open()
     // A press counts at once: waiting for a double click would delay it.
     mouseinterval(0);
     mousemask(BUTTON1_PRESSED | BUTTON1_RELEASED | BUTTON4_PRESSED | BUTTON5_PRESSED, nullptr);
+    _crashSignals.emplace(before);
     _open = true;
 }
 
@@ -140,6 +143,7 @@ void Screen::close()
         return;
     if (!_suspended)
         endwin();
+    _crashSignals.reset();
     _open = false;
     if (_standardError >= 0) {
         dup2(_standardError, STDERR_FILENO);

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "frontends/terminal/CrashSignals.h"
 #include "frontends/terminal/Text.h"
 
 #include <optional>
@@ -16,6 +17,9 @@ struct Style {
     bool bold = false, dim = false, underlined = false, reverse = false;
     Colour colour = Colour::Plain;
 };
+
+/// Rows and bars keep to a column of at most this width: a value far from its key is hard to read.
+inline constexpr int kColumn = 80;
 
 /// A rectangle of the screen, in cells.
 struct Area {
@@ -102,6 +106,7 @@ private:
     } _cursor;
     std::vector<Input> _mouse; // the last first
     int _standardError = -1;   // where it went before the screen was opened
+    std::optional<CrashSignals> _crashSignals;
 };
 
 /// A stretch of one line of the screen. What does not lie in it is not shown.

@@ -5,6 +5,7 @@
 #include <fcntl.h>
 #include <system_error>
 #include <unistd.h>
+#include <utility>
 
 namespace kestrum {
 
@@ -24,25 +25,21 @@ void note(int signal)
 
 } // namespace
 
-Signals::Signals()
+Signals::Signals(std::vector<int> signals) : _signals(std::move(signals)), _before(_signals.size())
 {
     if (pipe2(wakeUp, O_CLOEXEC | O_NONBLOCK) != 0)
         throw std::system_error(errno, std::generic_category(), "pipe");
     struct sigaction action {};
     action.sa_handler = note;
     action.sa_flags = SA_RESTART;
-    for (std::size_t i = 0; i < kSignals.size(); ++i)
-        sigaction(kSignals[i], &action, &_before[i]);
-    // Giving the terminal back must not stop a process that is in the background by then.
-    action.sa_handler = SIG_IGN;
-    sigaction(SIGTTOU, &action, &_ttouBefore);
+    for (std::size_t i = 0; i < _signals.size(); ++i)
+        sigaction(_signals[i], &action, &_before[i]);
 }
 
 Signals::~Signals()
 {
-    for (std::size_t i = 0; i < kSignals.size(); ++i)
-        sigaction(kSignals[i], &_before[i], nullptr);
-    sigaction(SIGTTOU, &_ttouBefore, nullptr);
+    for (std::size_t i = 0; i < _signals.size(); ++i)
+        sigaction(_signals[i], &_before[i], nullptr);
     close(wakeUp[0]);
     close(wakeUp[1]);
 }
@@ -58,7 +55,7 @@ std::vector<int> Signals::taken()
     while (read(wakeUp[0], bytes, sizeof bytes) > 0) {
     }
     std::vector<int> signals;
-    for (const int each : kSignals)
+    for (const int each : _signals)
         if (arrived[each]) {
             arrived[each] = 0;
             signals.push_back(each);

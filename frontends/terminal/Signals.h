@@ -1,6 +1,5 @@
 #pragma once
 
-#include <array>
 #include <csignal>
 #include <vector>
 
@@ -10,7 +9,7 @@ namespace kestrum {
 /// One object at a time; its end puts the old handlers back.
 class Signals {
 public:
-    Signals();
+    explicit Signals(std::vector<int> signals);
     ~Signals();
     Signals(const Signals&) = delete;
     Signals& operator=(const Signals&) = delete;
@@ -20,9 +19,8 @@ public:
     std::vector<int> taken();
 
 private:
-    static constexpr std::array kSignals = {SIGTERM, SIGHUP, SIGINT, SIGQUIT, SIGTSTP, SIGCONT, SIGWINCH};
-    std::array<struct sigaction, kSignals.size()> _before;
-    struct sigaction _ttouBefore;
+    std::vector<int> _signals;
+    std::vector<struct sigaction> _before;
 };
 
 } // namespace kestrum

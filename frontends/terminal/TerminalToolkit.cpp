@@ -18,6 +18,7 @@
 #include <csignal>
 #include <deque>
 #include <unistd.h>
+#include <vector>
 
 namespace kestrum {
 
@@ -253,7 +254,10 @@ void TerminalToolkit::showAlert(std::string_view title, std::string_view message
 int TerminalToolkit::run(ApplicationDelegate& application)
 {
     auto& parts = *_parts;
-    parts.signals.emplace(); // before the terminal library looks which ones are taken care of
+    // Before the terminal library looks which ones are taken care of.
+    parts.signals.emplace(std::vector{SIGTERM, SIGHUP, SIGINT, SIGQUIT, SIGTSTP, SIGCONT, SIGWINCH});
+    // Giving the terminal back must not stop a process that is in the background by then.
+    std::signal(SIGTTOU, SIG_IGN);
     parts.signalled = std::make_unique<QSocketNotifier>(parts.signals->descriptor(), QSocketNotifier::Read);
     QObject::connect(parts.signalled.get(), &QSocketNotifier::activated, [&parts] { parts.takeSignals(); });
     parts.input = std::make_unique<QSocketNotifier>(STDIN_FILENO, QSocketNotifier::Read);
@@ -267,6 +271,7 @@ int TerminalToolkit::run(ApplicationDelegate& application)
     parts.input.reset();
     parts.signalled.reset();
     parts.signals.reset();
+    std::signal(SIGTTOU, SIG_DFL);
     return status;
 }
 

@@ -189,7 +189,7 @@ std::string beginning(std::string_view text)
 {
     if (text.size() <= kMostKept)
         return std::string(text);
-    return std::string(text.substr(0, characterAt(text, kMostKept))) + "…";
+    return std::string(text.substr(0, characterAt(text, kMostKept))).append("…");
 }
 
 std::string cutInTheMiddle(std::string_view text, int width)
@@ -200,6 +200,25 @@ std::string cutInTheMiddle(std::string_view text, int width)
 std::string cutAtTheEnd(std::string_view text, int width)
 {
     return cut(text, width, 0);
+}
+
+std::vector<std::string> wrapped(std::string_view text, int width)
+{
+    std::vector<std::string> lines;
+    while (!text.empty()) {
+        const auto end = std::min(text.find('\n'), text.size());
+        std::string line;
+        for (auto rest = text.substr(0, end); !rest.empty();) {
+            const auto word = rest.substr(0, rest.find(' '));
+            if (!line.empty() && columns(line) + 1 + columns(word) > width)
+                lines.push_back(std::exchange(line, {}));
+            line.append(line.empty() ? "" : " ").append(word);
+            rest.remove_prefix(std::min(word.size() + 1, rest.size()));
+        }
+        lines.push_back(line);
+        text.remove_prefix(std::min(end + 1, text.size()));
+    }
+    return lines;
 }
 
 bool contains(std::string_view whole, std::string_view part)

@@ -4,6 +4,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <vector>
 
 /// Text as a terminal shows it. Widths come from wcwidth(3), so the process runs in a UTF-8 locale.
 namespace kestrum {
@@ -52,6 +53,9 @@ std::string beginning(std::string_view text);
 /// `text` in at most `width` columns, its middle or its end left out ("…") when it is longer.
 std::string cutInTheMiddle(std::string_view text, int width);
 std::string cutAtTheEnd(std::string_view text, int width);
+
+/// The lines of `text`, broken at blanks so that each has at most `width` columns; a longer word stays whole.
+std::vector<std::string> wrapped(std::string_view text, int width);
 
 /// Whether `part` occurs in `whole`, upper and lower case alike.
 bool contains(std::string_view whole, std::string_view part);

@@ -1,13 +1,20 @@
 #include "frontends/terminal/TextDisplay.h"
 
+#include "frontends/terminal/Signals.h"
 #include "frontends/terminal/Text.h"
 #include "platform/MainQueue.h"
 #include "platform/Time.h"
+#include "support/Format.h"
 
 #include <QCoreApplication>
+#include <QSocketNotifier>
 
+#include <cerrno>
 #include <chrono>
+#include <csignal>
+#include <cstring>
 #include <iostream>
+#include <utility>
 
 namespace kestrum {
 
@@ -15,7 +22,7 @@ namespace {
 
 using namespace std::chrono_literals;
 
-constexpr auto kPatience = 30s;
+constexpr std::chrono::duration<int> kPatience = 30s;
 
 void append(std::string& text, const KestrumModelNode& node, std::size_t depth)
 {
@@ -37,8 +44,12 @@ std::string treeText(const KestrumModelNode& node)
     return text;
 }
 
-TextDisplay::TextDisplay(ApplicationRoles& roles, std::ostream& out, int refreshes)
-    : _roles(roles), _out(out), _refreshes(refreshes), _model(std::make_shared<KestrumModel>(roles))
+TextDisplay::TextDisplay(MonitorRoles& roles, std::ostream& out, int refreshes, End end)
+    : _roles(roles),
+      _out(out),
+      _refreshes(refreshes),
+      _end(std::move(end)),
+      _model(std::make_shared<KestrumModel>(roles))
 {
     _model->setObserver(this);
 }
@@ -49,14 +60,23 @@ TextDisplay::~TextDisplay()
     _model->destroyPorts();
 }
 
-int TextDisplay::run()
+void TextDisplay::start()
 {
+    awaitData();
     _roles.queue.post([model = _model] { model->restartMonitor(); });
-    _roles.queue.post(kPatience, [] {
-        std::cerr << "kestrum-terminal: the telephony service sent too little within 30 s\n";
-        QCoreApplication::exit(1);
-    });
-    return QCoreApplication::exec();
+}
+
+void TextDisplay::awaitData()
+{
+    _patience = _roles.queue.repeat(
+        kPatience, [this] { end(1, formatted("the telephony service sent nothing for %d s", kPatience.count())); });
+}
+
+void TextDisplay::end(int status, const std::string& why)
+{
+    _refreshes = 0;
+    if (const auto tell = std::exchange(_end, nullptr))
+        tell(status, why);
 }
 
 void TextDisplay::messagesLost()
@@ -69,10 +89,36 @@ void TextDisplay::updateViewControllerFromModel()
     const auto root = _model->topLevelNodes();
     if (!root || _refreshes < 1)
         return;
+    awaitData();
+    errno = 0;
     _out << _roles.clock.localText(_roles.clock.now(), "'Updated' yyyy-MM-dd 'at' HH:mm:ss") << '\n'
          << treeText(*root) << std::endl;
-    if (--_refreshes == 0 || !_out)
-        QCoreApplication::quit();
+    if (!_out && errno != EPIPE)
+        end(1, formatted("standard output: %s", std::strerror(errno)));
+    else if (!_out || --_refreshes == 0) // with its reader gone, nobody wants the rest
+        end(0);
+}
+
+int printDisplay(MonitorRoles& roles, int refreshes)
+{
+    std::signal(SIGPIPE, SIG_IGN); // a reader that goes away is told by the write
+    int endedBy = 0;
+    Signals signals({SIGTERM, SIGHUP, SIGINT});
+    QSocketNotifier signalled(signals.descriptor(), QSocketNotifier::Read);
+    QObject::connect(&signalled, &QSocketNotifier::activated, [&] {
+        for (const int each : signals.taken())
+            endedBy = each;
+        if (endedBy != 0)
+            QCoreApplication::quit();
+    });
+    TextDisplay display(roles, std::cout, refreshes, [](int status, const std::string& why) {
+        if (!why.empty())
+            std::cerr << "kestrum-terminal: " << why << '\n';
+        QCoreApplication::exit(status);
+    });
+    display.start();
+    const int status = QCoreApplication::exec();
+    return endedBy == 0 ? status : 128 + endedBy;
 }
 
 } // namespace kestrum

@@ -3,6 +3,7 @@
 #include "core/KestrumModel.h"
 #include "platform/Roles.h"
 
+#include <functional>
 #include <iosfwd>
 #include <memory>
 #include <string>
@@ -16,24 +17,35 @@ std::string treeText(const KestrumModelNode& node);
 /// shows that the modem is heard, and what it says.
 class TextDisplay final : private KestrumModelObserver {
 public:
+    /// How it ended: an exit status, and for standard error why it is not 0.
+    using End = std::function<void(int status, const std::string& why)>;
+
     /// Writes to `out` after each of that many refreshes. The roles and the stream outlive it.
-    TextDisplay(ApplicationRoles& roles, std::ostream& out, int refreshes);
+    TextDisplay(MonitorRoles& roles, std::ostream& out, int refreshes, End end);
     ~TextDisplay() override;
 
-    /// Connects, and runs the main loop until all has been written: the program's exit status, 0. Says on standard error
-    /// why it is 1 when that takes longer than half a minute.
-    int run();
+    /// Connects. `end` is called once: with 0 when all has been written or the reader has gone, with 1 when nothing came
+    /// for half a minute, or it cannot be written.
+    void start();
 
 private:
     void updateViewControllerFromModel() override;
     void updateStatus() override {}
     void messagesLost() override;
     void displayReplaced() override {}
+    void awaitData();
+    void end(int status, const std::string& why = {});
 
-    ApplicationRoles& _roles;
+    MonitorRoles& _roles;
     std::ostream& _out;
     int _refreshes;
+    End _end;
     std::shared_ptr<KestrumModel> _model;
+    std::unique_ptr<Timer> _patience;
 };
+
+/// The program that prints the display to standard output: runs the main loop, which must exist, and gives the exit
+/// status. A signal that ends it leaves nothing behind; the status is then 128 and its number.
+int printDisplay(MonitorRoles& roles, int refreshes);
 
 } // namespace kestrum

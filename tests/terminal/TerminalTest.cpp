@@ -345,7 +345,7 @@ TEST_F(Terminal, FollowsTheTerminalsSize)
     expectRow(49, StartsWith(" Updated"));
     expectChosen("Cell 20");
     expectRow(1, StartsWith(" Cell 00"));
-    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().size() == 131; })) << terminal.text();
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().size() == 79; })) << terminal.text();
 }
 
 TEST_F(Terminal, BearsTheSmallestSizes)

@@ -17,25 +17,32 @@ struct Outcome {
     std::string output, errors;
 };
 
-/// The program between pipes, with neither terminal nor display server.
-Outcome run(const Demonstration& device, const std::string& arguments)
+/// What a shell's command writes to standard output, and its status.
+Outcome runShell(const std::string& shell)
+{
+    Outcome outcome{};
+    auto* pipe = popen(shell.c_str(), "r");
+    for (int c; (c = std::fgetc(pipe)) != EOF;)
+        outcome.output += static_cast<char>(c);
+    outcome.status = WEXITSTATUS(pclose(pipe));
+    return outcome;
+}
+
+std::string command(const Demonstration& device, const std::string& arguments)
 {
     std::string command = "env";
     for (const auto& [name, value] : device.environment())
         command += " " + name + "='" + value + "'";
-    command += " '" + builtProgram("kestrum-terminal") + "' " + arguments + " </dev/null";
-    const auto output = [](const std::string& shell, int& status) {
-        std::string text;
-        auto* pipe = popen(shell.c_str(), "r");
-        for (int c; (c = std::fgetc(pipe)) != EOF;)
-            text += static_cast<char>(c);
-        status = WEXITSTATUS(pclose(pipe));
-        return text;
-    };
-    Outcome outcome;
-    const auto all = output(command + " 2>&1 >/dev/null", outcome.status);
-    outcome.errors = all;
-    outcome.output = outcome.status == 0 ? output(command + " 2>/dev/null", outcome.status) : std::string();
+    return command + " '" + builtProgram("kestrum-terminal") + "' " + arguments + " </dev/null";
+}
+
+/// The program between pipes, with neither terminal nor display server.
+Outcome run(const Demonstration& device, const std::string& arguments)
+{
+    auto outcome = runShell(command(device, arguments) + " 2>&1 >/dev/null");
+    outcome.errors = std::exchange(outcome.output, {});
+    if (outcome.status == 0)
+        outcome.output = runShell(command(device, arguments) + " 2>/dev/null").output;
     return outcome;
 }
 
@@ -85,13 +92,102 @@ TEST(TextMode, IsNamedWhereThereIsNoTerminal)
               "kestrum-terminal: standard input and output are no terminal; --text prints without one\n");
 }
 
-TEST(TextMode, RefusesWhatIsNoNumberOfRefreshes)
+TEST(TextMode, RefusesWhatItDoesNotKnowByItsName)
 {
-    EXPECT_EQ(run(Demonstration(), "--text 0").status, 2);
-    EXPECT_EQ(run(Demonstration(), "--text soon").status, 2);
-    EXPECT_EQ(run(Demonstration(), "--window").status, 2);
+    const auto expectRefused = [](const std::string& arguments, const std::string& named) {
+        const auto outcome = run(Demonstration(), arguments);
+        EXPECT_EQ(outcome.status, 2);
+        EXPECT_THAT(outcome.errors, testing::HasSubstr(named));
+        EXPECT_LE(outcome.errors.size(), 120u) << outcome.errors;
+    };
+    expectRefused("--text 0", "--text: Value 0 not in range");
+    expectRefused("--text soon", "--text: Value soon not in range");
+    expectRefused("--text -3", "--text: Value -3 not in range");
+    expectRefused("--window", "--window");
+    expectRefused("lte", "lte");
 }
 
+TEST(TextMode, SaysThatItsOutputCannotBeWritten)
+{
+    Demonstration device;
+    device.serve({kDisplay});
+    const auto full = runShell("exec 2>&1; " + command(device, "--text") + " >/dev/full");
+    EXPECT_EQ(full.status, 1);
+    EXPECT_EQ(full.output, "kestrum-terminal: standard output: No space left on device\n");
+    const auto closed = runShell("exec 3>&1; " + command(device, "--text") + " 2>&3 >&-");
+    EXPECT_EQ(closed.status, 1);
+    EXPECT_EQ(closed.output, "kestrum-terminal: standard output is closed\n");
+}
+
+TEST(TextMode, EndsQuietlyWhenItsReaderHasGone)
+{
+    Demonstration device;
+    device.serve({kDisplay});
+    // The pipe's reader has gone before the first tree is written.
+    const auto outcome = runShell("{ { " + command(device, "--text 1000") + "; } 2>&3 | true; } 3>&1");
+    EXPECT_EQ(outcome.output, "");
+    EXPECT_TRUE(std::filesystem::is_empty(device.sockets()) || device.socketsOfDisplays() == 0);
+}
+
+TEST(TextMode, LeavesNoSocketBehindWhateverEndsIt)
+{
+    Demonstration device;
+    device.serve({kDisplay});
+    for (const int signal : {SIGTERM, SIGINT, SIGHUP}) {
+        Pseudoterminal terminal(24, 80);
+        terminal.start("kestrum-terminal", {"--text", "1000"}, device.environment());
+        ASSERT_TRUE(terminal.waitFor("Kestrum")) << terminal.text();
+        EXPECT_EQ(device.socketsOfDisplays(), 1u);
+        terminal.signal(signal);
+        ASSERT_TRUE(terminal.waitForEnd());
+        EXPECT_EQ(terminal.exitStatus(), 128 + signal);
+        EXPECT_EQ(device.socketsOfDisplays(), 0u);
+    }
+}
+
+/// The display as text on a virtual clock, heard by the test.
+class PatientText : public testing::Test {
+protected:
+    PatientText()
+    {
+        doubles.ports.serve("vox.commands", [](const auto&) { return MemoryPorts::Answer{}; });
+        display.start();
+        doubles.queue.run();
+    }
+    void advance(int seconds) { doubles.queue.advance(std::chrono::seconds(seconds)); }
+
+    MonitorDoubles doubles;
+    std::ostringstream out;
+    std::optional<int> status;
+    std::string why;
+    TextDisplay display{doubles.monitorRoles, out, 16, [this](int ended, const std::string& reason) {
+                            status = ended;
+                            why = reason;
+                        }};
+};
+
+TEST_F(PatientText, GivesUpWhenNothingComes)
+{
+    advance(29);
+    EXPECT_FALSE(status);
+    advance(1);
+    EXPECT_EQ(status, 1);
+    EXPECT_EQ(why, "the telephony service sent nothing for 30 s");
+}
+
+TEST(TextMode, SaysItsVersion)
+{
+    EXPECT_EQ(run(Demonstration(), "--version").output.find("kestrum-terminal "), 0u);
+}
+
+TEST(TextMode, ShowsAnEmptyTreeAsItsTitle)
+{
+    PathDictionary paths;
+    EXPECT_EQ(treeText(*KestrumModelNode::makeTreeFromObject(Value(), paths)), "Kestrum: (unknown)\n");
+}
+
+} // namespace
+} // namespace kestrum
 TEST(TextMode, SaysItsVersion)
 {
     EXPECT_EQ(run(Demonstration(), "--version").output.find("kestrum-terminal "), 0u);

@@ -1,0 +1,86 @@
+#include "frontends/terminal/CrashSignals.h"
+
+#include <array>
+#include <csignal>
+#include <cstddef>
+#include <unistd.h>
+
+// The second header names macros like `columns`.
+#include <curses.h>
+#include <term.h>
+
+namespace kestrum {
+
+namespace {
+
+constexpr std::array kSignals = {SIGSEGV, SIGABRT, SIGBUS, SIGFPE, SIGILL};
+
+// All that the handler needs is ready before it runs: in a crash neither memory nor the terminal library can be trusted.
+termios modes;
+std::array<char, 512> farewell;
+std::size_t farewellBytes = 0;
+std::array<struct sigaction, kSignals.size()> before;
+alignas(std::max_align_t) std::array<std::byte, 64 << 10> stack; // of the handler: the program's may have run over
+
+void giveBack(int signal)
+{
+    tcsetattr(STDOUT_FILENO, TCSANOW, &modes);
+    [[maybe_unused]] const auto written = write(STDOUT_FILENO, farewell.data(), farewellBytes);
+    for (std::size_t i = 0; i < kSignals.size(); ++i)
+        sigaction(kSignals[i], &before[i], nullptr);
+    raise(signal); // it waits until this handler returns, and then does what it did before
+}
+
+void add(const char* capability)
+{
+    // The library's own mark of a capability that is no string is -1.
+    if (capability == nullptr || capability == reinterpret_cast<const char*>(-1))
+        return;
+    tputs(capability, 1, [](int byte) {
+        if (farewellBytes < farewell.size())
+            farewell[farewellBytes++] = static_cast<char>(byte);
+        return byte;
+    });
+}
+
+// As the terminal library does when it closes the screen.
+void composeFarewell()
+{
+    farewellBytes = 0;
+    if (char* const mouse = tigetstr("XM"); mouse != nullptr && mouse != reinterpret_cast<char*>(-1))
+        add(tparm(mouse, 0));
+    else if (has_mouse())
+        add("\x1B[?1000l");
+    for (const char* each : {"sgr0", "op", "rmkx", "cnorm"})
+        add(tigetstr(each));
+    if (const char* const leave = tigetstr("rmcup"))
+        add(leave);
+    else
+        add(tparm(tigetstr("cup"), LINES - 1, 0));
+}
+
+} // namespace
+
+CrashSignals::CrashSignals(const termios& modesBefore)
+{
+    modes = modesBefore;
+    composeFarewell();
+    stack_t own{};
+    own.ss_sp = stack.data();
+    own.ss_size = stack.size();
+    if (stack_t present{}; sigaltstack(nullptr, &present) == 0 && (present.ss_flags & SS_DISABLE) != 0)
+        sigaltstack(&own, nullptr);
+    struct sigaction action {};
+    action.sa_handler = giveBack;
+    action.sa_flags = SA_ONSTACK;
+    for (std::size_t i = 0; i < kSignals.size(); ++i)
+        sigaction(kSignals[i], &action, &before[i]);
+}
+
+CrashSignals::~CrashSignals()
+{
+    for (std::size_t i = 0; i < kSignals.size(); ++i)
+        sigaction(kSignals[i], &before[i], nullptr);
+}
+
+} // namespace kestrum
