@@ -124,11 +124,13 @@ void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool
     const int rows = screen.rows(), columns = std::min(screen.columns(), kColumn);
     _bottom = rows - 1;
     int cursorRow = _bottom, cursorColumn = 0;
-    if (!_notice.empty() && rows > 2)
-        Line(screen, _bottom - 1, 0, columns)
-            .put(kInset, cutInTheMiddle(_notice, columns - 2 * kInset), {.colour = Colour::Accent});
+    const auto notice = wrapped(_notice, columns - 2 * kInset);
+    const int lines = std::clamp(static_cast<int>(notice.size()), 0, std::max(0, rows - 2));
+    for (int each = 0; each < lines; ++each)
+        Line(screen, _bottom - lines + each, 0, columns)
+            .put(kInset, notice[static_cast<std::size_t>(each)], {.colour = Colour::Accent});
     if (_pane) {
-        const Area area{1, 0, std::max(0, rows - (_notice.empty() ? 2 : 3)), columns};
+        const Area area{1, 0, std::max(0, rows - 2 - lines), columns};
         _pane->table().draw(screen, area, true);
         if (_pane->table().rows() == 0)
             drawHint(screen, area);
@@ -137,7 +139,7 @@ void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool
     drawTitle({screen, 0, 0, columns});
     const Line bottom(screen, _bottom, 0, columns);
     if (_jump) {
-        const int end = bottom.put(kInset, "/" + _jump->name.text(), {.bold = true});
+        const int end = bottom.put(kInset, std::string("/").append(_jump->name.text()), {.bold = true});
         if (!_jump->found)
             bottom.put(end + kGap, "no such row", {.colour = Colour::Danger});
         cursorRow = _bottom;

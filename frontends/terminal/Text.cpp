@@ -63,22 +63,23 @@ std::size_t characterAt(std::string_view text, std::size_t at)
     return at; // no UTF-8 anyway
 }
 
+// The bytes of the text's beginning that stand in at most so many columns.
+std::size_t bytesIn(std::string_view text, int width)
+{
+    Glyphs glyphs(text);
+    std::size_t bytes = 0;
+    for (auto each = glyphs.next(); each && each->columns <= width; each = glyphs.next()) {
+        width -= each->columns;
+        bytes = glyphs.read();
+    }
+    return bytes;
+}
+
 // What stands in at most so many columns, a wide character less than they could hold.
 struct Piece {
     std::wstring text;
     int columns = 0;
 };
-
-Piece first(std::string_view text, int width)
-{
-    Piece piece;
-    Glyphs glyphs(text);
-    for (auto each = glyphs.next(); each && piece.columns + each->columns <= width; each = glyphs.next()) {
-        piece.text += each->text;
-        piece.columns += each->columns;
-    }
-    return piece;
-}
 
 Piece last(std::string_view text, int width)
 {
@@ -117,7 +118,7 @@ std::string cut(std::string_view text, int width, int back)
     if (width < 1)
         return {};
     const auto tail = last(text, back);
-    return utf8(first(text, width - 1 - tail.columns).text + L'…' + tail.text);
+    return harmless(text.substr(0, bytesIn(text, width - 1 - tail.columns))) + utf8(L'…' + tail.text);
 }
 
 } // namespace
@@ -205,18 +206,21 @@ std::string cutAtTheEnd(std::string_view text, int width)
 std::vector<std::string> wrapped(std::string_view text, int width)
 {
     std::vector<std::string> lines;
-    while (!text.empty()) {
-        const auto end = std::min(text.find('\n'), text.size());
-        std::string line;
-        for (auto rest = text.substr(0, end); !rest.empty();) {
-            const auto word = rest.substr(0, rest.find(' '));
-            if (!line.empty() && columns(line) + 1 + columns(word) > width)
-                lines.push_back(std::exchange(line, {}));
-            line.append(line.empty() ? "" : " ").append(word);
-            rest.remove_prefix(std::min(word.size() + 1, rest.size()));
+    while (width > 1 && !text.empty()) {
+        const auto line = text.substr(0, text.find('\n'));
+        const bool fits = kestrum::fits(line, width);
+        auto end = fits ? line.size() : bytesIn(line, width);
+        if (!fits) {
+            // At a blank, unless that leaves a word which finds no line to itself anyway.
+            const auto blank = line.rfind(' ', end);
+            const auto next = blank == line.npos ? line : line.substr(blank + 1);
+            if (blank != line.npos && kestrum::fits(next.substr(0, next.find(' ')), width))
+                end = blank;
         }
-        lines.push_back(line);
-        text.remove_prefix(std::min(end + 1, text.size()));
+        lines.emplace_back(line.substr(0, end));
+        text.remove_prefix(end);
+        if (!text.empty() && (text.front() == '\n' || text.front() == ' '))
+            text.remove_prefix(1);
     }
     return lines;
 }

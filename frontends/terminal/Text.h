@@ -54,7 +54,7 @@ std::string beginning(std::string_view text);
 std::string cutInTheMiddle(std::string_view text, int width);
 std::string cutAtTheEnd(std::string_view text, int width);
 
-/// The lines of `text`, broken at blanks so that each has at most `width` columns; a longer word stays whole.
+/// The lines of `text`, broken so that each has at most `width` columns: at blanks, and within words that are longer.
 std::vector<std::string> wrapped(std::string_view text, int width);
 
 /// Whether `part` occurs in `whole`, upper and lower case alike.

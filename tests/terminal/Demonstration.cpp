@@ -88,6 +88,14 @@ void Demonstration::offerSave()
                                         "device/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle");
 }
 
+std::size_t Demonstration::displaysSockets() const
+{
+    std::size_t sockets = 0;
+    for (const auto& each : std::filesystem::directory_iterator(_directory / "run"))
+        sockets += each.path().filename().string().find(".log.") != std::string::npos;
+    return sockets;
+}
+
 std::map<std::string, std::string> Demonstration::environment() const
 {
     return {{"KESTRUM_RUNTIME_DIR", (_directory / "run").string()},

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <filesystem>
 #include <map>
 #include <string>
@@ -24,6 +25,8 @@ public:
 
     void offerSave();
     std::filesystem::path diagnosticLogs() const { return _directory / "device/var/log/diagnostics"; }
+    /// How many displays have a socket for the log.
+    std::size_t displaysSockets() const;
     /// For the programs on this device.
     std::map<std::string, std::string> environment() const;
 

@@ -122,6 +122,17 @@ TEST_F(Terminal, SaysConnectingUntilTheServiceAnswers)
     EXPECT_FALSE(terminal.cursorVisible());
 }
 
+TEST_F(Terminal, SaysWhatItWaitsForWhenNoServiceAnswers)
+{
+    start();
+    expectShown("Waiting for the telephony service.");
+    expectShown("voxd --scenario");
+    EXPECT_TRUE(terminal.shows("Connecting..."));
+    serve();
+    expectShown("Updated 20");
+    expectGone("Waiting for the telephony service.");
+}
+
 TEST_F(Terminal, ShowsKeysBoldAndValuesAgainstTheRightEdge)
 {
     startAndWait();
@@ -545,6 +556,57 @@ TEST_F(TerminalSave, WritesTheDescriptionThatWasTyped)
     EXPECT_NE(saved().find("<string>roof, north é 漢</string>"), std::string::npos) << saved();
 }
 
+TEST_F(TerminalSave, ConfirmsWhereTheSnapshotIsForAWhile)
+{
+    open();
+    clickOn("[ Save ]");
+    expectShown("Saved to /");
+    expectShown(".kestrum");
+    expectRow(23, StartsWith(" Updated"));
+    expectGone("Saved to /");
+    expectGone(".kestrum");
+}
+
+TEST_F(TerminalSave, WritesATimestampAloneBeforeTheFirstConnection)
+{
+    device.offerSave();
+    start();
+    expectShown("Connecting...");
+    terminal.type("s");
+    expectShown("Save Snapshot");
+    terminal.type("never seen\r\r");
+    expectGone("Save Snapshot");
+    EXPECT_THAT(saved(), HasSubstr("<key>Timestamp</key>"));
+    EXPECT_THAT(saved(), testing::Not(HasSubstr("<key>Data</key>")));
+    EXPECT_THAT(saved(), testing::Not(HasSubstr("<key>Description</key>")));
+}
+
+TEST_F(TerminalSave, StaysOverPanesThatGo)
+{
+    const auto without = [](const std::string& beat) {
+        return propertyList(text("_sorted", "_sorted") + text("3;Beat", beat) + text("4;Other", "1"));
+    };
+    const auto deep = propertyList(
+        dictionary("Top", dictionary("Middle", text("a", "1") + text("b", "2")) + text("Other", "1")) + text("x", "1"));
+    device.offerSave();
+    device.serve({deep, without("second"), without("third")}, {"--speed", "0.1"}); // one every 5 s
+    start();
+    expectShown("Top");
+    terminal.type("ll");
+    expectTitle("Kestrum › Top › Middle");
+    terminal.type("s");
+    expectShown("Save Snapshot");
+    // Another display shows the third: this one has had the second, and has no pane left under the sheet but the root.
+    Pseudoterminal other(24, 80);
+    other.start("kestrum-terminal", {}, device.environment());
+    EXPECT_TRUE(other.waitFor("third")) << other.text();
+    EXPECT_TRUE(terminal.shows("Save Snapshot")) << terminal.text();
+    terminal.press(Key::Escape);
+    expectGone("Save Snapshot");
+    expectRow(0, " Kestrum");
+    expectShown("Beat");
+}
+
 TEST_F(TerminalSave, IsLeftWithEscape)
 {
     open();
@@ -622,6 +684,24 @@ TEST_P(TerminalSignal, EndsItAndLeavesTheTerminalAsItWas)
 }
 
 INSTANTIATE_TEST_SUITE_P(Signals, TerminalSignal, testing::Values(SIGTERM, SIGHUP, SIGINT),
+                         [](const auto& each) { return std::string("Signal") + sigabbrev_np(each.param); });
+
+class TerminalCrash : public Terminal, public testing::WithParamInterface<int> {};
+
+TEST_P(TerminalCrash, GivesTheTerminalBackAndEndsWithItsSignal)
+{
+    const auto before = terminal.modes();
+    // A sanitizer's own handlers would make it another end.
+    const std::string none = "handle_segv=0:handle_abort=0:handle_sigbus=0:handle_sigfpe=0:handle_sigill=0";
+    startAndWait({{"ASAN_OPTIONS", none}, {"UBSAN_OPTIONS", none}});
+    terminal.signal(GetParam());
+    ASSERT_TRUE(terminal.waitForEnd());
+    EXPECT_EQ(terminal.exitStatus(), 128 + GetParam());
+    expectRestored(before);
+    EXPECT_NE(terminal.written().find("\x1B[?1006;1000l"), std::string::npos) << "the mouse is still reported";
+}
+
+INSTANTIATE_TEST_SUITE_P(Signals, TerminalCrash, testing::Values(SIGSEGV, SIGABRT, SIGBUS, SIGFPE, SIGILL),
                          [](const auto& each) { return std::string("Signal") + sigabbrev_np(each.param); });
 
 TEST_F(Terminal, EndsWithCtrlC)

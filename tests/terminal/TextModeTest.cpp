@@ -1,16 +1,24 @@
 #include "Demonstration.h"
 #include "Pseudoterminal.h"
 #include "core/KestrumModelNode.h"
+#include "doubles/MonitorDoubles.h"
 #include "doubles/Places.h"
 #include "frontends/terminal/TextDisplay.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
+#include <chrono>
+#include <csignal>
 #include <cstdio>
+#include <optional>
+#include <sstream>
 #include <sys/wait.h>
+#include <utility>
 
 namespace kestrum {
 namespace {
+
+using namespace std::chrono_literals;
 
 struct Outcome {
     int status;
@@ -124,9 +132,9 @@ TEST(TextMode, EndsQuietlyWhenItsReaderHasGone)
     Demonstration device;
     device.serve({kDisplay});
     // The pipe's reader has gone before the first tree is written.
-    const auto outcome = runShell("{ { " + command(device, "--text 1000") + "; } 2>&3 | true; } 3>&1");
-    EXPECT_EQ(outcome.output, "");
-    EXPECT_TRUE(std::filesystem::is_empty(device.sockets()) || device.socketsOfDisplays() == 0);
+    const auto outcome = runShell("{ { " + command(device, "--text 1000") + "; echo $? >&3; } 2>&3 | true; } 3>&1");
+    EXPECT_EQ(outcome.output, "0\n");
+    EXPECT_EQ(device.displaysSockets(), 0u);
 }
 
 TEST(TextMode, LeavesNoSocketBehindWhateverEndsIt)
@@ -137,30 +145,33 @@ TEST(TextMode, LeavesNoSocketBehindWhateverEndsIt)
         Pseudoterminal terminal(24, 80);
         terminal.start("kestrum-terminal", {"--text", "1000"}, device.environment());
         ASSERT_TRUE(terminal.waitFor("Kestrum")) << terminal.text();
-        EXPECT_EQ(device.socketsOfDisplays(), 1u);
+        EXPECT_EQ(device.displaysSockets(), 1u);
         terminal.signal(signal);
         ASSERT_TRUE(terminal.waitForEnd());
         EXPECT_EQ(terminal.exitStatus(), 128 + signal);
-        EXPECT_EQ(device.socketsOfDisplays(), 0u);
+        EXPECT_EQ(device.displaysSockets(), 0u);
     }
 }
 
-/// The display as text on a virtual clock, heard by the test.
-class PatientText : public testing::Test {
+/// The display as text on a virtual clock. The test is the telephony service.
+class PatientText : public testing::Test, protected MonitorDoubles {
 protected:
     PatientText()
     {
-        doubles.ports.serve("vox.commands", [](const auto&) { return MemoryPorts::Answer{}; });
+        propertyLists.parsed["reply"] = makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}});
+        propertyLists.parsed["list"] = makeDictionary({{"State", "idle"}});
+        ports.serve("vox.commands", [](const MemoryPorts::Request& request) {
+            const bool asks = request.text().find("GetTechnology") != std::string::npos;
+            return asks ? MemoryPorts::Answer{0, Data(bytesOf("reply"))} : MemoryPorts::Answer{};
+        });
         display.start();
-        doubles.queue.run();
     }
-    void advance(int seconds) { doubles.queue.advance(std::chrono::seconds(seconds)); }
+    void stream() { ports.send("org.kestrum.vox.baseband-state-report.log", 0, "list"); }
 
-    MonitorDoubles doubles;
     std::ostringstream out;
     std::optional<int> status;
     std::string why;
-    TextDisplay display{doubles.monitorRoles, out, 16, [this](int ended, const std::string& reason) {
+    TextDisplay display{monitorRoles, out, 16, [this](int ended, const std::string& reason) {
                             status = ended;
                             why = reason;
                         }};
@@ -168,29 +179,52 @@ protected:
 
 TEST_F(PatientText, GivesUpWhenNothingComes)
 {
-    advance(29);
+    queue.advance(29s);
     EXPECT_FALSE(status);
-    advance(1);
+    queue.advance(1s);
     EXPECT_EQ(status, 1);
     EXPECT_EQ(why, "the telephony service sent nothing for 30 s");
 }
 
+TEST_F(PatientText, WaitsThirtySecondsFromTheLastData)
+{
+    for (int i = 0; i < 15; ++i) {
+        queue.advance(25s);
+        stream();
+    }
+    queue.advance(2s);
+    EXPECT_FALSE(status) << why;
+    EXPECT_THAT(out.str(), testing::HasSubstr("State: idle"));
+    stream();
+    queue.advance(2s);
+    EXPECT_EQ(status, 0);
+}
+
+TEST_F(PatientText, GivesUpWhenNoMoreComes)
+{
+    queue.advance(25s);
+    stream();
+    queue.advance(40s);
+    EXPECT_EQ(status, 1);
+}
+
 TEST(TextMode, SaysItsVersion)
 {
     EXPECT_EQ(run(Demonstration(), "--version").output.find("kestrum-terminal "), 0u);
 }
 
-TEST(TextMode, ShowsAnEmptyTreeAsItsTitle)
+TEST(Service, RefusesNumbersThatAreNone)
 {
-    PathDictionary paths;
-    EXPECT_EQ(treeText(*KestrumModelNode::makeTreeFromObject(Value(), paths)), "Kestrum: (unknown)\n");
-}
-
-} // namespace
-} // namespace kestrum
-TEST(TextMode, SaysItsVersion)
-{
-    EXPECT_EQ(run(Demonstration(), "--version").output.find("kestrum-terminal "), 0u);
+    for (const std::string number : {"nan", "inf", "-nan", "0", "x"})
+        for (const std::string option : {"--speed", "--seconds"}) {
+            const auto outcome = runShell("'" + builtProgram("voxd") + "' --scenario lte --write /dev/null " + option +
+                                          " " + number + " 2>&1");
+            EXPECT_EQ(outcome.status, 2) << option << " " << number;
+            EXPECT_EQ(outcome.output.find(option + ": "), 0u) << outcome.output;
+        }
+    const auto unknown = runShell("'" + builtProgram("voxd") + "' --scenario lte --sped 2 2>&1");
+    EXPECT_EQ(unknown.status, 2);
+    EXPECT_THAT(unknown.output, testing::HasSubstr("--sped"));
 }
 
 TEST(TextMode, ShowsAnEmptyTreeAsItsTitle)

@@ -1,7 +1,7 @@
 #include "frontends/terminal/Text.h"
 #include "frontends/terminal/EditedLine.h"
 
-#include <gtest/gtest.h>
+#include <gmock/gmock.h>
 
 #include <cstring>
 #include <stdexcept>
@@ -131,6 +131,17 @@ TEST_F(TerminalText, IsCutInTheMiddleOrAtItsEnd)
     EXPECT_EQ(cutAtTheEnd("abc", 1), "…");
     EXPECT_EQ(cutAtTheEnd("abc", 0), "");
     EXPECT_EQ(cutInTheMiddle("abc", -3), "");
+}
+
+TEST_F(TerminalText, IsBrokenIntoLines)
+{
+    using testing::ElementsAre, testing::IsEmpty;
+    EXPECT_THAT(wrapped("Waiting for it.\nTo start: voxd", 10), ElementsAre("Waiting", "for it.", "To start:", "voxd"));
+    EXPECT_THAT(wrapped("Saved to /a/long/path/x", 12), ElementsAre("Saved to /a/", "long/path/x"));
+    EXPECT_THAT(wrapped("abc def", 7), ElementsAre("abc def"));
+    EXPECT_THAT(wrapped("漢字漢", 3), ElementsAre("漢", "字", "漢"));
+    EXPECT_THAT(wrapped("abc", 0), IsEmpty());
+    EXPECT_THAT(wrapped("", 10), IsEmpty());
 }
 
 TEST_F(TerminalText, IsFoundWhateverItsCase)
