@@ -44,7 +44,8 @@ void TerminalSaveInterface::focus(Focus focus)
 
 void TerminalSaveInterface::draw(Screen& screen)
 {
-    const int rows = screen.rows(), columns = std::min(screen.columns(), kColumn), inner = std::max(0, columns - 2 * kInset);
+    const int rows = screen.rows(), columns = std::min(screen.columns(), kColumn),
+              inner = std::max(0, columns - 2 * kInset);
     const Line title(screen, 0, 0, columns);
     title.put(kInset, "Save Snapshot", {.bold = true});
     Line(screen, kFieldRow - 1, 0, columns).put(kInset, "Description", {.dim = _focus != Focus::Description});

@@ -68,8 +68,11 @@ void TextDisplay::start()
 
 void TextDisplay::awaitData()
 {
-    _patience = _roles.queue.repeat(
-        kPatience, [this] { end(1, formatted("the telephony service sent nothing for %d s", kPatience.count())); });
+    _patience = _roles.queue.repeat(kPatience, [this] {
+        const auto& problem = _model->connectionProblem();
+        end(1, formatted("the telephony service sent nothing for %d s%s%s", kPatience.count(),
+                         problem.empty() ? "" : ": ", problem));
+    });
 }
 
 void TextDisplay::end(int status, const std::string& why)
