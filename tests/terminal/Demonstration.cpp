@@ -53,6 +53,11 @@ void Demonstration::killService()
     _service = -1;
 }
 
+void Demonstration::signalService(int number)
+{
+    kill(_service, number);
+}
+
 void Demonstration::restartService()
 {
     killService();
@@ -64,6 +69,7 @@ void Demonstration::restartService()
         dup2(said[1], STDOUT_FILENO);
         close(said[0]);
         close(said[1]);
+        std::signal(SIGPIPE, SIG_DFL); // whatever runs the tests may ignore it
         for (const auto& [name, value] : environment())
             setenv(name.c_str(), value.c_str(), 1);
         std::vector<char*> argv;

@@ -21,6 +21,7 @@ public:
     /// Every message is a property list, which an IFX modem sends as a whole display. One comes every 500 ms.
     void serve(const std::vector<std::string>& displays, const std::vector<std::string>& options = {"--loop"});
     void killService();
+    void signalService(int number);
     void restartService();
 
     void offerSave();

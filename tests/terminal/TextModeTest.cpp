@@ -38,7 +38,7 @@ Outcome runShell(const std::string& shell)
 
 std::string command(const Demonstration& device, const std::string& arguments)
 {
-    std::string command = "env";
+    std::string command = "env --default-signal=PIPE"; // whatever runs the tests may ignore it
     for (const auto& [name, value] : device.environment())
         command += " " + name + "='" + value + "'";
     return command + " '" + builtProgram("kestrum-terminal") + "' " + arguments + " </dev/null";
@@ -211,6 +211,14 @@ TEST_F(PatientText, GivesUpWhenNoMoreComes)
 TEST(TextMode, SaysItsVersion)
 {
     EXPECT_EQ(run(Demonstration(), "--version").output.find("kestrum-terminal "), 0u);
+}
+
+TEST(Service, SurvivesTheSignalOfAClosedPipe)
+{
+    Demonstration device;
+    device.serve({kDisplay});
+    device.signalService(SIGPIPE);
+    EXPECT_EQ(run(device, "--text 1").status, 0);
 }
 
 TEST(Service, RefusesNumbersThatAreNone)
