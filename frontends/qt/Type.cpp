@@ -5,12 +5,17 @@
 #include <QFontInfo>
 #include <QFontMetricsF>
 #include <QRawFont>
+#include <algorithm>
+#include <cstddef>
 
 namespace kestrum::qt {
 
 namespace {
 
 const QString kLiberationSans = QStringLiteral("Liberation Sans");
+
+// Bytes. A value can have megabytes; nobody swipes a row further than this, and every draw measures it.
+constexpr std::size_t kMostShown = 4 << 10;
 
 /// Whether the face that stands for the font is a proportional one without serifs.
 bool isSansSerif(const QFont& font)
@@ -66,12 +71,15 @@ QFont semiboldFont(double size)
 
 QString lineOf(std::string_view text)
 {
-    QString line = QString::fromUtf8(text.data(), static_cast<qsizetype>(text.size()));
+    std::size_t shown = std::min(text.size(), kMostShown);
+    while (shown > 0 && shown < text.size() && (static_cast<unsigned char>(text[shown]) & 0xC0) == 0x80)
+        --shown; // not within a character
+    QString line = QString::fromUtf8(text.data(), static_cast<qsizetype>(shown));
     for (QChar& each : line)
         if (each.category() == QChar::Other_Control || each == QChar::LineSeparator ||
             each == QChar::ParagraphSeparator)
             each = u' ';
-    return line;
+    return shown < text.size() ? line + u'\u2026' : line;
 }
 
 Size measured(const QString& line, const QFont& font)

@@ -18,7 +18,7 @@ QFont fontOf(const Font& font);
 /// Of bars and cards: heavier than the text around it, lighter than a row's key.
 QFont semiboldFont(double size);
 
-/// UTF-8 as it stands in one line: line breaks and other controls become blanks.
+/// UTF-8 as it stands in one line: line breaks and other controls become blanks, and what lies beyond 4 KiB "…".
 QString lineOf(std::string_view text);
 
 Size measured(const QString& line, const QFont& font);

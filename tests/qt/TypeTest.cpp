@@ -42,6 +42,15 @@ struct Text {
     friend void PrintTo(const Text& shown, std::ostream* out) { *out << shown.name; }
 };
 
+TEST(Line, KeepsOnlyWhatARowCanBeMovedTo)
+{
+    EXPECT_EQ(qt::lineOf("RSRP\n-97"), QStringLiteral("RSRP -97"));
+    const std::string most(4 << 10, 'a');
+    EXPECT_EQ(qt::lineOf(most), QString(4 << 10, u'a'));
+    EXPECT_EQ(qt::lineOf(std::string(15 << 20, 'a')), QString(4 << 10, u'a') + u'\u2026');
+    EXPECT_EQ(qt::lineOf(most.substr(1) + "\u6F22"), QString((4 << 10) - 1, u'a') + u'\u2026');
+}
+
 class Measure : public testing::TestWithParam<Text> {};
 
 TEST_P(Measure, MatchesWhatIsDrawn)
