@@ -260,10 +260,10 @@ TEST_F(KestrumAppTest, LostMessagesAreToldInALineThatGoesAway)
 
 TEST(ConnectionHintTest, SaysWhatIsMissingAndHowToStartIt)
 {
-    EXPECT_EQ(connectionHint(), "Waiting for the telephony service.\nTo start a simulated one: voxd --scenario lte");
+    EXPECT_EQ(connectionHint(), "Waiting for the telephony service.\nTo start a simulated one:\nvoxd --scenario lte");
     EXPECT_EQ(connectionHint("It belongs to another user."),
               "Waiting for the telephony service.\nIt belongs to another user.\n"
-              "To start a simulated one: voxd --scenario lte");
+              "To start a simulated one:\nvoxd --scenario lte");
 }
 
 // Notices
