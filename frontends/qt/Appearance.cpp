@@ -4,11 +4,13 @@
 #include "frontends/qt/Motion.h"
 
 #include <QApplication>
-#include <QDBusConnection>
+#include <QDBusError>
 #include <QDBusMessage>
 #include <QDBusPendingCallWatcher>
 #include <QDBusPendingReply>
+#include <QDBusServiceWatcher>
 #include <QFile>
+#include <QToolTip>
 
 namespace kestrum::qt {
 
@@ -23,19 +25,35 @@ const QString kMotionGroup = QStringLiteral("org.gnome.desktop.interface"),
 
 } // namespace
 
-Appearance::Appearance()
+QDBusConnection desktopBus()
 {
-    qApp->installEventFilter(this);
-    applyScheme();
     // Where no session bus runs, Qt would try to start one.
     if (!qEnvironmentVariableIsSet("DBUS_SESSION_BUS_ADDRESS") &&
         !QFile::exists(qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/bus")))
+        return QDBusConnection(QString());
+    return QDBusConnection::sessionBus();
+}
+
+Appearance::Appearance(const QDBusConnection& bus) : _bus(bus)
+{
+    qApp->installEventFilter(this);
+    applyScheme();
+    if (!_bus.isConnected())
         return;
-    QDBusConnection bus = QDBusConnection::sessionBus();
-    if (!bus.isConnected())
-        return;
-    bus.connect(kPortal, kPath, kSettings, QStringLiteral("SettingChanged"), this,
-                SLOT(settingChanged(QString, QString, QDBusVariant)));
+    // Qt finds the slot by the names of its types, and knows this one only once it is registered.
+    qRegisterMetaType<QDBusVariant>();
+    if (!_bus.connect(kPortal, kPath, kSettings, QStringLiteral("SettingChanged"), this,
+                      SLOT(settingChanged(QString, QString, QDBusVariant))))
+        qWarning("kestrum: changes of the desktop's settings are not followed: %s",
+                 qPrintable(_bus.lastError().message()));
+    // A portal that starts later, or again, may say something else than what is known.
+    auto* portal = new QDBusServiceWatcher(kPortal, _bus, QDBusServiceWatcher::WatchForRegistration, this);
+    connect(portal, &QDBusServiceWatcher::serviceRegistered, this, &Appearance::askAll);
+    askAll();
+}
+
+void Appearance::askAll()
+{
     ask(kSchemeGroup, kScheme);
     ask(kMotionGroup, kMotion);
 }
@@ -44,7 +62,7 @@ void Appearance::ask(const QString& group, const QString& key)
 {
     QDBusMessage read = QDBusMessage::createMethodCall(kPortal, kPath, kSettings, QStringLiteral("Read"));
     read << group << key;
-    auto* watcher = new QDBusPendingCallWatcher(QDBusConnection::sessionBus().asyncCall(read), this);
+    auto* watcher = new QDBusPendingCallWatcher(_bus.asyncCall(read), this);
     connect(watcher, &QDBusPendingCallWatcher::finished, this, [this, group, key, watcher] {
         const QDBusPendingReply<QDBusVariant> reply = *watcher;
         if (!reply.isError()) // no portal, or none that knows this setting
@@ -82,7 +100,9 @@ void Appearance::applyScheme()
     _applying = true;
     QApplication::setPalette(QPalette()); // brings the theme's own palette back
     const bool dark = _dark.value_or(isDark(QApplication::palette()));
-    QApplication::setPalette(paletteOf(dark ? darkColours() : lightColours()));
+    const QPalette palette = paletteOf(dark ? darkColours() : lightColours());
+    QApplication::setPalette(palette);
+    QToolTip::setPalette(palette);
     _applying = false;
 }
 

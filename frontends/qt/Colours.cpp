@@ -65,6 +65,8 @@ QPalette paletteOf(const Colours& colours)
     for (const auto role : {QPalette::WindowText, QPalette::Text, QPalette::ButtonText})
         palette.setColor(role, colours.ink);
     palette.setColor(QPalette::PlaceholderText, colours.muted);
+    palette.setColor(QPalette::ToolTipBase, colours.surface);
+    palette.setColor(QPalette::ToolTipText, colours.ink);
     palette.setColor(QPalette::Highlight, colours.accent);
     palette.setColor(QPalette::HighlightedText, colours.onAccent());
     return palette;

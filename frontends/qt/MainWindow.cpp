@@ -4,16 +4,53 @@
 #include "frontends/qt/Type.h"
 
 #include <QGuiApplication>
+#include <QInputDevice>
 #include <QScreen>
+#include <algorithm>
 
 namespace kestrum::qt {
 
-bool isHandset()
+namespace {
+
+double shortSide(const QSizeF& size)
+{
+    return std::min(size.width(), size.height());
+}
+
+/// Some screens give their aspect ratio in place of their size, in centimetres or in millimetres; others nothing.
+bool isSize(const QSizeF& millimetres)
+{
+    const QSize whole = millimetres.toSize();
+    static const QList<QSize> ratios{{160, 90}, {160, 100}, {16, 9}, {16, 10}};
+    return shortSide(millimetres) > 0 && !ratios.contains(whole) && !ratios.contains(whole.transposed());
+}
+
+Display primaryDisplay()
 {
     // These draw on the bare screen, without a desktop.
     static const QStringList bare{QStringLiteral("eglfs"), QStringLiteral("linuxfb"), QStringLiteral("vkkhrdisplay")};
-    const QSize screen = QGuiApplication::primaryScreen()->size();
-    return std::min(screen.width(), screen.height()) < kHandset || bare.contains(QGuiApplication::platformName());
+    const QScreen& screen = *QGuiApplication::primaryScreen();
+    const auto devices = QInputDevice::devices();
+    const bool touch = std::any_of(devices.begin(), devices.end(), [](const QInputDevice* each) {
+        return each->type() == QInputDevice::DeviceType::TouchScreen;
+    });
+    return {screen.size(), screen.physicalSize(), touch, bare.contains(QGuiApplication::platformName())};
+}
+
+} // namespace
+
+bool isHandset(const Display& display)
+{
+    if (display.bare)
+        return true;
+    if (isSize(display.millimetres))
+        return shortSide(display.millimetres) < kHandsetMillimetres;
+    return display.touch && shortSide(display.points) < kHandset;
+}
+
+bool isHandset()
+{
+    return isHandset(primaryDisplay());
 }
 
 QRect screenArea()

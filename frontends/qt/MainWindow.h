@@ -40,6 +40,17 @@ private:
     std::vector<Message> _messages; ///< waiting behind `_alert`
 };
 
+/// What is known of a screen.
+struct Display {
+    QSize points;
+    QSizeF millimetres; ///< empty or wrong where the screen does not tell
+    bool touch;
+    bool bare; ///< no desktop runs on it
+};
+
+/// Whether the screen is a handset's by its real size, whatever its scale makes of its points; where that is not known,
+/// a small one that is touched.
+bool isHandset(const Display& display);
 /// Whether the whole screen is ours: a handset's, or one without a desktop.
 bool isHandset();
 /// The screen as the application knows it: a handset's own, on a desktop the piece of it that the window takes.

@@ -19,7 +19,9 @@ inline constexpr double kTextSize = 15, kTitleSize = 17, kStatusSize = 14;
 inline constexpr int kSlide = 220; ///< push and pop
 inline constexpr int kSheet = 260; ///< the save screen, from below
 
-/// The handset's shape, which the window takes on a desktop, and the size below which a screen is a handset's.
-inline constexpr int kPhoneWidth = 390, kPhoneHeight = 844, kHandset = 600;
+/// The handset's shape, which the window takes on a desktop.
+inline constexpr int kPhoneWidth = 390, kPhoneHeight = 844;
+/// The shorter side below which a screen is a handset's, in millimetres, and in points where that is not known.
+inline constexpr double kHandsetMillimetres = 110, kHandset = 600;
 
 } // namespace kestrum::qt

@@ -20,19 +20,33 @@ Spinner::Spinner(QWidget* parent) : QWidget(parent)
     _turning.setEndValue(360.0);
     _turning.setDuration(1000);
     _turning.setLoopCount(-1);
-    connect(&_turning, &QVariantAnimation::valueChanged, this, QOverload<>::of(&QWidget::update));
+    connect(&_turning, &QVariantAnimation::valueChanged, this, [this] {
+        update();
+        turn();
+    });
 }
 
 void Spinner::setRunning(bool running)
 {
     _running = running;
     setVisible(running);
+    turn();
+}
+
+void Spinner::turn()
+{
+    const bool turns = isVisible() && motionWanted();
+    if (turns == (_turning.state() == QAbstractAnimation::Running))
+        return;
+    if (turns)
+        _turning.start();
+    else
+        _turning.stop();
 }
 
 void Spinner::showEvent(QShowEvent*)
 {
-    if (motionWanted())
-        _turning.start();
+    turn();
 }
 
 void Spinner::hideEvent(QHideEvent*)
@@ -57,7 +71,23 @@ void LineLabel::setLine(const QString& line)
 {
     _line = line;
     setAccessibleName(line);
-    setText(QFontMetricsF(font()).elidedText(_line, Qt::ElideRight, width()));
+    setText(isCut() ? QFontMetricsF(font()).elidedText(_line, Qt::ElideRight, width()) : _line);
+}
+
+void LineLabel::setLines(int lines)
+{
+    setWordWrap(lines > 1);
+    _lines = lines;
+    setLine(_line);
+}
+
+bool LineLabel::isCut() const
+{
+    const QFontMetricsF metrics(font());
+    if (metrics.horizontalAdvance(_line) <= width())
+        return false;
+    const QRectF wrapped = metrics.boundingRect(QRectF(rect()), Qt::TextWordWrap, _line);
+    return _lines == 1 || wrapped.width() > width() || wrapped.height() > (_lines + 0.5) * metrics.lineSpacing();
 }
 
 double LineLabel::wanted() const

@@ -15,6 +15,7 @@ public:
     explicit Spinner(QWidget* parent = nullptr);
     void setRunning(bool running);
     bool isRunning() const { return _running; }
+    bool isTurning() const { return _turning.state() == QAbstractAnimation::Running; }
 
 protected:
     void paintEvent(QPaintEvent*) override;
@@ -22,22 +23,29 @@ protected:
     void hideEvent(QHideEvent*) override;
 
 private:
+    /// Turns while it is seen, unless the desktop asks for reduced motion.
+    void turn();
+
     bool _running = false;
     QVariantAnimation _turning;
 };
 
-/// One line that is cut short where there is no room for it; a screen reader hears it whole.
+/// One line, or a few, cut short to one where there is no room for it; a screen reader hears it whole.
 class LineLabel final : public QLabel {
 public:
     using QLabel::QLabel;
     void setLine(const QString& line);
     double wanted() const; ///< the width of the whole line
+    /// May be broken into that many.
+    void setLines(int lines);
+    bool isCut() const;
 
 protected:
     void resizeEvent(QResizeEvent* event) override;
 
 private:
     QString _line;
+    int _lines = 1;
 };
 
 /// The bar under a pane. An item that stays at its place keeps its widget, whatever it says.

@@ -70,8 +70,8 @@ INSTANTIATE_TEST_SUITE_P(Run, TheEnd,
                                                 }}),
                          [](const auto& each) { return std::string(each.param.name); });
 
-/// As Qt does when the display server goes away.
-TEST(TheEndByExit, ReachesTheApplicationExactlyOnce)
+/// As Qt does when the display server goes away. A death test is run first, while the program has no threads to fork.
+TEST(TheEndByExitDeathTest, ReachesTheApplicationExactlyOnce)
 {
     const Ending exits{"ByExit", [](Window&) { std::exit(1); }};
     struct Telling final : Application {
