@@ -10,6 +10,7 @@
 #include <QImage>
 #include <QPainter>
 #include <QProcess>
+#include <QTextLayout>
 
 #include <filesystem>
 #include <fstream>
@@ -118,6 +119,36 @@ TEST(TheTestsFonts, AreTheInstalledLiberationFontsAlone)
                 .contains(family))
             << family.toStdString();
 }
+
+class Row : public testing::TestWithParam<Font> {
+protected:
+    static double widthOf(std::string_view text) { return toolkit().measure(text, GetParam()).width; }
+};
+
+TEST_P(Row, DrawsEveryCharacterByItself)
+{
+    for (const char* text : {"ffff", "ffffi", "fl", "99f999ffff"}) {
+        double sum = 0;
+        for (const char each : std::string_view(text))
+            sum += widthOf({&each, 1});
+        EXPECT_DOUBLE_EQ(widthOf(text), sum) << text;
+        QTextLayout layout(text, qt::fontOf(GetParam()));
+        layout.beginLayout();
+        layout.createLine();
+        layout.endLayout();
+        EXPECT_EQ(layout.glyphRuns().constFirst().glyphIndexes().size(), std::ssize(std::string_view(text))) << text;
+    }
+}
+
+TEST_P(Row, HasFiguresOfOneWidth)
+{
+    EXPECT_EQ(widthOf("111"), widthOf("888"));
+    EXPECT_EQ(widthOf("-111.71 dBm"), widthOf("-888.48 dBm"));
+}
+
+INSTANTIATE_TEST_SUITE_P(Type, Row,
+                         testing::Values(systemFont(15), boldSystemFont(15), systemFont(14), Font{"Helvetica", 13},
+                                         Font{"DejaVu Sans", 15}, Font{"Liberation Sans", 15}));
 
 TEST(Helvetica, IsLiberationSansWhereItIsInstalled)
 {
