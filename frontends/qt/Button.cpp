@@ -63,8 +63,9 @@ void Button::paintEvent(QPaintEvent*)
     }
     painter.setPen(_kind == Kind::Filled ? colours.onAccent() : colours.accent);
     const Qt::Alignment side = _kind == Kind::Back ? Qt::AlignLeft : Qt::AlignHCenter;
-    painter.drawText(place, QFontMetricsF(font()).elidedText(text(), Qt::ElideRight, place.width()),
-                     QTextOption(side | Qt::AlignVCenter));
+    if (_kind != Kind::Back || width() > kRowHeight) // else the chevron alone
+        painter.drawText(place, QFontMetricsF(font()).elidedText(text(), Qt::ElideRight, place.width()),
+                         QTextOption(side | Qt::AlignVCenter));
     if (_ringed)
         strokeRing(painter, _kind == Kind::Filled ? QRectF(rect()) : body, colours.accent);
 }

@@ -6,6 +6,7 @@
 
 #include <QPainter>
 #include <QScroller>
+#include <algorithm>
 
 namespace kestrum::qt {
 
@@ -100,6 +101,15 @@ QString Cell::spoken() const
     return texts.join(QStringLiteral(", "));
 }
 
+bool Cell::isCut() const
+{
+    const double width = contentBounds().width;
+    return std::any_of(_views.begin(), _views.end(), [&](const auto& view) {
+        const auto* drawn = dynamic_cast<const Drawn*>(view.get());
+        return drawn && drawn->isCut(width);
+    });
+}
+
 void Cell::paintEvent(QPaintEvent*)
 {
     const Colours& colours = coloursOf(*this);
@@ -107,7 +117,6 @@ void Cell::paintEvent(QPaintEvent*)
     QPainter painter(this);
     painter.setRenderHint(QPainter::Antialiasing);
     painter.fillRect(rect(), background);
-    fillHairline(painter, *this, height(), kInset, width() - kInset, colours.line);
 
     const Rect content = contentBounds();
     painter.save();
@@ -116,6 +125,7 @@ void Cell::paintEvent(QPaintEvent*)
         if (const auto* drawn = dynamic_cast<const Drawn*>(view.get()))
             drawn->paint(painter, {colours, background, content.width});
     painter.restore();
+    fillHairline(painter, *this, height(), kInset, width() - kInset, colours.line); // no fade reaches it
 
     const QPointF middle(width() - kInset - kMark / 2, height() / 2.0);
     if (_accessory == Accessory::DisclosureIndicator)

@@ -34,6 +34,8 @@ public:
     Strip* strip() const;
     double sideways() const; ///< its offset, 0 without one
     void setSideways(double offset);
+    /// Whether some of its text is out of sight.
+    bool isCut() const;
     /// What a screen reader says: "key, value".
     QString spoken() const;
 

@@ -42,12 +42,20 @@ void TextLabel::setFont(Font font)
 void TextLabel::paint(QPainter& painter, const Paper& paper) const
 {
     const QFontMetricsF metrics(_font);
-    const double room = std::min(_frame.width + 1, paper.width - _frame.x); // + 1: measures are rounded somewhere
-    const bool fits = metrics.horizontalAdvance(_line) <= room;
     painter.setFont(_font);
     painter.setPen(paper.colours.ink);
     painter.drawText(QPointF(_frame.x, _frame.y + (_frame.height - metrics.height()) / 2 + metrics.ascent()),
-                     fits ? _line : metrics.elidedText(_line, Qt::ElideRight, room));
+                     isCut(paper.width) ? metrics.elidedText(_line, Qt::ElideRight, room(paper.width)) : _line);
+}
+
+double TextLabel::room(double width) const
+{
+    return std::min(_frame.width + 1, width - _frame.x); // + 1: measures are rounded somewhere
+}
+
+bool TextLabel::isCut(double width) const
+{
+    return QFontMetricsF(_font).horizontalAdvance(_line) > room(width);
 }
 
 void Strip::setFrame(Rect frame)
@@ -91,6 +99,20 @@ QStringList Strip::texts() const
     return texts;
 }
 
+bool Strip::isCutLeft() const
+{
+    return std::any_of(_views.begin(), _views.end(),
+                       [this](const auto& view) { return view->frame().width > 0 && view->frame().x < offset(); });
+}
+
+bool Strip::isCutRight() const
+{
+    return std::any_of(_views.begin(), _views.end(), [this](const auto& view) {
+        const Rect each = view->frame();
+        return each.width > 0 && each.x + each.width > offset() + _frame.width;
+    });
+}
+
 void Strip::paint(QPainter& painter, const Paper& paper) const
 {
     constexpr double kFade = 32; // points at an edge that what lies beyond fades in
@@ -114,9 +136,9 @@ void Strip::paint(QPainter& painter, const Paper& paper) const
         painter.fillRect(QRectF(QPointF(std::min(from, to), frame.top()), QPointF(std::max(from, to), frame.bottom())),
                          gradient);
     };
-    if (offset() > 0)
+    if (isCutLeft())
         fade(frame.left(), frame.left() + kFade);
-    if (offset() < reach()) {
+    if (isCutRight()) {
         fade(frame.right(), frame.right() - kFade);
         // What lies beyond may begin there, with nothing to fade: three dots tell of it.
         painter.setPen(Qt::NoPen);

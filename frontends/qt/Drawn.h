@@ -31,6 +31,8 @@ public:
     virtual ~Drawn() = default;
     virtual void paint(QPainter& painter, const Paper& paper) const = 0;
     virtual QStringList texts() const = 0; ///< those that are not empty
+    /// Whether some of it is out of sight in a holder of that width.
+    virtual bool isCut(double width) const = 0;
     virtual void setHolder(QWidget* holder) { _holder = holder; }
 
 protected:
@@ -56,7 +58,11 @@ public:
     void paint(QPainter& painter, const Paper& paper) const override;
     QStringList texts() const override { return _line.isEmpty() ? QStringList() : QStringList(_line); }
 
+    bool isCut(double width) const override;
+
 private:
+    double room(double width) const;
+
     Rect _frame;
     std::optional<std::string> _text;
     QString _line; ///< `_text` as drawn
@@ -76,7 +82,12 @@ public:
 
     void paint(QPainter& painter, const Paper& paper) const override;
     QStringList texts() const override;
+    bool isCut(double) const override { return isCutLeft() || isCutRight(); }
     void setHolder(QWidget* holder) override;
+
+    // Its content is wider than the texts in it: only what is out of sight counts.
+    bool isCutLeft() const;
+    bool isCutRight() const;
 
     double reach() const { return std::max(0.0, _content.width - _frame.width); } ///< the largest offset
     double offset() const { return std::min(_offset, reach()); }

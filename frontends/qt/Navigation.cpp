@@ -5,10 +5,18 @@
 #include "frontends/qt/Paint.h"
 #include "frontends/qt/Type.h"
 
+#include <QAccessible>
 #include <QKeyEvent>
 #include <QMouseEvent>
 
 namespace kestrum::qt {
+
+namespace {
+
+constexpr double kLeastTitleSize = 13;
+constexpr int kLeastBackWidth = 72; // points that show a few letters of where it goes
+
+} // namespace
 
 TitleBar::TitleBar(QWidget* parent) : QWidget(parent), _back(Button::Kind::Back, {}, this), _title(this)
 {
@@ -33,14 +41,38 @@ void TitleBar::setTitles(const std::vector<std::string>& titles)
 
 void TitleBar::arrange()
 {
-    const int column = std::min(width(), kColumn), left = (width() - column) / 2;
-    const int backWidth = _back.isHidden() ? 0 : std::min(_back.sizeHint().width(), column * 2 / 5);
-    _back.setGeometry(left, 2, backWidth, kRowHeight);
+    const int column = std::min(width(), kColumn), left = (width() - column) / 2, to = column - kInset;
+    const bool hasBack = !_back.isHidden();
+    const int whole = std::min(_back.sizeHint().width(), column * 2 / 5);
+    const int least = std::min(whole, kLeastBackWidth);
+
+    // Before the title is cut it shrinks, then the button gives way: a few letters, at last the chevron alone. What is
+    // still too long stands in two lines.
+    double size = kTitleSize;
+    int back = 0, from = kInset;
+    const auto fits = [&](int backWidth) {
+        back = hasBack ? backWidth : 0;
+        from = hasBack ? back + kGap : kInset;
+        return _title.wanted() <= to - from;
+    };
+    bool fitted = false;
+    for (const int smallest : {least, kRowHeight}) {
+        for (size = kTitleSize; !fitted && size >= kLeastTitleSize; --size) {
+            _title.setFont(semiboldFont(size));
+            fitted = fits(smallest);
+        }
+        if (fitted)
+            break;
+    }
+    if (fitted && back > kRowHeight)
+        fits(std::clamp(to - kGap - static_cast<int>(_title.wanted()), back, whole));
+    _title.setLines(fitted ? 1 : 2);
+    _back.setGeometry(left, 2, back, kRowHeight);
     // In the middle of the bar if it fits there, beside the button if not.
-    const int from = backWidth ? backWidth + kGap : kInset, to = column - kInset;
-    const int wanted = std::min(static_cast<int>(_title.wanted()), to - from);
+    const int wanted = fitted ? static_cast<int>(_title.wanted()) : to - from;
     const int x = std::clamp((column - wanted) / 2, from, to - wanted);
     _title.setGeometry(left + x, 2, wanted, kRowHeight);
+    _title.setToolTip(_title.isCut() ? title() : QString());
 }
 
 void TitleBar::resizeEvent(QResizeEvent*)
@@ -54,7 +86,34 @@ void TitleBar::paintEvent(QPaintEvent*)
     fillHairline(painter, *this, height(), 0, width(), coloursOf(*this).line);
 }
 
-Navigation::Navigation(NavigationViewDelegate& delegate) : _delegate(delegate), _bar(this), _stage(this)
+Notice::Notice(QWidget* parent) : QLabel(parent)
+{
+    setFont(fontOf(systemFont(kStatusSize)));
+    setTextFormat(Qt::PlainText);
+    setWordWrap(true);
+    setMargin(kInset);
+    setAttribute(Qt::WA_TransparentForMouseEvents);
+    hide();
+}
+
+void Notice::arrange(const QRect& over)
+{
+    const int column = std::min(over.width(), kColumn);
+    const int high = std::min(heightForWidth(column), over.height());
+    setGeometry(over.x() + (over.width() - column) / 2, over.bottom() + 1 - high, column, high);
+}
+
+void Notice::paintEvent(QPaintEvent* event)
+{
+    QPainter painter(this);
+    painter.fillRect(rect(), coloursOf(*this).ground);
+    fillHairline(painter, *this, 1 / devicePixelRatioF(), 0, width(), coloursOf(*this).line);
+    painter.end();
+    QLabel::paintEvent(event);
+}
+
+Navigation::Navigation(NavigationViewDelegate& delegate)
+    : _delegate(delegate), _bar(this), _stage(this), _notice(&_stage)
 {
     setAutoFillBackground(true);
     _stage.setBackgroundRole(QPalette::Base);
@@ -115,6 +174,7 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
         return;
     still->show();
     fresh->raise();
+    _notice.raise();
     // The old pane goes a little slower than the new one, which covers it.
     const int way = transition == Transition::Push ? _stage.width() : -_stage.width();
     _slide.start(
@@ -138,6 +198,19 @@ void Navigation::setToolbarHidden(bool hidden)
 {
     _toolbarHidden = hidden;
     arrange();
+}
+
+void Navigation::setNotice(std::string_view text)
+{
+    const QString line = lineOf(text);
+    _notice.setText(line);
+    _notice.setAccessibleName(line);
+    _notice.setVisible(!line.isEmpty());
+    arrange();
+    if (line.isEmpty())
+        return;
+    QAccessibleEvent alert(&_notice, QAccessible::Alert);
+    QAccessible::updateAccessibility(&alert);
 }
 
 void Navigation::present(SaveInterface& screen, bool animated)
@@ -197,6 +270,8 @@ void Navigation::arrange()
     _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - bottom));
     if (_table)
         _table->setGeometry(_stage.rect());
+    _notice.arrange(_stage.rect());
+    _notice.raise();
     if (_toolbar) {
         _toolbar->setGeometry(0, height() - bottom, width(), kBarHeight);
         _toolbar->setVisible(bottom > 0);

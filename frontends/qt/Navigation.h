@@ -16,6 +16,7 @@ public:
     void setTitles(const std::vector<std::string>& titles);
     Button& back() { return _back; }
     QString title() const { return _title.accessibleName(); }
+    const LineLabel& label() const { return _title; }
 
 protected:
     void paintEvent(QPaintEvent*) override;
@@ -28,6 +29,16 @@ private:
     LineLabel _title;
 };
 
+/// What was done, over the lower end of the panes; it takes no input.
+class Notice final : public QLabel {
+public:
+    explicit Notice(QWidget* parent);
+    void arrange(const QRect& over);
+
+protected:
+    void paintEvent(QPaintEvent* event) override;
+};
+
 /// Title bar, the top pane's table, its toolbar; over them the save sheet while it is presented.
 class Navigation final : public QWidget, public NavigationView {
 public:
@@ -38,12 +49,13 @@ public:
     void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) override;
     void setTitles(std::vector<std::string> titles) override;
     void setToolbarHidden(bool hidden) override;
-    void setNotice(std::string_view) override {}
+    void setNotice(std::string_view text) override;
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 
     TitleBar& titleBar() { return _bar; }
     Table* table() const { return _table; }
+    const Notice& notice() const { return _notice; }
     Toolbar* toolbar() const { return _toolbar; }
     SaveSheet* sheet() const { return _sheet; }
     bool isMoving() const { return _slide.isRunning() || _rise.isRunning(); }
@@ -62,6 +74,7 @@ private:
     NavigationViewDelegate& _delegate;
     TitleBar _bar;
     QWidget _stage; ///< what slides, slides in here
+    Notice _notice; ///< over the stage's lower end
     QPointer<Table> _table;
     QPointer<Toolbar> _toolbar;
     QPointer<SaveSheet> _sheet;

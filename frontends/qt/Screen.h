@@ -15,7 +15,7 @@ public:
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool) override { _toolbar.setItems(std::move(items)); }
     void resignFirstResponder() override { _table.clearFocus(); }
-    void setHint(std::string_view) override {}
+    void setHint(std::string_view text) override { _table.setHint(text); }
 
     Toolbar& toolbar() { return _toolbar; }
 

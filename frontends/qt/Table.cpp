@@ -2,12 +2,15 @@
 
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Paint.h"
+#include "frontends/qt/Type.h"
 
 #include <QAccessible>
+#include <QHelpEvent>
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
 #include <QScroller>
+#include <QToolTip>
 #include <algorithm>
 #include <cmath>
 
@@ -54,8 +57,15 @@ private:
 
 } // namespace
 
-Table::Table(TableDataSource& source) : _source(source)
+Table::Table(TableDataSource& source) : _source(source), _hint(viewport())
 {
+    _hint.setFont(fontOf(systemFont(kTextSize)));
+    _hint.setForegroundRole(QPalette::PlaceholderText);
+    _hint.setTextFormat(Qt::PlainText);
+    _hint.setAlignment(Qt::AlignCenter);
+    _hint.setWordWrap(true);
+    _hint.setAttribute(Qt::WA_TransparentForMouseEvents);
+    _hint.hide();
     setFrameShape(QFrame::NoFrame);
     setFocusPolicy(Qt::StrongFocus);
     setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
@@ -115,6 +125,22 @@ void Table::clearSelection()
 {
     _selected.reset();
     refreshLooks();
+}
+
+void Table::setHint(std::string_view text)
+{
+    _hint.setText(QString::fromUtf8(text.data(), static_cast<qsizetype>(text.size())));
+    arrangeHint();
+}
+
+void Table::arrangeHint()
+{
+    const bool shown = _rows == 0 && !_hint.text().isEmpty();
+    const int x = (viewport()->width() - columnWidth()) / 2;
+    // A little above the middle, where an empty page is looked at.
+    _hint.setGeometry(x + 2 * kInset, 0, columnWidth() - 4 * kInset, viewport()->height() * 4 / 5);
+    _hint.setVisible(shown);
+    setAccessibleDescription(shown ? _hint.text() : QString());
 }
 
 QSize Table::sizeHint() const
@@ -210,6 +236,7 @@ void Table::place()
     _mark->setGeometry(viewport()->width() - 3, 2, 2, viewport()->height() - 4);
     _mark->raise();
     _mark->update();
+    arrangeHint();
 }
 
 void Table::refreshLooks()
@@ -343,6 +370,31 @@ void Table::mouseReleaseEvent(QMouseEvent* event)
     }
 }
 
+void Table::mouseDoubleClickEvent(QMouseEvent* event)
+{
+    if (const auto row = rowAt(event->position()); row && event->button() == Qt::LeftButton)
+        bringBack(*row);
+    mousePressEvent(event);
+}
+
+bool Table::viewportEvent(QEvent* event)
+{
+    if (event->type() != QEvent::ToolTip)
+        return QAbstractScrollArea::viewportEvent(event);
+    showTip(static_cast<const QHelpEvent&>(*event));
+    return true;
+}
+
+void Table::showTip(const QHelpEvent& event)
+{
+    const auto row = rowAt(event.pos());
+    const Cell* cell = row ? cellAt(*row) : nullptr;
+    if (cell && cell->isCut())
+        QToolTip::showText(event.globalPos(), cell->spoken(), viewport(), cell->geometry());
+    else
+        QToolTip::hideText();
+}
+
 void Table::wheelEvent(QWheelEvent* event)
 {
     QPoint delta = event->pixelDelta().isNull() ? event->angleDelta() / 2 : event->pixelDelta();
@@ -361,6 +413,17 @@ void Table::scrollSideways(std::size_t row, double by)
 {
     if (Cell* cell = cellAt(row))
         cell->setSideways(cell->sideways() + by);
+}
+
+bool Table::bringBack(std::size_t row)
+{
+    Cell* cell = cellAt(row);
+    if (!cell || cell->sideways() <= 0)
+        return false;
+    if (Strip* strip = cell->strip(); QScroller::hasScroller(strip))
+        QScroller::scroller(strip)->stop();
+    cell->setSideways(0);
+    return true;
 }
 
 void Table::select(std::size_t row)
@@ -433,7 +496,7 @@ void Table::keyPressEvent(QKeyEvent* event)
     case Qt::Key_PageUp:
         return to(at > page ? at - page : 0);
     case Qt::Key_Home:
-        return to(0);
+        return bringBack(at) ? makeCurrent(at) : to(0);
     case Qt::Key_End:
         return to(_rows - 1);
     case Qt::Key_Right:

@@ -5,12 +5,14 @@
 #include "platform/Toolkit.h"
 
 #include <QAbstractScrollArea>
+#include <QLabel>
 #include <QPointer>
 #include <functional>
 #include <map>
 #include <optional>
 #include <vector>
 
+class QHelpEvent;
 class QScroller;
 
 namespace kestrum::qt {
@@ -47,6 +49,10 @@ public:
     std::optional<std::size_t> rowOf(const Cell& cell) const; ///< nothing when it is not in view
     std::size_t cells() const;                                ///< those that wait to be used again among them
 
+    /// What stands where the rows would be while there are none.
+    void setHint(std::string_view text);
+    const QLabel& hint() const { return _hint; }
+
     /// Told of a swipe from the left edge.
     void onSwipeBack(std::function<void()> action) { _swipedBack = std::move(action); }
 
@@ -54,6 +60,7 @@ public:
 
 protected:
     bool event(QEvent* event) override;
+    bool viewportEvent(QEvent* event) override;
     void resizeEvent(QResizeEvent* event) override;
     void showEvent(QShowEvent* event) override;
     void scrollContentsBy(int dx, int dy) override;
@@ -61,7 +68,7 @@ protected:
     void mousePressEvent(QMouseEvent* event) override;
     void mouseMoveEvent(QMouseEvent* event) override;
     void mouseReleaseEvent(QMouseEvent* event) override;
-    void mouseDoubleClickEvent(QMouseEvent* event) override { mousePressEvent(event); }
+    void mouseDoubleClickEvent(QMouseEvent* event) override;
     void wheelEvent(QWheelEvent* event) override;
     void focusInEvent(QFocusEvent* event) override;
     void focusOutEvent(QFocusEvent* event) override;
@@ -86,6 +93,10 @@ private:
     void scrollTo(std::size_t row);
     void feed(QScroller& scroller, int input, const QMouseEvent& event);
     void scrollSideways(std::size_t row, double by);
+    /// False when the row is where it belongs.
+    bool bringBack(std::size_t row);
+    void showTip(const QHelpEvent& event);
+    void arrangeHint();
 
     TableDataSource& _source;
     std::size_t _rows = 0;
@@ -98,6 +109,7 @@ private:
     std::function<void()> _swipedBack;
     int _laidOutWidth = -1;
     bool _filling = false, _stale = true, _ringed = false, _fitsRows = false;
+    QLabel _hint;
     QWidget* _mark; ///< how far the table is scrolled
 };
 

@@ -1,6 +1,7 @@
 #include "QtTest.h"
 
 #include "frontends/qt/Motion.h"
+#include "frontends/qt/Type.h"
 
 namespace kestrum {
 namespace {
@@ -55,6 +56,70 @@ TEST_F(ANavigationView, CutsALongTitleButSaysItWhole)
     navigation().setTitles({"A root with a name that is rather long for a button", title});
     EXPECT_EQ(navigation().titleBar().title().toStdString(), title);
     EXPECT_LE(navigation().titleBar().back().width(), 390 * 2 / 5);
+}
+
+const std::string kLongTitle = "Connected mode LTE Intra-frequency Measurement";
+
+TEST_F(ANavigationView, ShowsALongTitleWholeOnEveryHandset)
+{
+    makeVisible();
+    push();
+    for (const int width : {390, 360, 320}) {
+        window().resize(width, 640);
+        navigation().setTitles({"Kestrum", "Neighbour Cells", kLongTitle});
+        EXPECT_FALSE(navigation().titleBar().label().isCut()) << width;
+        EXPECT_GE(navigation().titleBar().label().font().pixelSize(), 13);
+    }
+}
+
+TEST_F(ANavigationView, LetsTheBackButtonGiveWayToALongTitle)
+{
+    makeVisible();
+    push();
+    const auto& bar = navigation().titleBar();
+    const auto backWidth = [&](const std::string& title) {
+        navigation().setTitles({"Serving Cell Measurements", title});
+        return navigation().titleBar().back().width();
+    };
+    const int whole = backWidth("PLMN");
+    EXPECT_EQ(bar.label().font().pixelSize(), 17);
+    std::string title;
+    while (qt::measured(QString::fromStdString(title), qt::semiboldFont(17)).width < 260) // of 390
+        title += 'n';
+    const int shorter = backWidth(title);
+    EXPECT_LT(shorter, whole);
+    EXPECT_GT(shorter, 44);
+    EXPECT_EQ(bar.label().font().pixelSize(), 17);
+    EXPECT_EQ(backWidth(kLongTitle), 44) << "the chevron alone";
+    EXPECT_EQ(navigation().titleBar().back().accessibleName(), "Back to Serving Cell Measurements");
+    EXPECT_EQ(backWidth("PLMN"), whole);
+}
+
+TEST_F(ANavigationView, TellsATitleThatIsCutInItsToolTip)
+{
+    makeVisible();
+    const std::string title(300, 'W');
+    navigation().setTitles({title});
+    EXPECT_EQ(navigation().titleBar().label().toolTip().toStdString(), title);
+    navigation().setTitles({"Kestrum"});
+    EXPECT_EQ(navigation().titleBar().label().toolTip(), "");
+}
+
+TEST_F(ANavigationView, ShowsANoticeWholeOverItsPanesUntilItIsTakenAway)
+{
+    makeVisible();
+    const std::string path = "/home/tester/.local/state/kestrum/DiagnosticLogs/KestrumSnapshot-1794809148.kestrum";
+    navigation().setNotice("Saved to " + path);
+    const auto& notice = navigation().notice();
+    EXPECT_TRUE(notice.isVisible());
+    EXPECT_EQ(notice.text().toStdString(), "Saved to " + path);
+    EXPECT_GT(notice.height(), 44) << "it is broken into lines";
+    EXPECT_EQ(notice.mapTo(&window(), notice.rect().bottomLeft()).y(), window().height() - 48 - 1);
+    push();
+    EXPECT_TRUE(notice.isVisible());
+    EXPECT_TRUE(notice.testAttribute(Qt::WA_TransparentForMouseEvents));
+    navigation().setNotice("");
+    EXPECT_FALSE(notice.isVisible());
 }
 
 TEST_F(ANavigationView, TakesNoInputOnAPaneThatLeaves)

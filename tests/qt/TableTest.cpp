@@ -1,7 +1,9 @@
 #include "QtTest.h"
 
+#include <QHelpEvent>
 #include <QScrollBar>
 #include <QScroller>
+#include <QToolTip>
 #include <QWheelEvent>
 
 #include <set>
@@ -356,6 +358,107 @@ TEST_F(ATable, ScrollsItsCurrentRowSidewaysByKeys)
     EXPECT_GT(cell(0).sideways(), 0);
     key(Qt::Key_Left);
     EXPECT_EQ(cell(0).sideways(), 0);
+}
+
+TEST_F(ATable, BringsAMovedRowBackByHomeBeforeItGoesToTheFirst)
+{
+    Rows rows = Rows::leaves(5);
+    rows.rows[2].value = kLong;
+    show(rows);
+    for (int i = 0; i < 3; ++i)
+        key(Qt::Key_Down);
+    key(Qt::Key_Right);
+    ASSERT_GT(cell(2).sideways(), 0);
+    key(Qt::Key_Home);
+    EXPECT_EQ(cell(2).sideways(), 0);
+    EXPECT_EQ(table().current(), 2u);
+    key(Qt::Key_Home);
+    EXPECT_EQ(table().current(), 0u);
+}
+
+TEST_F(ATable, BringsAMovedRowBackByADoubleTap)
+{
+    Rows rows = Rows::leaves(5);
+    rows.rows[2].value = kLong;
+    show(rows);
+    cell(2).setSideways(77);
+    tap(table(), 2);
+    EXPECT_EQ(cell(2).sideways(), 77) << "a single one leaves it";
+    QTest::mouseDClick(table().viewport(), Qt::LeftButton, {}, middleOf(table(), 2));
+    EXPECT_EQ(cell(2).sideways(), 0);
+}
+
+TEST_F(ATable, TellsOfAValueOnlyWhileSomeOfItIsOutOfSight)
+{
+    Rows rows = Rows::leaves(3);
+    rows.rows[1].value = std::string(60, '7');
+    show(rows);
+    const auto dots = [&] {
+        // Where the last of the three stands.
+        return cell(1).grab().toImage().pixelColor(380 - 2, 26) != qt::lightColours().surface;
+    };
+    EXPECT_FALSE(cell(0).isCut());
+    EXPECT_TRUE(cell(1).isCut());
+    EXPECT_TRUE(dots());
+    cell(1).setSideways(100'000); // past the value's end, as far as the strip goes
+    EXPECT_FALSE(dots());
+    const double end = cell(1).sideways();
+    cell(1).setSideways(end / 4);
+    EXPECT_TRUE(dots());
+}
+
+TEST_F(ATable, FadesALongValueAboveAWholeSeparator)
+{
+    Rows rows = Rows::leaves(3);
+    rows.rows[1].value = kLong;
+    show(rows);
+    cell(1).setSideways(50);
+    const QImage picture = cell(1).grab().toImage();
+    for (int x = 10; x < 380; ++x)
+        ASSERT_EQ(picture.pixelColor(x, 43), qt::lightColours().line) << x;
+}
+
+TEST_F(ATable, TellsANameThatIsCutInAToolTip)
+{
+    Rows rows = Rows::leaves(2);
+    const std::string name = "Connected mode LTE Intra-frequency Measurement of every neighbour";
+    rows.rows[1] = {name, std::nullopt};
+    show(rows);
+    const auto tip = [&](std::size_t row) {
+        QHelpEvent help(QEvent::ToolTip, middleOf(table(), row),
+                        table().viewport()->mapToGlobal(middleOf(table(), row)));
+        QApplication::sendEvent(table().viewport(), &help);
+        return QToolTip::isVisible() ? QToolTip::text().toStdString() : "";
+    };
+    EXPECT_EQ(tip(1), name);
+    EXPECT_EQ(cell(1).spoken().toStdString(), name);
+    EXPECT_FALSE(cell(0).isCut());
+}
+
+TEST_F(ATable, SaysInPlaceOfRowsWhatIsWaitedFor)
+{
+    Rows rows;
+    show(rows);
+    EXPECT_FALSE(table().hint().isVisible());
+    _screen->setHint("Waiting for the telephony service.\nTo start a simulated one: voxd");
+    EXPECT_TRUE(table().hint().isVisible());
+    EXPECT_EQ(table().accessibleDescription(), table().hint().text());
+    const QImage picture = table().viewport()->grab().toImage();
+    bool muted = false;
+    for (int x = 0; x < picture.width(); ++x)
+        for (int y = 0; y < picture.height(); ++y)
+            muted = muted || picture.pixelColor(x, y) == qt::lightColours().muted;
+    EXPECT_TRUE(muted);
+
+    rows = Rows::leaves(1);
+    reload();
+    EXPECT_FALSE(table().hint().isVisible());
+    EXPECT_EQ(table().accessibleDescription(), "");
+    rows.rows.clear();
+    reload();
+    EXPECT_TRUE(table().hint().isVisible());
+    _screen->setHint("");
+    EXPECT_FALSE(table().hint().isVisible());
 }
 
 TEST_F(ATable, ShowsTheRingToTheKeyboardAlone)
