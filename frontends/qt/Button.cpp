@@ -63,8 +63,10 @@ void Button::paintEvent(QPaintEvent*)
     }
     painter.setPen(_kind == Kind::Filled ? colours.onAccent() : colours.accent);
     const Qt::Alignment side = _kind == Kind::Back ? Qt::AlignLeft : Qt::AlignHCenter;
-    if (_kind != Kind::Back || width() > kRowHeight) // else the chevron alone
-        painter.drawText(place, QFontMetricsF(font()).elidedText(text(), Qt::ElideRight, place.width()),
+    // A back button that had to give way has room for its chevron alone.
+    const QFontMetricsF metrics(font());
+    if (width() > kRowHeight || metrics.horizontalAdvance(text()) <= place.width())
+        painter.drawText(place, metrics.elidedText(text(), Qt::ElideRight, place.width()),
                          QTextOption(side | Qt::AlignVCenter));
     if (_ringed)
         strokeRing(painter, _kind == Kind::Filled ? QRectF(rect()) : body, colours.accent);

@@ -46,9 +46,8 @@ void TitleBar::arrange()
     const int whole = std::min(_back.sizeHint().width(), column * 2 / 5);
     const int least = std::min(whole, kLeastBackWidth);
 
-    // Before the title is cut it shrinks, then the button gives way: a few letters, at last the chevron alone. What is
-    // still too long stands in two lines.
-    double size = kTitleSize;
+    // Before the title is cut the button keeps a few letters only, the title shrinks a little, the button keeps its
+    // chevron alone, the title shrinks further. What is still too long stands in two lines.
     int back = 0, from = kInset;
     const auto fits = [&](int backWidth) {
         back = hasBack ? backWidth : 0;
@@ -56,14 +55,12 @@ void TitleBar::arrange()
         return _title.wanted() <= to - from;
     };
     bool fitted = false;
-    for (const int smallest : {least, kRowHeight}) {
-        for (size = kTitleSize; !fitted && size >= kLeastTitleSize; --size) {
+    const std::pair<int, double> ways[] = {{least, kTextSize}, {kRowHeight, kLeastTitleSize}};
+    for (const auto& [backWidth, leastSize] : ways)
+        for (double size = kTitleSize; !fitted && size >= leastSize; --size) {
             _title.setFont(semiboldFont(size));
-            fitted = fits(smallest);
+            fitted = fits(backWidth);
         }
-        if (fitted)
-            break;
-    }
     if (fitted && back > kRowHeight)
         fits(std::clamp(to - kGap - static_cast<int>(_title.wanted()), back, whole));
     _title.setLines(fitted ? 1 : 2);
@@ -98,18 +95,18 @@ Notice::Notice(QWidget* parent) : QLabel(parent)
 
 void Notice::arrange(const QRect& over)
 {
-    const int column = std::min(over.width(), kColumn);
-    const int high = std::min(heightForWidth(column), over.height());
-    setGeometry(over.x() + (over.width() - column) / 2, over.bottom() + 1 - high, column, high);
+    const int high = std::min(heightForWidth(std::min(over.width(), kColumn)), over.height());
+    setGeometry(over.x(), over.bottom() + 1 - high, over.width(), high);
 }
 
-void Notice::paintEvent(QPaintEvent* event)
+void Notice::paintEvent(QPaintEvent*)
 {
     QPainter painter(this);
     painter.fillRect(rect(), coloursOf(*this).ground);
     fillHairline(painter, *this, 1 / devicePixelRatioF(), 0, width(), coloursOf(*this).line);
-    painter.end();
-    QLabel::paintEvent(event);
+    painter.setPen(coloursOf(*this).ink);
+    const int column = std::min(width(), kColumn), beside = (width() - column) / 2 + margin();
+    painter.drawText(rect().adjusted(beside, margin(), -beside, -margin()), Qt::TextWordWrap, text());
 }
 
 Navigation::Navigation(NavigationViewDelegate& delegate)

@@ -95,6 +95,15 @@ TEST_F(ANavigationView, LetsTheBackButtonGiveWayToALongTitle)
     EXPECT_EQ(backWidth("PLMN"), whole);
 }
 
+TEST_F(ANavigationView, NamesAPaneOfTwoLettersOnItsBackButton)
+{
+    makeVisible();
+    navigation().setTitles({"1x", "Radio"});
+    const QImage named = navigation().titleBar().back().grab().toImage();
+    navigation().setTitles({"", "Radio"});
+    EXPECT_NE(navigation().titleBar().back().grab().toImage(), named);
+}
+
 TEST_F(ANavigationView, TellsATitleThatIsCutInItsToolTip)
 {
     makeVisible();
