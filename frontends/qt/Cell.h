@@ -34,6 +34,9 @@ public:
     Strip* strip() const;
     double sideways() const; ///< its offset, 0 without one
     void setSideways(double offset);
+    /// Its labels', from the first to the last: the key, then the value.
+    QStringList texts() const;
+    QString name() const { return texts().value(0); }
     /// What a screen reader says: "key, value".
     QString spoken() const;
 

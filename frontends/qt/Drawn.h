@@ -30,7 +30,7 @@ class Drawn {
 public:
     virtual ~Drawn() = default;
     virtual void paint(QPainter& painter, const Paper& paper) const = 0;
-    virtual QStringList texts() const = 0; ///< those that are not empty
+    virtual QStringList texts() const = 0; ///< one for each label, empty ones too
     virtual void setHolder(QWidget* holder) { _holder = holder; }
 
 protected:
@@ -54,7 +54,7 @@ public:
     Font font() const override { return {_family, _size, _bold}; }
 
     void paint(QPainter& painter, const Paper& paper) const override;
-    QStringList texts() const override { return _line.isEmpty() ? QStringList() : QStringList(_line); }
+    QStringList texts() const override { return QStringList(_line); }
 
 private:
     Rect _frame;

@@ -10,6 +10,23 @@
 
 namespace kestrum::qt {
 
+namespace {
+
+void bring(QWidget& widget, QWidget& onto)
+{
+    widget.setParent(&onto);
+    widget.setEnabled(true);
+}
+
+/// Out of reach of all input: assistive technology may hold on to what is no longer on the screen.
+void takeAway(QWidget& widget)
+{
+    widget.setParent(nullptr);
+    widget.setEnabled(false);
+}
+
+} // namespace
+
 TitleBar::TitleBar(QWidget* parent) : QWidget(parent), _back(Button::Kind::Back, {}, this), _title(this)
 {
     setAutoFillBackground(true);
@@ -54,7 +71,8 @@ void TitleBar::paintEvent(QPaintEvent*)
     fillHairline(painter, *this, height(), 0, width(), coloursOf(*this).line);
 }
 
-Navigation::Navigation(NavigationViewDelegate& delegate) : _delegate(delegate), _bar(this), _stage(this)
+Navigation::Navigation(NavigationViewDelegate& delegate)
+    : _delegate(delegate), _panes(this), _bar(&_panes), _stage(&_panes)
 {
     setAutoFillBackground(true);
     _stage.setBackgroundRole(QPalette::Base);
@@ -90,27 +108,24 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
         return setTitles(std::move(titles));
 
     const bool slides = animated && transition != Transition::None && old && old->isVisible() && motionWanted();
-    const bool ringed = old && old->isRinged();
     QPointer<Still> still = slides ? new Still(*old, &_stage) : nullptr;
     _table = fresh;
     _toolbar = &screen.toolbar();
-    fresh->setParent(&_stage);
-    screen.toolbar().setParent(this);
+    bring(*fresh, _stage);
+    bring(screen.toolbar(), _panes);
     fresh->clearSelection();
     fresh->onSwipeBack([this] { goBack(); });
     setTitles(std::move(titles));
     arrange();
     fresh->show();
-    if (ringed)
-        fresh->setRinged(true);
     takeFocus();
     // What leaves goes out of reach at once; only its picture stays until it has moved away.
     if (old) {
-        old->setParent(nullptr);
+        takeAway(*old);
         old->onSwipeBack(nullptr);
     }
     if (oldBar)
-        oldBar->setParent(nullptr);
+        takeAway(*oldBar);
     if (!still)
         return;
     still->show();
@@ -144,7 +159,7 @@ void Navigation::present(SaveInterface& screen, bool animated)
 {
     // This front end makes every save interface, so it is one of ours.
     _sheet = static_cast<SaveSheet*>(&screen);
-    _sheet->setParent(this);
+    bring(*_sheet, *this);
     _sheet->setGeometry(rect());
     _sheet->show();
     _sheet->raise();
@@ -163,7 +178,7 @@ void Navigation::dismiss(bool animated)
         return;
     SaveSheet* const sheet = std::exchange(_sheet, nullptr);
     const QPointer<Still> still = animated && motionWanted() ? new Still(sheet->card(), this) : nullptr;
-    sheet->setParent(nullptr);
+    takeAway(*sheet);
     takeFocus();
     if (!still)
         return;
@@ -181,9 +196,7 @@ void Navigation::dismiss(bool animated)
 void Navigation::takeFocus()
 {
     // What lies under a modal screen is out of reach, of Tab and of a screen reader too.
-    for (QWidget* each : std::initializer_list<QWidget*>{&_bar, &_stage, _toolbar})
-        if (each)
-            each->setEnabled(!_sheet);
+    _panes.setEnabled(!_sheet);
     if (_sheet)
         _sheet->takeFocus();
     else if (_table)
@@ -192,6 +205,7 @@ void Navigation::takeFocus()
 
 void Navigation::arrange()
 {
+    _panes.setGeometry(rect());
     const int bottom = _toolbarHidden || !_toolbar ? 0 : kBarHeight;
     _bar.setGeometry(0, 0, width(), kBarHeight);
     _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - bottom));

@@ -60,6 +60,7 @@ private:
     void goBack();
 
     NavigationViewDelegate& _delegate;
+    QWidget _panes; ///< the bars and the stage: all that a modal screen covers
     TitleBar _bar;
     QWidget _stage; ///< what slides, slides in here
     QPointer<Table> _table;

@@ -140,6 +140,67 @@ TEST_F(ATable, KeepsScrollOffsetSelectionAndFocusAcrossAReload)
     EXPECT_TRUE(table().hasFocus());
 }
 
+TEST_F(ATable, KeepsFocusAndSelectionOnTheirRowWhenOneIsInsertedAbove)
+{
+    Rows rows = Rows::leaves(5);
+    rows.rows[3].value.reset();
+    show(rows);
+    for (int i = 0; i < 4; ++i)
+        key(Qt::Key_Down);
+    key(Qt::Key_Return);
+    ASSERT_EQ(table().selected(), 3u);
+    rows.rows.insert(rows.rows.begin(), {"Serving", std::nullopt});
+    reload();
+    EXPECT_EQ(table().current(), 4u);
+    EXPECT_EQ(table().selected(), 4u);
+    EXPECT_EQ(cell(4).name(), "Key 3");
+    EXPECT_TRUE(cell(4).look().ringed);
+    EXPECT_TRUE(cell(4).look().selected);
+    EXPECT_FALSE(cell(3).look().ringed);
+    key(Qt::Key_Return);
+    EXPECT_THAT(rows.selected, ElementsAre(3u, 4u));
+}
+
+TEST_F(ATable, KeepsFocusOnARowOutOfView)
+{
+    Rows rows = Rows::leaves(100);
+    show(rows);
+    key(Qt::Key_End);
+    scroll(0);
+    rows.rows.erase(rows.rows.begin() + 40, rows.rows.begin() + 50);
+    reload();
+    EXPECT_EQ(table().current(), 89u);
+    EXPECT_EQ(offset(), 0);
+}
+
+TEST_F(ATable, HandsFocusToTheNeighbourOfARowThatGoes)
+{
+    Rows rows = Rows::leaves(5);
+    show(rows);
+    for (int i = 0; i < 3; ++i)
+        key(Qt::Key_Down);
+    rows.rows.erase(rows.rows.begin() + 2);
+    rows.rows.insert(rows.rows.begin(), {"new", "row"});
+    reload();
+    EXPECT_EQ(cell(table().current().value()).name(), "Key 3");
+    key(Qt::Key_Down);
+    rows.rows.pop_back();
+    reload();
+    EXPECT_EQ(cell(table().current().value()).name(), "Key 3");
+}
+
+TEST_F(ATable, DoesNothingForATapOnARowThatMovedUnderTheFinger)
+{
+    Rows rows = Rows::leaves(5);
+    show(rows);
+    const QPoint at = middleOf(table(), 2);
+    press(*table().viewport(), at);
+    rows.rows.insert(rows.rows.begin(), {"Serving", std::nullopt});
+    reload();
+    release(*table().viewport(), at);
+    EXPECT_THAT(rows.selected, IsEmpty());
+}
+
 TEST_F(ATable, KeepsARowsSidewaysScrollAcrossAReload)
 {
     Rows rows = Rows::leaves(10);
@@ -366,6 +427,24 @@ TEST_F(ATable, ShowsTheRingToTheKeyboardAlone)
     EXPECT_FALSE(cell(2).look().ringed);
     key(Qt::Key_Down);
     EXPECT_TRUE(cell(3).look().ringed);
+}
+
+TEST_F(ATable, TakesTheRingAwayOnAPressAnywhere)
+{
+    Rows rows = Rows::leaves(5);
+    show(rows);
+    key(Qt::Key_Down);
+    ASSERT_TRUE(cell(0).look().ringed);
+    press(navigation().titleBar(), {200, 20});
+    EXPECT_FALSE(cell(0).look().ringed);
+    release(navigation().titleBar(), {200, 20});
+    key(Qt::Key_Down);
+    EXPECT_TRUE(cell(1).look().ringed);
+    static QPointingDevice* const screen = QTest::createTouchDevice();
+    QTest::touchEvent(window().windowHandle(), screen).press(0, {200, 20});
+    EXPECT_FALSE(cell(1).look().ringed);
+    QTest::touchEvent(window().windowHandle(), screen).release(0, {200, 20});
+    EXPECT_EQ(table().current(), 1u) << "the keyboard's place stays";
 }
 
 TEST_F(ATable, TellsAScreenReaderOfItsRows)
