@@ -29,6 +29,17 @@ void Card::paintEvent(QPaintEvent*)
     painter.drawRoundedRect(QRectF(rect()).adjusted(0, 0, 0, _bottomSquare ? kRadius : 0), kRadius, kRadius);
 }
 
+DescriptionField::DescriptionField(QWidget* parent) : QLineEdit(parent)
+{
+    // Assistive technology sets the text of a field without asking whether it is covered.
+    connect(this, &QLineEdit::textChanged, this, [this](const QString& text) {
+        if (isEnabled())
+            _kept = text;
+        else if (text != _kept)
+            setText(_kept);
+    });
+}
+
 void DescriptionField::resignFirstResponder()
 {
     clearFocus();
