@@ -72,12 +72,13 @@ void TitleBar::paintEvent(QPaintEvent*)
 }
 
 Navigation::Navigation(NavigationViewDelegate& delegate)
-    : _delegate(delegate), _panes(this), _bar(&_panes), _stage(&_panes)
+    : _delegate(delegate), _panes(this), _bar(&_panes), _stage(&_panes), _jump(&_panes)
 {
     setAutoFillBackground(true);
     _stage.setBackgroundRole(QPalette::Base);
     _stage.setAutoFillBackground(true);
     connect(&_bar.back(), &QAbstractButton::clicked, this, [this] { goBack(); });
+    connect(&_jump, &Jump::ended, this, [this] { takeFocus(); });
 }
 
 Navigation::~Navigation()
@@ -106,6 +107,7 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     Table* const fresh = &screen.table();
     if (old == fresh)
         return setTitles(std::move(titles));
+    _jump.end();
 
     const bool slides = animated && transition != Transition::None && old && old->isVisible() && motionWanted();
     QPointer<Still> still = slides ? new Still(*old, &_stage) : nullptr;
@@ -147,6 +149,7 @@ void Navigation::setTitles(std::vector<std::string> titles)
 {
     _depth = titles.size();
     _bar.setTitles(titles);
+    window()->setWindowTitle(_bar.title()); // a desktop adds the program's name
 }
 
 void Navigation::setToolbarHidden(bool hidden)
@@ -157,6 +160,7 @@ void Navigation::setToolbarHidden(bool hidden)
 
 void Navigation::present(SaveInterface& screen, bool animated)
 {
+    _jump.end();
     // This front end makes every save interface, so it is one of ours.
     _sheet = static_cast<SaveSheet*>(&screen);
     bring(*_sheet, *this);
@@ -211,6 +215,7 @@ void Navigation::arrange()
     _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - bottom));
     if (_table)
         _table->setGeometry(_stage.rect());
+    _jump.setGeometry(0, height() - kBarHeight, width(), kBarHeight);
     if (_toolbar) {
         _toolbar->setGeometry(0, height() - bottom, width(), kBarHeight);
         _toolbar->setVisible(bottom > 0);
@@ -228,16 +233,27 @@ void Navigation::resizeEvent(QResizeEvent*)
 
 void Navigation::keyPressEvent(QKeyEvent* event)
 {
-    switch (event->key()) {
-    case Qt::Key_Escape:
-    case Qt::Key_Backspace:
-    case Qt::Key_Back:
-        if (!event->isAutoRepeat())
-            goBack();
-        return;
-    default:
+    const int key = event->key();
+    const bool control = event->modifiers() == Qt::ControlModifier, alt = event->modifiers() == Qt::AltModifier;
+    const bool back = key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back;
+    if (event->isAutoRepeat())
         event->ignore();
-    }
+    else if (back || (alt && key == Qt::Key_Left))
+        goBack();
+    else if (control && key == Qt::Key_S)
+        pressSave();
+    else if (_table && ((control && key == Qt::Key_F) || event->text() == u"/"))
+        _jump.start(*_table);
+    else if (_table && (key == Qt::Key_F3 || event->text() == u"n"))
+        _jump.again(*_table);
+    else
+        event->ignore();
+}
+
+void Navigation::pressSave()
+{
+    if (Button* save = _toolbar ? _toolbar->save() : nullptr)
+        save->click();
 }
 
 void Navigation::mousePressEvent(QMouseEvent* event)

@@ -141,8 +141,13 @@ void SaveSheet::paintEvent(QPaintEvent*)
 
 void SaveSheet::keyPressEvent(QKeyEvent* event)
 {
-    if (event->key() == Qt::Key_Escape && !event->isAutoRepeat())
+    // A key that is still held from what opened the sheet means nothing here.
+    if (event->isAutoRepeat())
+        return;
+    if (event->key() == Qt::Key_Escape)
         _owner.cancelPressed();
+    else if (event->key() == Qt::Key_S && event->modifiers() == Qt::ControlModifier)
+        _save.click();
     // Nothing goes on to the panes below.
 }
 

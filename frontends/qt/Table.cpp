@@ -1,14 +1,19 @@
 #include "frontends/qt/Table.h"
 
+#include "frontends/qt/ContextMenu.h"
+#include "frontends/qt/Copying.h"
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Paint.h"
 
 #include <QAccessible>
+#include <QApplication>
+#include <QContextMenuEvent>
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
 #include <QScroller>
+#include <QStyleHints>
 #include <algorithm>
 #include <cmath>
 
@@ -70,6 +75,8 @@ Table::Table(TableDataSource& source) : _source(source)
     properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
     properties.setScrollMetric(QScrollerProperties::DragStartDistance, 0.0); // the table itself tells drags from taps
     QScroller::scroller(this)->setScrollerProperties(properties);
+    _hold.setSingleShot(true);
+    connect(&_hold, &QTimer::timeout, this, [this] { held(); });
     connect(&FocusRing::instance(), &FocusRing::changed, this, [this] { refreshLooks(); });
 }
 
@@ -216,10 +223,11 @@ void Table::place()
 
 void Table::refreshLooks()
 {
+    const bool ringed = FocusRing::instance().isShown() && (hasFocus() || _ringKept);
     for (const auto& [row, reusable] : _shown)
         cellOf(*reusable).setLook({.pressed = _press && _press->row == row && _press->drag == Drag::Undecided,
                                    .selected = selected() == row,
-                                   .ringed = FocusRing::instance().isShown() && hasFocus() && current() == row});
+                                   .ringed = ringed && current() == row});
 }
 
 Cell* Table::cellAt(std::size_t row) const
@@ -311,6 +319,8 @@ void Table::mousePressEvent(QMouseEvent* event)
             _press->strip = cell->strip();
             _press->name = names()(*row);
         }
+    if (_press->row)
+        _hold.start(QGuiApplication::styleHints()->mousePressAndHoldInterval());
     feed(upright, QScroller::InputPress, *event);
     if (_press->strip)
         feed(*QScroller::scroller(_press->strip.data()), QScroller::InputPress, *event);
@@ -333,6 +343,7 @@ void Table::mouseMoveEvent(QMouseEvent* event)
             _press->drag = Drag::Ignored; // a swipe back, if it goes far enough
         else
             _press->drag = _press->strip ? Drag::Sideways : Drag::Ignored;
+        _hold.stop();
         refreshLooks();
     }
     if (_press->drag == Drag::Upright)
@@ -349,16 +360,21 @@ void Table::mouseReleaseEvent(QMouseEvent* event)
     if (_press->strip)
         feed(*QScroller::scroller(_press->strip.data()), QScroller::InputRelease, *event);
     const Press press = *std::exchange(_press, std::nullopt);
+    _hold.stop();
     refreshLooks();
-    // Rows may have come or gone under the finger: what it lies on now was not meant.
-    if (press.drag == Drag::Undecided && press.row && press.row == rowAt(event->position()) &&
-        names()(*press.row) == press.name) {
+    if (press.drag == Drag::Undecided && isOnItsRow(press, event->position())) {
         mark(_current, *press.row);
         select(*press.row);
     } else if (press.drag == Drag::Ignored && press.at.x() < kEdge && event->position().x() - press.at.x() > kSwipe &&
                _swipedBack) {
         _swipedBack();
     }
+}
+
+bool Table::isOnItsRow(const Press& press, QPointF point)
+{
+    // Rows may have come or gone under the finger: what it lies on now was not meant.
+    return press.row && press.row == rowAt(point) && names()(*press.row) == press.name;
 }
 
 void Table::wheelEvent(QWheelEvent* event)
@@ -392,6 +408,49 @@ void Table::select(std::size_t row)
     _source.didSelectRowAtIndexPath(*this, IndexPath{0, row});
 }
 
+// The row's menu -------------------------------------------------------------------------------------------------
+
+void Table::held()
+{
+    if (!_press || !isVisible() || !isEnabled())
+        return;
+    const Press press = *std::exchange(_press, std::nullopt);
+    QScroller::scroller(this)->stop();
+    if (press.strip)
+        QScroller::scroller(press.strip.data())->stop();
+    refreshLooks();
+    if (isOnItsRow(press, press.at))
+        openMenu(press.row, viewport()->mapToGlobal(press.at).toPoint());
+}
+
+void Table::contextMenuEvent(QContextMenuEvent* event)
+{
+    if (event->reason() == QContextMenuEvent::Keyboard)
+        openMenuOfCurrentRow();
+    else
+        openMenu(rowAt(event->pos()), event->globalPos());
+}
+
+void Table::openMenuOfCurrentRow()
+{
+    if (current())
+        scrollTo(*current());
+    const Cell* cell = current() ? cellAt(*current()) : nullptr;
+    const QPoint at = cell ? cell->geometry().center() : viewport()->rect().center();
+    openMenu(current(), viewport()->mapToGlobal(at));
+}
+
+void Table::openMenu(std::optional<std::size_t> row, QPoint at)
+{
+    // A platform may report one key both as a key and as the wish for a menu.
+    if (!_rows || QApplication::activePopupWidget())
+        return;
+    if (row)
+        mark(_current, *row);
+    refreshLooks();
+    new ContextMenu(*this, row, at);
+}
+
 // Keyboard ------------------------------------------------------------------------------------------------------
 
 bool Table::event(QEvent* event)
@@ -400,6 +459,12 @@ bool Table::event(QEvent* event)
     if (event->type() == QEvent::ApplicationFontChange && isVisible())
         fill(true);
     return QAbstractScrollArea::event(event);
+}
+
+void Table::keepRing(bool kept)
+{
+    _ringKept = kept;
+    refreshLooks();
 }
 
 void Table::makeCurrent(std::size_t row)
@@ -430,9 +495,15 @@ void Table::keyPressEvent(QKeyEvent* event)
         makeCurrent(std::min(row, _rows - 1));
     };
     const std::size_t at = current().value_or(0);
-    if (_rows == 0)
+    if (_rows == 0 || event->modifiers() & Qt::AltModifier)
         return event->ignore();
     switch (event->key()) {
+    case Qt::Key_C:
+        return current() && event->modifiers() == Qt::ControlModifier ? copy(rowAsText(*this, at)) : event->ignore();
+    case Qt::Key_F10:
+        return event->modifiers() == Qt::ShiftModifier ? openMenuOfCurrentRow() : event->ignore();
+    case Qt::Key_Menu:
+        return openMenuOfCurrentRow();
     case Qt::Key_Down:
         return to(current() ? at + 1 : 0);
     case Qt::Key_Up:

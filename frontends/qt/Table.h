@@ -7,6 +7,7 @@
 
 #include <QAbstractScrollArea>
 #include <QPointer>
+#include <QTimer>
 #include <functional>
 #include <map>
 #include <optional>
@@ -48,6 +49,9 @@ public:
     QStringList textsOf(std::size_t row);
     std::size_t cells() const; ///< those that wait to be used again among them
 
+    /// The current row shows its ring although the keyboard is elsewhere: in the field that looks for a row.
+    void keepRing(bool kept);
+
     /// Told of a swipe from the left edge.
     void onSwipeBack(std::function<void()> action) { _swipedBack = std::move(action); }
 
@@ -66,6 +70,7 @@ protected:
     void wheelEvent(QWheelEvent* event) override;
     void focusInEvent(QFocusEvent* event) override;
     void focusOutEvent(QFocusEvent* event) override;
+    void contextMenuEvent(QContextMenuEvent* event) override;
 
 private:
     enum class Drag { Undecided, Sideways, Upright, Ignored };
@@ -93,6 +98,10 @@ private:
     void scrollTo(std::size_t row);
     void feed(QScroller& scroller, int input, const QMouseEvent& event);
     void scrollSideways(std::size_t row, double by);
+    bool isOnItsRow(const Press& press, QPointF point);
+    void held();
+    void openMenu(std::optional<std::size_t> row, QPoint at);
+    void openMenuOfCurrentRow();
 
     TableDataSource& _source;
     std::size_t _rows = 0;
@@ -104,7 +113,8 @@ private:
     std::optional<Press> _press;
     std::function<void()> _swipedBack;
     int _laidOutWidth = -1;
-    bool _filling = false, _stale = true, _fitsRows = false;
+    bool _filling = false, _stale = true, _fitsRows = false, _ringKept = false;
+    QTimer _hold;   ///< runs while a finger rests on a row
     QWidget* _mark; ///< how far the table is scrolled
 };
 
