@@ -4,6 +4,7 @@
 #include <QScroller>
 #include <QWheelEvent>
 
+#include <cmath>
 #include <set>
 
 namespace kestrum {
@@ -272,6 +273,47 @@ TEST_F(ATable, LeavesTheContentAreaTheRowLessItsAccessory)
     show(rows);
     EXPECT_EQ(cell(0).contentBounds(), (Rect{0, 0, 380, 44}));
     EXPECT_EQ(cell(1).contentBounds(), (Rect{0, 0, 358, 44}));
+}
+
+/// The layout at the very width where a value just fits, with the real font's measures.
+TEST_F(ATable, PutsAValueThatFitsExactlyBehindItsKey)
+{
+    Rows rows = Rows::leaves(1);
+    show(rows);
+    const auto width = [](const std::string& text) { return toolkit().measure(text, boldSystemFont(15)).width; };
+    std::string key, value;
+    const auto needed = [&] { return width(key) + 60 + width(value); };
+    const auto isWhole = [&] { return needed() == std::floor(needed()); };
+    // A window is whole points wide, so what the texts need must be too.
+    for (char last = '!'; last <= '~' && (key.empty() || !isWhole()); ++last)
+        for (char first = '!'; first <= '~' && (key.empty() || !isWhole()); ++first) {
+            key = std::string("Measured RSRP ") + first;
+            value = std::string("-95.25 dBm, and falling ") + last;
+        }
+    ASSERT_TRUE(isWhole()) << needed();
+    ASSERT_LT(needed(), 700);
+    ASSERT_GT(needed(), 280);
+    const auto layout = [&](double content) {
+        window().resize(static_cast<int>(content) + 10, window().height());
+        auto made = KestrumCell::initWithStyle(toolkit(), table(), CellStyle::KeyAndDetail, "row");
+        made->setTexts(key, value);
+        made->setLayout();
+        EXPECT_EQ(made->cell().contentBounds().width, content);
+        return made;
+    };
+    const auto reach = [](KestrumCell& made) {
+        const auto* strip = static_cast<qt::Cell&>(made.cell()).strip();
+        return strip ? strip->reach() : 0;
+    };
+    const auto exact = layout(needed());
+    EXPECT_EQ(exact->value()->frame().x, 10 + width(key) + 50);
+    EXPECT_EQ(reach(*exact), 0);
+    const auto roomy = layout(needed() + 1);
+    EXPECT_EQ(roomy->value()->frame().x, needed() + 1 - width(value));
+    EXPECT_EQ(reach(*roomy), 0);
+    const auto tight = layout(needed() - 1);
+    EXPECT_EQ(tight->value()->frame().x, 10 + width(key) + 50);
+    EXPECT_EQ(reach(*tight), width(key) + width(value));
 }
 
 TEST_F(ATable, SelectsTheRowThatIsTapped)
