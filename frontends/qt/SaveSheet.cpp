@@ -42,7 +42,9 @@ DescriptionField::DescriptionField(QWidget* parent) : QLineEdit(parent)
 
 void DescriptionField::resignFirstResponder()
 {
-    clearFocus();
+    // The sheet keeps the keyboard: without a place in the window Escape and Tab would go nowhere.
+    if (hasFocus())
+        parentWidget()->setFocus(Qt::OtherFocusReason);
     QGuiApplication::inputMethod()->hide();
 }
 

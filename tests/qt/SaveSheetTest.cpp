@@ -104,6 +104,27 @@ TEST_F(ASaveSheet, ClosesTheKeyboardOnReturnAndDoesNotSave)
     EXPECT_FALSE(sheet().description().hasFocus());
 }
 
+TEST_F(ASaveSheet, StillAnswersKeysAfterTheKeyboardWasClosed)
+{
+    present();
+    QTest::keyClick(&sheet().description(), Qt::Key_Return);
+    QTest::keyClick(window().windowHandle(), Qt::Key_Tab);
+    EXPECT_TRUE(sheet().description().hasFocus());
+    QTest::keyClick(&sheet().description(), Qt::Key_Return);
+    QTest::keyClick(window().windowHandle(), Qt::Key_Escape);
+    EXPECT_EQ(owner.cancels, 1);
+}
+
+TEST_F(ASaveSheet, SavesByControlSButNotByTheHeldKeyThatOpenedIt)
+{
+    present();
+    QKeyEvent held(QEvent::KeyPress, Qt::Key_S, Qt::ControlModifier, {}, true);
+    QApplication::sendEvent(&sheet().description(), &held);
+    EXPECT_EQ(owner.saves, 0);
+    QTest::keyClick(&sheet().description(), Qt::Key_S, Qt::ControlModifier);
+    EXPECT_EQ(owner.saves, 1);
+}
+
 TEST_F(ASaveSheet, ClosesTheKeyboardOnATouchOutsideTheField)
 {
     present();
