@@ -27,7 +27,7 @@ Jump::Jump(QWidget* parent) : QWidget(parent), _field(this), _missing(this)
     _field.setFrame(false);
     _field.setPlaceholderText(QStringLiteral("Jump to a name"));
     _field.setAccessibleName(QStringLiteral("Jump to a name"));
-    QPalette ground = _field.palette();
+    QPalette ground; // the rest follows the scheme
     ground.setColor(QPalette::Base, Qt::transparent);
     _field.setPalette(ground);
     _missing.setFont(fontOf(systemFont(kStatusSize)));

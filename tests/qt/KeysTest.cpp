@@ -268,6 +268,16 @@ TEST_F(Keys, JumpToARowOutOfViewByControlF)
     key(Qt::Key_Return);
 }
 
+TEST_F(Keys, TypeTheNameInTheColoursOfTheScheme)
+{
+    key(Qt::Key_Slash);
+    for (const auto* colours : {&qt::darkColours(), &qt::lightColours()}) {
+        QApplication::setPalette(qt::paletteOf(*colours));
+        EXPECT_TRUE(QTest::qWaitFor([&] { return jump().field().palette().color(QPalette::Text) == colours->ink; }));
+    }
+    key(Qt::Key_Escape);
+}
+
 TEST_F(Keys, ReturnWhereTheJumpBeganOnEscape)
 {
     walkTo(5);
