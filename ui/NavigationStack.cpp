@@ -25,6 +25,9 @@ NavigationStack::~NavigationStack()
 
 void NavigationStack::pushViewController(std::shared_ptr<KestrumPaneController> pane, bool animated)
 {
+    // What lies under the save screen takes no input, whatever way it comes.
+    if (_presenting)
+        return;
     topViewController().viewWillDisappear(animated);
     _panes.push_back(std::move(pane));
     topViewController().setNavigationController(this);
@@ -80,7 +83,6 @@ void NavigationStack::titlesChanged()
 
 void NavigationStack::backRequested()
 {
-    // What lies under the save screen takes no input.
     if (!_presenting && _panes.size() > 1)
         popToViewController(**std::prev(_panes.end(), 2), true);
 }

@@ -40,6 +40,7 @@ public:
     const Panes& viewControllers() const { return _panes; }
     KestrumPaneController& topViewController() const { return *_panes.back(); }
 
+    /// Nothing happens under the save screen.
     void pushViewController(std::shared_ptr<KestrumPaneController> pane, bool animated);
     /// Drops what lies over `pane`. Nothing happens when it is the top, or not on the stack.
     void popToViewController(const KestrumPaneController& pane, bool animated);

@@ -1,9 +1,13 @@
 #include "frontends/qt/Accessibility.h"
 
+#include "frontends/qt/Alert.h"
+#include "frontends/qt/FocusRing.h"
+#include "frontends/qt/MainWindow.h"
 #include "frontends/qt/Table.h"
 
 #include <QAccessible>
 #include <QAccessibleWidget>
+#include <QScrollBar>
 #include <algorithm>
 
 namespace kestrum::qt {
@@ -30,12 +34,12 @@ public:
     QAccessible::State state() const override
     {
         QAccessible::State state = QAccessibleWidget::state();
-        state.focusable = state.selectable = true;
+        state.focusable = state.selectable = !state.disabled;
         if (const auto [table, row] = place(); table) {
             state.focused = table->hasFocus() && table->current() == row;
             state.selected = table->selected() == row;
         }
-        state.checked = cell().accessory() == Accessory::CheckMark;
+        state.checkable = state.checked = cell().accessory() == Accessory::CheckMark;
         state.hasPopup = false;
         state.expandable = cell().accessory() == Accessory::DisclosureIndicator;
         return state;
@@ -46,8 +50,10 @@ public:
     void doAction(const QString& name) override
     {
         const auto [table, row] = place();
-        if (!table)
+        // Assistive technology may hold on to rows that are covered, or of a pane that has left.
+        if (!table || !table->isVisible() || !table->isEnabled())
             return;
+        FocusRing::instance().setShown(true);
         table->makeCurrent(row);
         if (name == pressAction())
             table->select(row);
@@ -112,12 +118,72 @@ private:
     Table& table() const { return *static_cast<Table*>(widget()); }
 };
 
-QAccessibleInterface* makeInterface(const QString&, QObject* object)
+/// A widget that holds others. What is hidden is no part of it.
+class AccessibleGroup final : public QAccessibleWidget {
+public:
+    using QAccessibleWidget::QAccessibleWidget;
+
+    int childCount() const override { return static_cast<int>(shown().size()); }
+
+    QAccessibleInterface* child(int index) const override
+    {
+        return QAccessible::queryAccessibleInterface(shown().value(index));
+    }
+
+    int indexOfChild(const QAccessibleInterface* child) const override
+    {
+        return static_cast<int>(shown().indexOf(qobject_cast<QWidget*>(child->object())));
+    }
+
+    QAccessibleInterface* childAt(int x, int y) const override
+    {
+        const auto children = shown();
+        for (auto each = children.rbegin(); each != children.rend(); ++each) // what covers comes last
+            if ((*each)->rect().contains((*each)->mapFromGlobal(QPoint(x, y))))
+                return QAccessible::queryAccessibleInterface(*each);
+        return nullptr;
+    }
+
+    // It would take the focus from what is inside.
+    QStringList actionNames() const override { return {}; }
+    void doAction(const QString&) override {}
+
+    QAccessible::State state() const override
+    {
+        QAccessible::State state = QAccessibleWidget::state();
+        state.modal = role() == QAccessible::Dialog;
+        return state;
+    }
+
+private:
+    QWidgetList shown() const
+    {
+        QWidgetList shown = widget()->findChildren<QWidget*>(Qt::FindDirectChildrenOnly);
+        shown.removeIf([](const QWidget* each) { return each->isHidden() || each->isWindow(); });
+        return shown;
+    }
+};
+
+QAccessible::Role roleOf(const QWidget& group)
+{
+    if (dynamic_cast<const MainWindow*>(&group))
+        return QAccessible::Window;
+    if (dynamic_cast<const SaveSheet*>(&group) || dynamic_cast<const Alert*>(&group))
+        return QAccessible::Dialog;
+    return QAccessible::Client;
+}
+
+QAccessibleInterface* makeInterface(const QString& type, QObject* object)
 {
     if (auto* cell = dynamic_cast<Cell*>(object))
         return new AccessibleCell(*cell);
     if (auto* table = dynamic_cast<Table*>(object))
         return new AccessibleTable(*table);
+    // A table scrolls to the row that is asked for; its scroll bars are never shown, and not to be moved from outside.
+    if (auto* bar = qobject_cast<QScrollBar*>(object))
+        return new QAccessibleWidget(bar, QAccessible::ScrollBar);
+    if (auto* group = qobject_cast<QWidget*>(object); group && type == QStringLiteral("QWidget"))
+        return new AccessibleGroup(group, roleOf(*group));
     return nullptr;
 }
 

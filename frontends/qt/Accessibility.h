@@ -2,7 +2,8 @@
 
 namespace kestrum::qt {
 
-/// Makes tables and their rows known to screen readers: a list of "key, value" items that can be pressed.
+/// Makes the window known to screen readers: tables as lists of "key, value" items that can be pressed, modal screens
+/// as dialogs. What such a screen covers takes no action.
 void installAccessibility();
 
 } // namespace kestrum::qt

@@ -1,6 +1,7 @@
 #include "frontends/qt/Button.h"
 
 #include "frontends/qt/Colours.h"
+#include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Paint.h"
 #include "frontends/qt/Type.h"
@@ -24,6 +25,7 @@ Button::Button(Kind kind, const QString& text, QWidget* parent) : QAbstractButto
     setText(text);
     setFont(kind == Kind::Back ? fontOf(systemFont(kTextSize)) : semiboldFont(kTextSize));
     setFocusPolicy(Qt::StrongFocus);
+    connect(&FocusRing::instance(), &FocusRing::changed, this, QOverload<>::of(&QWidget::update));
 }
 
 QSize Button::sizeHint() const
@@ -68,7 +70,7 @@ void Button::paintEvent(QPaintEvent*)
     if (width() > kRowHeight || metrics.horizontalAdvance(text()) <= place.width())
         painter.drawText(place, metrics.elidedText(text(), Qt::ElideRight, place.width()),
                          QTextOption(side | Qt::AlignVCenter));
-    if (_ringed)
+    if (hasFocus() && FocusRing::instance().isShown())
         strokeRing(painter, _kind == Kind::Filled ? QRectF(rect()) : body, colours.accent);
 }
 
@@ -80,20 +82,6 @@ void Button::keyPressEvent(QKeyEvent* event)
     if (event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter)
         return click();
     QAbstractButton::keyPressEvent(event);
-}
-
-void Button::focusInEvent(QFocusEvent* event)
-{
-    _ringed = event->reason() != Qt::MouseFocusReason;
-    QAbstractButton::focusInEvent(event);
-    update();
-}
-
-void Button::focusOutEvent(QFocusEvent* event)
-{
-    _ringed = false;
-    QAbstractButton::focusOutEvent(event);
-    update();
 }
 
 } // namespace kestrum::qt

@@ -17,12 +17,9 @@ public:
 protected:
     void paintEvent(QPaintEvent*) override;
     void keyPressEvent(QKeyEvent* event) override;
-    void focusInEvent(QFocusEvent* event) override;
-    void focusOutEvent(QFocusEvent* event) override;
 
 private:
     Kind _kind;
-    bool _ringed = false;
 };
 
 } // namespace kestrum::qt

@@ -92,13 +92,20 @@ void Cell::setSideways(double offset)
         scrollable->setOffset(offset);
 }
 
-QString Cell::spoken() const
+QStringList Cell::texts() const
 {
     QStringList texts;
     for (const auto& view : _views)
         if (const auto* drawn = dynamic_cast<const Drawn*>(view.get()))
             texts += drawn->texts();
-    return texts.join(QStringLiteral(", "));
+    return texts;
+}
+
+QString Cell::spoken() const
+{
+    QStringList spoken = texts();
+    spoken.removeAll(QString());
+    return spoken.join(QStringLiteral(", "));
 }
 
 bool Cell::isCut() const

@@ -36,6 +36,9 @@ public:
     void setSideways(double offset);
     /// Whether some of its text is out of sight.
     bool isCut() const;
+    /// Its labels', from the first to the last: the key, then the value.
+    QStringList texts() const;
+    QString name() const { return texts().value(0); }
     /// What a screen reader says: "key, value".
     QString spoken() const;
 

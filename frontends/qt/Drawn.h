@@ -30,7 +30,7 @@ class Drawn {
 public:
     virtual ~Drawn() = default;
     virtual void paint(QPainter& painter, const Paper& paper) const = 0;
-    virtual QStringList texts() const = 0; ///< those that are not empty
+    virtual QStringList texts() const = 0; ///< one for each label, empty ones too
     /// Whether some of it is out of sight in a holder of that width.
     virtual bool isCut(double width) const = 0;
     virtual void setHolder(QWidget* holder) { _holder = holder; }
@@ -56,7 +56,7 @@ public:
     Font font() const override { return {_family, _size, _bold}; }
 
     void paint(QPainter& painter, const Paper& paper) const override;
-    QStringList texts() const override { return _line.isEmpty() ? QStringList() : QStringList(_line); }
+    QStringList texts() const override { return QStringList(_line); }
 
     bool isCut(double width) const override;
 

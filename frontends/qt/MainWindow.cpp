@@ -1,6 +1,7 @@
 #include "frontends/qt/MainWindow.h"
 
 #include "frontends/qt/Measures.h"
+#include "frontends/qt/Shortcuts.h"
 #include "frontends/qt/Type.h"
 
 #include <QGuiApplication>
@@ -69,6 +70,7 @@ MainWindow::MainWindow()
     setWindowTitle(QStringLiteral("Kestrum"));
     setMinimumSize(280, 320);
     setGeometry(screenArea());
+    installShortcuts(*this);
 }
 
 MainWindow::~MainWindow()
@@ -84,6 +86,7 @@ void MainWindow::setRoot(NavigationView& root)
     _root = static_cast<Navigation*>(&root);
     _root->setParent(this);
     _root->setGeometry(rect());
+    setWindowTitle(_root->titleBar().title());
     _root->show();
 }
 

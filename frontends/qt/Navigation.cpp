@@ -16,6 +16,19 @@ namespace {
 constexpr double kLeastTitleSize = 13;
 constexpr int kLeastBackWidth = 72; // points that show a few letters of where it goes
 
+void bring(QWidget& widget, QWidget& onto)
+{
+    widget.setParent(&onto);
+    widget.setEnabled(true);
+}
+
+/// Out of reach of all input: assistive technology may hold on to what is no longer on the screen.
+void takeAway(QWidget& widget)
+{
+    widget.setParent(nullptr);
+    widget.setEnabled(false);
+}
+
 } // namespace
 
 TitleBar::TitleBar(QWidget* parent) : QWidget(parent), _back(Button::Kind::Back, {}, this), _title(this)
@@ -110,12 +123,13 @@ void Notice::paintEvent(QPaintEvent*)
 }
 
 Navigation::Navigation(NavigationViewDelegate& delegate)
-    : _delegate(delegate), _bar(this), _stage(this), _notice(&_stage)
+    : _delegate(delegate), _panes(this), _bar(&_panes), _stage(&_panes), _notice(&_stage), _jump(&_panes)
 {
     setAutoFillBackground(true);
     _stage.setBackgroundRole(QPalette::Base);
     _stage.setAutoFillBackground(true);
     connect(&_bar.back(), &QAbstractButton::clicked, this, [this] { goBack(); });
+    connect(&_jump, &Jump::ended, this, [this] { takeFocus(); });
 }
 
 Navigation::~Navigation()
@@ -144,29 +158,27 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     Table* const fresh = &screen.table();
     if (old == fresh)
         return setTitles(std::move(titles));
+    _jump.end();
 
     const bool slides = animated && transition != Transition::None && old && old->isVisible() && motionWanted();
-    const bool ringed = old && old->isRinged();
     QPointer<Still> still = slides ? new Still(*old, &_stage) : nullptr;
     _table = fresh;
     _toolbar = &screen.toolbar();
-    fresh->setParent(&_stage);
-    screen.toolbar().setParent(this);
+    bring(*fresh, _stage);
+    bring(screen.toolbar(), _panes);
     fresh->clearSelection();
     fresh->onSwipeBack([this] { goBack(); });
     setTitles(std::move(titles));
     arrange();
     fresh->show();
-    if (ringed)
-        fresh->setRinged(true);
     takeFocus();
     // What leaves goes out of reach at once; only its picture stays until it has moved away.
     if (old) {
-        old->setParent(nullptr);
+        takeAway(*old);
         old->onSwipeBack(nullptr);
     }
     if (oldBar)
-        oldBar->setParent(nullptr);
+        takeAway(*oldBar);
     if (!still)
         return;
     still->show();
@@ -189,6 +201,7 @@ void Navigation::setTitles(std::vector<std::string> titles)
 {
     _depth = titles.size();
     _bar.setTitles(titles);
+    window()->setWindowTitle(_bar.title()); // a desktop adds the program's name
 }
 
 void Navigation::setToolbarHidden(bool hidden)
@@ -212,9 +225,10 @@ void Navigation::setNotice(std::string_view text)
 
 void Navigation::present(SaveInterface& screen, bool animated)
 {
+    _jump.end();
     // This front end makes every save interface, so it is one of ours.
     _sheet = static_cast<SaveSheet*>(&screen);
-    _sheet->setParent(this);
+    bring(*_sheet, *this);
     _sheet->setGeometry(rect());
     _sheet->show();
     _sheet->raise();
@@ -233,7 +247,7 @@ void Navigation::dismiss(bool animated)
         return;
     SaveSheet* const sheet = std::exchange(_sheet, nullptr);
     const QPointer<Still> still = animated && motionWanted() ? new Still(sheet->card(), this) : nullptr;
-    sheet->setParent(nullptr);
+    takeAway(*sheet);
     takeFocus();
     if (!still)
         return;
@@ -251,9 +265,7 @@ void Navigation::dismiss(bool animated)
 void Navigation::takeFocus()
 {
     // What lies under a modal screen is out of reach, of Tab and of a screen reader too.
-    for (QWidget* each : std::initializer_list<QWidget*>{&_bar, &_stage, _toolbar})
-        if (each)
-            each->setEnabled(!_sheet);
+    _panes.setEnabled(!_sheet);
     if (_sheet)
         _sheet->takeFocus();
     else if (_table)
@@ -262,6 +274,7 @@ void Navigation::takeFocus()
 
 void Navigation::arrange()
 {
+    _panes.setGeometry(rect());
     const int bottom = _toolbarHidden || !_toolbar ? 0 : kBarHeight;
     _bar.setGeometry(0, 0, width(), kBarHeight);
     _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - bottom));
@@ -269,6 +282,7 @@ void Navigation::arrange()
         _table->setGeometry(_stage.rect());
     _notice.arrange(_stage.rect());
     _notice.raise();
+    _jump.setGeometry(0, height() - kBarHeight, width(), kBarHeight);
     if (_toolbar) {
         _toolbar->setGeometry(0, height() - bottom, width(), kBarHeight);
         _toolbar->setVisible(bottom > 0);
@@ -286,16 +300,27 @@ void Navigation::resizeEvent(QResizeEvent*)
 
 void Navigation::keyPressEvent(QKeyEvent* event)
 {
-    switch (event->key()) {
-    case Qt::Key_Escape:
-    case Qt::Key_Backspace:
-    case Qt::Key_Back:
-        if (!event->isAutoRepeat())
-            goBack();
-        return;
-    default:
+    const int key = event->key();
+    const bool control = event->modifiers() == Qt::ControlModifier, alt = event->modifiers() == Qt::AltModifier;
+    const bool back = key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back;
+    if (event->isAutoRepeat())
         event->ignore();
-    }
+    else if (back || (alt && key == Qt::Key_Left))
+        goBack();
+    else if (control && key == Qt::Key_S)
+        pressSave();
+    else if (_table && ((control && key == Qt::Key_F) || event->text() == u"/"))
+        _jump.start(*_table);
+    else if (_table && (key == Qt::Key_F3 || event->text() == u"n"))
+        _jump.again(*_table);
+    else
+        event->ignore();
+}
+
+void Navigation::pressSave()
+{
+    if (Button* save = _toolbar ? _toolbar->save() : nullptr)
+        save->click();
 }
 
 void Navigation::mousePressEvent(QMouseEvent* event)

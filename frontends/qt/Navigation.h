@@ -1,6 +1,7 @@
 #pragma once
 
 #include "frontends/qt/Button.h"
+#include "frontends/qt/Jump.h"
 #include "frontends/qt/Motion.h"
 #include "frontends/qt/SaveSheet.h"
 #include "frontends/qt/Screen.h"
@@ -58,6 +59,7 @@ public:
     const Notice& notice() const { return _notice; }
     Toolbar* toolbar() const { return _toolbar; }
     SaveSheet* sheet() const { return _sheet; }
+    Jump& jump() { return _jump; }
     bool isMoving() const { return _slide.isRunning() || _rise.isRunning(); }
     /// Gives the keyboard to what is on top: the sheet, or the pane.
     void takeFocus();
@@ -70,11 +72,14 @@ protected:
 private:
     void arrange();
     void goBack();
+    void pressSave();
 
     NavigationViewDelegate& _delegate;
+    QWidget _panes; ///< the bars and the stage: all that a modal screen covers
     TitleBar _bar;
     QWidget _stage; ///< what slides, slides in here
     Notice _notice; ///< over the stage's lower end
+    Jump _jump;
     QPointer<Table> _table;
     QPointer<Toolbar> _toolbar;
     QPointer<SaveSheet> _sheet;

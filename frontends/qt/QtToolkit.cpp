@@ -2,6 +2,7 @@
 
 #include "frontends/qt/Accessibility.h"
 #include "frontends/qt/Appearance.h"
+#include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Icon.h"
 #include "frontends/qt/MainWindow.h"
 #include "frontends/qt/TerminationSignals.h"
@@ -63,6 +64,7 @@ public:
         QApplication::setWindowIcon(windowIcon());
         installAccessibility();
         chooseSansSerif();
+        FocusRing::instance();
     }
 
     Rect mainScreenBounds() const override

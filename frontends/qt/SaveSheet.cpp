@@ -29,9 +29,22 @@ void Card::paintEvent(QPaintEvent*)
     painter.drawRoundedRect(QRectF(rect()).adjusted(0, 0, 0, _bottomSquare ? kRadius : 0), kRadius, kRadius);
 }
 
+DescriptionField::DescriptionField(QWidget* parent) : QLineEdit(parent)
+{
+    // Assistive technology sets the text of a field without asking whether it is covered.
+    connect(this, &QLineEdit::textChanged, this, [this](const QString& text) {
+        if (isEnabled())
+            _kept = text;
+        else if (text != _kept)
+            setText(_kept);
+    });
+}
+
 void DescriptionField::resignFirstResponder()
 {
-    clearFocus();
+    // The sheet keeps the keyboard: without a place in the window Escape and Tab would go nowhere.
+    if (hasFocus())
+        parentWidget()->setFocus(Qt::OtherFocusReason);
     QGuiApplication::inputMethod()->hide();
 }
 
@@ -130,8 +143,13 @@ void SaveSheet::paintEvent(QPaintEvent*)
 
 void SaveSheet::keyPressEvent(QKeyEvent* event)
 {
-    if (event->key() == Qt::Key_Escape && !event->isAutoRepeat())
+    // A key that is still held from what opened the sheet means nothing here.
+    if (event->isAutoRepeat())
+        return;
+    if (event->key() == Qt::Key_Escape)
         _owner.cancelPressed();
+    else if (event->key() == Qt::Key_S && event->modifiers() == Qt::ControlModifier)
+        _save.click();
     // Nothing goes on to the panes below.
 }
 

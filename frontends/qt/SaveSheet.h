@@ -25,12 +25,15 @@ private:
 
 class DescriptionField final : public QLineEdit, public TextField {
 public:
-    using QLineEdit::QLineEdit;
+    explicit DescriptionField(QWidget* parent);
     std::optional<std::string> text() const override { return QLineEdit::text().toStdString(); }
     void resignFirstResponder() override;
 
 protected:
     void paintEvent(QPaintEvent* event) override;
+
+private:
+    QString _kept;
 };
 
 /// The save screen: a sheet over the panes.

@@ -2,6 +2,7 @@
 
 #include "frontends/qt/Table.h"
 #include "frontends/qt/Toolbar.h"
+#include "frontends/qt/Type.h"
 
 namespace kestrum::qt {
 
@@ -11,7 +12,11 @@ public:
     explicit Screen(TableDataSource& source) : _table(source) { _table.hide(); }
 
     Table& table() override { return _table; }
-    void setTitle(std::string_view title) override { _title = title; }
+    void setTitle(std::string_view title) override
+    {
+        _title = title;
+        _table.setAccessibleName(lineOf(title));
+    }
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool) override { _toolbar.setItems(std::move(items)); }
     void resignFirstResponder() override { _table.clearFocus(); }

@@ -1,15 +1,21 @@
 #include "frontends/qt/Table.h"
 
+#include "frontends/qt/ContextMenu.h"
+#include "frontends/qt/Copying.h"
+#include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Paint.h"
 #include "frontends/qt/Type.h"
 
 #include <QAccessible>
+#include <QApplication>
+#include <QContextMenuEvent>
 #include <QHelpEvent>
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
 #include <QScroller>
+#include <QStyleHints>
 #include <QToolTip>
 #include <algorithm>
 #include <cmath>
@@ -79,6 +85,9 @@ Table::Table(TableDataSource& source) : _source(source), _hint(viewport())
     properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
     properties.setScrollMetric(QScrollerProperties::DragStartDistance, 0.0); // the table itself tells drags from taps
     QScroller::scroller(this)->setScrollerProperties(properties);
+    _hold.setSingleShot(true);
+    connect(&_hold, &QTimer::timeout, this, [this] { held(); });
+    connect(&FocusRing::instance(), &FocusRing::changed, this, [this] { refreshLooks(); });
 }
 
 Table::~Table()
@@ -117,13 +126,13 @@ std::unique_ptr<TableCell> Table::makeCell(CellStyle style)
 
 void Table::deselectRow(IndexPath indexPath, bool)
 {
-    if (_selected == indexPath.row)
+    if (selected() == indexPath.row)
         clearSelection();
 }
 
 void Table::clearSelection()
 {
-    _selected.reset();
+    _selected.clear();
     refreshLooks();
 }
 
@@ -169,10 +178,6 @@ void Table::fill(bool anew)
         _stale = false;
         _rows = _source.numberOfRowsInSection(*this, 0);
         _laidOutWidth = columnWidth();
-        if (_current >= _rows)
-            _current = _rows ? std::optional(_rows - 1) : std::nullopt;
-        if (_selected >= _rows)
-            _selected.reset();
     }
     const int height = viewport()->height();
     const int whole = static_cast<int>(std::min<std::size_t>(_rows, 40'000'000)) * kRowHeight;
@@ -194,6 +199,10 @@ void Table::fill(bool anew)
     for (std::size_t row = first; row < end; ++row)
         if (!_shown.contains(row))
             showRow(row);
+    if (anew) {
+        _current.follow(_rows, names());
+        _selected.follow(_rows, names());
+    }
     // Only now: what shows a row again is never hidden in between.
     for (const auto& cell : left)
         if (cell && !rowOf(*cell))
@@ -241,10 +250,11 @@ void Table::place()
 
 void Table::refreshLooks()
 {
+    const bool ringed = FocusRing::instance().isShown() && (hasFocus() || _ringKept);
     for (const auto& [row, reusable] : _shown)
         cellOf(*reusable).setLook({.pressed = _press && _press->row == row && _press->drag == Drag::Undecided,
-                                   .selected = _selected == row,
-                                   .ringed = _ringed && hasFocus() && _current == row});
+                                   .selected = selected() == row,
+                                   .ringed = ringed && current() == row});
 }
 
 Cell* Table::cellAt(std::size_t row) const
@@ -260,6 +270,19 @@ std::vector<Cell*> Table::cellsInView() const
     for (const auto& [row, reusable] : _shown)
         cells.push_back(&cellOf(*reusable));
     return cells;
+}
+
+QString Table::nameOf(std::size_t row)
+{
+    const Cell* cell = cellAt(row);
+    return cell ? cell->name() : textsOf(row).value(0);
+}
+
+QStringList Table::textsOf(std::size_t row)
+{
+    // Outside of `showRow` nothing is offered for reuse: the cell is a new one, of the row's kind.
+    const auto reusable = _source.cellForRowAtIndexPath(*this, {0, row});
+    return cellOf(*reusable).texts();
 }
 
 std::size_t Table::cells() const
@@ -317,11 +340,14 @@ void Table::mousePressEvent(QMouseEvent* event)
         return event->ignore();
     QScroller& upright = *QScroller::scroller(this);
     const bool stops = upright.state() == QScroller::Scrolling;
-    _press = Press{event->position(), stops ? std::nullopt : rowAt(event->position()), Drag::Undecided, nullptr};
+    _press = Press{event->position(), stops ? std::nullopt : rowAt(event->position()), Drag::Undecided, nullptr, {}};
     if (const auto row = rowAt(event->position()))
-        if (const Cell* cell = cellAt(*row))
+        if (const Cell* cell = cellAt(*row)) {
             _press->strip = cell->strip();
-    _ringed = false;
+            _press->name = names()(*row);
+        }
+    if (_press->row)
+        _hold.start(QGuiApplication::styleHints()->mousePressAndHoldInterval());
     feed(upright, QScroller::InputPress, *event);
     if (_press->strip)
         feed(*QScroller::scroller(_press->strip.data()), QScroller::InputPress, *event);
@@ -344,6 +370,7 @@ void Table::mouseMoveEvent(QMouseEvent* event)
             _press->drag = Drag::Ignored; // a swipe back, if it goes far enough
         else
             _press->drag = _press->strip ? Drag::Sideways : Drag::Ignored;
+        _hold.stop();
         refreshLooks();
     }
     if (_press->drag == Drag::Upright)
@@ -360,9 +387,10 @@ void Table::mouseReleaseEvent(QMouseEvent* event)
     if (_press->strip)
         feed(*QScroller::scroller(_press->strip.data()), QScroller::InputRelease, *event);
     const Press press = *std::exchange(_press, std::nullopt);
+    _hold.stop();
     refreshLooks();
-    if (press.drag == Drag::Undecided && press.row && press.row == rowAt(event->position())) {
-        _current = press.row;
+    if (press.drag == Drag::Undecided && isOnItsRow(press, event->position())) {
+        mark(_current, *press.row);
         select(*press.row);
     } else if (press.drag == Drag::Ignored && press.at.x() < kEdge && event->position().x() - press.at.x() > kSwipe &&
                _swipedBack) {
@@ -393,6 +421,12 @@ void Table::showTip(const QHelpEvent& event)
         QToolTip::showText(event.globalPos(), cell->spoken(), viewport(), cell->geometry());
     else
         QToolTip::hideText();
+}
+
+bool Table::isOnItsRow(const Press& press, QPointF point)
+{
+    // Rows may have come or gone under the finger: what it lies on now was not meant.
+    return press.row && press.row == rowAt(point) && names()(*press.row) == press.name;
 }
 
 void Table::wheelEvent(QWheelEvent* event)
@@ -432,9 +466,52 @@ void Table::select(std::size_t row)
         fill(true);
     if (row >= _rows)
         return;
-    _selected = row;
+    mark(_selected, row);
     refreshLooks();
     _source.didSelectRowAtIndexPath(*this, IndexPath{0, row});
+}
+
+// The row's menu -------------------------------------------------------------------------------------------------
+
+void Table::held()
+{
+    if (!_press || !isVisible() || !isEnabled())
+        return;
+    const Press press = *std::exchange(_press, std::nullopt);
+    QScroller::scroller(this)->stop();
+    if (press.strip)
+        QScroller::scroller(press.strip.data())->stop();
+    refreshLooks();
+    if (isOnItsRow(press, press.at))
+        openMenu(press.row, viewport()->mapToGlobal(press.at).toPoint());
+}
+
+void Table::contextMenuEvent(QContextMenuEvent* event)
+{
+    if (event->reason() == QContextMenuEvent::Keyboard)
+        openMenuOfCurrentRow();
+    else
+        openMenu(rowAt(event->pos()), event->globalPos());
+}
+
+void Table::openMenuOfCurrentRow()
+{
+    if (current())
+        scrollTo(*current());
+    const Cell* cell = current() ? cellAt(*current()) : nullptr;
+    const QPoint at = cell ? cell->geometry().center() : viewport()->rect().center();
+    openMenu(current(), viewport()->mapToGlobal(at));
+}
+
+void Table::openMenu(std::optional<std::size_t> row, QPoint at)
+{
+    // A platform may report one key both as a key and as the wish for a menu.
+    if (!_rows || QApplication::activePopupWidget())
+        return;
+    if (row)
+        mark(_current, *row);
+    refreshLooks();
+    new ContextMenu(*this, row, at);
 }
 
 // Keyboard ------------------------------------------------------------------------------------------------------
@@ -447,19 +524,16 @@ bool Table::event(QEvent* event)
     return QAbstractScrollArea::event(event);
 }
 
-void Table::setRinged(bool ringed)
+void Table::keepRing(bool kept)
 {
-    _ringed = ringed;
-    if (ringed && !_current && _rows)
-        _current = static_cast<std::size_t>(offset() / kRowHeight);
+    _ringKept = kept;
     refreshLooks();
 }
 
 void Table::makeCurrent(std::size_t row)
 {
-    _current = row;
-    _ringed = true;
     scrollTo(row);
+    mark(_current, row);
     refreshLooks();
     if (Cell* cell = cellAt(row)) {
         QAccessibleEvent focus(cell, QAccessible::Focus);
@@ -483,12 +557,18 @@ void Table::keyPressEvent(QKeyEvent* event)
         QScroller::scroller(this)->stop();
         makeCurrent(std::min(row, _rows - 1));
     };
-    const std::size_t at = _current.value_or(0);
-    if (_rows == 0)
+    const std::size_t at = current().value_or(0);
+    if (_rows == 0 || event->modifiers() & Qt::AltModifier)
         return event->ignore();
     switch (event->key()) {
+    case Qt::Key_C:
+        return current() && event->modifiers() == Qt::ControlModifier ? copy(rowAsText(*this, at)) : event->ignore();
+    case Qt::Key_F10:
+        return event->modifiers() == Qt::ShiftModifier ? openMenuOfCurrentRow() : event->ignore();
+    case Qt::Key_Menu:
+        return openMenuOfCurrentRow();
     case Qt::Key_Down:
-        return to(_current ? at + 1 : 0);
+        return to(current() ? at + 1 : 0);
     case Qt::Key_Up:
         return to(at ? at - 1 : 0);
     case Qt::Key_PageDown:
@@ -500,14 +580,14 @@ void Table::keyPressEvent(QKeyEvent* event)
     case Qt::Key_End:
         return to(_rows - 1);
     case Qt::Key_Right:
-        return _current ? scrollSideways(at, kSidewaysStep) : void();
+        return current() ? scrollSideways(at, kSidewaysStep) : void();
     case Qt::Key_Left:
-        return _current ? scrollSideways(at, -kSidewaysStep) : void();
+        return current() ? scrollSideways(at, -kSidewaysStep) : void();
     case Qt::Key_Return:
     case Qt::Key_Enter:
     case Qt::Key_Space:
     case Qt::Key_Select:
-        if (_current && !event->isAutoRepeat()) {
+        if (current() && !event->isAutoRepeat()) {
             makeCurrent(at);
             select(at);
         }
@@ -520,7 +600,9 @@ void Table::keyPressEvent(QKeyEvent* event)
 void Table::focusInEvent(QFocusEvent* event)
 {
     QAbstractScrollArea::focusInEvent(event);
-    setRinged(_ringed || event->reason() == Qt::TabFocusReason || event->reason() == Qt::BacktabFocusReason);
+    if (FocusRing::instance().isShown() && !current() && _rows)
+        mark(_current, static_cast<std::size_t>(offset() / kRowHeight));
+    refreshLooks();
 }
 
 void Table::focusOutEvent(QFocusEvent* event)

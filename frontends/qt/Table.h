@@ -1,12 +1,14 @@
 #pragma once
 
 #include "frontends/qt/Cell.h"
+#include "platform/FollowedRow.h"
 #include "platform/ReusePool.h"
 #include "platform/Toolkit.h"
 
 #include <QAbstractScrollArea>
 #include <QLabel>
 #include <QPointer>
+#include <QTimer>
 #include <functional>
 #include <map>
 #include <optional>
@@ -34,12 +36,9 @@ public:
     }
 
     std::size_t rows() const { return _rows; }
-    std::optional<std::size_t> current() const { return _current; } ///< where the keyboard is
-    std::optional<std::size_t> selected() const { return _selected; }
+    std::optional<std::size_t> current() const { return _current.row(); } ///< where the keyboard is
+    std::optional<std::size_t> selected() const { return _selected.row(); }
     void clearSelection();
-    /// Whether the keyboard's place is shown; the pane that opens takes it over from the one that was left.
-    bool isRinged() const { return _ringed; }
-    void setRinged(bool ringed);
     void makeCurrent(std::size_t row);
     /// As a tap or Enter does.
     void select(std::size_t row);
@@ -47,7 +46,13 @@ public:
     Cell* cellAt(std::size_t row) const;                      ///< null when it is not in view
     std::vector<Cell*> cellsInView() const;                   ///< top down
     std::optional<std::size_t> rowOf(const Cell& cell) const; ///< nothing when it is not in view
-    std::size_t cells() const;                                ///< those that wait to be used again among them
+    QString nameOf(std::size_t row);
+    /// Its key, and its value where it has one, as the data source gives them now.
+    QStringList textsOf(std::size_t row);
+    std::size_t cells() const; ///< those that wait to be used again among them
+
+    /// The current row shows its ring although the keyboard is elsewhere: in the field that looks for a row.
+    void keepRing(bool kept);
 
     /// What stands where the rows would be while there are none.
     void setHint(std::string_view text);
@@ -72,6 +77,7 @@ protected:
     void wheelEvent(QWheelEvent* event) override;
     void focusInEvent(QFocusEvent* event) override;
     void focusOutEvent(QFocusEvent* event) override;
+    void contextMenuEvent(QContextMenuEvent* event) override;
 
 private:
     enum class Drag { Undecided, Sideways, Upright, Ignored };
@@ -80,11 +86,17 @@ private:
         std::optional<std::size_t> row; ///< nothing when the press stopped a scroll
         Drag drag = Drag::Undecided;
         QPointer<Strip> strip;
+        std::string name; ///< of the row
     };
 
     int offset() const;
     int columnWidth() const;
     std::optional<std::size_t> rowAt(QPointF point) const;
+    auto names()
+    {
+        return [this](std::size_t row) { return nameOf(row).toStdString(); };
+    }
+    void mark(FollowedRow& followed, std::size_t row) { followed.set(row, _rows, names()); }
     void fill(bool anew);
     void showRow(std::size_t row);
     void spare(std::size_t row, std::shared_ptr<ReusableCell> reusable);
@@ -97,6 +109,10 @@ private:
     bool bringBack(std::size_t row);
     void showTip(const QHelpEvent& event);
     void arrangeHint();
+    bool isOnItsRow(const Press& press, QPointF point);
+    void held();
+    void openMenu(std::optional<std::size_t> row, QPoint at);
+    void openMenuOfCurrentRow();
 
     TableDataSource& _source;
     std::size_t _rows = 0;
@@ -104,11 +120,12 @@ private:
     ReusePool _spare;
     std::map<std::size_t, double> _sideways; ///< offsets of rows out of view that are not 0
     std::optional<std::size_t> _asked;       ///< the row whose cell the data source is making
-    std::optional<std::size_t> _current, _selected;
+    FollowedRow _current, _selected;
     std::optional<Press> _press;
     std::function<void()> _swipedBack;
     int _laidOutWidth = -1;
-    bool _filling = false, _stale = true, _ringed = false, _fitsRows = false;
+    bool _filling = false, _stale = true, _fitsRows = false, _ringKept = false;
+    QTimer _hold; ///< runs while a finger rests on a row
     QLabel _hint;
     QWidget* _mark; ///< how far the table is scrolled
 };

@@ -107,6 +107,14 @@ Toolbar::Toolbar()
     hide();
 }
 
+Button* Toolbar::save() const
+{
+    for (const Item& each : _items)
+        if (std::holds_alternative<SaveItem>(each.item))
+            return static_cast<Button*>(each.widget);
+    return nullptr;
+}
+
 QSize Toolbar::sizeHint() const
 {
     return {kPhoneWidth, kBarHeight};
@@ -125,7 +133,7 @@ QWidget* Toolbar::makeWidget(const ToolbarItem& item)
         auto* save = new Button(Button::Kind::Plain, QStringLiteral("Save"), this);
         connect(save, &QAbstractButton::clicked, this, [this] {
             // The action may replace this bar's items.
-            if (const auto action = _save)
+            if (const auto action = _saveAction)
                 action();
         });
         widget = save;
@@ -152,7 +160,7 @@ void Toolbar::setItems(std::vector<ToolbarItem> items)
             widget->setFont(fontOf(label->font));
             static_cast<LineLabel*>(widget)->setLine(lineOf(label->text));
         } else if (const auto* save = std::get_if<SaveItem>(&items[i])) {
-            _save = save->action;
+            _saveAction = save->action;
         }
         _items[i].item = std::move(items[i]);
     }

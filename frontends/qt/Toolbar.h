@@ -9,6 +9,8 @@
 
 namespace kestrum::qt {
 
+class Button;
+
 /// Small and grey, turning while something is awaited.
 class Spinner final : public QWidget {
 public:
@@ -56,6 +58,9 @@ public:
     /// The widget of an item; null for a space.
     QWidget* widgetAt(std::size_t item) const { return item < _items.size() ? _items[item].widget : nullptr; }
 
+    /// Null where Save is not offered.
+    Button* save() const;
+
     QSize sizeHint() const override;
 
 protected:
@@ -71,7 +76,7 @@ private:
     void arrange();
 
     std::vector<Item> _items;
-    std::function<void()> _save;
+    std::function<void()> _saveAction;
 };
 
 } // namespace kestrum::qt

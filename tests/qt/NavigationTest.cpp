@@ -245,6 +245,19 @@ TEST_F(ANavigationView, ComesBackToAPaneWhereItWasLeft)
     EXPECT_TRUE(table().hasFocus());
 }
 
+TEST_F(ANavigationView, BringsNoRingBackThatAMouseTookAway)
+{
+    makeVisible();
+    QTest::keyClick(&table(), Qt::Key_Down);
+    ASSERT_TRUE(table().cellAt(0)->look().ringed);
+    push();
+    ASSERT_TRUE(comesToRest());
+    click(navigation().titleBar().back());
+    pop();
+    EXPECT_EQ(table().current(), 0u);
+    EXPECT_FALSE(table().cellAt(0)->look().ringed);
+}
+
 TEST_F(ANavigationView, HidesTheToolbar)
 {
     makeVisible();

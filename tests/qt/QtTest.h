@@ -1,6 +1,7 @@
 #pragma once
 
 #include "doubles/QtTestToolkit.h"
+#include "frontends/qt/FocusRing.h"
 #include "frontends/qt/MainWindow.h"
 #include "platform/Toolkit.h"
 #include "ui/KestrumCell.h"
@@ -76,6 +77,7 @@ class InAWindow : public testing::Test, public NavigationViewDelegate {
 protected:
     InAWindow() : _navigation(toolkit().makeNavigationView(*this)), _window(toolkit().makeWindow({0, 0, 390, 844}))
     {
+        qt::FocusRing::instance().setShown(false); // as at the start, whatever the test before did
         navigation().setToolbarHidden(false);
         window().setRoot(navigation());
     }

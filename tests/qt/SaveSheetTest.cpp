@@ -72,7 +72,9 @@ TEST_F(ASaveSheet, ListsWhatIsSavedWithCheckMarks)
     EXPECT_EQ(cells[0]->spoken(), "Snapshot (2026-11-16 06:05:42 +0000)");
     EXPECT_EQ(cells[1]->spoken(), "DLF binary (1024 bytes)");
     EXPECT_EQ(cells[1]->accessory(), Accessory::CheckMark);
-    EXPECT_TRUE(QAccessible::queryAccessibleInterface(cells[1])->state().checked);
+    const auto state = QAccessible::queryAccessibleInterface(cells[1])->state();
+    EXPECT_TRUE(state.checkable);
+    EXPECT_TRUE(state.checked);
 }
 
 TEST_F(ASaveSheet, IsEmptyWithNothingToSave)
@@ -100,6 +102,27 @@ TEST_F(ASaveSheet, ClosesTheKeyboardOnReturnAndDoesNotSave)
     EXPECT_EQ(owner.returns, 1);
     EXPECT_EQ(owner.saves, 0);
     EXPECT_FALSE(sheet().description().hasFocus());
+}
+
+TEST_F(ASaveSheet, StillAnswersKeysAfterTheKeyboardWasClosed)
+{
+    present();
+    QTest::keyClick(&sheet().description(), Qt::Key_Return);
+    QTest::keyClick(window().windowHandle(), Qt::Key_Tab);
+    EXPECT_TRUE(sheet().description().hasFocus());
+    QTest::keyClick(&sheet().description(), Qt::Key_Return);
+    QTest::keyClick(window().windowHandle(), Qt::Key_Escape);
+    EXPECT_EQ(owner.cancels, 1);
+}
+
+TEST_F(ASaveSheet, SavesByControlSButNotByTheHeldKeyThatOpenedIt)
+{
+    present();
+    QKeyEvent held(QEvent::KeyPress, Qt::Key_S, Qt::ControlModifier, {}, true);
+    QApplication::sendEvent(&sheet().description(), &held);
+    EXPECT_EQ(owner.saves, 0);
+    QTest::keyClick(&sheet().description(), Qt::Key_S, Qt::ControlModifier);
+    EXPECT_EQ(owner.saves, 1);
 }
 
 TEST_F(ASaveSheet, ClosesTheKeyboardOnATouchOutsideTheField)
@@ -182,6 +205,42 @@ TEST_F(ASaveSheet, LeavesInAMovementThatOutlivesIt)
     owner.interface.reset();
     EXPECT_TRUE(table().hasFocus());
     EXPECT_TRUE(QTest::qWaitFor([&] { return !navigation().isMoving(); }));
+}
+
+TEST_F(ASaveSheet, IsNeverCoveredByWhatHappensUnderIt)
+{
+    present();
+    const auto picture = [&] { return window().grab().toImage(); };
+    const QImage before = picture();
+    const QPoint saveBelow(360, 844 - 24);
+    ASSERT_TRUE(&sheet() == window().childAt(saveBelow) || sheet().isAncestorOf(window().childAt(saveBelow)));
+
+    Rows others = Rows::leaves(1);
+    const auto other = screenOf(others);
+    other->setToolbarItems(
+        {ActivityIndicatorItem{true}, LabelItem{"Connecting...", systemFont(14)}, FlexibleSpaceItem{}, SaveItem{[] {}}},
+        true);
+    for (const auto transition : {Transition::Push, Transition::Pop, Transition::None}) {
+        navigation().show(transition == Transition::Pop ? *_screen : *other, {"Kestrum"}, transition, true);
+        navigation().setToolbarHidden(true);
+        navigation().setToolbarHidden(false);
+        EXPECT_TRUE(sheet().isAncestorOf(window().childAt(saveBelow)));
+        EXPECT_EQ(picture().copy(sheet().card().geometry()), before.copy(sheet().card().geometry()));
+    }
+    navigation().show(*_screen, {"Kestrum"}, Transition::None, false);
+}
+
+TEST_F(ASaveSheet, KeepsTheKeyboardWhenThePaneUnderItChanges)
+{
+    present();
+    Rows others = Rows::leaves(1);
+    const auto other = screenOf(others);
+    navigation().show(*other, {"Kestrum"}, Transition::Pop, true);
+    EXPECT_TRUE(sheet().description().hasFocus());
+    EXPECT_FALSE(table().isEnabled());
+    navigation().dismiss(true);
+    EXPECT_TRUE(table().hasFocus());
+    navigation().show(*_screen, {"Kestrum"}, Transition::None, false);
 }
 
 TEST_F(ASaveSheet, ClosesBehindAnAlert)

@@ -6,6 +6,7 @@
 #include <QToolTip>
 #include <QWheelEvent>
 
+#include <cmath>
 #include <set>
 
 namespace kestrum {
@@ -142,6 +143,67 @@ TEST_F(ATable, KeepsScrollOffsetSelectionAndFocusAcrossAReload)
     EXPECT_TRUE(table().hasFocus());
 }
 
+TEST_F(ATable, KeepsFocusAndSelectionOnTheirRowWhenOneIsInsertedAbove)
+{
+    Rows rows = Rows::leaves(5);
+    rows.rows[3].value.reset();
+    show(rows);
+    for (int i = 0; i < 4; ++i)
+        key(Qt::Key_Down);
+    key(Qt::Key_Return);
+    ASSERT_EQ(table().selected(), 3u);
+    rows.rows.insert(rows.rows.begin(), {"Serving", std::nullopt});
+    reload();
+    EXPECT_EQ(table().current(), 4u);
+    EXPECT_EQ(table().selected(), 4u);
+    EXPECT_EQ(cell(4).name(), "Key 3");
+    EXPECT_TRUE(cell(4).look().ringed);
+    EXPECT_TRUE(cell(4).look().selected);
+    EXPECT_FALSE(cell(3).look().ringed);
+    key(Qt::Key_Return);
+    EXPECT_THAT(rows.selected, ElementsAre(3u, 4u));
+}
+
+TEST_F(ATable, KeepsFocusOnARowOutOfView)
+{
+    Rows rows = Rows::leaves(100);
+    show(rows);
+    key(Qt::Key_End);
+    scroll(0);
+    rows.rows.erase(rows.rows.begin() + 40, rows.rows.begin() + 50);
+    reload();
+    EXPECT_EQ(table().current(), 89u);
+    EXPECT_EQ(offset(), 0);
+}
+
+TEST_F(ATable, HandsFocusToTheNeighbourOfARowThatGoes)
+{
+    Rows rows = Rows::leaves(5);
+    show(rows);
+    for (int i = 0; i < 3; ++i)
+        key(Qt::Key_Down);
+    rows.rows.erase(rows.rows.begin() + 2);
+    rows.rows.insert(rows.rows.begin(), {"new", "row"});
+    reload();
+    EXPECT_EQ(cell(table().current().value()).name(), "Key 3");
+    key(Qt::Key_Down);
+    rows.rows.pop_back();
+    reload();
+    EXPECT_EQ(cell(table().current().value()).name(), "Key 3");
+}
+
+TEST_F(ATable, DoesNothingForATapOnARowThatMovedUnderTheFinger)
+{
+    Rows rows = Rows::leaves(5);
+    show(rows);
+    const QPoint at = middleOf(table(), 2);
+    press(*table().viewport(), at);
+    rows.rows.insert(rows.rows.begin(), {"Serving", std::nullopt});
+    reload();
+    release(*table().viewport(), at);
+    EXPECT_THAT(rows.selected, IsEmpty());
+}
+
 TEST_F(ATable, KeepsARowsSidewaysScrollAcrossAReload)
 {
     Rows rows = Rows::leaves(10);
@@ -213,6 +275,47 @@ TEST_F(ATable, LeavesTheContentAreaTheRowLessItsAccessory)
     show(rows);
     EXPECT_EQ(cell(0).contentBounds(), (Rect{0, 0, 380, 44}));
     EXPECT_EQ(cell(1).contentBounds(), (Rect{0, 0, 358, 44}));
+}
+
+/// The layout at the very width where a value just fits, with the real font's measures.
+TEST_F(ATable, PutsAValueThatFitsExactlyBehindItsKey)
+{
+    Rows rows = Rows::leaves(1);
+    show(rows);
+    const auto width = [](const std::string& text) { return toolkit().measure(text, boldSystemFont(15)).width; };
+    std::string key, value;
+    const auto needed = [&] { return width(key) + 60 + width(value); };
+    const auto isWhole = [&] { return needed() == std::floor(needed()); };
+    // A window is whole points wide, so what the texts need must be too.
+    for (std::size_t more = 0; more < 64 && (key.empty() || !isWhole()); ++more)
+        for (char first = '!'; first <= '~' && (key.empty() || !isWhole()); ++first) {
+            key = std::string("Measured RSRP ") + first;
+            value = "-95.25 dBm, and falling " + std::string(more, 'i');
+        }
+    ASSERT_TRUE(isWhole()) << needed();
+    ASSERT_LT(needed(), 700);
+    ASSERT_GT(needed(), 280);
+    const auto layout = [&](double content) {
+        window().resize(static_cast<int>(content) + 10, window().height());
+        auto made = KestrumCell::initWithStyle(toolkit(), table(), CellStyle::KeyAndDetail, "row");
+        made->setTexts(key, value);
+        made->setLayout();
+        EXPECT_EQ(made->cell().contentBounds().width, content);
+        return made;
+    };
+    const auto reach = [](KestrumCell& made) {
+        const auto* strip = static_cast<qt::Cell&>(made.cell()).strip();
+        return strip ? strip->reach() : 0;
+    };
+    const auto exact = layout(needed());
+    EXPECT_EQ(exact->value()->frame().x, 10 + width(key) + 50);
+    EXPECT_EQ(reach(*exact), 0);
+    const auto roomy = layout(needed() + 1);
+    EXPECT_EQ(roomy->value()->frame().x, needed() + 1 - width(value));
+    EXPECT_EQ(reach(*roomy), 0);
+    const auto tight = layout(needed() - 1);
+    EXPECT_EQ(tight->value()->frame().x, 10 + width(key) + 50);
+    EXPECT_EQ(reach(*tight), width(key) + width(value));
 }
 
 TEST_F(ATable, SelectsTheRowThatIsTapped)
@@ -469,6 +572,24 @@ TEST_F(ATable, ShowsTheRingToTheKeyboardAlone)
     EXPECT_FALSE(cell(2).look().ringed);
     key(Qt::Key_Down);
     EXPECT_TRUE(cell(3).look().ringed);
+}
+
+TEST_F(ATable, TakesTheRingAwayOnAPressAnywhere)
+{
+    Rows rows = Rows::leaves(5);
+    show(rows);
+    key(Qt::Key_Down);
+    ASSERT_TRUE(cell(0).look().ringed);
+    press(navigation().titleBar(), {200, 20});
+    EXPECT_FALSE(cell(0).look().ringed);
+    release(navigation().titleBar(), {200, 20});
+    key(Qt::Key_Down);
+    EXPECT_TRUE(cell(1).look().ringed);
+    static QPointingDevice* const screen = QTest::createTouchDevice();
+    QTest::touchEvent(window().windowHandle(), screen).press(0, {200, 20});
+    EXPECT_FALSE(cell(1).look().ringed);
+    QTest::touchEvent(window().windowHandle(), screen).release(0, {200, 20});
+    EXPECT_EQ(table().current(), 1u) << "the keyboard's place stays";
 }
 
 TEST_F(ATable, TellsAScreenReaderOfItsRows)

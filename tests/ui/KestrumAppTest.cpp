@@ -451,6 +451,19 @@ TEST_F(KestrumAppSaveTest, SavePressedTwicePresentsOneScreen)
     EXPECT_EQ(app->saveViewController(), nullptr) << "the property is none of the screen's business";
 }
 
+TEST_F(KestrumAppSaveTest, RowUnderTheSaveScreenOpensNothing)
+{
+    launchConnected();
+    showCells();
+    top().pressSave();
+    open("Serving");
+    EXPECT_THAT(path(), ElementsAre("Kestrum"));
+    navigation().presented->owner.cancelPressed();
+    doubles.queue.run();
+    open("Serving");
+    EXPECT_THAT(path(), ElementsAre("Kestrum", "Serving"));
+}
+
 TEST_F(KestrumAppSaveTest, ListsAndWritesTheHistoryOfTheMoment)
 {
     launchConnected();

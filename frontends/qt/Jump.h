@@ -1,0 +1,47 @@
+#pragma once
+
+#include "frontends/qt/Table.h"
+#include "frontends/qt/Toolbar.h"
+
+#include <QLineEdit>
+
+namespace kestrum::qt {
+
+/// Jumps to a row by a part of its name while it is typed: a bar in the toolbar's place.
+class Jump final : public QWidget {
+    Q_OBJECT
+
+public:
+    explicit Jump(QWidget* parent);
+
+    void start(Table& table);
+    /// To the next row that the last name fits.
+    void again(Table& table);
+    /// The table stays where the jump has brought it.
+    void end();
+
+    QLineEdit& field() { return _field; }
+    bool hasFound() const { return _missing.isHidden(); }
+
+    bool eventFilter(QObject* watched, QEvent* event) override;
+
+Q_SIGNALS:
+    void ended();
+
+protected:
+    void paintEvent(QPaintEvent*) override;
+    void resizeEvent(QResizeEvent*) override;
+
+private:
+    void follow();
+    void giveUp();
+    static bool go(Table& table, const QString& name, std::size_t from);
+
+    QLineEdit _field;
+    LineLabel _missing;
+    QPointer<Table> _table;
+    std::size_t _from = 0;
+    QString _last;
+};
+
+} // namespace kestrum::qt

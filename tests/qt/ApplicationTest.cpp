@@ -1,0 +1,175 @@
+#include "QtTest.h"
+
+#include "core/KestrumModelNode.h"
+#include "doubles/MemoryFileSystem.h"
+#include "doubles/MonitorDoubles.h"
+#include "doubles/RecordingPreferences.h"
+#include "doubles/ScratchDirectory.h"
+#include "frontends/qt/Motion.h"
+#include "platform/propertylist/PropertyListCodec.h"
+#include "ui/KestrumApp.h"
+
+namespace kestrum {
+namespace {
+
+using namespace std::chrono_literals;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+constexpr const char* kMarker = "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
+constexpr const char* kCommands = "vox.commands";
+
+/// Two entries at least, so that the modem's wrapper dictionaries do not matter here.
+Value cellOf(const char* rssi)
+{
+    return makeDictionary({{"RSSI", rssi}, {"Band", makeDictionary({{"Now", "3"}, {"Before", "8"}})}});
+}
+
+/// The application in a real window, writing real files; the service and the clock are the test's.
+class TheApplicationInItsWindow : public testing::Test {
+protected:
+    TheApplicationInItsWindow()
+    {
+        qt::setMotionWanted(false);
+        qt::FocusRing::instance().setShown(false);
+        _files.paths.insert(kMarker);
+        _files.logDirectory = directory.path();
+    }
+    ~TheApplicationInItsWindow() override
+    {
+        _application->applicationWillTerminate();
+        doubles.queue.drop();
+        qt::setMotionWanted(true);
+    }
+
+    void launch()
+    {
+        _application->applicationDidFinishLaunching();
+        doubles.queue.run();
+        for (auto* each : QApplication::topLevelWidgets())
+            if (auto* window = dynamic_cast<qt::MainWindow*>(each))
+                _window = window;
+        ASSERT_NE(_window, nullptr);
+        ASSERT_TRUE(QTest::qWaitForWindowActive(_window));
+    }
+    /// A service with an IFX modem.
+    void serve()
+    {
+        const Value reply = makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}});
+        doubles.ports.serve(kCommands, [data = _codec.toXml(reply)](const MemoryPorts::Request& request) {
+            const bool asked = request.reply == RemotePort::Reply::Awaited;
+            return MemoryPorts::Answer{0, asked ? data : std::nullopt};
+        });
+    }
+    /// A message that holds the whole display, and the refresh that finds it.
+    void show(const Value& display)
+    {
+        const auto data = _codec.toXml(display);
+        ASSERT_TRUE(data);
+        const auto bytes = data->bytes();
+        ASSERT_TRUE(doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0,
+                                       {reinterpret_cast<const char*>(bytes.data()), bytes.size()}));
+        doubles.queue.advance(2s);
+    }
+
+    qt::Navigation& navigation() { return *_window->root(); }
+    std::string title() { return navigation().titleBar().title().toStdString(); }
+    std::vector<std::string> rows()
+    {
+        std::vector<std::string> rows;
+        for (const auto* cell : navigation().table()->cellsInView())
+            rows.push_back(cell->spoken().toStdString());
+        return rows;
+    }
+    void key(Qt::Key key, Qt::KeyboardModifiers modifiers = {})
+    {
+        QTest::keyClick(QApplication::focusWidget(), key, modifiers);
+    }
+    void open(const char* name)
+    {
+        key(Qt::Key_Slash);
+        QTest::keyClicks(QApplication::focusWidget(), name);
+        key(Qt::Key_Return);
+        key(Qt::Key_Return);
+        ASSERT_EQ(title(), name);
+    }
+    void openSaveScreen()
+    {
+        key(Qt::Key_S, Qt::ControlModifier);
+        ASSERT_NE(navigation().sheet(), nullptr);
+    }
+    /// What the only file holds that was saved.
+    Value saveAndRead()
+    {
+        key(Qt::Key_S, Qt::ControlModifier);
+        doubles.queue.run();
+        EXPECT_EQ(navigation().sheet(), nullptr);
+        std::vector<std::string> names;
+        for (const auto& each : std::filesystem::directory_iterator(directory.path()))
+            names.push_back(each.path().filename());
+        EXPECT_THAT(names, ElementsAre("KestrumSnapshot-1794809142.kestrum"));
+        return names.size() == 1 ? _codec.load(directory.file(names[0])) : Value();
+    }
+
+    ScratchDirectory directory;
+    MonitorDoubles doubles;
+
+private:
+    PropertyListCodec _codec;
+    RecordingPreferences _preferences;
+    MemoryFileSystem _files;
+    ApplicationRoles _roles{{{doubles.log, doubles.console, doubles.clock, doubles.bundle, _codec, nullptr},
+                             doubles.queue,
+                             doubles.ports,
+                             doubles.telephony},
+                            _preferences,
+                            _files,
+                            toolkit()};
+    std::shared_ptr<KestrumApp> _application = KestrumApp::make(_roles);
+    qt::MainWindow* _window = nullptr;
+};
+
+TEST_F(TheApplicationInItsWindow, ReturnsToTheRootUnderTheSheetWhenAMiddlePaneIsGone)
+{
+    serve();
+    launch();
+    show(makeDictionary({{"Serving", cellOf("-80 dBm")}, {"Neighbour", cellOf("-95 dBm")}}));
+    open("Serving");
+    open("Band");
+    openSaveScreen();
+    show(makeDictionary({{"Other", cellOf("-70 dBm")}, {"Neighbour", cellOf("-94 dBm")}}));
+    EXPECT_EQ(title(), "Kestrum");
+    EXPECT_THAT(rows(), ElementsAre("Other", "Neighbour"));
+    ASSERT_NE(navigation().sheet(), nullptr);
+    EXPECT_TRUE(navigation().sheet()->description().hasFocus());
+    const auto* under = QApplication::widgetAt(navigation().mapToGlobal(QPoint(360, navigation().height() - 24)));
+    EXPECT_TRUE(navigation().sheet()->isAncestorOf(under));
+
+    key(Qt::Key_Escape);
+    doubles.queue.run();
+    EXPECT_EQ(navigation().sheet(), nullptr);
+    open("Other");
+}
+
+TEST_F(TheApplicationInItsWindow, SavesAnEmptyHistory)
+{
+    serve();
+    launch();
+    openSaveScreen();
+    EXPECT_TRUE(navigation().sheet()->table().cellsInView().empty());
+    QTest::keyClicks(QApplication::focusWidget(), "roof");
+    EXPECT_EQ(saveAndRead(),
+              Value(makeDictionary(
+                  {{"Timestamp", "2026-11-16 06:05:42 +0000"}, {"Data", makeArray({})}, {"Description", "roof"}})));
+}
+
+TEST_F(TheApplicationInItsWindow, SavesTheTimeAloneWithoutAGenerator)
+{
+    launch();
+    openSaveScreen();
+    EXPECT_TRUE(navigation().sheet()->table().cellsInView().empty());
+    EXPECT_EQ(saveAndRead(), Value(makeDictionary({{"Timestamp", "2026-11-16 06:05:42 +0000"}})));
+}
+
+} // namespace
+} // namespace kestrum

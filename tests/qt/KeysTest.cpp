@@ -1,0 +1,319 @@
+#include "QtTest.h"
+
+#include "frontends/qt/ContextMenu.h"
+#include "frontends/qt/Motion.h"
+
+#include <QClipboard>
+#include <QGuiApplication>
+
+namespace kestrum {
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+QString clipboard()
+{
+    return QGuiApplication::clipboard()->text();
+}
+
+/// A pane under the root, with keyboard, mouse and finger on it.
+class Keys : public InAWindow {
+protected:
+    Keys()
+    {
+        qt::setMotionWanted(false);
+        rows.rows[1].value = "-95.25 dBm";
+        rows.rows[3] = {"Neighbours", std::nullopt};
+        rows.rows[7] = {"Serving Neighbour", "7"};
+        _screen = screenOf(rows);
+        _screen->setToolbarItems({LabelItem{"Updated", systemFont(14)}, SaveItem{[this] { ++saves; }}}, true);
+        navigation().show(*_screen, {"Kestrum", "Serving Cell"}, Transition::None, false);
+        QGuiApplication::clipboard()->setText("before");
+        makeVisible();
+    }
+    ~Keys() override { qt::setMotionWanted(true); }
+
+    void key(Qt::Key key, Qt::KeyboardModifiers modifiers = {})
+    {
+        QWidget* const popup = QApplication::activePopupWidget();
+        QTest::keyClick(popup ? popup : QApplication::focusWidget(), key, modifiers);
+    }
+    void type(const char* text) { QTest::keyClicks(QApplication::focusWidget(), text); }
+    void walkTo(std::size_t row)
+    {
+        key(Qt::Key_Home);
+        for (std::size_t i = 0; i < row; ++i)
+            key(Qt::Key_Down);
+    }
+    static qt::ContextMenu* menu() { return dynamic_cast<qt::ContextMenu*>(QApplication::activePopupWidget()); }
+    static std::vector<std::string> choices()
+    {
+        std::vector<std::string> texts;
+        if (menu())
+            for (const auto* each : menu()->actions())
+                texts.push_back(each->text().toStdString());
+        return texts;
+    }
+    static void choose(const QString& text)
+    {
+        for (auto* each : menu()->actions())
+            if (each->text() == text)
+                QTest::mouseClick(menu(), Qt::LeftButton, {}, menu()->actionGeometry(each).center());
+    }
+    qt::Jump& jump() { return navigation().jump(); }
+
+    Rows rows = Rows::leaves(40);
+    std::unique_ptr<TableScreen> _screen;
+    int saves = 0;
+};
+
+TEST_F(Keys, CloseTheWindowByControlQAndControlW)
+{
+    for (const auto letter : {Qt::Key_Q, Qt::Key_W}) {
+        window().show();
+        ASSERT_TRUE(QTest::qWaitForWindowActive(&window()));
+        key(letter, Qt::ControlModifier);
+        EXPECT_FALSE(window().isVisible()) << letter;
+    }
+}
+
+TEST_F(Keys, CloseTheWindowUnderAnAlertToo)
+{
+    toolkit().showAlert("File Error", "Unable to write file to disk", "Close");
+    key(Qt::Key_Q, Qt::ControlModifier);
+    EXPECT_FALSE(window().isVisible());
+}
+
+TEST_F(Keys, GiveTheWindowTheWholeScreenAndTakeItBackByF11)
+{
+    const QSize before = window().size();
+    key(Qt::Key_F11);
+    EXPECT_TRUE(window().isFullScreen());
+    EXPECT_TRUE(QTest::qWaitFor([&] { return navigation().size() == window().screen()->size(); }));
+    key(Qt::Key_F11);
+    EXPECT_FALSE(window().isFullScreen());
+    EXPECT_TRUE(QTest::qWaitFor([&] { return navigation().size() == before; }));
+}
+
+TEST_F(Keys, GoBackByAltLeft)
+{
+    walkTo(1);
+    key(Qt::Key_Left, Qt::AltModifier);
+    EXPECT_EQ(backs, 1);
+    key(Qt::Key_Left);
+    EXPECT_EQ(backs, 1);
+}
+
+TEST_F(Keys, SaveByControlSWhereSaveIsOffered)
+{
+    key(Qt::Key_S, Qt::ControlModifier);
+    EXPECT_EQ(saves, 1);
+    _screen->setToolbarItems({LabelItem{"Updated", systemFont(14)}}, true);
+    key(Qt::Key_S, Qt::ControlModifier);
+    EXPECT_EQ(saves, 1);
+}
+
+TEST_F(Keys, DoNothingUnderAnAlert)
+{
+    toolkit().showAlert("File Error", "Unable to write file to disk", "Close");
+    key(Qt::Key_S, Qt::ControlModifier);
+    key(Qt::Key_F, Qt::ControlModifier);
+    key(Qt::Key_C, Qt::ControlModifier);
+    key(Qt::Key_Left, Qt::AltModifier);
+    key(Qt::Key_F10, Qt::ShiftModifier);
+    EXPECT_EQ(saves + backs, 0);
+    EXPECT_TRUE(jump().isHidden());
+    EXPECT_EQ(menu(), nullptr);
+    EXPECT_EQ(clipboard(), "before");
+    key(Qt::Key_Return);
+}
+
+TEST_F(Keys, CopyTheRowByControlC)
+{
+    key(Qt::Key_C, Qt::ControlModifier);
+    EXPECT_EQ(clipboard(), "before") << "no row is chosen yet";
+    walkTo(1);
+    key(Qt::Key_C, Qt::ControlModifier);
+    EXPECT_EQ(clipboard(), "Key 1\t-95.25 dBm");
+    walkTo(3);
+    key(Qt::Key_C, Qt::ControlModifier);
+    EXPECT_EQ(clipboard(), "Neighbours");
+}
+
+TEST_F(Keys, NameThePaneInTheWindowsTitle)
+{
+    EXPECT_EQ(window().windowTitle(), "Serving Cell");
+    EXPECT_EQ(window().windowHandle()->title(), "Serving Cell");
+    navigation().setTitles({"Kestrum"});
+    EXPECT_EQ(window().windowTitle(), "Kestrum");
+}
+
+// The row's menu
+
+TEST_F(Keys, OpenTheMenuOfTheCurrentRow)
+{
+    walkTo(1);
+    key(Qt::Key_Menu);
+    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text"));
+    key(Qt::Key_Escape);
+    EXPECT_EQ(menu(), nullptr);
+    EXPECT_EQ(backs, 0);
+    walkTo(3);
+    key(Qt::Key_F10, Qt::ShiftModifier);
+    EXPECT_THAT(choices(), ElementsAre("Copy row", "Copy pane as text")) << "what opens has no value";
+    key(Qt::Key_Down);
+    key(Qt::Key_Return);
+    EXPECT_EQ(clipboard(), "Neighbours");
+    EXPECT_THAT(rows.selected, IsEmpty());
+}
+
+TEST_F(Keys, CopyFromTheMenuByTheMouse)
+{
+    click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
+    ASSERT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text"));
+    EXPECT_EQ(table().current(), 1u);
+    choose("Copy value");
+    EXPECT_EQ(clipboard(), "-95.25 dBm");
+    EXPECT_EQ(menu(), nullptr);
+    click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
+    choose("Copy row");
+    EXPECT_EQ(clipboard(), "Key 1\t-95.25 dBm");
+    EXPECT_THAT(rows.selected, IsEmpty());
+}
+
+TEST_F(Keys, CopyTheWholePaneWithTheRowsOutOfView)
+{
+    click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
+    choose("Copy pane as text");
+    const QStringList lines = clipboard().split('\n');
+    ASSERT_EQ(lines.size(), 41);
+    EXPECT_EQ(lines[1], "Key 1\t-95.25 dBm");
+    EXPECT_EQ(lines[3], "Neighbours");
+    EXPECT_EQ(lines[39], "Key 39\tValue 39");
+    EXPECT_EQ(lines[40], "");
+}
+
+TEST_F(Keys, CopyTheRowThatTheMenuWasOpenedOn)
+{
+    click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
+    rows.rows.insert(rows.rows.begin(), {"new", "row"});
+    _screen->table().reloadData();
+    choose("Copy row");
+    EXPECT_EQ(clipboard(), "Key 1\t-95.25 dBm");
+}
+
+TEST_F(Keys, OpenTheMenuByALongPressOfAFinger)
+{
+    static QPointingDevice* const device = QTest::createTouchDevice();
+    const QPoint at = table().viewport()->mapTo(&window(), middleOf(table(), 1));
+    QTest::touchEvent(window().windowHandle(), device).press(0, at);
+    EXPECT_TRUE(QTest::qWaitFor([] { return menu() != nullptr; }));
+    QTest::touchEvent(window().windowHandle(), device).release(0, at);
+    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text"));
+    EXPECT_THAT(rows.selected, IsEmpty());
+    for (const auto* each : menu()->actions())
+        EXPECT_GE(menu()->actionGeometry(const_cast<QAction*>(each)).height(), 44);
+    key(Qt::Key_Escape);
+    click(*table().viewport(), middleOf(table(), 2));
+    EXPECT_THAT(rows.selected, ElementsAre(2u));
+}
+
+TEST_F(Keys, CloseTheMenuWhenItsPaneIsCoveredOrLeaves)
+{
+    walkTo(1);
+    key(Qt::Key_Menu);
+    ASSERT_NE(menu(), nullptr);
+    toolkit().showAlert("File Error", "Unable to write file to disk", "Close");
+    EXPECT_EQ(menu(), nullptr);
+    key(Qt::Key_Return);
+
+    key(Qt::Key_Menu);
+    ASSERT_NE(menu(), nullptr);
+    Rows others = Rows::leaves(1);
+    const auto other = screenOf(others);
+    navigation().show(*other, {"Kestrum"}, Transition::Pop, false);
+    EXPECT_EQ(menu(), nullptr);
+    navigation().show(*_screen, {"Kestrum"}, Transition::None, false);
+}
+
+// Jumping to a name
+
+TEST_F(Keys, JumpToANameWhileItIsTyped)
+{
+    key(Qt::Key_Slash);
+    ASSERT_TRUE(jump().field().hasFocus());
+    type("neigh");
+    EXPECT_EQ(table().current(), 3u);
+    EXPECT_TRUE(table().cellAt(3)->look().ringed);
+    EXPECT_TRUE(jump().hasFound());
+    key(Qt::Key_Return);
+    EXPECT_TRUE(jump().isHidden());
+    EXPECT_TRUE(table().hasFocus());
+    EXPECT_EQ(table().current(), 3u);
+    EXPECT_THAT(rows.selected, IsEmpty());
+
+    type("n");
+    EXPECT_EQ(table().current(), 7u);
+    key(Qt::Key_F3);
+    EXPECT_EQ(table().current(), 3u) << "round the end";
+}
+
+TEST_F(Keys, JumpToARowOutOfViewByControlF)
+{
+    key(Qt::Key_F, Qt::ControlModifier);
+    type("y 38");
+    EXPECT_EQ(table().current(), 38u);
+    EXPECT_NE(table().cellAt(38), nullptr);
+    key(Qt::Key_Return);
+}
+
+TEST_F(Keys, TypeTheNameInTheColoursOfTheScheme)
+{
+    key(Qt::Key_Slash);
+    for (const auto* colours : {&qt::darkColours(), &qt::lightColours()}) {
+        QApplication::setPalette(qt::paletteOf(*colours));
+        EXPECT_TRUE(QTest::qWaitFor([&] { return jump().field().palette().color(QPalette::Text) == colours->ink; }));
+    }
+    key(Qt::Key_Escape);
+}
+
+TEST_F(Keys, ReturnWhereTheJumpBeganOnEscape)
+{
+    walkTo(5);
+    key(Qt::Key_Slash);
+    type("key 9");
+    EXPECT_EQ(table().current(), 9u);
+    type("zzz");
+    EXPECT_EQ(table().current(), 5u);
+    EXPECT_FALSE(jump().hasFound());
+    key(Qt::Key_Escape);
+    EXPECT_EQ(table().current(), 5u);
+    EXPECT_TRUE(jump().isHidden());
+    EXPECT_EQ(backs, 0);
+    key(Qt::Key_Slash);
+    key(Qt::Key_Backspace);
+    EXPECT_TRUE(jump().isHidden());
+    EXPECT_EQ(backs, 0);
+}
+
+TEST_F(Keys, EndTheJumpOnATapAndWithItsPane)
+{
+    key(Qt::Key_Slash);
+    type("key 9");
+    click(*table().viewport(), middleOf(table(), 2));
+    EXPECT_TRUE(jump().isHidden());
+    EXPECT_THAT(rows.selected, ElementsAre(2u));
+
+    key(Qt::Key_Slash);
+    ASSERT_FALSE(jump().isHidden());
+    Rows others = Rows::leaves(1);
+    const auto other = screenOf(others);
+    navigation().show(*other, {"Kestrum"}, Transition::Pop, false);
+    EXPECT_TRUE(jump().isHidden());
+    EXPECT_TRUE(table().hasFocus());
+    navigation().show(*_screen, {"Kestrum"}, Transition::None, false);
+}
+
+} // namespace
+} // namespace kestrum
