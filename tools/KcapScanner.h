@@ -4,7 +4,8 @@
 
 namespace kestrum {
 
-/// Messages of a channel capture: each behind its length, 32 bits, little-endian.
+/// Messages of a channel capture: each behind its length, 32 bits, little-endian. Where the lengths lead from one
+/// message to the next, they alone decide, whatever the messages hold.
 class KcapScanner final : public MessageScanner {
 public:
     using MessageScanner::MessageScanner;
@@ -22,7 +23,11 @@ private:
     };
     /// What stands `at` bytes into the window.
     Look look(std::size_t at);
-    bool isFollowed(std::size_t at, int links);
+    bool leadsOn(std::size_t at);
+    Sound proof(std::size_t at);
+
+    std::uint64_t _followedTo = 0; ///< in the stream: as far as the lengths were followed ahead
+    bool _leadsOn = false;         ///< what was found there
 };
 
 } // namespace kestrum

@@ -6,6 +6,7 @@ namespace kestrum {
 
 std::optional<Bytes> MessageScanner::next(bool mayGrow)
 {
+    _mayGrow = mayGrow;
     _window.skip(std::exchange(_taken, 0));
     while (!_window.peek(1).empty()) {
         Candidate found = _skipping ? chanced() : due();

@@ -47,6 +47,9 @@ protected:
     /// The channel message in the first `size` bytes of the window.
     virtual Bytes message(std::size_t size) = 0;
 
+    /// Whether what ends may only not have been written yet.
+    bool mayGrow() const { return _mayGrow; }
+
     ByteWindow& _window;
 
 private:
@@ -54,6 +57,7 @@ private:
     void tellSkipped();
 
     Tell _tell;
+    bool _mayGrow = false;
     std::size_t _taken = 0; ///< still in the window, since it was handed out
     std::uint64_t _messageOffset = 0;
     std::optional<Fault> _skipping;

@@ -2,12 +2,14 @@
 
 #include "tools/MessageScanner.h"
 
+#include <set>
 #include <vector>
 
 namespace kestrum {
 
 /// Log records one behind the other: length, log code, time stamp, payload. Before them stands what the stream's
-/// origin left there.
+/// origin left there. Where the lengths lead from record to record up to the end, they alone decide; time stamps help
+/// where they do not: a modem that has not heard of the time yet counts from 1980, and any stamp may be wrong.
 class RecordScanner final : public MessageScanner {
 public:
     enum class Origin {
@@ -43,6 +45,17 @@ private:
         std::uint64_t stamp;
     };
     std::optional<Head> headAt(std::size_t at, const Lead& lead);
+    std::optional<Head> framed(std::size_t at);
+    /// Where the lengths lead: to the end of the stream, on and on, or to one that cannot be.
+    enum class Chain { Ends, GoesOn, Breaks };
+    Chain follow();
+    bool leadsOn(const Head& head);
+    bool isContradicted(const Head& head);
+    bool isProvenAhead();
+    Candidate accept(const Head& head, std::size_t size);
+    bool isInTime(std::uint64_t stamp) const;
+    bool isFamiliar(const Head& head, std::size_t end);
+
     enum class Next { Nothing, End, Record };
     Next whatFollows(std::size_t at, std::uint64_t stamp, int links);
     /// The record at `at`: its size when something follows it that may; else the best that was found of its head.
@@ -55,6 +68,15 @@ private:
     std::size_t endOfPropertyList(std::size_t at);
 
     Origin _origin;
+    // Offsets in the stream. What was found is kept, so that no part of it is gone through for each record again.
+    std::vector<std::uint64_t> _way; ///< the records that were followed last
+    Chain _chain = Chain::Breaks;    ///< where they lead
+    std::set<std::uint64_t> _broken; ///< where lengths begin that lead to one that cannot be
+    std::uint64_t _searchedTo = 0;   ///< up to here stamps prove no record, and there they do, or nothing was looked at
+    struct {
+        std::uint64_t from = 0, end = 0; ///< the first end of a list behind `from`; 0: none before `to`
+        std::uint64_t to = 0;
+    } _list;
     std::uint64_t _lastStamp = 0;
     std::optional<Head> _accepted;
     std::vector<std::byte> _message;

@@ -7,6 +7,8 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
+#include <tuple>
+
 namespace kestrum {
 namespace {
 
@@ -292,6 +294,184 @@ RC_GTEST_PROP(AnyBytes, AreScannedToTheirEnd, (const std::vector<std::uint8_t>& 
     for (const auto& each : asInterval.messages)
         taken += each.size();
     RC_ASSERT(taken + asInterval.lost == stream.size());
+}
+
+/// What a fresh modem stamps its records with: 1.25 ms since it was switched on, as if that were 1980.
+constexpr std::uint64_t kSwitchedOn = 12'345ull << 16;
+
+std::string records(int count, std::uint64_t first, bool withTypes)
+{
+    std::string stream;
+    for (int i = 0; i < count; ++i)
+        stream += message(0xB0C1u + static_cast<unsigned>(i % 3), std::string(static_cast<std::size_t>(i % 40), 'p'),
+                          first + (static_cast<std::uint64_t>(i * 9) << 16))
+                      .substr(withTypes ? 0 : 1);
+    return stream;
+}
+
+TEST(DlfScanner, TakesTheRecordsOfAModemThatHasNotHeardOfTheTime)
+{
+    const auto got = scanDlf(records(400, kSwitchedOn, false));
+    EXPECT_THAT(got.messages, SizeIs(400));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(DlfScanner, TakesARecordOf1980AmongOthers)
+{
+    const auto odd = dlf(0xB0C1, "clock not set yet", kSwitchedOn);
+    const auto got = scanDlf(odd + records(30, kStamp, false) + odd + odd + records(30, kStamp, false) + odd);
+    EXPECT_THAT(got.messages, SizeIs(64));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(DlfScanner, ReadsAnIntervalOfAModemThatHasNotHeardOfTheTime)
+{
+    const auto interval = records(40, kSwitchedOn, true);
+    const auto got = scanDlf(interval.substr(1) + interval.substr(1));
+    EXPECT_THAT(got.messages, SizeIs(80));
+    EXPECT_THAT(got.faults, IsEmpty());
+    EXPECT_THAT(scanInterval(interval).messages, SizeIs(40));
+    EXPECT_THAT(scanInterval(interval).faults, IsEmpty());
+}
+
+TEST(KcapScanner, GivesAMessageThatHoldsACaptureInOnePiece)
+{
+    const auto holding = "a file: " + kcap(kFirst) + kcap(kSecond);
+    const auto got = scanKcap(kcap(holding) + kcap(holding) + kcap("ab") + kcap(""));
+    EXPECT_THAT(got.messages, ElementsAre(holding, holding, "ab", ""));
+    EXPECT_THAT(got.faults, IsEmpty());
+}
+
+TEST(KcapScanner, KeepsOddMessagesBeforeACutEnd)
+{
+    const auto got = scanKcap(kcap("odd") + kcap("") + kcap("odder") + kcap(kFirst).substr(0, 20));
+    EXPECT_THAT(got.messages, ElementsAre("odd", "", "odder"));
+    EXPECT_THAT(got.faults, SizeIs(1));
+}
+
+TEST(KcapScanner, FindsABinaryPropertyListBehindDamage)
+{
+    const auto list = contentsOf(inCheckout("fuzz/corpus/propertylist/all.bplist"));
+    const auto got = scanKcap(kcap(kFirst) + "\xFF\xFF\xFF\xFFgarbage" + kcap(list) + kcap(list));
+    EXPECT_THAT(got.messages, ElementsAre(kFirst, list, list));
+}
+
+using Text = std::vector<std::uint8_t>;
+
+std::string textOfAny(const Text& bytes)
+{
+    return {bytes.begin(), bytes.end()};
+}
+
+/// Empty messages, zeros, a few bytes and whole records among messages of any bytes.
+rc::Gen<std::string> anyMessage()
+{
+    const auto any = rc::gen::map(rc::gen::arbitrary<Text>(), textOfAny);
+    const auto zeros = rc::gen::map(rc::gen::inRange(0, 30),
+                                    [](int count) { return std::string(static_cast<std::size_t>(count), '\0'); });
+    const auto record = rc::gen::map(any, [](const std::string& payload) { return message(0xB0C1, payload); });
+    const auto nested = rc::gen::map(record, [](const std::string& held) { return "x" + kcap(held) + kcap(held); });
+    return rc::gen::oneOf(any, zeros, record, nested);
+}
+
+RC_GTEST_PROP(WellFramed, KcapIsReadWholeWhateverItsMessagesHold, ())
+{
+    const auto messages = *rc::gen::container<std::vector<std::string>>(anyMessage());
+    std::string stream;
+    for (const auto& each : messages)
+        stream += kcap(each);
+    const auto got = scanKcap(stream);
+    RC_ASSERT(got.messages == messages);
+    RC_ASSERT(got.faults.empty());
+}
+
+RC_GTEST_PROP(WellFramed, DlfIsReadWholeWhateverItsTimeStamps, ())
+{
+    const auto stamp = rc::gen::oneOf(
+        rc::gen::arbitrary<std::uint64_t>(), rc::gen::element<std::uint64_t>(0, kStamp),
+        rc::gen::inRange<std::uint64_t>(0, 1ull << 40),
+        rc::gen::map(rc::gen::arbitrary<std::uint8_t>(), [](std::uint64_t byte) { return byte * 0x0101010101010101; }));
+    const auto each = rc::gen::tuple(rc::gen::arbitrary<std::uint16_t>(), anyMessage(), stamp);
+    std::string stream;
+    std::vector<std::string> payloads;
+    for (const auto& [code, payload, at] :
+         *rc::gen::container<std::vector<std::tuple<std::uint16_t, std::string, std::uint64_t>>>(each)) {
+        stream += dlf(code, payload, at);
+        payloads.push_back(payload);
+    }
+    const auto got = scanDlf(stream);
+    RC_ASSERT(got.messages.size() == payloads.size());
+    RC_ASSERT(got.faults.empty());
+    for (std::size_t i = 0; i < payloads.size(); ++i)
+        RC_ASSERT(got.messages[i].substr(13) == payloads[i]);
+}
+
+// No zeros: the lengths and times of records are half of them, and enough of them can pass for a record.
+rc::Gen<Text> someBytes(int least, int most)
+{
+    return rc::gen::container<Text>(static_cast<std::size_t>(*rc::gen::inRange(least, most)),
+                                    rc::gen::cast<std::uint8_t>(rc::gen::inRange(1, 256)));
+}
+
+/// A stream in which some bytes were written over, and the whole messages behind them.
+struct Damaged {
+    std::string stream;
+    std::vector<std::string> behind;
+};
+
+Damaged damaged(const std::vector<std::string>& messages, std::string (*framed)(const std::string&), std::size_t slack)
+{
+    Damaged result;
+    std::vector<std::size_t> begins;
+    for (const auto& each : messages) {
+        begins.push_back(result.stream.size());
+        result.stream += framed(each);
+    }
+    const auto at = *rc::gen::inRange<std::size_t>(0, begins[messages.size() - 4]);
+    const auto noise = *someBytes(1, 60);
+    const auto count = std::min(noise.size(), result.stream.size() - at);
+    result.stream.replace(at, count, textOfAny(noise), 0, count);
+    for (std::size_t i = 0; i < messages.size(); ++i)
+        if (begins[i] >= at + noise.size() + slack)
+            result.behind.push_back(messages[i]);
+    return result;
+}
+
+std::vector<std::string> drive()
+{
+    std::vector<Text> payloads;
+    for (int count = *rc::gen::inRange(8, 40); count > 0; --count)
+        payloads.push_back(*someBytes(0, 60));
+    std::vector<std::string> messages;
+    for (const auto& each : payloads)
+        messages.push_back(message(0xB0C1, textOfAny(each), kStamp + (messages.size() * 40 << 16)));
+    return messages;
+}
+
+bool endsWith(const std::vector<std::string>& all, const std::vector<std::string>& last)
+{
+    return all.size() >= last.size() && std::equal(last.rbegin(), last.rend(), all.rbegin());
+}
+
+RC_GTEST_PROP(OverwrittenBytes, HideNoMessageOfAKcapBehindThem, ())
+{
+    const auto [stream, behind] = damaged(
+        drive(), [](const std::string& each) { return kcap(each); }, 0);
+    const auto got = scanKcap(stream);
+    // Unless the new lengths lead to the end as well.
+    RC_ASSERT(endsWith(got.messages, behind) || got.faults.empty());
+}
+
+// A false length that leads to another record by accident hides what lies between, in the record that it belongs to.
+RC_GTEST_PROP(OverwrittenBytes, LeaveNoRecordOfADlfBehindThemUnread, ())
+{
+    const auto [stream, behind] = damaged(
+        drive(), [](const std::string& each) { return each.substr(1); }, 256);
+    const auto got = scanDlf(stream);
+    RC_CLASSIFY(endsWith(got.messages, behind), "each found by itself");
+    for (const auto& each : behind)
+        RC_ASSERT(std::ranges::any_of(
+            got.messages, [&](const auto& message) { return message.find(each.substr(1)) != message.npos; }));
 }
 
 TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
