@@ -2,23 +2,23 @@
 #include "platform/SystemLog.h"
 
 #include <cmath>
-#include <optional>
 
 namespace kestrum {
 namespace {
 
-constexpr std::uint32_t kUnusedFinger = 0xFFFF;
+constexpr std::uint32_t kUnusedFinger = 0xFFFF, kNone = 0x10000; // PNs have 16 bits
 
 /// Where a record keeps its pilots, and what of each is read.
 struct PilotList {
     Field count;
     std::size_t first, size;
-    Field pn, energy; ///< from the pilot's first byte; energies are in units of 1/512
+    Field pn, energy;      ///< from the pilot's first byte; energies are in units of 1/512
+    std::uint32_t leftOut; ///< the PN that marks an entry as unused
 };
 
 // clang-format off
-constexpr PilotList kActiveSet{u8(15), 25, 12, u16(0), u16(2)};
-constexpr PilotList kFingers  {u8(22), 23, 14, u16(0), u16(6)};
+constexpr PilotList kActiveSet{u8(15), 25, 12, u16(0), u16(2), kNone};
+constexpr PilotList kFingers  {u8(22), 23, 14, u16(0), u16(6), kUnusedFinger};
 // clang-format on
 
 unsigned lengthOf(Record record)
@@ -28,8 +28,7 @@ unsigned lengthOf(Record record)
 
 /// Lists {"_sorted", "0;PN": strength, ...}: the index first, so that the list keeps the record's order. A pilot that
 /// is left out leaves a gap in the index.
-void listStrengths(Record record, const PilotList& list, std::uint32_t count, std::optional<std::uint32_t> leftOut,
-                   Dictionary& shown)
+void listStrengths(Record record, const PilotList& list, std::uint32_t count, Dictionary& shown)
 {
     shown.setText("_sorted", "_sorted");
     for (std::uint32_t i = 0; i < count; ++i) {
@@ -37,7 +36,7 @@ void listStrengths(Record record, const PilotList& list, std::uint32_t count, st
         if (!pilot)
             break;
         const auto pn = pilot->read(list.pn).value_or(0);
-        if (leftOut == pn)
+        if (pn == list.leftOut)
             continue;
         const double ratio = pilot->read(list.energy).value_or(0) / 512.0;
         shown.setText(formatted("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
@@ -46,11 +45,11 @@ void listStrengths(Record record, const PilotList& list, std::uint32_t count, st
 }
 
 void publishPilots(C2KContext& context, std::string_view identifier, Record record, const PilotList& list,
-                   std::uint32_t count, std::optional<std::uint32_t> leftOut = std::nullopt)
+                   std::uint32_t count)
 {
     context.publish(identifier, [&](Value& shown) {
         Dictionary& pilots = shown.becomeDictionary();
-        listStrengths(record, list, count, leftOut, pilots);
+        listStrengths(record, list, count, pilots);
         if (pilots.size() == 1)
             shown = "(none)";
     });
@@ -88,7 +87,7 @@ void decodeFingers(Record record, C2KContext& context)
                                        lengthOf(record), static_cast<std::int32_t>(count), kFingers.first));
         return;
     }
-    publishPilots(context, "kFingerC2I", record, kFingers, count, kUnusedFinger);
+    publishPilots(context, "kFingerC2I", record, kFingers, count);
 }
 
 } // namespace kestrum
