@@ -211,7 +211,8 @@ RecordScanner::Look RecordScanner::look(std::size_t at, bool chance)
         const auto fits = [&](std::size_t end) {
             if (end - at < lead.size + kHead || _window.peek(end).size() < end)
                 return false;
-            const auto next = whatFollows(end, head->stamp != 0 ? head->stamp : _lastStamp, 1);
+            const bool mayJump = !chance || isInTime(head->stamp);
+            const auto next = whatFollows(end, head->stamp != 0 ? head->stamp : _lastStamp, mayJump ? 1 : 0);
             return next == Next::Record || (next == Next::End && (!chance || isNear(head->stamp, _lastStamp)));
         };
         const std::size_t end = at + lead.size + head->length;

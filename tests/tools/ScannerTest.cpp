@@ -419,7 +419,7 @@ struct Damaged {
     std::vector<std::string> behind;
 };
 
-Damaged damaged(const std::vector<std::string>& messages, std::string (*framed)(const std::string&), std::size_t slack)
+Damaged damaged(const std::vector<std::string>& messages, std::string (*framed)(const std::string&))
 {
     Damaged result;
     std::vector<std::size_t> begins;
@@ -427,12 +427,12 @@ Damaged damaged(const std::vector<std::string>& messages, std::string (*framed)(
         begins.push_back(result.stream.size());
         result.stream += framed(each);
     }
-    const auto at = *rc::gen::inRange<std::size_t>(0, begins[messages.size() - 4]);
+    const auto at = *rc::gen::inRange<std::size_t>(0, begins[messages.size() / 2]);
     const auto noise = *someBytes(1, 60);
     const auto count = std::min(noise.size(), result.stream.size() - at);
     result.stream.replace(at, count, textOfAny(noise), 0, count);
     for (std::size_t i = 0; i < messages.size(); ++i)
-        if (begins[i] >= at + noise.size() + slack)
+        if (begins[i] >= at + noise.size())
             result.behind.push_back(messages[i]);
     return result;
 }
@@ -455,23 +455,18 @@ bool endsWith(const std::vector<std::string>& all, const std::vector<std::string
 
 RC_GTEST_PROP(OverwrittenBytes, HideNoMessageOfAKcapBehindThem, ())
 {
-    const auto [stream, behind] = damaged(
-        drive(), [](const std::string& each) { return kcap(each); }, 0);
+    const auto [stream, behind] = damaged(drive(), [](const std::string& each) { return kcap(each); });
     const auto got = scanKcap(stream);
     // Unless the new lengths lead to the end as well.
     RC_ASSERT(endsWith(got.messages, behind) || got.faults.empty());
 }
 
-// A false length that leads to another record by accident hides what lies between, in the record that it belongs to.
-RC_GTEST_PROP(OverwrittenBytes, LeaveNoRecordOfADlfBehindThemUnread, ())
+// False bytes that pass for a record can hide some: of short records here not as many as half of a drive.
+RC_GTEST_PROP(OverwrittenBytes, DoNotKeepADlfFromBeingFoundAgain, ())
 {
-    const auto [stream, behind] = damaged(
-        drive(), [](const std::string& each) { return each.substr(1); }, 256);
-    const auto got = scanDlf(stream);
-    RC_CLASSIFY(endsWith(got.messages, behind), "each found by itself");
-    for (const auto& each : behind)
-        RC_ASSERT(std::ranges::any_of(
-            got.messages, [&](const auto& message) { return message.find(each.substr(1)) != message.npos; }));
+    auto [stream, behind] = damaged(drive(), [](const std::string& each) { return each.substr(1); });
+    behind.erase(behind.begin(), behind.end() - 3);
+    RC_ASSERT(endsWith(scanDlf(stream).messages, behind));
 }
 
 TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
