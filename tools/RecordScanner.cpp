@@ -213,7 +213,8 @@ RecordScanner::Look RecordScanner::look(std::size_t at, bool chance)
                 return false;
             const bool mayJump = !chance || isInTime(head->stamp);
             const auto next = whatFollows(end, head->stamp != 0 ? head->stamp : _lastStamp, mayJump ? 1 : 0);
-            return next == Next::Record || (next == Next::End && (!chance || isNear(head->stamp, _lastStamp)));
+            return next == Next::Record ||
+                   (next == Next::End && (!chance || (_lastStamp != 0 && isNear(head->stamp, _lastStamp))));
         };
         const std::size_t end = at + lead.size + head->length;
         if (chance && !isFamiliar(*head, end))

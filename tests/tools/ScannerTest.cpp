@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
+#include <random>
 #include <tuple>
 
 namespace kestrum {
@@ -461,12 +462,34 @@ RC_GTEST_PROP(OverwrittenBytes, HideNoMessageOfAKcapBehindThem, ())
     RC_ASSERT(endsWith(got.messages, behind) || got.faults.empty());
 }
 
-// False bytes that pass for a record can hide some: of short records here not as many as half of a drive.
-RC_GTEST_PROP(OverwrittenBytes, DoNotKeepADlfFromBeingFoundAgain, ())
+// Nothing but lengths and time stamps tells where records begin, so bytes of two records can pass for a third. That is
+// rare: all whole records behind the damage are found in all but a few of a thousand cases.
+TEST(OverwrittenBytes, HideRecordsOfADlfHardlyEver)
 {
-    auto [stream, behind] = damaged(drive(), [](const std::string& each) { return each.substr(1); });
-    behind.erase(behind.begin(), behind.end() - 3);
-    RC_ASSERT(endsWith(scanDlf(stream).messages, behind));
+    std::mt19937 random(7); // always the same cases
+    const auto bytes = [&](std::size_t most) {
+        std::string text(random() % most, ' ');
+        for (char& each : text)
+            each = static_cast<char>(1 + random() % 255);
+        return text;
+    };
+    int hidden = 0;
+    for (int run = 0; run < 1000; ++run) {
+        std::string stream;
+        std::vector<std::string> all;
+        std::vector<std::size_t> begins;
+        for (std::uint64_t i = 0; i < 30; ++i) {
+            all.push_back(message(0xB0C1, bytes(60), kStamp + (i * 40 << 16)));
+            begins.push_back(stream.size());
+            stream += all.back().substr(1);
+        }
+        const auto noise = "#" + bytes(60);
+        const auto at = random() % begins[20];
+        stream.replace(at, noise.size(), noise);
+        const auto first = std::ranges::lower_bound(begins, at + noise.size()) - begins.begin();
+        hidden += endsWith(scanDlf(stream).messages, {all.begin() + first, all.end()}) ? 0 : 1;
+    }
+    EXPECT_LE(hidden, 10);
 }
 
 TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
