@@ -18,7 +18,7 @@ public:
     Value parseOver(Bytes bytes, Value /*spent*/) const override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override { return _lists.toXml(value); }
     Value load(const std::string& path) const override { return _lists.load(path); }
-    bool write(const Dictionary& dictionary, const std::string& path) const override
+    Stored write(const Dictionary& dictionary, const std::string& path) const override
     {
         return _lists.write(dictionary, path);
     }

@@ -28,9 +28,11 @@ public:
     /// The property list in a file; null when it cannot be read or parsed.
     virtual Value load(const std::string& path) const = 0;
 
-    /// Writes a dictionary in XML form straight to its final path; a missing directory is created. The list is
-    /// serialised in full before the path is opened. False when it cannot be written.
-    virtual bool write(const Dictionary& dictionary, const std::string& path) const = 0;
+    enum class Stored { Written, NameTaken, Failed };
+    /// Writes a dictionary in XML form into a file of its own, for the user's eyes alone, whole or not at all. A missing
+    /// directory is created. The same path again replaces what these lists wrote there; anything else that stands
+    /// there stays as it is.
+    virtual Stored write(const Dictionary& dictionary, const std::string& path) const = 0;
 };
 
 } // namespace kestrum

@@ -17,10 +17,12 @@ namespace {
 constexpr std::string_view kReuseIdentifier = "SaveHistoryContentCell";
 constexpr Font kRowFont{"Helvetica", 13};
 
-std::string snapshotPath(const FileSystem& files, Date now)
+// A name that another display took in the same second is that display's: the next second's is as good.
+constexpr std::chrono::seconds kMostNames{60};
+
+std::string snapshotPath(const FileSystem& files, std::chrono::seconds moment)
 {
-    const auto seconds = std::chrono::floor<std::chrono::seconds>(now).time_since_epoch().count();
-    return formatted("%@/KestrumSnapshot-%ld.kestrum", files.diagnosticLogDirectory(), seconds);
+    return formatted("%@/KestrumSnapshot-%ld.kestrum", files.diagnosticLogDirectory(), moment.count());
 }
 
 } // namespace
@@ -80,8 +82,15 @@ void KestrumSaveViewController::savePressed()
     const auto text = saveDescription().text();
     const auto snapshot = makeDictionaryUntilNull(
         {{"Timestamp", dateText(_timeStamp)}, {"Data", _saveHistory}, {"Description", text ? Value(*text) : Value()}});
-    const std::string path = snapshotPath(_roles.files, _roles.clock.now());
-    if (_roles.propertyLists.write(*snapshot, path)) {
+    auto moment = std::chrono::floor<std::chrono::seconds>(_roles.clock.now()).time_since_epoch();
+    const auto last = moment + kMostNames;
+    std::string path;
+    PropertyLists::Stored stored;
+    do
+        path = snapshotPath(_roles.files, moment);
+    while ((stored = _roles.propertyLists.write(*snapshot, path)) == PropertyLists::Stored::NameTaken &&
+           ++moment != last);
+    if (stored == PropertyLists::Stored::Written) {
         _application.showNotice("Saved to " + path);
     } else {
         _roles.log.write(Priority::Error, "Unable to write snapshot to %s", path);

@@ -8,6 +8,7 @@
 #include <cstdio>
 #include <filesystem>
 #include <memory>
+#include <system_error>
 
 namespace kestrum {
 namespace {
@@ -31,16 +32,6 @@ std::optional<std::vector<std::byte>> contents(const std::string& path)
         bytes.insert(bytes.end(), block, block + count);
     }
     return std::ferror(file.get()) ? std::nullopt : std::optional(std::move(bytes));
-}
-
-/// False also when the disk fills up while the last bytes leave the buffer.
-bool store(const std::string& text, const std::string& path)
-{
-    File file(std::fopen(path.c_str(), "wb"));
-    if (!file)
-        return false;
-    const bool written = std::fwrite(text.data(), 1, text.size(), file.get()) == text.size();
-    return std::fclose(file.release()) == 0 && written;
 }
 
 /// Nothing when the value has no XML form.
@@ -91,16 +82,27 @@ Value PropertyListCodec::load(const std::string& path) const
     return bytes ? parse(*bytes) : Value();
 }
 
-bool PropertyListCodec::write(const Dictionary& dictionary, const std::string& path) const
+PropertyLists::Stored PropertyListCodec::write(const Dictionary& dictionary, const std::string& path) const
 {
     const auto text = xmlText(std::make_shared<Dictionary>(dictionary));
-    if (!text)
-        return false;
+    if (!text || text->size() > kMaxBytes)
+        return Stored::Failed;
     if (const auto directory = std::filesystem::path(path).parent_path(); !directory.empty()) {
-        std::error_code ignored; // a directory that is missing still shows when the file is opened
+        std::error_code ignored; // a directory that is missing still shows when the file is made
         std::filesystem::create_directories(directory, ignored);
     }
-    return store(*text, path);
+    try {
+        WholeFile file(path);
+        file.write(bytesOf(*text));
+        const auto there = WholeFile::at(path);
+        const bool isOurs = there == _lastWritten && there != WholeFile::Identity();
+        if (!file.finish(isOurs ? WholeFile::Existing::Replaced : WholeFile::Existing::Kept))
+            return Stored::NameTaken;
+        _lastWritten = file.identity();
+        return Stored::Written;
+    } catch (const std::system_error&) {
+        return Stored::Failed;
+    }
 }
 
 } // namespace kestrum

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/PropertyLists.h"
+#include "platform/propertylist/WholeFile.h"
 
 #include <cstddef>
 #include <string>
@@ -30,7 +31,8 @@ public:
     std::optional<Data> toXml(const Value& value) const override;
 
     Value load(const std::string& path) const override;
-    bool write(const Dictionary& dictionary, const std::string& path) const override;
+    /// Fails also for a file of more bytes than could be read again.
+    Stored write(const Dictionary& dictionary, const std::string& path) const override;
 
     /// What `parseWithError` found: a value, or why there is none.
     struct Parsed {
@@ -41,6 +43,9 @@ public:
         explicit operator bool() const { return reason.empty(); }
     };
     Parsed parseWithError(Bytes bytes, Value spent = {}) const;
+
+private:
+    mutable WholeFile::Identity _lastWritten;
 };
 
 } // namespace kestrum

@@ -22,7 +22,10 @@ public:
     }
     std::optional<Data> toXml(const Value&) const override { return Data(bytesOf("xml")); }
     Value load(const std::string& path) const override { return path; }
-    bool write(const Dictionary&, const std::string& path) const override { return path == "writable"; }
+    Stored write(const Dictionary&, const std::string& path) const override
+    {
+        return path == "writable" ? Stored::Written : Stored::Failed;
+    }
 
     mutable int parsed = 0;
     mutable Value spent;
@@ -75,8 +78,8 @@ TEST(ParsedOnce, LeavesTheRestToTheListsBehindIt)
     const ParsedOnce once(lists);
     EXPECT_EQ(textOf(once.toXml(Value("any"))->bytes()), "xml");
     EXPECT_EQ(once.load("path"), Value("path"));
-    EXPECT_TRUE(once.write({}, "writable"));
-    EXPECT_FALSE(once.write({}, "elsewhere"));
+    EXPECT_EQ(once.write({}, "writable"), PropertyLists::Stored::Written);
+    EXPECT_EQ(once.write({}, "elsewhere"), PropertyLists::Stored::Failed);
 }
 
 } // namespace

@@ -3,6 +3,7 @@
 #include "platform/PropertyLists.h"
 
 #include <map>
+#include <set>
 
 namespace kestrum {
 
@@ -19,16 +20,19 @@ public:
         return Data(bytesOf(describe(value)));
     }
     Value load(const std::string& path) const override { return deepCopy(find(files, path)); }
-    bool write(const Dictionary& dictionary, const std::string& path) const override
+    Stored write(const Dictionary& dictionary, const std::string& path) const override
     {
         if (!writable)
-            return false;
+            return Stored::Failed;
+        if (taken.contains(path))
+            return Stored::NameTaken;
         files[path] = deepCopy(std::make_shared<Dictionary>(dictionary));
-        return true;
+        return Stored::Written;
     }
 
     std::map<std::string, Value> parsed;
     mutable std::map<std::string, Value> files;
+    std::set<std::string> taken; ///< paths at which something else stands
     bool writable = true;
 
 private:

@@ -90,7 +90,7 @@ protected:
     /// As the program reads it from the disk.
     Value reread(const DictionaryRef& snapshot) const
     {
-        EXPECT_TRUE(codec.write(*snapshot, scratch.file("a.kestrum")));
+        EXPECT_EQ(codec.write(*snapshot, scratch.file("a.kestrum")), PropertyLists::Stored::Written);
         return codec.load(scratch.file("a.kestrum"));
     }
 
@@ -186,7 +186,7 @@ class SnapshotFile : public testing::Test {
 protected:
     std::string write(const DictionaryRef& snapshot)
     {
-        EXPECT_TRUE(codec.write(*snapshot, scratch.file("Saved.kestrum")));
+        EXPECT_EQ(codec.write(*snapshot, scratch.file("Saved.kestrum")), PropertyLists::Stored::Written);
         return scratch.file("Saved.kestrum");
     }
 

@@ -158,6 +158,15 @@ TEST_F(KestrumSaveViewControllerTest, TwoSavesWithinOneSecondLeaveTheSecond)
     EXPECT_EQ(doubles.propertyLists.files.size(), 2u);
 }
 
+TEST_F(KestrumSaveViewControllerTest, ANameThatAnotherDisplayTookIsLeftToIt)
+{
+    doubles.propertyLists.taken = {kFirstPath};
+    open(makeArray());
+    controller->savePressed();
+    EXPECT_TRUE(doubles.propertyLists.files.contains("/logs/KestrumSnapshot-1794809143.kestrum"));
+    EXPECT_THAT(doubles.toolkit.alerts, IsEmpty());
+}
+
 TEST_F(KestrumSaveViewControllerTest, WhatIsSavedIsWhatWasOffered)
 {
     const auto display = makeDictionary({{"State", "Idle"}});
@@ -299,12 +308,20 @@ TEST_F(SnapshotFile, DirectoryThatCannotBeMadeIsTold)
                                                   scratch.file("file/logs/KestrumSnapshot-1794809142.kestrum")));
 }
 
-TEST_F(SnapshotFile, FullDiskIsTold)
+TEST_F(SnapshotFile, OfTwoDisplaysInOneSecondThereAreTwo)
 {
-    std::filesystem::create_symlink("/dev/full", scratch.file("KestrumSnapshot-1794809142.kestrum"));
     save(scratch.path());
-    EXPECT_EQ(doubles.toolkit.alerts.size(), 1u);
-    EXPECT_EQ(doubles.log.errors().size(), 1u);
+    PropertyListCodec another;
+    ApplicationRoles second{{{doubles.log, doubles.console, doubles.clock, doubles.bundle, another},
+                             doubles.queue,
+                             doubles.ports,
+                             doubles.telephony},
+                            doubles.preferences,
+                            doubles.files,
+                            doubles.toolkit};
+    KestrumSaveViewController(second, application, makeArray()).savePressed();
+    EXPECT_TRUE(codec.load(scratch.file("KestrumSnapshot-1794809142.kestrum")));
+    EXPECT_TRUE(codec.load(scratch.file("KestrumSnapshot-1794809143.kestrum")));
 }
 
 } // namespace
