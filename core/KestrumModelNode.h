@@ -2,10 +2,10 @@
 
 #include "support/Value.h"
 
+#include <map>
 #include <memory>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
 namespace kestrum {
@@ -15,8 +15,8 @@ class KestrumModelNode;
 /// Nodes never change, so whoever holds one may keep it after the tree was built anew.
 using KestrumModelNodeRef = std::shared_ptr<const KestrumModelNode>;
 using KestrumModelNodes = std::vector<KestrumModelNodeRef>;
-/// Node path to node.
-using PathDictionary = std::unordered_map<std::string, KestrumModelNodeRef>;
+/// Node path to node. Sorted, for paths can be chosen to collide in any hash.
+using PathDictionary = std::map<std::string, KestrumModelNodeRef>;
 
 inline constexpr std::string_view kRootPath = "/";
 

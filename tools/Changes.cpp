@@ -65,16 +65,21 @@ void Changes::compare(const Dictionary& now, Dictionary& seen)
     }
     if (seen.size() == shown)
         return;
-    std::vector<std::string> missing;
-    for (const auto& [key, value] : seen)
-        if (now.at(key).isNull())
-            missing.push_back(key);
-    for (const auto& key : missing) {
-        _path.push_back({&key, 0});
-        gone(seen.at(key));
-        _path.pop_back();
-        seen.remove(key);
+    const auto isGone = [&](const Dictionary::Entry& entry) {
+        const Value* held = now.find(entry.key);
+        return held == nullptr || held->isNull();
+    };
+    Dictionary kept;
+    for (const auto& entry : seen) {
+        if (isGone(entry)) {
+            _path.push_back({&entry.key, 0});
+            gone(entry.value);
+            _path.pop_back();
+        } else {
+            kept.set(entry.key, entry.value);
+        }
     }
+    seen = kept;
 }
 
 void Changes::compare(const Array& now, Array& seen)

@@ -1,61 +1,67 @@
 #include "tools/Extraction.h"
 
 #include "platform/ChannelMessage.h"
-#include "voxd/capture/Capture.h"
 
-#include <cerrno>
+#include <array>
 #include <filesystem>
-#include <system_error>
+#include <stdexcept>
 
 namespace kestrum {
 namespace {
 
 constexpr std::size_t kLongestRecord = 0xFFFF;
+constexpr const char *kKcap = ".kcap", *kDlf = ".dlf", *kWritten = "-written.dlf";
 
-std::string pathIn(const std::string& directory, const Snapshot& snapshot, const char* ending)
+std::string stemIn(const std::string& directory, const Snapshot& snapshot)
 {
     std::filesystem::create_directories(directory);
     const auto stem = std::filesystem::path(snapshot.listing().file).stem().string();
-    return (std::filesystem::path(directory) / ((stem == "-" ? "snapshot" : stem) + ending)).string();
+    return (std::filesystem::path(directory) / (stem == "-" ? "snapshot" : stem)).string();
 }
 
-void write(std::ostream& to, Bytes bytes)
+bool isThere(const std::string& path)
 {
-    to.write(textOf(bytes).data(), static_cast<std::streamsize>(bytes.size()));
+    return WholeFile::at(path) != WholeFile::Identity();
+}
+
+template <std::size_t Width>
+std::array<std::byte, Width> littleEndian(std::size_t number)
+{
+    std::array<std::byte, Width> bytes{};
+    for (std::size_t i = 0; i < Width; ++i)
+        bytes[i] = static_cast<std::byte>(number >> (8 * i));
+    return bytes;
 }
 
 } // namespace
 
-Extraction::File Extraction::create(const std::string& path)
+Extraction::Extraction(const std::string& directory, const Snapshot& snapshot, WholeFile::Existing existing)
+    : _stem(stemIn(directory, snapshot)), _existing(existing)
 {
-    File file{path, std::ofstream(path, std::ios::binary | std::ios::trunc)};
-    if (!file.stream)
-        throw std::system_error(errno, std::generic_category(), path);
-    return file;
-}
-
-void Extraction::close(File& file)
-{
-    if (file.stream.is_open() && !file.stream.flush())
-        throw std::system_error(errno, std::generic_category(), file.path);
-}
-
-Extraction::Extraction(const std::string& directory, const Snapshot& snapshot)
-    : _kcap(create(pathIn(directory, snapshot, ".kcap")))
-{
+    std::string there;
+    for (const auto* ending : {kKcap, kWritten, kDlf})
+        if ((ending == kKcap || snapshot.dlf()) && isThere(_stem + ending))
+            there += (there.empty() ? "" : ", ") + _stem + ending;
+    if (existing == WholeFile::Existing::Kept && !there.empty())
+        throw std::runtime_error("nothing is extracted, for there is already " + there + " (--force replaces it)");
+    _kcap = &create(kKcap);
     if (!snapshot.dlf())
         return;
-    auto written = create(pathIn(directory, snapshot, "-written.dlf"));
-    write(written.stream, snapshot.dlf()->bytes());
-    close(written);
-    _dlf = create(pathIn(directory, snapshot, ".dlf"));
-    write(_dlf.stream, snapshot.versionReport());
+    create(kWritten).write(snapshot.dlf()->bytes());
+    _dlf = &create(kDlf);
+    _dlf->write(snapshot.versionReport());
+}
+
+WholeFile& Extraction::create(const std::string& ending)
+{
+    return *_files.emplace_back(_stem + ending, std::make_unique<WholeFile>(_stem + ending)).second;
 }
 
 void Extraction::take(Bytes message)
 {
-    writeKcap(_kcap.stream, message);
-    if (!_dlf.stream.is_open())
+    _kcap->write(littleEndian<4>(message.size()));
+    _kcap->write(message);
+    if (_dlf == nullptr)
         return;
     const auto read = ChannelMessage::read(message);
     const auto record = read && read->type == ChannelMessage::kOrdinary ? read->record.from(1) : std::nullopt;
@@ -64,15 +70,15 @@ void Extraction::take(Bytes message)
         return;
     }
     // The length as it is, whatever the record said.
-    const std::byte length[] = {static_cast<std::byte>(record->size()), static_cast<std::byte>(record->size() >> 8)};
-    write(_dlf.stream, length);
-    write(_dlf.stream, record->from(sizeof length)->bytes());
+    _dlf->write(littleEndian<2>(record->size()));
+    _dlf->write(record->from(2)->bytes());
 }
 
 void Extraction::finish()
 {
-    close(_kcap);
-    close(_dlf);
+    for (const auto& [path, file] : _files)
+        if (!file->finish(_existing))
+            throw std::runtime_error("not extracted, for there is already " + path);
 }
 
 } // namespace kestrum

@@ -1,20 +1,24 @@
 #pragma once
 
+#include "platform/propertylist/WholeFile.h"
 #include "support/Bytes.h"
 #include "tools/Snapshot.h"
 
 #include <cstdint>
-#include <fstream>
+#include <memory>
 #include <string>
+#include <utility>
+#include <vector>
 
 namespace kestrum {
 
 /// Files made of a snapshot, named after it: the DLF stream as it was written ("-written.dlf"), and what was recovered
-/// of it as a clean ".dlf" and ".kcap".
+/// of it as a clean ".dlf" and ".kcap". All of them, or none.
 class Extraction {
 public:
-    /// Makes the directory where it is missing. Throws std::runtime_error when a file cannot be written.
-    Extraction(const std::string& directory, const Snapshot& snapshot);
+    /// Makes the directory where it is missing. Throws std::runtime_error, naming the files that exist unless they are
+    /// to be replaced, and when a file cannot be written. Links are replaced, never followed.
+    Extraction(const std::string& directory, const Snapshot& snapshot, WholeFile::Existing existing);
 
     /// One recovered message.
     void take(Bytes message);
@@ -24,14 +28,13 @@ public:
     std::uint64_t inKcapAlone() const { return _inKcapAlone; }
 
 private:
-    struct File {
-        std::string path;
-        std::ofstream stream;
-    };
-    static File create(const std::string& path);
-    static void close(File& file);
+    WholeFile& create(const std::string& ending);
 
-    File _kcap, _dlf;
+    const std::string _stem;
+    const WholeFile::Existing _existing;
+    std::vector<std::pair<std::string, std::unique_ptr<WholeFile>>> _files; ///< by path
+    WholeFile* _kcap = nullptr;
+    WholeFile* _dlf = nullptr; ///< null: the snapshot has no such stream
     std::uint64_t _inKcapAlone = 0;
 };
 

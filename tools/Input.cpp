@@ -4,12 +4,12 @@
 #include <csignal>
 #include <fcntl.h>
 #include <poll.h>
-#include <stdexcept>
 #include <sys/inotify.h>
 #include <sys/signalfd.h>
 #include <sys/stat.h>
 #include <system_error>
 #include <unistd.h>
+#include <utility>
 
 namespace kestrum {
 namespace {
@@ -22,7 +22,7 @@ namespace {
 } // namespace
 
 Input::Input(const std::string& path, bool follow)
-    : _file(path == "-" ? ::dup(STDIN_FILENO) : ::open(path.c_str(), O_RDONLY | O_CLOEXEC))
+    : _path(path), _file(path == "-" ? ::dup(STDIN_FILENO) : ::open(path.c_str(), O_RDONLY | O_CLOEXEC))
 {
     if (_file < 0)
         fail("cannot be opened");
@@ -31,7 +31,13 @@ Input::Input(const std::string& path, bool follow)
         return;
     // Watched before the first byte is read, so that no change falls between.
     _changes = ::inotify_init1(IN_CLOEXEC | IN_NONBLOCK);
-    if (_changes < 0 || ::inotify_add_watch(_changes, path.c_str(), IN_MODIFY) < 0)
+    if (_changes < 0)
+        fail("cannot be followed");
+    watch();
+    // Another file may get its name.
+    const auto slash = path.rfind('/');
+    const auto directory = slash == path.npos ? "." : path.substr(0, slash + 1);
+    if (::inotify_add_watch(_changes, directory.c_str(), IN_CREATE | IN_MOVED_TO | IN_DELETE | IN_MOVED_FROM) < 0)
         fail("cannot be followed");
     sigset_t endings;
     sigemptyset(&endings);
@@ -84,9 +90,40 @@ Input::Woken Input::wait(std::optional<std::chrono::milliseconds> atMost)
     alignas(inotify_event) char events[4096];
     while (::read(_changes, events, sizeof events) > 0) {
     }
-    if (size().value_or(_read) < _read)
-        throw std::runtime_error("has become shorter than what was read of it");
-    return Woken::Changed;
+    return whatChanged();
+}
+
+void Input::watch()
+{
+    if (::inotify_add_watch(_changes, ("/proc/self/fd/" + std::to_string(_file)).c_str(), IN_MODIFY) < 0)
+        fail("cannot be followed");
+}
+
+Input::Woken Input::whatChanged()
+{
+    const auto there = size().value_or(_read);
+    if (there > _read)
+        return Woken::Changed;
+    if (there < _read) {
+        ::lseek(_file, 0, SEEK_SET);
+        _read = 0;
+        return Woken::Restarted;
+    }
+    struct stat held {
+    }, named{};
+    ::fstat(_file, &held);
+    if (::stat(_path.c_str(), &named) != 0)
+        return std::exchange(_isGone, true) ? Woken::TimedOut : Woken::Gone;
+    if (held.st_dev == named.st_dev && held.st_ino == named.st_ino)
+        return Woken::TimedOut;
+    const int another = ::open(_path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK);
+    if (another < 0)
+        fail("cannot be opened");
+    ::close(std::exchange(_file, another));
+    _read = 0;
+    _isGone = false;
+    watch();
+    return Woken::Restarted;
 }
 
 } // namespace kestrum

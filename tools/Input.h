@@ -25,12 +25,18 @@ public:
 
     /// Whether it may grow: a regular file that is followed.
     bool mayGrow() const { return _changes >= 0; }
-    enum class Woken { Changed, TimedOut, Ended };
-    /// Waits until the file has changed, or the program is asked to end (SIGINT, SIGTERM, SIGHUP). Throws
-    /// std::runtime_error when the file has become shorter than what was read.
+    /// Restarted: another file has its name now, or it was emptied; it is read from its start. Gone: it was deleted, and
+    /// there is no other one yet.
+    enum class Woken { Changed, Restarted, Gone, TimedOut, Ended };
+    /// Waits until the file has changed, or the program is asked to end (SIGINT, SIGTERM, SIGHUP).
     Woken wait(std::optional<std::chrono::milliseconds> atMost);
 
 private:
+    void watch();
+    Woken whatChanged();
+
+    std::string _path;
+    bool _isGone = false;
     int _file = -1, _changes = -1, _signals = -1;
     std::uint64_t _read = 0;
 };

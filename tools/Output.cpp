@@ -3,8 +3,8 @@
 #include "core/KestrumModelNode.h"
 #include "support/Base64.h"
 #include "support/Format.h"
-#include "support/Utf8.h"
 #include "tools/Changes.h"
+#include "tools/Harmless.h"
 
 #include <nlohmann/json.hpp>
 
@@ -50,8 +50,10 @@ Json jsonOf(const Value& value)
     }
     case Value::Kind::Dictionary: {
         Json object = Json::object();
+        // No two keys are equal: none has to be looked for.
+        auto& entries = object.get_ref<Json::object_t&>();
         for (const auto& [key, held] : *value.dictionary())
-            object[key] = jsonOf(held);
+            entries.push_back({key, jsonOf(held)});
         return object;
     }
     case Value::Kind::Null:
@@ -77,21 +79,6 @@ void appendJson(std::string& to, std::string_view raw)
 std::string plainText(const Value& value)
 {
     return value.string() != nullptr ? *value.string() : value.isNull() ? std::string() : text(jsonOf(value));
-}
-
-/// A text on one line of a terminal: control characters, and bytes that are no UTF-8, as \xnn.
-std::string onOneLine(std::string_view raw)
-{
-    std::string line;
-    for (std::size_t at = 0; at < raw.size();) {
-        const std::size_t begin = at;
-        const auto character = nextCharacter(raw, at);
-        const bool shown = character && *character >= 0x20 && (*character < 0x7F || *character > 0x9F);
-        for (std::size_t i = begin; i < at; ++i)
-            line += shown ? std::string(1, raw[i])
-                          : formatted("\\x%02x", static_cast<unsigned>(static_cast<unsigned char>(raw[i])));
-    }
-    return line;
 }
 
 Json jsonOf(const SnapshotListing& listing)
@@ -291,6 +278,29 @@ std::string cell(std::string_view raw)
     return quoted + '"';
 }
 
+/// "-98.25 dBm": a sign, a number, and perhaps a unit behind a blank.
+bool isNumber(std::string_view raw)
+{
+    const auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
+    raw.remove_prefix(raw.starts_with('+') || raw.starts_with('-') ? 1 : 0);
+    const auto digits = std::min(raw.find_first_not_of("0123456789."), raw.size());
+    if (std::ranges::none_of(raw.substr(0, digits), isDigit) || std::ranges::count(raw.substr(0, digits), '.') > 1)
+        return false;
+    const auto unit = raw.substr(digits);
+    return unit.empty() || (unit.front() == ' ' && std::ranges::all_of(unit, [](char c) {
+                                return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '%' || c == '/' ||
+                                       c == ' ';
+                            }));
+}
+
+/// What a spreadsheet would take for a formula stands behind an apostrophe: there it is text.
+std::string guarded(std::string text)
+{
+    const bool isFormula =
+        !text.empty() && std::string_view("=+-@\t\r").find(text.front()) != std::string_view::npos && !isNumber(text);
+    return isFormula ? "'" + text : text;
+}
+
 class CsvOutput final : public RemarkingOutput {
 public:
     CsvOutput(bool withLog, OutputFile& data, OutputFile& remarks) : RemarkingOutput(withLog, data, remarks)
@@ -324,7 +334,7 @@ private:
         _data.write(begin());
         _data.write(cell(path));
         _data.write(",");
-        _data.write(cell(plainText(value)));
+        _data.write(cell(guarded(plainText(value))));
         _data.write("\r\n");
     }};
 };

@@ -1,5 +1,7 @@
 #include "tools/OutputFile.h"
 
+#include "tools/Harmless.h"
+
 #include <cerrno>
 #include <system_error>
 #include <unistd.h>
@@ -11,7 +13,19 @@ constexpr std::size_t kPiece = 64 << 10;
 
 } // namespace
 
+OutputFile::OutputFile(int descriptor, Loss loss)
+    : _descriptor(descriptor), _loss(loss), _isTerminal(::isatty(descriptor) != 0)
+{}
+
 void OutputFile::write(std::string_view text)
+{
+    if (_isTerminal)
+        control(onLines(text));
+    else
+        control(text);
+}
+
+void OutputFile::control(std::string_view text)
 {
     _held += text;
     if (_held.size() >= kPiece)

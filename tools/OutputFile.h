@@ -20,14 +20,18 @@ public:
 class OutputFile {
 public:
     enum class Loss { Throws, Ignored };
-    explicit OutputFile(int descriptor, Loss loss = Loss::Throws) : _descriptor(descriptor), _loss(loss) {}
+    explicit OutputFile(int descriptor, Loss loss = Loss::Throws);
 
+    /// What it was given by files and modems: harmless on a terminal, as it is elsewhere.
     void write(std::string_view text);
+    /// What may move the cursor.
+    void control(std::string_view text);
     void flush();
 
 private:
     int _descriptor;
     Loss _loss;
+    bool _isTerminal;
     std::string _held;
 };
 

@@ -5,6 +5,7 @@
 #include "support/Record.h"
 #include "tools/ByteWindow.h"
 #include "tools/Extraction.h"
+#include "tools/Harmless.h"
 #include "tools/Input.h"
 #include "tools/KcapScanner.h"
 #include "tools/RecordScanner.h"
@@ -14,15 +15,21 @@
 #include <algorithm>
 #include <chrono>
 #include <csignal>
+#include <filesystem>
+#include <set>
 #include <stdexcept>
 #include <unistd.h>
 
 namespace kestrum {
 namespace {
 
+using Existing = WholeFile::Existing;
 using SteadyClock = std::chrono::steady_clock;
 
-constexpr int kBadInput = 1;
+constexpr int kBadInput = 1, kUsageError = 2;
+
+/// A snapshot cannot be followed.
+struct WrongUsage {};
 constexpr std::uint64_t kMostFaultLines = 100;
 /// The display of a file that is followed is shown anew this often at most, as the panes are.
 constexpr std::chrono::milliseconds kRefresh{2000};
@@ -40,7 +47,7 @@ public:
         _next = now + std::chrono::milliseconds(250);
         const auto part = size && *size != 0 ? formatted(" (%lu%%)", std::min<std::uint64_t>(100, done * 100 / *size))
                                              : std::string();
-        _to.write(formatted("\r%s: %lu MB%s\x1b[K", file, done / 1'000'000, part));
+        _to.control(formatted("\r%s: %lu MB%s\x1b[K", onOneLine(file), done / 1'000'000, part));
         _to.flush();
         _isShown = true;
     }
@@ -48,7 +55,7 @@ public:
     void clear()
     {
         if (std::exchange(_isShown, false))
-            _to.write("\r\x1b[K");
+            _to.control("\r\x1b[K");
     }
 
 private:
@@ -77,6 +84,9 @@ public:
             finish();
         } catch (const ClosedPipe&) {
             return 0; // Nobody wants the rest.
+        } catch (const WrongUsage&) {
+            complain(_file + ": a snapshot does not grow, and cannot be followed");
+            return kUsageError;
         }
         return _isBad ? kBadInput : 0;
     }
@@ -88,15 +98,19 @@ private:
         _faults = {};
         try {
             Input input(file, _options.follow && isLast);
-            // What is decoded is shown before more is waited for.
-            ByteWindow window([&](std::span<std::byte> into) {
-                _data.flush();
-                _remarks.flush();
-                _progress.show(_file, _window == nullptr ? 0 : _window->offset(), input.size());
-                return input.read(into);
-            });
-            _window = &window;
-            decode(file, input, window);
+            do {
+                // What is decoded is shown before more is waited for.
+                ByteWindow window([&](std::span<std::byte> into) {
+                    _data.flush();
+                    _remarks.flush();
+                    _progress.show(_file, _window == nullptr ? 0 : _window->offset(), input.size());
+                    return input.read(into);
+                });
+                _window = &window;
+                _isRestarted = false;
+                decode(file, input, window);
+                _window = nullptr;
+            } while (_isRestarted);
         } catch (const OutputFailure&) {
             throw;
         } catch (const std::runtime_error& error) {
@@ -114,7 +128,7 @@ private:
         auto known = captureFormat(file);
         if (!known &&
             (file.ends_with(".kestrum") || textOf(begin).starts_with("<") || textOf(begin).starts_with("bplist")))
-            return decodeSnapshot(file, window);
+            return decodeSnapshot(file, input, window);
         if (!known)
             known = Record(begin).read(u32(0)).value_or(0) <= CaptureReader::kMaximumMessage ? CaptureFormat::Kcap
                                                                                              : CaptureFormat::Dlf;
@@ -134,6 +148,8 @@ private:
             while (const auto message = scanner.next(true))
                 _decoding.take(*message);
             mayGrow = waitForMore(input);
+            if (_isRestarted)
+                return;
             window.resume();
         }
         while (const auto message = scanner.next())
@@ -155,13 +171,20 @@ private:
             if (messages != _shownMessages)
                 atMost = std::chrono::ceil<std::chrono::milliseconds>(_nextDisplay - SteadyClock::now());
             const auto woken = input.wait(atMost);
-            if (woken != Input::Woken::TimedOut)
-                return woken == Input::Woken::Changed;
+            _isRestarted = woken == Input::Woken::Restarted;
+            if (_isRestarted)
+                remark(_file + " was replaced or emptied: it is read from its start");
+            if (woken == Input::Woken::Gone)
+                remark(_file + " was deleted: a new one is waited for");
+            else if (woken != Input::Woken::TimedOut)
+                return woken != Input::Woken::Ended;
         }
     }
 
-    void decodeSnapshot(const std::string& file, ByteWindow& window)
+    void decodeSnapshot(const std::string& file, Input& input, ByteWindow& window)
     {
+        if (input.mayGrow())
+            throw WrongUsage();
         const Bytes all = window.peek(PropertyListCodec::kMaxBytes + 1);
         const auto parsed = _lists.parseWithError(all);
         if (!parsed)
@@ -170,7 +193,14 @@ private:
         _output->snapshot(snapshot.listing());
         std::optional<Extraction> extraction;
         if (!_options.extract.empty())
-            extraction.emplace(_options.extract, snapshot);
+            try {
+                const auto stem = std::filesystem::path(file).stem().string();
+                // What this run wrote is not replaced by its next snapshot.
+                const bool mayReplace = _options.force && _extracted.insert(stem).second;
+                extraction.emplace(_options.extract, snapshot, mayReplace ? Existing::Replaced : Existing::Kept);
+            } catch (const std::exception& error) {
+                complain(formatted("%s: %s", _file, error.what()));
+            }
         snapshot.recover(_lists, [&](Bytes message) {
             if (extraction)
                 extraction->take(message);
@@ -241,7 +271,7 @@ private:
     void remark(const std::string& line)
     {
         _progress.clear();
-        _remarks.write("kestrum-decode: " + line + '\n');
+        _remarks.write("kestrum-decode: " + onOneLine(line) + '\n');
         _remarks.flush();
     }
 
@@ -261,7 +291,8 @@ private:
         std::uint64_t lines = 0, untold = 0;
     } _faults;
     std::uint64_t _skipped = 0;
-    bool _isBad = false;
+    std::set<std::string> _extracted; ///< stems of snapshots
+    bool _isBad = false, _isRestarted = false;
     std::uint64_t _shownMessages = 0;
     SteadyClock::time_point _nextDisplay{};
 };

@@ -16,6 +16,7 @@ struct DecodeOptions {
     OutputFormat format = OutputFormat::Tree;
     bool log = false, stats = false, follow = false;
     std::string extract; ///< a directory; empty: nothing is extracted
+    bool force = false;  ///< what is extracted replaces files
 };
 
 /// Decodes the files, as parts of one log, onto standard output; all else goes to standard error. Gives the exit

@@ -1,5 +1,6 @@
 #include "platform/TelephonyService.h"
 #include "platform/linux/LinuxBundle.h"
+#include "tools/Harmless.h"
 #include "tools/Program.h"
 
 #include <CLI/CLI.hpp>
@@ -30,13 +31,15 @@ constexpr const char* kFooter = R"(Formats:
   tree   what the panes show after the last message
   json   one object: technology, messages, dropped, display, and (with --log) log
   jsonl  one object for each message that changed the display: time, code, changes by path
-  csv    the same changes as rows: time, code, path, value
+  csv    the same changes as rows: time, code, path, value; a value that a spreadsheet would take for a formula (it
+         begins with = + - @, a tab or a return, and is no number) stands behind an apostrophe
 
 Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum); other names are told by their content.
 Several files are read one after the other, as parts of one log. "dropped" counts messages of an invalid type, too short
 for their decoder, or no property list where one is due.
 
-The display goes to standard output, everything else to standard error.
+The display goes to standard output, everything else to standard error. Control characters are shown as \xnn on a
+terminal. Files that are extracted replace none, unless --force is given.
 Exit status: 0 all was read, 1 there was bad input (the rest is shown), 2 wrong usage.)";
 
 } // namespace
@@ -60,12 +63,15 @@ int main(int argc, char** argv)
     commands.add_flag("--follow", options.follow, "Go on as the last file grows, until interrupted");
     commands.add_option("--extract", options.extract,
                         "Write a snapshot's DLF stream, and the recovered records as .dlf and .kcap, into a directory");
+    commands.add_flag("--force", options.force, "Let what is extracted replace files of the same name");
     try {
         commands.parse(argc, argv);
         if (!options.extract.empty())
             for (const auto& file : options.files)
                 if (file.ends_with(".kcap") || file.ends_with(".dlf"))
                     throw CLI::ValidationError("--extract", file + " is no snapshot");
+        if (options.follow && options.files.back().ends_with(".kestrum"))
+            throw CLI::ValidationError("--follow", options.files.back() + " is a snapshot: it does not grow");
     } catch (const CLI::ParseError& error) {
         return commands.exit(error) == 0 ? 0 : kUsageError;
     }
@@ -77,7 +83,7 @@ int main(int argc, char** argv)
         LinuxBundle bundle;
         return decodeFiles(options, bundle);
     } catch (const std::exception& error) {
-        std::cerr << "kestrum-decode: " << error.what() << '\n';
+        std::cerr << "kestrum-decode: " << onOneLine(error.what()) << '\n';
         return kFailed;
     }
 }

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <filesystem>
 #include <sys/resource.h>
 
 namespace kestrum {
@@ -48,8 +49,8 @@ TEST_F(ProgramTest, HelpNamesEveryOptionAndStatus)
 {
     const auto ran = run({"--help"});
     EXPECT_EQ(ran.status, 0);
-    for (const auto* each : {"--technology", "--format", "--log", "--stats", "--follow", "--extract", "--version",
-                             "standard input", "Exit status"})
+    for (const auto* each : {"--technology", "--format", "--log", "--stats", "--follow", "--extract", "--force",
+                             "--version", "standard input", "Exit status"})
         EXPECT_THAT(ran.output, HasSubstr(each));
 }
 
@@ -79,6 +80,7 @@ INSTANTIATE_TEST_SUITE_P(CommandLine, WrongUsage,
                          testing::Values(Usage{"NoFile", {}}, Usage{"UnknownOption", {"--colour", "a.kcap"}},
                                          Usage{"UnknownFormat", {"--format", "xml", "a.kcap"}},
                                          Usage{"UnknownTechnology", {"--technology", "nmt", "a.kcap"}},
+                                         Usage{"FollowASnapshot", {"--follow", "a.kestrum"}},
                                          Usage{"ExtractFromACapture", {"--extract", "d", "a.kcap"}}),
                          [](const auto& each) { return std::string(each.param.name); });
 
@@ -288,15 +290,92 @@ TEST_F(ProgramTest, AFollowedTreeIsShownWhenItsEndIsMetAndAtTheEnd)
     EXPECT_EQ(tool.status(), 0);
 }
 
-TEST_F(ProgramTest, AFollowedFileThatShrinksIsBadInput)
+TEST_F(ProgramTest, AFollowedFileThatIsEmptiedIsReadFromItsStart)
 {
     const auto file = capture(kcap(ifx("a")) + kcap(ifx("b")));
     Tool tool({"--follow", "--format", "jsonl", file});
     tool.line();
     tool.line();
     writeFile(file, "");
-    EXPECT_THAT(tool.remarks(), HasSubstr("has become shorter than what was read of it"));
-    EXPECT_EQ(tool.status(), 1);
+    EXPECT_EQ(tool.remark(), "kestrum-decode: " + file + " was replaced or emptied: it is read from its start");
+    writeFile(file, kcap(ifx("c")), std::ios::app);
+    EXPECT_THAT(tool.line(), HasSubstr("\"c\""));
+    tool.signal(SIGINT);
+    EXPECT_EQ(tool.status(), 0);
+}
+
+TEST_F(ProgramTest, AFollowedFileThatIsReplacedIsReadFromItsStart)
+{
+    const auto file = capture(kcap(ifx("a")));
+    const auto other = capture(kcap(ifx("b")), "other");
+    Tool tool({"--follow", "--format", "jsonl", file});
+    tool.line();
+    std::filesystem::rename(other, file);
+    EXPECT_THAT(tool.line(), HasSubstr("\"b\""));
+    EXPECT_EQ(tool.remark(), "kestrum-decode: " + file + " was replaced or emptied: it is read from its start");
+    writeFile(file, kcap(ifx("c")), std::ios::app);
+    EXPECT_THAT(tool.line(), HasSubstr("\"c\""));
+}
+
+TEST_F(ProgramTest, AFollowedFileThatIsDeletedMayComeAgain)
+{
+    const auto file = capture(kcap(ifx("a")));
+    Tool tool({"--follow", "--format", "jsonl", file});
+    tool.line();
+    std::filesystem::remove(file);
+    EXPECT_EQ(tool.remark(), "kestrum-decode: " + file + " was deleted: a new one is waited for");
+    std::filesystem::rename(capture(kcap(ifx("b")), "other"), file);
+    EXPECT_THAT(tool.line(), HasSubstr("\"b\""));
+}
+
+TEST_F(ProgramTest, CsvGuardsFormulasAndLeavesNumbersAlone)
+{
+    for (const auto* formula : {"=1+2", "+cmd", "-2+3", "-2 dBm+3", "@SUM(1)", "-"})
+        EXPECT_THAT(run({"--format", "csv", capture(kcap(ifx(formula)))}).output,
+                    HasSubstr(",/Cell,'"s + formula + "\r\n"));
+    for (const auto* number : {"-98.25 dBm", "+2.50 dB", "-3", "-0.5 %", "4"})
+        EXPECT_THAT(run({"--format", "csv", capture(kcap(ifx(number)))}).output,
+                    HasSubstr(",/Cell,"s + number + "\r\n"));
+}
+
+TEST_F(ProgramTest, NamesOfFilesDoNothingToATerminal)
+{
+    const auto ran = run({scratch.file("\x1b[31m\u202Eno.kcap")});
+    EXPECT_THAT(ran.remarks, HasSubstr("\\x1b[31m\\xe2\\x80\\xaeno.kcap: cannot be opened"));
+}
+
+TEST_F(ProgramTest, ATerminalIsShownNoControlCharacters)
+{
+    const auto file = capture(kcap(ifx("a\u0085\u202E\x7F")));
+    for (const auto* format : {"csv", "json", "jsonl", "tree"}) {
+        const auto shown = scratch.file("shown");
+        const auto command = "script -qec \"'" + builtProgram("kestrum-decode") + "' --format " + format + " '" + file +
+                             "'\" /dev/null </dev/null >'" + shown + "'";
+        ASSERT_EQ(std::system(command.c_str()), 0);
+        EXPECT_THAT(contentsOf(shown), HasSubstr("a\\xc2\\x85\\xe2\\x80\\xae\\x7f")) << format;
+    }
+}
+
+// Ten times as many keys may cost more than ten times as much, but not nearly a hundred times.
+TEST_F(ProgramTest, KeysThatVanishCostNoMoreThanTheyAreMany)
+{
+    const auto seconds = [&](int keys, const char* format) {
+        std::string list = "<plist version=\"1.0\"><dict>";
+        for (int i = 0; i < keys; ++i)
+            list += "<key>k" + std::to_string(i) + "</key><string>v</string>";
+        list += "</dict></plist>";
+        const auto file = capture(kcap(list) + kcap(ifx("a")) + kcap(list));
+        ::rusage before{}, after{};
+        ::getrusage(RUSAGE_CHILDREN, &before);
+        EXPECT_EQ(run({"--format", format, file}).status, 0);
+        ::getrusage(RUSAGE_CHILDREN, &after);
+        const auto inSeconds = [](const ::timeval& time) {
+            return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_usec) / 1e6;
+        };
+        return inSeconds(after.ru_utime) - inSeconds(before.ru_utime);
+    };
+    for (const auto* format : {"csv", "jsonl", "json"})
+        EXPECT_LE(seconds(50'000, format), 45 * seconds(5'000, format) + 0.5) << format;
 }
 
 // Far more than any buffer goes through a pipe; what the process ever held is asked of the system.

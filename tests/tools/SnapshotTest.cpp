@@ -230,6 +230,38 @@ TEST_F(SnapshotFile, IsExtracted)
     EXPECT_THAT(clean.remarks, HasSubstr("bytes skipped: 0"));
 }
 
+TEST_F(SnapshotFile, IsExtractedIntoNewFilesAlone)
+{
+    const LiveRun live("lte");
+    const auto file = write(live.saved());
+    std::filesystem::create_directory(scratch.file("out"));
+    writeFile(scratch.file("out/Saved.dlf"), "a recording");
+    writeFile(scratch.file("somebody's"), "here");
+    std::filesystem::create_symlink(scratch.file("somebody's"), scratch.file("out/Saved.kcap"));
+    const auto ran = run({"--extract", scratch.file("out"), file});
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_THAT(ran.remarks,
+                HasSubstr("there is already " + scratch.file("out/Saved.kcap") + ", " + scratch.file("out/Saved.dlf")));
+    EXPECT_EQ(contentsOf(scratch.file("out/Saved.dlf")), "a recording");
+    EXPECT_FALSE(std::filesystem::exists(scratch.file("out/Saved-written.dlf")));
+
+    EXPECT_EQ(run({"--extract", scratch.file("out"), "--force", file}).status, 0);
+    EXPECT_NE(contentsOf(scratch.file("out/Saved.dlf")), "a recording");
+    EXPECT_EQ(contentsOf(scratch.file("somebody's")), "here");
+    EXPECT_TRUE(std::filesystem::is_regular_file(std::filesystem::symlink_status(scratch.file("out/Saved.kcap"))));
+}
+
+TEST_F(SnapshotFile, OfTwoNamesakesTheFirstIsExtracted)
+{
+    const LiveRun live("lte");
+    const auto first = write(live.saved());
+    std::filesystem::create_directory(scratch.file("other"));
+    const auto second = scratch.file("other/Saved.kestrum");
+    std::filesystem::copy_file(first, second);
+    EXPECT_EQ(run({"--extract", scratch.file("out"), first, second}).status, 1);
+    EXPECT_EQ(run({"--extract", scratch.file("out"), "--force", first, second}).status, 1) << "not each other";
+}
+
 TEST_F(SnapshotFile, CutOffIsBadInputWithItsOffset)
 {
     const auto file = write(snapshotOf(makeArray()));

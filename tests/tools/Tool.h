@@ -92,13 +92,9 @@ public:
     ::pid_t process() const { return _process; }
 
     /// Waits for the next line, which is given without its end.
-    std::string line()
-    {
-        std::string text;
-        for (char next; ::read(_out, &next, 1) == 1 && next != '\n';)
-            text += next;
-        return text;
-    }
+    std::string line() { return lineOf(_out); }
+    /// The same of what goes to standard error.
+    std::string remark() { return lineOf(_error); }
     std::string output() { return rest(_out); }
     std::string remarks() { return rest(_error); }
     /// The exit status; 128 and the signal when one ended it.
@@ -114,6 +110,13 @@ private:
     {
         if (end >= 0)
             ::close(std::exchange(end, -1));
+    }
+    static std::string lineOf(int from)
+    {
+        std::string text;
+        for (char next; ::read(from, &next, 1) == 1 && next != '\n';)
+            text += next;
+        return text;
     }
     static std::string rest(int from)
     {
