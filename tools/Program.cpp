@@ -187,9 +187,14 @@ private:
             throw WrongUsage();
         const Bytes all = window.peek(PropertyListCodec::kMaxBytes + 1);
         const auto parsed = _lists.parseWithError(all);
-        if (!parsed)
-            throw std::runtime_error(formatted("at offset %lu: %s", parsed.offset, parsed.reason));
-        const Snapshot snapshot(file, parsed.value, [this](const Fault& fault) { tell(fault); });
+        const Value list = parsed ? parsed.value : Snapshot::salvaged(all);
+        if (!parsed) {
+            const auto reason = formatted("at offset %lu: %s", parsed.offset, parsed.reason);
+            if (!list)
+                throw std::runtime_error(reason);
+            complain(formatted("%s: %s; what raw records are left are shown", _file, reason));
+        }
+        const Snapshot snapshot(file, list, [this](const Fault& fault) { tell(fault); });
         _output->snapshot(snapshot.listing());
         std::optional<Extraction> extraction;
         if (!_options.extract.empty())

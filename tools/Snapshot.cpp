@@ -2,6 +2,7 @@
 
 #include "LogGenerator/DlfVersionReport.h"
 #include "platform/PropertyLists.h"
+#include "support/Base64.h"
 #include "support/Format.h"
 #include "support/Record.h"
 #include "tools/RecordScanner.h"
@@ -34,7 +35,41 @@ std::optional<std::string> textAt(const Dictionary& dictionary, std::string_view
     return held.string() != nullptr ? std::optional(*held.string()) : std::nullopt;
 }
 
+/// The bytes of base64 up to where it is cut off or damaged.
+Data dataBefore(std::string_view damaged)
+{
+    constexpr std::string_view kAlphabet = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/=";
+    std::string text;
+    for (const char each : damaged) {
+        if (kAlphabet.find(each) != kAlphabet.npos)
+            text += each;
+        else if (std::string_view(" \t\r\n").find(each) == std::string_view::npos)
+            break;
+    }
+    text.resize(text.size() / 4 * 4);
+    return Data(bytesFromBase64(text).value_or(std::vector<std::byte>()));
+}
+
 } // namespace
+
+Value Snapshot::salvaged(Bytes xml)
+{
+    constexpr std::string_view kData = "<data>";
+    const auto text = textOf(xml);
+    std::vector<Value> entries;
+    for (const char* key : {"DisplayState", "DLF"}) {
+        const auto mark = formatted("<key>%s</key>", key);
+        for (auto at = text.find(mark); at != text.npos; at = text.find(mark, at)) {
+            at += mark.size();
+            const auto begin = text.find_first_not_of(" \t\r\n", at);
+            if (begin == text.npos || !text.substr(begin).starts_with(kData))
+                continue;
+            at = begin + kData.size();
+            entries.emplace_back(makeDictionary({{key, dataBefore(text.substr(at))}}));
+        }
+    }
+    return entries.empty() ? Value() : Value(makeDictionary({{"Data", makeArray(std::move(entries))}}));
+}
 
 Snapshot::Snapshot(std::string file, const Value& propertyList, MessageScanner::Tell tell) : _tell(std::move(tell))
 {

@@ -31,6 +31,9 @@ struct SnapshotListing {
 /// A snapshot that the save screen wrote.
 class Snapshot {
 public:
+    /// What can be read of a snapshot whose property list is damaged: its raw records. Null when there are none.
+    static Value salvaged(Bytes xml);
+
     /// Throws std::runtime_error when the property list is no snapshot. Whatever else is wrong with it is told.
     Snapshot(std::string file, const Value& propertyList, MessageScanner::Tell tell);
 

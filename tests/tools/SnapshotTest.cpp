@@ -271,6 +271,20 @@ TEST_F(SnapshotFile, CutOffIsBadInputWithItsOffset)
     EXPECT_THAT(ran.remarks, StartsWith("kestrum-decode: " + file + ": at offset "));
 }
 
+TEST_F(SnapshotFile, CutOffGivesTheRecordsBeforeTheCut)
+{
+    const auto antennas = message(0xB0C1, std::string(7, '\0') + "\x04\0"s);
+    const auto interval = makeDictionary({{"DisplayState", dataOf(antennas + antennas + antennas)}});
+    const auto file = write(snapshotOf(makeArray({interval, interval})));
+    const auto text = contentsOf(file);
+    writeFile(file, text.substr(0, text.rfind("</data>") - 10));
+    const auto ran = run({"--format", "json", file});
+    EXPECT_EQ(ran.status, 1);
+    EXPECT_THAT(ran.remarks, HasSubstr("; what raw records are left are shown\n"));
+    EXPECT_THAT(ran.output, HasSubstr("\"Num Tx Antennas\": \"4\""));
+    EXPECT_THAT(ran.output, HasSubstr("\"messages\": 6"));
+}
+
 TEST_F(SnapshotFile, WithoutDataIsListedAlone)
 {
     EXPECT_THAT(run({write(makeDictionary({{"Timestamp", "t"}}))}).output,
