@@ -33,14 +33,17 @@ Service::Service(Settings settings, Source& source, const PropertyLists& lists, 
       _source(source),
       _log(log),
       _streamed(std::move(streamed)),
-      _host{[this] { return std::string_view(_technology); }, [this] { pace(); },
+      _host{[this] { return std::string_view(_technology); },
+            [this] { pace(); },
             [this](ServiceChannel& channel) {
                 const auto found = std::ranges::find(_channels, &channel, &std::unique_ptr<ServiceChannel>::get);
                 if (found != _channels.end())
                     retire(found, std::next(found));
                 pace();
             },
-            lists, log},
+            _settings.send,
+            lists,
+            log},
       _listener(log),
       _technology(source.technology())
 {
@@ -94,7 +97,7 @@ void Service::serve(Clients::iterator client)
 void Service::reply(Clients::iterator client, std::int32_t messageId, std::uint32_t serial,
                     const LogChannelAnswer& answer)
 {
-    client->connection->send({Frame::Kind::Reply, messageId, serial, vox::encode(answer)});
+    _settings.send(*client->connection, {Frame::Kind::Reply, messageId, serial, vox::encode(answer)});
 }
 
 void Service::createLogChannel(Clients::iterator client, std::uint32_t serial, const std::string& address)
@@ -212,7 +215,8 @@ void Service::changeTechnology()
     _log.write(Priority::Notice, "the technology is now %s", _technology);
     for (const auto& client : _clients)
         if (client.connection->unsent() < kUnsentReplies) // a client that reads nothing misses nothing
-            client.connection->send({Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
+            _settings.send(*client.connection,
+                           {Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
     retire(_channels.begin(), _channels.end());
 }
 

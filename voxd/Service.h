@@ -27,6 +27,8 @@ public:
     struct Settings {
         std::string directory;
         double speed = 1; ///< source time per real time, above 0
+        /// Every frame goes out through it.
+        FrameSender send = [](FrameConnection& connection, const Frame& frame) { return connection.send(frame); };
     };
     static constexpr std::size_t kMaximumChannels = 16, kMaximumConnections = 64;
 

@@ -85,7 +85,7 @@ void ServiceChannel::obey(const Frame& frame)
     }
     if (command->contains("GetTechnology") && frame.kind == Frame::Kind::Request) {
         const auto reply = _host.lists.toXml(makeDictionary({{"GetTechnology", _host.technology()}}));
-        if (reply && !_commands->send({Frame::Kind::Reply, frame.messageId, frame.serial, reply->bytes()}))
+        if (reply && !_host.send(*_commands, {Frame::Kind::Reply, frame.messageId, frame.serial, reply->bytes()}))
             return end();
     }
     if (const auto state = command->at("SetState"); const auto* text = state.string()) {
@@ -126,7 +126,7 @@ void ServiceChannel::flush()
             }
             return;
         }
-        _logPort->send({Frame::Kind::Message, kLogMessage, 0, message->bytes()});
+        _host.send(*_logPort, {Frame::Kind::Message, kLogMessage, 0, message->bytes()});
     }
 }
 
@@ -139,7 +139,7 @@ void ServiceChannel::tellLosses()
     std::array<std::byte, sizeof missing> payload;
     for (std::size_t i = 0; i < payload.size(); ++i)
         payload[i] = static_cast<std::byte>(missing >> (8 * i));
-    _logPort->send({Frame::Kind::Message, kLossMessage, 0, payload});
+    _host.send(*_logPort, {Frame::Kind::Message, kLossMessage, 0, payload});
 }
 
 void ServiceChannel::end()

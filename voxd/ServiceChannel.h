@@ -16,6 +16,9 @@ namespace kestrum {
 
 class SystemLog;
 
+/// Sends a frame, as `FrameConnection::send` does.
+using FrameSender = std::function<bool(FrameConnection&, const Frame&)>;
+
 /// One client's log channel: its commands come in at a port of its own, the log goes out to the client's port. It ends
 /// when either side of it goes.
 class ServiceChannel {
@@ -25,6 +28,7 @@ public:
         std::function<std::string_view()> technology;
         std::function<void()> streamingChanged;
         std::function<void(ServiceChannel&)> ended; ///< at most once; must not destroy the channel at once
+        FrameSender send;
         const PropertyLists& lists;
         SystemLog& log;
     };

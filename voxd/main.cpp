@@ -4,6 +4,7 @@
 #include "platform/linux/TerminationSignals.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "support/Format.h"
+#include "voxd/Faults.h"
 #include "voxd/ReplaySource.h"
 #include "voxd/Service.h"
 #include "voxd/capture/Capture.h"
@@ -30,6 +31,7 @@ struct Options {
     double speed = 1, seconds = 60;
     bool loop = false;
     std::uint64_t seed = 1;
+    std::vector<std::string> faults;
 };
 
 std::string scenarioNames()
@@ -84,7 +86,12 @@ int serve(QCoreApplication& application, const Options& options)
     std::ofstream record;
     if (!options.record.empty())
         record = openForWriting(options.record);
-    Service service({runtimeDirectory(), options.speed}, *source, lists, log, [&](Bytes message) {
+    Faults faults(options.faults, log);
+    const auto unsteady = faults.unsteady(*source);
+    Service::Settings settings{runtimeDirectory(), options.speed};
+    if (!options.faults.empty())
+        settings.send = [&](FrameConnection& connection, const Frame& frame) { return faults.send(connection, frame); };
+    Service service(settings, unsteady ? *unsteady : *source, lists, log, [&](Bytes message) {
         if (!record.is_open())
             return;
         writeKcap(record, message);
@@ -135,6 +142,12 @@ int main(int argc, char** argv)
         ->check(notFinite)
         ->check(CLI::Range(0.001, 1e9))
         ->capture_default_str();
+    commands.add_option("--fault", options.faults, Faults::help())
+        ->type_name("NAME[,NAME...]")
+        ->delimiter(',')
+        ->allow_extra_args(false)
+        ->excludes(write)
+        ->check([](const std::string& name) { return Faults::exists(name) ? "" : "there is no fault " + name; });
     scenario->excludes(replay)->check([](const std::string& name) {
         for (const auto& each : scenarios())
             if (each.name == name)

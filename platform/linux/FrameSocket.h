@@ -40,6 +40,8 @@ public:
     std::size_t unsent() const { return static_cast<std::size_t>(_socket->bytesToWrite()); }
     /// Gives the system what it takes of them at once, rather than from the event loop. Runs no handler.
     void push();
+    /// The system's socket, for what is no frame.
+    int descriptor() const { return static_cast<int>(_socket->socketDescriptor()); }
 
     // Waits serve nothing else and run no handler: look at `isOpen` and `next` afterwards.
     /// Until nothing is kept; false when time is up or the connection closed.

@@ -5,12 +5,15 @@ _voxd() {
     case $previous in
         --scenario)
             mapfile -t COMPREPLY < <(compgen -W 'lte gsm cdma utran drive ifx' -- "$current") ;;
+        --fault)
+            mapfile -t COMPREPLY < <(compgen -W 'reply-900ms reply-1100ms reply-never wrong-ids half-frame byte-by-byte
+                garbage oversized flood notifications technology stop die' -- "$current") ;;
         --replay | --record | --write)
             compopt -o filenames 2>/dev/null
             mapfile -t COMPREPLY < <(compgen -f -- "$current") ;;
         --speed | --seed | --start | --seconds) ;;
         *)
             mapfile -t COMPREPLY < <(compgen -W '-h --help --version --scenario --replay --loop --speed --seed --start
-                --record --write --seconds' -- "$current") ;;
+                --record --write --seconds --fault' -- "$current") ;;
     esac
 } && complete -F _voxd voxd

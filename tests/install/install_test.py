@@ -75,19 +75,22 @@ class Documents(unittest.TestCase):
         decode = help_of("kestrum-decode")
         technologies, formats = (set(re.search(rf"--{name} .*?{{(.*?)}}", decode)[1].split(","))
                                  for name in ("technology", "format"))
-        scenarios = set(re.findall(r"^ {8,}([a-z]+): ", help_of("voxd"), re.M))
+        scenarios, faults = (set(re.findall(r"^ {8,}([a-z0-9-]+): ", help_of("voxd").split(f"\n  {option} ")[1]
+                                            .split("\n  -")[0], re.M)) for option in ("--scenario", "--fault"))
         self.assertIn("lte", scenarios)
-        for program, option, values in (("voxd", "--scenario", scenarios), ("kestrum-decode", "--format", formats),
+        self.assertIn("flood", faults)
+        for program, option, values in (("voxd", "--scenario", scenarios), ("voxd", "--fault", faults),
+                                        ("kestrum-decode", "--format", formats),
                                         ("kestrum-decode", "--technology", technologies)):
             with self.subTest(option):
                 self.assertEqual(set(completions(program, option, "")), values)
                 for file in ("_" + program, program + ".fish"):
-                    offered = re.findall(r"(?::\(|-a ')([a-z ]+)", text("resources", "completions", file))
+                    offered = re.findall(r"(?::\(|-a '|_values -s , fault )([a-z0-9 -]+)", text("resources", "completions", file))
                     self.assertIn(values, [set(words.split()) for words in offered])
                 page = text("docs", "man", program + ".1")
                 item = page.split(f".It Fl -{option.strip('-')} ")[1].split(".It Fl ")[0]
                 named = " ".join(line for line in item.splitlines() if re.match(r"\.(It )?Cm", line))
-                self.assertLessEqual(values, set(re.findall(r"[a-z]+", named)))
+                self.assertLessEqual(values, set(re.findall(r"[a-z0-9-]+", named)))
 
 
 def completions(program, *words):

@@ -640,6 +640,51 @@ TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndNobodyElse)
     EXPECT_THAT(voxd.log(), HasSubstr("its client reads again, " + std::to_string(missing) + " messages were dropped"));
 }
 
+class CutMessages : public ServiceTest, public testing::WithParamInterface<const char*> {};
+
+TEST_P(CutMessages, LeaveTheOthersWholeAndNothingIsInvented)
+{
+    constexpr std::size_t kStruck = 19;
+    std::vector<std::string> sent;
+    for (int i = 10; i < 90; ++i)
+        sent.push_back(record(0xB0C2, std::to_string(i) + std::string(100, 'x')));
+    ASSERT_TRUE(voxd.start(replay(capture(sent), {"--speed", "200", "--fault", GetParam()})));
+    Client client{*this, "log"};
+    const auto open = [&] {
+        client.remote.reset();
+        client.local.reset();
+        client.open();
+        EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE");
+        client.startStreaming();
+    };
+    open();
+    ASSERT_TRUE(eventually([&] { return !client.remote->isValid(); })) << voxd.log();
+    ASSERT_TRUE(client.hasReceived(kStruck));
+    EXPECT_EQ(client.received, std::vector(sent.begin(), sent.begin() + kStruck));
+    open();
+    ASSERT_TRUE(eventually([&] { return !client.received.empty() && client.received.back() == sent.back(); }));
+    EXPECT_TRUE(std::ranges::includes(sent, client.received));
+    EXPECT_THAT(client.received, testing::Not(testing::Contains(sent[kStruck])));
+}
+
+INSTANTIATE_TEST_SUITE_P(ByFaults, CutMessages, testing::Values("half-frame", "garbage", "oversized"),
+                         [](const auto& each) { return each.param == "half-frame"s ? "HalfFrame"s : each.param; });
+
+TEST_F(ServiceTest, AMessageInSingleBytesArrivesWhole)
+{
+    std::vector<std::string> sent;
+    for (int i = 0; i < 30; ++i)
+        sent.push_back(record(0xB0C2, std::to_string(i)));
+    ASSERT_TRUE(voxd.start(replay(capture(sent), {"--speed", "200", "--fault", "byte-by-byte"})));
+    Client client{*this, "log"};
+    client.open();
+    EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE");
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(sent.size()));
+    EXPECT_EQ(client.received, sent);
+    EXPECT_TRUE(voxd.logs("fault byte-by-byte: over"));
+}
+
 struct BadUse {
     const char* name;
     QStringList arguments;
@@ -669,6 +714,7 @@ INSTANTIATE_TEST_SUITE_P(
                     BadUse{"SpeedNoNumber", {"--scenario", "ifx", "--speed", "fast"}, 2, "--speed"},
                     BadUse{"StartNoDate", {"--scenario", "ifx", "--start", "yesterday"}, 2, "yesterday is no date"},
                     BadUse{"LoopWithoutReplay", {"--scenario", "ifx", "--loop"}, 2, "--replay"},
+                    BadUse{"UnknownFault", {"--scenario", "ifx", "--fault", "flood,moon"}, 2, "there is no fault moon"},
                     BadUse{"NoSuchCapture", {"--replay", "/nowhere/a.kcap"}, 1, "/nowhere/a.kcap: cannot be read"},
                     BadUse{"RecordNowhere",
                            {"--scenario", "ifx", "--record", "/nowhere/a.kcap"},
@@ -685,7 +731,8 @@ TEST_F(ServiceTest, TellsItsVersionAndItsHelp)
     help.launch({"--help"});
     EXPECT_EQ(help.finish(), 0);
     const auto text = help.process.readAllStandardOutput().toStdString();
-    for (const char* each : {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx"})
+    for (const char* each :
+         {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx", "--fault", "flood"})
         EXPECT_THAT(text, HasSubstr(each));
 }
 

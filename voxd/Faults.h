@@ -1,0 +1,45 @@
+#pragma once
+
+#include "platform/linux/Frame.h"
+#include "voxd/Source.h"
+
+#include <cstddef>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace kestrum {
+
+class FrameConnection;
+class SystemLog;
+
+/// What the service does wrong on purpose, so that displays can be tested against it. Each fault strikes a few times, or
+/// for some seconds, and the service is as ever afterwards. It may stand still meanwhile.
+class Faults {
+public:
+    /// For the help text: a line for each fault.
+    static std::string help();
+    static bool exists(std::string_view name);
+
+    /// Of names that exist. Each strike, and the end of each fault, is logged.
+    Faults(const std::vector<std::string>& names, SystemLog& log);
+    ~Faults();
+
+    /// Sends the frame, or does wrong. False when the connection has closed.
+    bool send(FrameConnection& connection, const Frame& frame);
+    /// The source with the changes of technology that were asked for. Null when none were; `source` outlives it.
+    std::unique_ptr<Source> unsteady(Source& source);
+
+private:
+    struct Fault;
+
+    static const std::vector<Fault>& all();
+    void strike(const Fault& fault, FrameConnection& connection, const Frame& frame);
+
+    SystemLog& _log;
+    std::vector<Fault> _pending;
+    std::size_t _logMessages = 0; // since the last reply about the technology
+};
+
+} // namespace kestrum
