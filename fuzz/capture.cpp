@@ -31,11 +31,19 @@ void read(Bytes input)
     std::istringstream stream(file);
     CaptureReader reader(stream, format);
     std::string known;
+    // Notes are passed over: they are the file's own bytes too.
+    const auto passNotes = [&] {
+        while (format == CaptureFormat::Kcap && known.size() <= file.size() &&
+               kcapGap(bytesOf(std::string_view(file).substr(known.size()))))
+            known += std::string_view(file).substr(known.size(), kKcapGapSize);
+    };
     while (const auto message = reader.next()) {
+        passNotes();
         known += inFile(format, *message);
         require(reader.offset() == known.size(), "a gap between two messages");
         require(known.size() <= file.size() && std::string_view(file).starts_with(known), "not what the file holds");
     }
+    passNotes();
     require(reader.offset() == known.size(), "the fault's place is not behind the last message");
     require(reader.fault().empty() == (known.size() == file.size()), "it ends early without a fault");
     require(!reader.next(), "it goes on behind its end");

@@ -86,6 +86,10 @@ KcapScanner::Look KcapScanner::look(std::size_t at)
     const auto length = Record(head.subspan(at)).read(u32(0));
     if (!length)
         return {Sound::Incomplete, 0};
+    if (*length == kKcapGap) {
+        const bool isWhole = _window.peek(at + kKcapGapSize).size() >= at + kKcapGapSize;
+        return {isWhole ? Sound::Yes : Sound::Incomplete, kKcapGapSize};
+    }
     if (*length > CaptureReader::kMaximumMessage)
         return {Sound::No, *length};
     const std::size_t size = kLengthSize + *length;
@@ -122,6 +126,8 @@ KcapScanner::Sound KcapScanner::proof(std::size_t at)
     const auto length = Record(head).read(u32(0));
     if (!length)
         return Sound::Incomplete;
+    if (*length == kKcapGap)
+        return look(at).sound;
     if (*length == 0 || *length > CaptureReader::kMaximumMessage)
         return Sound::No;
     const Bytes begin = head.subspan(kLengthSize);
@@ -144,7 +150,7 @@ MessageScanner::Candidate KcapScanner::due()
     if (sound == Sound::Incomplete)
         return {.incomplete = true, .reason = formatted("the last message ends %lu bytes short", size - here)};
     if (sound == Sound::Yes || leadsOn(size))
-        return {.size = size};
+        return found(size);
     // There is damage ahead: this length is true unless it hides a message.
     for (std::size_t at = 1; at < size; ++at)
         if (proof(at) == Sound::Yes)
@@ -158,7 +164,12 @@ MessageScanner::Candidate KcapScanner::chanced()
     if (sound != Sound::Yes)
         return {.incomplete = sound == Sound::Incomplete};
     _followedTo = 0;
-    return {.size = look(0).size};
+    return found(look(0).size);
+}
+
+MessageScanner::Candidate KcapScanner::found(std::size_t size)
+{
+    return {.size = size, .gap = kcapGap(_window.peek(kKcapGapSize))};
 }
 
 Bytes KcapScanner::message(std::size_t size)

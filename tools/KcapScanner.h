@@ -24,6 +24,7 @@ private:
     /// What stands `at` bytes into the window.
     Look look(std::size_t at);
     bool leadsOn(std::size_t at);
+    Candidate found(std::size_t size);
     Sound proof(std::size_t at);
 
     std::uint64_t _followedTo = 0; ///< in the stream: as far as the lengths were followed ahead

@@ -10,6 +10,12 @@ std::optional<Bytes> MessageScanner::next(bool mayGrow)
     _window.skip(std::exchange(_taken, 0));
     while (!_window.peek(1).empty()) {
         Candidate found = _skipping ? chanced() : due();
+        if (found.gap) {
+            tellSkipped();
+            _missing += *found.gap;
+            _window.skip(found.size);
+            continue;
+        }
         if (found.size != 0)
             return take(found.size, found.reason);
         if (found.incomplete && mayGrow)

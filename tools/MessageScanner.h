@@ -33,12 +33,15 @@ public:
     std::optional<Bytes> next(bool mayGrow = false);
     /// Where the message that `next` gave begins.
     std::uint64_t offset() const { return _messageOffset; }
+    /// How many messages the recording's notes say to be missing, up to there.
+    std::uint64_t missing() const { return _missing; }
 
 protected:
     struct Candidate {
-        std::size_t size = 0;    ///< of the message as it stands in the stream; 0: there is none
-        bool incomplete = false; ///< none yet: the stream ends before the message does
-        std::string reason = {}; ///< why there is none; of a message: what was wrong with it all the same
+        std::size_t size = 0;                  ///< of the message as it stands in the stream; 0: there is none
+        bool incomplete = false;               ///< none yet: the stream ends before the message does
+        std::string reason = {};               ///< why there is none; of a message: what was wrong with it all the same
+        std::optional<std::uint64_t> gap = {}; ///< no message, but a note: so many are missing here
     };
     /// The message at the window's beginning, where one is due.
     virtual Candidate due() = 0;
@@ -59,7 +62,7 @@ private:
     Tell _tell;
     bool _mayGrow = false;
     std::size_t _taken = 0; ///< still in the window, since it was handed out
-    std::uint64_t _messageOffset = 0;
+    std::uint64_t _messageOffset = 0, _missing = 0;
     std::optional<Fault> _skipping;
 };
 

@@ -149,11 +149,12 @@ private:
                 _decoding.take(*message);
             mayGrow = waitForMore(input);
             if (_isRestarted)
-                return;
+                break;
             window.resume();
         }
-        while (const auto message = scanner.next())
+        while (const auto message = _isRestarted ? std::nullopt : scanner.next())
             _decoding.take(*message);
+        _missing += scanner.missing();
     }
 
     bool waitForMore(Input& input)
@@ -255,6 +256,8 @@ private:
             row(code ? codeText(*code) : "(none)", tally);
         row("total", _decoding.total());
         _remarks.write(formatted("bytes skipped: %lu\n", _skipped));
+        if (_missing > 0)
+            _remarks.write(formatted("messages missing: %lu\n", _missing));
     }
 
     void tell(const Fault& fault)
@@ -295,7 +298,7 @@ private:
     struct {
         std::uint64_t lines = 0, untold = 0;
     } _faults;
-    std::uint64_t _skipped = 0;
+    std::uint64_t _skipped = 0, _missing = 0;
     std::set<std::string> _extracted; ///< stems of snapshots
     bool _isBad = false, _isRestarted = false;
     std::uint64_t _shownMessages = 0;

@@ -27,12 +27,11 @@ constexpr std::string_view kTechnologyChanged = "kVoxTechnologyChangedNotificati
 
 } // namespace
 
-Service::Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log,
-                 std::function<void(Bytes)> streamed)
+Service::Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log, Witness witness)
     : _settings(std::move(settings)),
       _source(source),
       _log(log),
-      _streamed(std::move(streamed)),
+      _witness(std::move(witness)),
       _host{[this] { return std::string_view(_technology); },
             [this] { pace(); },
             [this](ServiceChannel& channel) {
@@ -41,6 +40,7 @@ Service::Service(Settings settings, Source& source, const PropertyLists& lists, 
                     retire(found, std::next(found));
                 pace();
             },
+            _witness.dropped,
             _settings.send,
             lists,
             log},
@@ -198,8 +198,7 @@ void Service::streamDue()
             break;
         }
         const Data message(std::move(_next->bytes));
-        if (_streamed)
-            _streamed(message.bytes());
+        _witness.streamed(message.bytes());
         for (const auto& channel : _channels)
             channel->stream(message);
         _next.reset();

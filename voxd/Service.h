@@ -32,9 +32,14 @@ public:
     };
     static constexpr std::size_t kMaximumChannels = 16, kMaximumConnections = 64;
 
-    /// All outlive the service. `streamed` is given each message as it goes out, whoever wants it.
-    Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log,
-            std::function<void(Bytes)> streamed = {});
+    /// Is given all that goes out, in its order: for a recording.
+    struct Witness {
+        std::function<void(Bytes)> streamed = [](Bytes) {};                ///< each message, whichever client wants it
+        std::function<void(std::uint64_t)> dropped = [](std::uint64_t) {}; ///< so many, for one client, by now
+    };
+
+    /// All outlive the service.
+    Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log, Witness witness);
     ~Service();
 
     /// Empty on success, else what is wrong.
@@ -71,7 +76,7 @@ private:
     Settings _settings;
     Source& _source;
     SystemLog& _log;
-    std::function<void(Bytes)> _streamed;
+    Witness _witness;
     ServiceChannel::Host _host;
     FrameListener _listener;
     Clients _clients;

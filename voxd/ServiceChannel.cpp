@@ -140,6 +140,7 @@ void ServiceChannel::tellLosses()
     for (std::size_t i = 0; i < payload.size(); ++i)
         payload[i] = static_cast<std::byte>(missing >> (8 * i));
     _host.send(*_logPort, {Frame::Kind::Message, kLossMessage, 0, payload});
+    _host.dropped(missing);
 }
 
 void ServiceChannel::end()

@@ -28,6 +28,7 @@ public:
         std::function<std::string_view()> technology;
         std::function<void()> streamingChanged;
         std::function<void(ServiceChannel&)> ended; ///< at most once; must not destroy the channel at once
+        std::function<void(std::uint64_t)> dropped; ///< so many messages, for a client that does not read
         FrameSender send;
         const PropertyLists& lists;
         SystemLog& log;

@@ -91,15 +91,18 @@ int serve(QCoreApplication& application, const Options& options)
     Service::Settings settings{runtimeDirectory(), options.speed};
     if (!options.faults.empty())
         settings.send = [&](FrameConnection& connection, const Frame& frame) { return faults.send(connection, frame); };
-    Service service(settings, unsteady ? *unsteady : *source, lists, log, [&](Bytes message) {
+    const auto recorded = [&](const auto& write) {
         if (!record.is_open())
             return;
-        writeKcap(record, message);
+        write();
         if (!record.flush()) {
             log.write(Priority::Error, options.record + ": cannot be written; the recording ends here");
             record.close();
         }
-    });
+    };
+    Service service(settings, unsteady ? *unsteady : *source, lists, log,
+                    {.streamed = [&](Bytes message) { recorded([&] { writeKcap(record, message); }); },
+                     .dropped = [&](std::uint64_t count) { recorded([&] { writeKcapGap(record, count); }); }});
     service.sourceEnded = [&] {
         const auto* const replay = dynamic_cast<const ReplaySource*>(source.get());
         if (replay != nullptr && !replay->fault().empty())

@@ -2,12 +2,14 @@
 #include "Tool.h"
 #include "doubles/Places.h"
 #include "doubles/ScratchDirectory.h"
+#include "voxd/capture/Capture.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <filesystem>
+#include <sstream>
 #include <sys/resource.h>
 
 namespace kestrum {
@@ -132,6 +134,17 @@ TEST_F(ProgramTest, MessagesBeforeTheOneThatTellsAreDecodedToo)
     const auto ran = run({"--stats", capture(kcap(message(1, "no list", kStamp, 0xFF)) + kcap(antennas(4)))});
     EXPECT_THAT(ran.remarks, HasSubstr("0xFF0001           1"));
     EXPECT_THAT(ran.remarks, HasSubstr("total              2"));
+    EXPECT_THAT(ran.remarks, EndsWith("bytes skipped: 0\n"));
+}
+
+TEST_F(ProgramTest, StatisticsCountTheMessagesThatARecordingNotesAsMissing)
+{
+    std::ostringstream note;
+    writeKcapGap(note, 17);
+    const auto ran = run({"--stats", capture(kcap(antennas(1)) + note.str() + kcap(antennas(2)) + note.str())});
+    EXPECT_EQ(ran.status, 0);
+    EXPECT_THAT(ran.remarks, HasSubstr("total              2"));
+    EXPECT_THAT(ran.remarks, EndsWith("bytes skipped: 0\nmessages missing: 34\n"));
 }
 
 TEST_F(ProgramTest, ALogThatGoesOnInAnotherTechnologyShowsThatOne)

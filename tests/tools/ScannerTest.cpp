@@ -2,12 +2,14 @@
 #include "Tool.h"
 #include "tools/KcapScanner.h"
 #include "tools/RecordScanner.h"
+#include "voxd/capture/Capture.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
 #include <random>
+#include <sstream>
 #include <tuple>
 
 namespace kestrum {
@@ -22,6 +24,7 @@ struct Scanned {
     std::vector<std::string> messages;
     std::vector<Fault> faults;
     std::uint64_t lost = 0;
+    std::uint64_t missing = 0; ///< by the recording's notes
 };
 
 Scanned drained(MessageScanner& scanner)
@@ -29,6 +32,7 @@ Scanned drained(MessageScanner& scanner)
     Scanned result;
     while (const auto message = scanner.next())
         result.messages.emplace_back(textOf(*message));
+    result.missing = scanner.missing();
     return result;
 }
 
@@ -501,6 +505,40 @@ TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
     EXPECT_THAT(scanKcap(heads).messages, IsEmpty());
     const auto got = scanDlf(heads);
     EXPECT_LE(got.messages.size(), heads.size() / 12);
+}
+
+// Notes of missing messages.
+
+std::string note(std::uint64_t missing)
+{
+    std::ostringstream file;
+    writeKcapGap(file, missing);
+    return file.str();
+}
+
+TEST(KcapNotes, AreCountedAndAreNoMessages)
+{
+    const auto found =
+        scanKcap(kcap("one") + note(3) + note(std::uint64_t{1} << 33) + kcap("") + note(0) + kcap("two"));
+    EXPECT_THAT(found.messages, ElementsAre("one", "", "two"));
+    EXPECT_EQ(found.missing, (std::uint64_t{1} << 33) + 3);
+    EXPECT_THAT(found.faults, IsEmpty());
+}
+
+TEST(KcapNotes, AreFoundBehindDamage)
+{
+    const auto found = scanKcap(kcap("one") + "#####" + note(3) + kcap(message(0xB0C2, "payload")));
+    EXPECT_THAT(found.messages, ElementsAre("one", message(0xB0C2, "payload")));
+    EXPECT_EQ(found.missing, 3u);
+    EXPECT_EQ(found.lost, 5u);
+}
+
+TEST(KcapNotes, MayEndTooEarly)
+{
+    const auto found = scanKcap(kcap(message(0xB0C2, "payload")) + note(3).substr(0, 7));
+    EXPECT_THAT(found.messages, ElementsAre(message(0xB0C2, "payload")));
+    EXPECT_EQ(found.missing, 0u);
+    EXPECT_EQ(found.lost, 7u);
 }
 
 } // namespace

@@ -68,6 +68,44 @@ TEST(Kcap, RefusesALengthBeyondReason)
     EXPECT_EQ(read.fault, "a message of 4294967295 bytes, allowed are 16777216");
 }
 
+TEST(Kcap, PassesOverNotesOfMissingMessages)
+{
+    std::ostringstream file;
+    for (int i = 0; i < 100'000; ++i)
+        writeKcapGap(file, 7);
+    writeKcap(file, bytesOf("one"));
+    writeKcapGap(file, std::uint64_t{1} << 40);
+    std::istringstream written(file.str());
+    CaptureReader reader(written, CaptureFormat::Kcap);
+    const auto message = reader.next();
+    ASSERT_TRUE(message);
+    EXPECT_EQ(textOf(*message), "one");
+    EXPECT_FALSE(reader.next());
+    EXPECT_EQ(reader.fault(), "");
+    EXPECT_EQ(reader.offset(), file.str().size());
+}
+
+TEST(Kcap, TellsOfANoteThatIsCutOff)
+{
+    std::ostringstream file;
+    writeKcapGap(file, 7);
+    std::istringstream written(file.str().substr(0, 11));
+    CaptureReader reader(written, CaptureFormat::Kcap);
+    EXPECT_FALSE(reader.next());
+    EXPECT_EQ(reader.fault(), "the last message ends 1 bytes short");
+    EXPECT_EQ(reader.offset(), 0u);
+}
+
+TEST(Kcap, NotesSayHowManyMessagesAreMissing)
+{
+    std::ostringstream file;
+    writeKcapGap(file, 0x0102030405060708);
+    EXPECT_EQ(file.str(), std::string("\x08\0\0\x80\x08\x07\x06\x05\x04\x03\x02\x01", 12));
+    EXPECT_EQ(kcapGap(bytesOf(file.str())), 0x0102030405060708u);
+    EXPECT_FALSE(kcapGap(bytesOf(file.str()).first(11)));
+    EXPECT_FALSE(kcapGap(bytesOf("\x08 no note here")));
+}
+
 TEST(Dlf, GivesRecordsAsOrdinaryChannelMessages)
 {
     // length 14 (header 12, payload 2), code 0xB0C2, time stamp

@@ -13,6 +13,12 @@ constexpr std::size_t kKcapLength = 4, kDlfLength = 2, kDlfHeader = 12;
 constexpr std::byte kOrdinaryRecord{1};
 constexpr std::size_t kChunk = 64 << 10;
 
+void write(std::ostream& to, std::uint64_t number, std::size_t width)
+{
+    for (std::size_t i = 0; i < width; ++i)
+        to.put(static_cast<char>(number >> (8 * i)));
+}
+
 } // namespace
 
 std::optional<CaptureFormat> captureFormat(std::string_view path)
@@ -30,8 +36,13 @@ std::optional<std::vector<std::byte>> CaptureReader::next()
         return std::nullopt;
     std::array<std::byte, kKcapLength> bytes{};
     const std::size_t width = _format == CaptureFormat::Kcap ? kKcapLength : kDlfLength;
-    _from->read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(width));
-    const auto got = static_cast<std::size_t>(_from->gcount());
+    std::size_t got = readLength(bytes, width);
+    while (_format == CaptureFormat::Kcap && got == width && Record(bytes).read(u32(0)) == kKcapGap) {
+        if (!take(kKcapGapSize - kKcapLength, {}))
+            return std::nullopt;
+        _offset += kKcapGapSize;
+        got = readLength(bytes, width);
+    }
     if (got == 0)
         return std::nullopt;
     const Record length(Bytes(bytes).first(got));
@@ -59,6 +70,12 @@ std::optional<std::vector<std::byte>> CaptureReader::next()
     return std::nullopt;
 }
 
+std::size_t CaptureReader::readLength(std::span<std::byte> into, std::size_t width)
+{
+    _from->read(reinterpret_cast<char*>(into.data()), static_cast<std::streamsize>(width));
+    return static_cast<std::size_t>(_from->gcount());
+}
+
 // In pieces: what a damaged length promises need not be there.
 std::optional<std::vector<std::byte>> CaptureReader::take(std::size_t length, std::vector<std::byte> into)
 {
@@ -76,12 +93,24 @@ std::optional<std::vector<std::byte>> CaptureReader::take(std::size_t length, st
     return into;
 }
 
+void writeKcapGap(std::ostream& to, std::uint64_t messages)
+{
+    write(to, kKcapGap, kKcapLength);
+    write(to, messages, kKcapGapSize - kKcapLength);
+}
+
+std::optional<std::uint64_t> kcapGap(Bytes bytes)
+{
+    const Record note(bytes);
+    const auto low = note.read(u32(4)), high = note.read(u32(8));
+    if (note.read(u32(0)) != kKcapGap || !low || !high)
+        return std::nullopt;
+    return std::uint64_t{*high} << 32 | *low;
+}
+
 void writeKcap(std::ostream& to, Bytes message)
 {
-    std::array<char, kKcapLength> length{};
-    for (std::size_t i = 0; i < length.size(); ++i)
-        length[i] = static_cast<char>(message.size() >> (8 * i));
-    to.write(length.data(), length.size());
+    write(to, message.size(), kKcapLength);
     to.write(reinterpret_cast<const char*>(message.data()), static_cast<std::streamsize>(message.size()));
 }
 

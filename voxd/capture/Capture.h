@@ -28,8 +28,8 @@ public:
     /// The stream outlives the reader.
     CaptureReader(std::istream& from, CaptureFormat format) : _from(&from), _format(format) {}
 
-    /// The next channel message; a DLF record with the type byte of ordinary records put before it. Nothing at the
-    /// end and where the capture cannot be read on.
+    /// The next channel message; a DLF record with the type byte of ordinary records put before it. Notes are skipped.
+    /// Nothing at the end and where the capture cannot be read on.
     std::optional<std::vector<std::byte>> next();
 
     /// Where the next message begins, or what cannot be read.
@@ -38,6 +38,7 @@ public:
     const std::string& fault() const { return _fault; }
 
 private:
+    std::size_t readLength(std::span<std::byte> into, std::size_t width);
     std::optional<std::vector<std::byte>> take(std::size_t length, std::vector<std::byte> into);
 
     std::istream* _from;
@@ -48,5 +49,13 @@ private:
 
 /// Appends a message to a channel capture.
 void writeKcap(std::ostream& to, Bytes message);
+
+/// A note between the messages of a channel capture: here the service dropped messages for a client that did not read.
+/// It stands where a length would, and says how many.
+inline constexpr std::uint32_t kKcapGap = 0x8000'0008;
+inline constexpr std::size_t kKcapGapSize = 12; ///< bytes, kKcapGap included
+void writeKcapGap(std::ostream& to, std::uint64_t messages);
+/// How many messages the note says; nothing when `bytes` do not begin with a whole note.
+std::optional<std::uint64_t> kcapGap(Bytes bytes);
 
 } // namespace kestrum
