@@ -13,8 +13,8 @@
 #include "platform/Roles.h"
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"
+#include "support/Record.h"
 
-#include <charconv>
 #include <cstdint>
 #include <memory>
 #include <string>
@@ -23,9 +23,9 @@
 namespace kestrum::fuzz {
 namespace {
 
-constexpr std::string_view kTechnologies[] = {
-    kVoxLogChannelTechnology_Zephra_GSM, kVoxLogChannelTechnology_Zephra_CDMA, kVoxLogChannelTechnology_Zephra_LTE,
-    kVoxLogChannelTechnology_Zephra_UTRAN2};
+constexpr std::string_view kTechnologies[] = {kVoxLogChannelTechnology_Zephra_GSM, kVoxLogChannelTechnology_Zephra_CDMA,
+                                              kVoxLogChannelTechnology_Zephra_LTE,
+                                              kVoxLogChannelTechnology_Zephra_UTRAN2};
 
 /// A record whose counts are small and whose fields differ.
 std::vector<std::byte> patterned(LogCode code)
@@ -101,7 +101,8 @@ void show(Bytes input)
     Run once(technology, templateNode), again(technology, templateNode);
     once.receiveAll();
     again.receiveAll();
-    require(describe(once.state.at("Display")) == describe(again.state.at("Display")), "equal templates, other display");
+    require(describe(once.state.at("Display")) == describe(again.state.at("Display")),
+            "equal templates, other display");
     require(once.log.lines == again.log.lines, "equal templates, other log");
     checkTree(once.state.at("Display"));
 
