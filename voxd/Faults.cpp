@@ -121,8 +121,8 @@ void sendBehindFloodOf(FrameConnection& connection, const Frame& flood, const Fr
 
 void sendBehindRecords(FrameConnection& connection, const Frame& frame)
 {
-    // A record of 38 bytes but for its type, which no modem has.
-    std::array<std::byte, 38> record{std::byte{7}, std::byte{37}};
+    // A record of 1000 bytes but for its type, which no modem has.
+    std::array<std::byte, 1000> record{std::byte{7}, std::byte{0xE7}, std::byte{3}};
     sendBehindFloodOf(connection, {Frame::Kind::Message, kLogMessage, 0, record}, frame);
 }
 
