@@ -72,6 +72,7 @@ public:
     const std::string& written() const { return _written; } ///< everything the program has sent so far
     void forgetWritten() { _written.clear(); }
     termios modes() const;
+    pid_t process() const { return _program; }
     int exitStatus() const; ///< as the shell counts it: 128 and the signal's number when one ended it
 
 private:

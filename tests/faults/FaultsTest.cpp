@@ -1,0 +1,350 @@
+#include "doubles/FileContents.h"
+#include "doubles/Places.h"
+#include "doubles/QtTestToolkit.h"
+#include "frontends/qt/MainWindow.h"
+#include "linux/Scratch.h"
+#include "platform/Toolkit.h"
+#include "platform/linux/LinuxDevice.h"
+#include "terminal/Demonstration.h"
+#include "terminal/Pseudoterminal.h"
+#include "ui/KestrumApp.h"
+#include "voxd/capture/Capture.h"
+
+#include <QApplication>
+#include <QKeyEvent>
+#include <QProcess>
+#include <gmock/gmock.h>
+
+#include <algorithm>
+#include <cctype>
+#include <csignal>
+#include <filesystem>
+#include <fstream>
+#include <optional>
+#include <regex>
+#include <stdexcept>
+#include <unistd.h>
+
+// Both front ends, each against a service of its own that misbehaves.
+namespace kestrum {
+namespace {
+
+using testing::ElementsAre, testing::MatchesRegex;
+
+/// voxd on a device of its own.
+class Service {
+public:
+    explicit Service(const QStringList& scenario) : _scenario(scenario)
+    {
+        for (const char* each : {"run", "device"})
+            std::filesystem::create_directories(directory / each);
+        std::filesystem::permissions(directory / "run", std::filesystem::perms::owner_all);
+        std::ofstream capture(directory / "beats.kcap", std::ios::binary);
+        for (int beat = 0; beat < 5000; ++beat)
+            writeKcap(capture,
+                      bytesOf(propertyList(text("_sorted", "_sorted") +
+                                           dictionary("0;Serving Cell", text("PCI", "101") + text("RSRP", "-97")) +
+                                           text("1;Beat", std::to_string(beat)) + text("2;State", "camped") +
+                                           text("3;Band", "7"))));
+        capture.close();
+        serve({});
+    }
+    ~Service() { stop(); }
+
+    std::map<std::string, std::string> environment() const
+    {
+        return {{"KESTRUM_RUNTIME_DIR", directory / "run"},
+                {"KESTRUM_DEVICE_ROOT", directory / "device"},
+                {"XDG_CONFIG_HOME", directory / "config"}};
+    }
+    /// Until it serves, instead of what it did before.
+    void serve(const QStringList& options)
+    {
+        stop();
+        _log.clear();
+        const QStringList beats{"--replay", QString::fromStdString(directory / "beats.kcap")};
+        auto environment = QProcessEnvironment::systemEnvironment();
+        for (const auto& [name, value] : this->environment())
+            environment.insert(QString::fromStdString(name), QString::fromStdString(value));
+        _process.setProcessEnvironment(environment);
+        _process.start(QString::fromStdString(builtProgram("voxd")),
+                       (_scenario.isEmpty() ? beats : _scenario) + options);
+        while (!_process.canReadLine())
+            if (!_process.waitForReadyRead())
+                throw std::runtime_error("voxd does not serve");
+    }
+    void stop()
+    {
+        _process.kill();
+        _process.waitForFinished();
+    }
+    bool told(std::string_view text)
+    {
+        _log += _process.readAllStandardError().toStdString();
+        return _log.find(text) != std::string::npos;
+    }
+    const std::string& log() const { return _log; }
+    bool isGone() const { return _process.state() == QProcess::NotRunning; }
+    bool isStopped() const
+    {
+        const auto state = contentsOf("/proc/" + std::to_string(_process.processId()) + "/stat");
+        return state.find(") T ") != std::string::npos;
+    }
+    void resume() { ::kill(static_cast<pid_t>(_process.processId()), SIGCONT); }
+
+    ScratchDirectory directory;
+
+private:
+    QStringList _scenario; ///< instead of the beats
+    QProcess _process;
+    std::string _log;
+};
+
+std::string keyOf(const std::string& row)
+{
+    return row.substr(0, row.find(", "));
+}
+
+/// What a user has in front of them.
+class Display {
+public:
+    virtual ~Display() = default;
+    virtual std::vector<std::string> rows() = 0; ///< "Key" or "Key, value"
+    virtual std::string status() = 0;
+    virtual std::string chosen() = 0; ///< the chosen row's key
+    virtual void pressDown() = 0;
+    virtual pid_t process() const = 0;
+
+    /// Bytes of memory that are really there.
+    std::size_t memory() const
+    {
+        std::ifstream file("/proc/" + std::to_string(process()) + "/statm");
+        std::size_t total = 0, resident = 0;
+        file >> total >> resident;
+        return resident * static_cast<std::size_t>(::sysconf(_SC_PAGESIZE));
+    }
+};
+
+class TerminalDisplay final : public Display {
+public:
+    explicit TerminalDisplay(const std::map<std::string, std::string>& environment)
+    {
+        terminal.start("kestrum-terminal", {}, environment);
+    }
+
+    std::vector<std::string> rows() override
+    {
+        std::vector<std::string> rows;
+        for (int i = 1; i < 23; ++i)
+            if (auto row = asSpoken(terminal.row(i)); !row.empty())
+                rows.push_back(std::move(row));
+        return rows;
+    }
+    std::string status() override
+    {
+        std::smatch found;
+        const auto line = terminal.row(23);
+        return std::regex_search(line, found, std::regex("Updated [-0-9a-z: ]*[0-9]")) ? found.str() : "";
+    }
+    std::string chosen() override { return keyOf(asSpoken(terminal.chosen())); }
+    void pressDown() override { terminal.press(Pseudoterminal::Key::Down); }
+    pid_t process() const override { return terminal.process(); }
+
+    Pseudoterminal terminal{24, 80};
+
+private:
+    static std::string asSpoken(const std::string& row)
+    {
+        return std::regex_replace(std::regex_replace(row, std::regex("^ +| +›? *$"), ""), std::regex("  +"), ", ");
+    }
+};
+
+/// The application in this process.
+class WindowDisplay final : public Display {
+public:
+    WindowDisplay()
+    {
+        _application->applicationDidFinishLaunching();
+        for (auto* each : QApplication::topLevelWidgets())
+            if (auto* window = dynamic_cast<qt::MainWindow*>(each))
+                _window = window;
+    }
+    ~WindowDisplay() override
+    {
+        _application->applicationWillTerminate();
+        _device.dropQueued();
+    }
+
+    std::vector<std::string> rows() override
+    {
+        std::vector<std::string> rows;
+        for (const auto* cell : table().cellsInView())
+            rows.push_back(cell->spoken().toStdString());
+        return rows;
+    }
+    std::string status() override
+    {
+        const auto status = _window->root()->toolbar()->widgetAt(1)->accessibleName().toStdString();
+        return status.starts_with("Updated ") ? status : "";
+    }
+    std::string chosen() override
+    {
+        const auto row = table().current();
+        const auto* cell = row ? table().cellAt(*row) : nullptr;
+        return cell != nullptr ? keyOf(cell->spoken().toStdString()) : "";
+    }
+    void pressDown() override
+    {
+        // It waits for its turn, as a user's key does.
+        QApplication::postEvent(&table(), new QKeyEvent(QEvent::KeyPress, Qt::Key_Down, Qt::NoModifier));
+    }
+    pid_t process() const override { return ::getpid(); }
+
+private:
+    qt::Table& table() { return *_window->root()->table(); }
+
+    LinuxDevice _device{"kestrum", LinuxDevice::Output::Quiet};
+    ApplicationRoles _roles = _device.applicationRoles(toolkit());
+    std::shared_ptr<KestrumApp> _application = KestrumApp::make(_roles);
+    qt::MainWindow* _window = nullptr;
+};
+
+constexpr std::size_t kMegabyte = 1 << 20;
+// A beat comes every 10 ms then, before that every 500 ms: so no display has come as far when a fault begins.
+constexpr const char* kFast = "50";
+constexpr int kBeatAfterFaults = 100;
+
+struct Fault {
+    const char* names;
+    std::size_t memory = 24 * kMegabyte; ///< that a display may take because of it
+    const char* scenario = "";           ///< instead of the beats
+
+    friend void PrintTo(const Fault& shown, std::ostream* out) { *out << shown.names; }
+};
+
+class Faults : public testing::TestWithParam<Fault> {
+protected:
+    struct Side {
+        Side(Service& service, Display& display) : service(service), display(display) {}
+
+        Service& service;
+        Display& display;
+        std::size_t before = 0, peak = 0; ///< memory
+        std::string last;                 ///< what was seen last
+    };
+
+    /// Serves both displays until the condition holds for both.
+    bool both(const std::function<bool(Side&)>& condition)
+    {
+        const auto holds = [&] {
+            QCoreApplication::processEvents(QEventLoop::AllEvents, 20); // ms, as long as the terminal's turn
+            for (auto& side : sides)
+                side.peak = std::max(side.peak, side.display.memory());
+            return std::ranges::all_of(sides, condition);
+        };
+        for (int patience = 0; patience < 3; ++patience) // of the terminal's
+            if (terminal.terminal.waitUntil(holds))
+                return true;
+        return false;
+    }
+    std::string shown()
+    {
+        std::string all;
+        for (auto& side : sides)
+            all += "service:\n" + side.service.log() + "display:\n" + testing::PrintToString(side.display.rows()) +
+                   side.display.status() + "\n";
+        return all;
+    }
+
+    static bool isScenario() { return *GetParam().scenario != '\0'; }
+    static QStringList scenario()
+    {
+        return isScenario() ? QStringList{"--scenario", GetParam().scenario} : QStringList();
+    }
+    /// Of the rows, when they are what the service has sent and nothing else.
+    static std::optional<int> beat(Display& display)
+    {
+        static const std::string key = "Beat, ";
+        const auto rows = display.rows();
+        const testing::Matcher<std::vector<std::string>> sound =
+            ElementsAre("Serving Cell", MatchesRegex(key + "[0-9]+"), "State, camped", "Band, 7");
+        return sound.Matches(rows) ? std::optional(std::stoi(rows[1].substr(key.size()))) : std::nullopt;
+    }
+    static bool showsData(Display& display)
+    {
+        return isScenario() ? !display.status().empty() && !display.rows().empty() : beat(display).has_value();
+    }
+
+    Service ofTerminal{scenario()}, ofWindow{scenario()};
+    ScopedVariable runtimeVariable{"KESTRUM_RUNTIME_DIR", ofWindow.directory / "run"};
+    ScopedVariable deviceVariable{"KESTRUM_DEVICE_ROOT", ofWindow.directory / "device"};
+    ScopedVariable configurationVariable{"XDG_CONFIG_HOME", ofWindow.directory / "config"};
+    TerminalDisplay terminal{ofTerminal.environment()};
+    WindowDisplay window;
+    std::vector<Side> sides{{ofTerminal, terminal}, {ofWindow, window}};
+};
+
+// Timing decides nothing here: what a display shows in the end is waited for.
+TEST_P(Faults, LeaveTheDisplayAnsweringSmallAndShowingWhatComesNext)
+{
+    ASSERT_TRUE(both([](Side& side) { return showsData(side.display); })) << shown();
+    for (auto& side : sides)
+        side.before = std::exchange(side.peak, 0);
+
+    for (auto& side : sides)
+        side.service.serve({"--speed", kFast, "--fault", GetParam().names});
+    const QStringList faults = QString(GetParam().names).split(',');
+    for (const auto& each : faults) {
+        ASSERT_TRUE(both([&](Side& side) {
+            // What it says last before a signal may stay in it.
+            return side.service.told("fault " + each.toStdString() + ": now") || side.service.isStopped() ||
+                   side.service.isGone();
+        })) << shown();
+        for (auto& side : sides) {
+            side.last = side.display.chosen();
+            side.display.pressDown();
+        }
+        EXPECT_TRUE(both([](Side& side) { return side.display.chosen() != side.last; })) << shown();
+    }
+    const auto fault = faults.last().toStdString();
+
+    if (fault == "stop") {
+        ASSERT_TRUE(both([](Side& side) { return side.service.isStopped(); })) << shown();
+        for (auto& side : sides)
+            side.service.resume();
+    }
+    if (fault == "die") {
+        ASSERT_TRUE(both([](Side& side) { return side.service.isGone(); })) << shown();
+        for (auto& side : sides)
+            side.service.serve({"--speed", kFast});
+    } else {
+        ASSERT_TRUE(both([&](Side& side) { return side.service.told("fault " + fault + ": over"); })) << shown();
+    }
+    if (isScenario()) {
+        for (int update = 0; update < 2; ++update) { // the first may be of what came before
+            for (auto& side : sides)
+                side.last = side.display.status();
+            EXPECT_TRUE(both([](Side& side) { return showsData(side.display) && side.display.status() != side.last; }))
+                << shown();
+        }
+    } else {
+        EXPECT_TRUE(both([](Side& side) { return beat(side.display) >= kBeatAfterFaults; })) << shown();
+    }
+    for (auto& side : sides)
+        EXPECT_LT(side.peak, side.before + GetParam().memory) << "from " << side.before;
+}
+
+INSTANTIATE_TEST_SUITE_P(OfTheService, Faults,
+                         testing::Values(Fault{"reply-never"}, Fault{"reply-1100ms"}, Fault{"wrong-ids"},
+                                         Fault{"technology"}, Fault{"notifications"},
+                                         Fault{"half-frame,garbage,oversized"}, Fault{"reply-900ms"},
+                                         Fault{"flood", 300 * kMegabyte, "lte"}, Fault{"byte-by-byte"}, Fault{"stop"},
+                                         Fault{"die"}),
+                         [](const auto& each) {
+                             std::string name = each.param.names;
+                             std::erase_if(name, [](unsigned char letter) { return std::isalnum(letter) == 0; });
+                             return name;
+                         });
+
+} // namespace
+} // namespace kestrum
