@@ -232,8 +232,9 @@ bool Faults::send(FrameConnection& connection, const Frame& frame)
         left = &Fault::messages;
     if (left == &Fault::technologies)
         _logMessages = 0;
-    const auto found =
-        std::ranges::find_if(_pending, [&](const Fault& each) { return left != nullptr && each.*left > 0; });
+    if (left == nullptr)
+        return connection.send(frame);
+    const auto found = std::ranges::find_if(_pending, [&](const Fault& each) { return each.*left > 0; });
     if (found == _pending.end())
         return connection.send(frame);
     --(*found.*left);
