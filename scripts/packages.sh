@@ -17,7 +17,7 @@ readonly test_packages=(
 # shellcheck disable=SC2034
 readonly package_packages=(dpkg-dev file lintian desktop-file-utils appstream mandoc systemd)
 # shellcheck disable=SC2034
-readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev libbenchmark-dev git debootstrap)
+readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev libbenchmark-dev git debootstrap valgrind)
 
 fail() { echo "${0##*/}: $*" >&2; exit 1; }
 
