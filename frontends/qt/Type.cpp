@@ -15,7 +15,7 @@ namespace {
 constexpr double kLeastSpacing = 1.0 / 64;
 const QString kLiberationSans = QStringLiteral("Liberation Sans");
 
-// Bytes. A value can have megabytes; nobody swipes a row further than this, and every draw measures it.
+// Bytes. A value can have megabytes. No row is swiped further than this, and every draw measures it.
 constexpr std::size_t kMostShown = 4 << 10;
 
 /// Whether the face that stands for the font is a proportional one without serifs.

@@ -98,7 +98,7 @@ void TextDisplay::updateViewControllerFromModel()
          << treeText(*root) << std::endl;
     if (!_out && errno != EPIPE)
         end(1, formatted("standard output: %s", std::strerror(errno)));
-    else if (!_out || --_refreshes == 0) // with its reader gone, nobody wants the rest
+    else if (!_out || --_refreshes == 0) // with its reader gone, the rest is not wanted
         end(0);
 }
 

@@ -291,5 +291,8 @@ TEST_F(WalkedArrays, DictionariesAreNotLocked)
     EXPECT_EQ(counts.locked, 0);
 }
 
+// Names come from outside. In an ordered container no choice of them makes a look-up slow, as it would with a hash.
+static_assert(std::is_same_v<PathDictionary::key_compare, std::less<std::string>>);
+
 } // namespace
 } // namespace kestrum

@@ -1,1 +1,1 @@
-// An empty file: the precompiled headers of the tests are built beside it.
+// Empty: the precompiled header of the tests is built beside it.

@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
+#include <ctime>
 #include <random>
 #include <sstream>
 #include <tuple>
@@ -505,6 +506,21 @@ TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
     EXPECT_THAT(scanKcap(heads).messages, IsEmpty());
     const auto got = scanDlf(heads);
     EXPECT_LE(got.messages.size(), heads.size() / 12);
+}
+
+TEST(HostileStreams, OfServiceRecordsWhoseListsNeverEndAreScannedInLinearTime)
+{
+    const auto seconds = [](std::size_t records) {
+        std::string stream;
+        for (std::size_t i = 0; i < records; ++i)
+            stream += message(static_cast<unsigned>(i % 3), "<?xml version='1.0'?><plist>", kStamp + (i << 16), 0xFF);
+        const auto before = std::clock();
+        EXPECT_LE(scanDlf(stream).messages.size(), records);
+        return static_cast<double>(std::clock() - before) / CLOCKS_PER_SEC;
+    };
+    // Ten times the input may take ten times as long; what grows with its square takes a hundred times.
+    const double few = seconds(5'000);
+    EXPECT_LT(seconds(50'000), 40 * few + 1);
 }
 
 // Notes of missing messages.
