@@ -4,6 +4,9 @@
 
 #include <gmock/gmock.h>
 
+#include <functional>
+#include <type_traits>
+
 namespace kestrum {
 namespace {
 
