@@ -303,15 +303,14 @@ void Navigation::keyPressEvent(QKeyEvent* event)
     const int key = event->key();
     const bool control = event->modifiers() == Qt::ControlModifier, alt = event->modifiers() == Qt::AltModifier;
     const bool back = key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back;
-    if (event->isAutoRepeat())
-        event->ignore();
-    else if (back || (alt && key == Qt::Key_Left))
+    const bool once = !event->isAutoRepeat();
+    if (once && (back || (alt && key == Qt::Key_Left)))
         goBack();
-    else if (control && key == Qt::Key_S)
+    else if (once && control && key == Qt::Key_S)
         pressSave();
-    else if (_table && ((control && key == Qt::Key_F) || event->text() == u"/"))
+    else if (once && _table && ((control && key == Qt::Key_F) || event->text() == u"/"))
         _jump.start(*_table);
-    else if (_table && (key == Qt::Key_F3 || event->text() == u"n"))
+    else if (once && _table && (key == Qt::Key_F3 || event->text() == u"n"))
         _jump.again(*_table);
     else
         event->ignore();

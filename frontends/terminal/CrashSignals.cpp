@@ -3,6 +3,7 @@
 #include <array>
 #include <csignal>
 #include <cstddef>
+#include <cstdint>
 #include <unistd.h>
 
 // The second header names macros like `columns`.
@@ -31,10 +32,15 @@ void giveBack(int signal)
     raise(signal); // it waits until this handler returns, and then does what it did before
 }
 
+// The library's own mark of a capability that is no string is -1.
+bool isText(const char* capability)
+{
+    return capability != nullptr && reinterpret_cast<std::intptr_t>(capability) != -1;
+}
+
 void add(const char* capability)
 {
-    // The library's own mark of a capability that is no string is -1.
-    if (capability == nullptr || capability == reinterpret_cast<const char*>(-1))
+    if (!isText(capability))
         return;
     tputs(capability, 1, [](int byte) {
         if (farewellBytes < farewell.size())
@@ -47,7 +53,7 @@ void add(const char* capability)
 void composeFarewell()
 {
     farewellBytes = 0;
-    if (char* const mouse = tigetstr("XM"); mouse != nullptr && mouse != reinterpret_cast<char*>(-1))
+    if (char* const mouse = tigetstr("XM"); isText(mouse))
         add(tparm(mouse, 0));
     else if (has_mouse())
         add("\x1B[?1000l");
