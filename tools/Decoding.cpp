@@ -88,7 +88,7 @@ public:
     Date moment{};
 };
 
-Decoding::Decoding(std::string technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then)
+Decoding::Decoding(std::string_view technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then)
     : _bundle(bundle),
       _lists(lists),
       _told(!technology.empty()),

@@ -52,7 +52,7 @@ public:
 
     /// `technology`: an identifier, or empty when the messages shall tell. Bundle and lists outlive the decoding;
     /// `then`, if there is one, is called behind each message.
-    Decoding(std::string technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then);
+    Decoding(std::string_view technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then);
     ~Decoding();
 
     /// Messages that come before one that tells the technology are kept until then. Throws std::runtime_error when
