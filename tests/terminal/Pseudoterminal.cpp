@@ -36,14 +36,12 @@ struct Pseudoterminal::Callbacks {
             self._cursorVisible = value->boolean != 0;
         return 1;
     }
-    static constexpr VTermScreenCallbacks kTable = {.damage = nullptr,
-                                                    .moverect = nullptr,
-                                                    .movecursor = nullptr,
-                                                    .settermprop = property,
-                                                    .bell = nullptr,
-                                                    .resize = nullptr,
-                                                    .sb_pushline = nullptr,
-                                                    .sb_popline = nullptr};
+    // The library's versions differ in what else can be called back.
+    static constexpr VTermScreenCallbacks kTable = [] {
+        VTermScreenCallbacks table{};
+        table.settermprop = property;
+        return table;
+    }();
 };
 
 Pseudoterminal::Pseudoterminal(int rows, int columns)
