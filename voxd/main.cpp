@@ -139,7 +139,8 @@ int main(int argc, char** argv)
         ->needs(scenario)
         ->check([](const std::string& text) { return dateFromIso(text) ? "" : text + " is no date of that form"; });
     auto* const record = commands.add_option("--record", options.record, "Write what is streamed to FILE.kcap");
-    auto* const write = commands.add_option("--write", options.write, "Write a capture at once, without serving, and end");
+    auto* const write =
+        commands.add_option("--write", options.write, "Write a capture at once, without serving, and end");
     commands.add_option("--seconds", options.seconds, "How much of the source --write writes")
         ->needs(write)
         ->check(notFinite)
