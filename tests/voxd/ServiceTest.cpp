@@ -180,6 +180,17 @@ protected:
         return names;
     }
 
+    /// Asks for a channel to a port that the test plays itself, the service's `number`th: where its commands go.
+    RawSocket openChannel(const std::string& address, int number) const
+    {
+        const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
+        server.send(frame(kRequest, 1, 1, address));
+        const auto name =
+            "org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + "." + std::to_string(number);
+        constexpr std::size_t kFrameAndErrors = 13 + 8;
+        return RawSocket::connectTo(directory / server.receive(kFrameAndErrors + name.size()).substr(kFrameAndErrors));
+    }
+
     ScratchDirectory directory, files;
     PropertyListCodec lists;
     RecordingLog log;
@@ -426,11 +437,7 @@ TEST_F(ServiceTest, MalformedFramesEndTheirConnectionWithOneLineEach)
                           ": a frame of 4294967295 bytes"));
 
     const auto receiving = RawSocket::listenAt(directory / "rude.1");
-    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
-    server.send(frame(kRequest, 1, 1, "rude.1"));
-    const auto answer =
-        server.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".2").size());
-    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    const auto command = openChannel("rude.1", 2);
     ASSERT_TRUE(command.isOpen());
     command.send(std::string("\0\0\0\0", 4));
     EXPECT_TRUE(eventually([&] { return command.isAbandoned(); }));
@@ -552,11 +559,7 @@ TEST_F(ServiceTest, RepliesThatAreNotReadCostBoundedMemory)
     EXPECT_LT(flood(server, frame(kRequest, 99, 1, "")), std::size_t{16} << 20);
 
     const auto receiving = RawSocket::listenAt(directory / "mute.1");
-    const auto asking = RawSocket::connectTo(directory / "org.kestrum.vox");
-    asking.send(frame(kRequest, 1, 1, "mute.1"));
-    const auto answer =
-        asking.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".2").size());
-    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    const auto command = openChannel("mute.1", 2);
     const auto question = lists.toXml(makeDictionary({{"GetTechnology", Value("GetTechnology")}}));
     EXPECT_LT(flood(command, frame(kRequest, 0, 1, textOf(question->bytes()))), std::size_t{16} << 20);
     EXPECT_LT(voxd.memory(), before + (std::size_t{16} << 20));
@@ -598,11 +601,7 @@ TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndNobodyElse)
     // 0.5 s of nominal spacing in 5 µs: some 200,000 messages a second, were they taken.
     ASSERT_TRUE(voxd.start(replay(capture(messages), {"--loop", "--speed", "100000"})));
     const auto receiving = RawSocket::listenAt(directory / "deaf.1");
-    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
-    server.send(frame(kRequest, 1, 1, "deaf.1"));
-    const auto answer =
-        server.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".1").size());
-    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    const auto command = openChannel("deaf.1", 1);
     const auto start = lists.toXml(makeDictionary({{"SetState", Value("Streaming")}}));
     command.send(frame(kMessage, 0, 0, textOf(start->bytes())));
     ASSERT_TRUE(voxd.logs("its client does not read, the oldest messages go"));
@@ -649,11 +648,7 @@ TEST_F(ServiceTest, ItsRecordingHoldsAllAndNotesWhatAClientMissed)
     ASSERT_TRUE(voxd.start(
         replay(capture(messages), {"--loop", "--speed", "4000", "--record", QString::fromStdString(recording)})));
     const auto receiving = RawSocket::listenAt(directory / "deaf.1");
-    const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
-    server.send(frame(kRequest, 1, 1, "deaf.1"));
-    const auto answer =
-        server.receive(13 + 8 + ("org.kestrum.vox.command." + std::to_string(voxd.process.processId()) + ".1").size());
-    const auto command = RawSocket::connectTo(directory / answer.substr(13 + 8));
+    const auto command = openChannel("deaf.1", 1);
     const auto order = [&](const char* state) {
         const auto list = lists.toXml(makeDictionary({{"SetState", Value(state)}}));
         command.send(frame(kMessage, 0, 0, textOf(list->bytes())));
