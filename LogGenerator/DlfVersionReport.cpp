@@ -1,7 +1,9 @@
 #include "LogGenerator/DlfVersionReport.h"
 
+#include "support/Bytes.h"
+#include "support/FieldWriter.h"
+
 #include <algorithm>
-#include <cstring>
 #include <span>
 
 namespace kestrum {
@@ -10,24 +12,11 @@ namespace {
 constexpr int kSuccess = 0, kTooSmall = 3;
 constexpr std::uint16_t kVersionReportCode = 0x1FFD;
 
-/// Little-endian fields and texts at fixed places of the report.
-class Report {
-public:
-    explicit Report(std::span<std::byte> bytes) : _bytes(bytes) { std::ranges::fill(_bytes, std::byte{0}); }
-
-    void number(std::size_t offset, std::size_t width, std::uint64_t value)
-    {
-        for (std::size_t i = 0; i < width; ++i, value >>= 8)
-            _bytes[offset + i] = static_cast<std::byte>(value);
-    }
-    void text(std::size_t offset, std::size_t width, std::string_view text)
-    {
-        std::memcpy(&_bytes[offset], text.data(), std::min(text.size(), width - 1));
-    }
-
-private:
-    std::span<std::byte> _bytes;
-};
+/// A text in a field of `width` bytes that is 0: cut where it is too long, always ended by a NUL.
+void put(std::string_view text, std::span<std::byte> report, std::size_t offset, std::size_t width)
+{
+    std::ranges::copy(bytesOf(text.substr(0, width - 1)), report.subspan(offset, width).begin());
+}
 
 } // namespace
 
@@ -39,17 +28,19 @@ int QrelDLFAddVersionReport(std::byte* output, std::uint32_t capacity, std::uint
     if (capacity < kDlfVersionReportSize)
         return kTooSmall;
     // What is not named, time stamp included, is 0.
-    Report report(std::span(output, kDlfVersionReportSize));
-    report.number(0, 2, kDlfVersionReportSize);
-    report.number(2, 2, kVersionReportCode);
-    report.number(12, 2, firstReport);
-    report.number(14, 2, secondReport);
-    report.text(16, 7, version);
-    report.text(23, 16, executable);
-    report.text(63, 18, build);
-    report.number(81, 4, packedTime);
-    report.number(85, 2, packedTime >> 32);
-    report.number(87, 2, packedTime >> 48 & 0xFF);
+    const std::span report(output, kDlfVersionReportSize);
+    std::ranges::fill(report, std::byte{0});
+    FieldWriter(report)
+        .set(u16(0), kDlfVersionReportSize)
+        .set(u16(2), kVersionReportCode)
+        .set(u16(12), firstReport)
+        .set(u16(14), secondReport)
+        .set(u32(81), static_cast<std::uint32_t>(packedTime))
+        .set(u16(85), packedTime >> 32 & 0xFFFF)
+        .set(u16(87), packedTime >> 48 & 0xFF);
+    put(version, report, 16, 7);
+    put(executable, report, 23, 16);
+    put(build, report, 63, 18);
     written = kDlfVersionReportSize;
     return kSuccess;
 }

@@ -7,7 +7,7 @@ namespace {
 
 constexpr Field kType = u8(0);
 constexpr Field kCode = u16(3);
-constexpr Field kTimeStamp = u32(5), kTimeStampUpper = u32(9);
+constexpr std::size_t kTimeStamp = 5;
 
 /// The record that opens a DLF stream tells who wrote it, whatever the modem.
 constexpr LogCode kDlfVersionReport = 0x1FFD;
@@ -26,8 +26,7 @@ std::optional<ChannelMessage> ChannelMessage::read(Bytes message)
 
 std::optional<std::uint64_t> ChannelMessage::timeStamp() const
 {
-    const auto low = record.read(kTimeStamp), high = record.read(kTimeStampUpper);
-    return high ? std::optional(std::uint64_t{*high} << 32 | *low) : std::nullopt;
+    return record.read64(kTimeStamp);
 }
 
 std::optional<ChannelRecord> channelRecord(Bytes message)

@@ -92,6 +92,15 @@ public:
         return (word >> field.first) & (0xFFFF'FFFFu >> (31 - (field.last - field.first)));
     }
 
+    /// The little-endian 64-bit number at `offset`; nothing unless all of it is there.
+    std::optional<std::uint64_t> read64(std::size_t offset) const
+    {
+        const auto part = slice(offset, 8);
+        if (!part)
+            return std::nullopt;
+        return std::uint64_t{*part->read(u32(4))} << 32 | *part->read(u32(0));
+    }
+
 private:
     Bytes _bytes;
 };

@@ -1,6 +1,7 @@
 #include "voxd/ServiceChannel.h"
 
 #include "platform/SystemLog.h"
+#include "support/FieldWriter.h"
 #include "support/Format.h"
 
 #include <array>
@@ -137,8 +138,7 @@ void ServiceChannel::tellLosses()
     if (missing == 0)
         return;
     std::array<std::byte, sizeof missing> payload;
-    for (std::size_t i = 0; i < payload.size(); ++i)
-        payload[i] = static_cast<std::byte>(missing >> (8 * i));
+    FieldWriter(payload).set64(0, missing);
     _host.send(*_logPort, {Frame::Kind::Message, kLossMessage, 0, payload});
     _host.dropped(missing);
 }
