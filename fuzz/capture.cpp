@@ -1,52 +1,109 @@
-// A capture file. What is read are the file's own bytes, in their order and without a gap, up to its end or to a fault
-// with its place.
-#include "voxd/capture/Capture.h"
+// A capture file, damaged or not. The first byte chooses the format: .kcap, .dlf, or the raw records of a snapshot's
+// interval, which are only searched.
+//
+// By the lengths alone: messages are the file's own bytes, in their order and without a gap, up to its end or to a fault
+// with its place. Searching behind damage: messages and skipped bytes are all of the file, in its order. Where the
+// lengths lead to the end, both give the same messages and nothing is skipped.
 #include "Require.h"
+#include "capture/CaptureWriter.h"
+#include "capture/RecordReader.h"
 
-#include <algorithm>
 #include <cstdint>
+#include <memory>
 #include <sstream>
 #include <string>
+#include <vector>
 
 namespace kestrum::fuzz {
 namespace {
+
+using Messages = std::vector<std::string>;
 
 /// The message as the file holds it.
 std::string inFile(CaptureFormat format, Bytes message)
 {
     std::ostringstream written;
     if (format == CaptureFormat::Kcap)
-        writeKcap(written, message);
+        writeKcap(sinkTo(written), message);
     else
         written << textOf(message.subspan(1)); // less the type byte that was put before it
     return written.str();
+}
+
+/// The messages, when the lengths lead to the end.
+std::optional<Messages> byLengths(Bytes file, CaptureFormat format)
+{
+    std::istringstream stream{std::string(textOf(file))};
+    ByteWindow window(stream);
+    std::optional<CaptureFault> found;
+    const auto reader = CaptureReader::make(format, window, OnDamage::Stop, [&](const CaptureFault& fault) {
+        require(!found, "two faults");
+        require(!fault.reason.empty() && fault.size == 0, "a fault without a reason, or bytes were skipped");
+        found = fault;
+    });
+    Messages messages;
+    std::size_t behind = 0, notes = 0;
+    while (const auto message = reader->next()) {
+        require(reader->offset() >= behind, "messages overlap");
+        // Between messages stand nothing but whole notes.
+        require((reader->offset() - behind) % kKcapGapSize == 0, "a gap between two messages");
+        notes += (reader->offset() - behind) / kKcapGapSize;
+        behind = reader->offset();
+        const auto held = inFile(format, *message);
+        require(behind + held.size() <= file.size() && textOf(file).substr(behind, held.size()) == held,
+                "not what the file holds");
+        behind += held.size();
+        messages.emplace_back(textOf(*message));
+    }
+    require(format == CaptureFormat::Kcap || notes == 0, "a note in a format that has none");
+    const auto end = found ? found->offset : file.size();
+    require(end >= behind && (end - behind) % kKcapGapSize == 0, "it ends elsewhere than behind the last message");
+    require(!found || end < file.size(), "a fault behind the end");
+    require(!reader->next(), "it goes on behind its end");
+    return found ? std::nullopt : std::optional(messages);
+}
+
+struct Searched {
+    Messages messages;
+    std::uint64_t skipped = 0;
+};
+
+Searched searched(Bytes file, unsigned kind)
+{
+    ByteWindow window(file);
+    Searched result;
+    const auto report = [&](const CaptureFault& fault) {
+        require(fault.offset + fault.size <= file.size(), "a fault outside the file");
+        result.skipped += fault.size;
+    };
+    const auto reader =
+        kind == 2 ? std::make_unique<RecordReader>(window, OnDamage::Search, report, RecordReader::Origin::Interval)
+                  : CaptureReader::make(kind == 0 ? CaptureFormat::Kcap : CaptureFormat::Dlf, window, OnDamage::Search,
+                                        report);
+    std::uint64_t behind = 0, size = 0;
+    while (const auto message = reader->next()) {
+        require(result.messages.empty() || reader->offset() > behind, "a message that does not follow the last one");
+        behind = reader->offset();
+        require(behind < file.size(), "a message outside the file");
+        result.messages.emplace_back(textOf(*message));
+        size += message->size();
+    }
+    require(result.skipped <= file.size() && !reader->next(), "it goes on behind its end");
+    require(kind != 0 || size + result.skipped <= file.size(), "more than the file holds");
+    return result;
 }
 
 void read(Bytes input)
 {
     if (input.empty())
         return;
-    const auto format = input.front() == std::byte{0} ? CaptureFormat::Kcap : CaptureFormat::Dlf;
-    const std::string file(textOf(input.subspan(1)));
-    std::istringstream stream(file);
-    CaptureReader reader(stream, format);
-    std::string known;
-    // Notes are passed over: they are the file's own bytes too.
-    const auto passNotes = [&] {
-        while (format == CaptureFormat::Kcap && known.size() <= file.size() &&
-               kcapGap(bytesOf(std::string_view(file).substr(known.size()))))
-            known += std::string_view(file).substr(known.size(), kKcapGapSize);
-    };
-    while (const auto message = reader.next()) {
-        passNotes();
-        known += inFile(format, *message);
-        require(reader.offset() == known.size(), "a gap between two messages");
-        require(known.size() <= file.size() && std::string_view(file).starts_with(known), "not what the file holds");
-    }
-    passNotes();
-    require(reader.offset() == known.size(), "the fault's place is not behind the last message");
-    require(reader.fault().empty() == (known.size() == file.size()), "it ends early without a fault");
-    require(!reader.next(), "it goes on behind its end");
+    const unsigned kind = std::to_integer<unsigned>(input.front()) % 3;
+    const Bytes file = input.subspan(1);
+    const auto found = searched(file, kind);
+    if (kind == 2)
+        return;
+    if (const auto framed = byLengths(file, kind == 0 ? CaptureFormat::Kcap : CaptureFormat::Dlf))
+        require(found.messages == *framed && found.skipped == 0, "lengths that lead to the end, read in another way");
 }
 
 } // namespace

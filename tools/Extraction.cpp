@@ -1,15 +1,13 @@
 #include "tools/Extraction.h"
 
-#include "platform/ChannelMessage.h"
+#include "capture/CaptureWriter.h"
 
-#include <array>
 #include <filesystem>
 #include <stdexcept>
 
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kLongestRecord = 0xFFFF;
 constexpr const char *kKcap = ".kcap", *kDlf = ".dlf", *kWritten = "-written.dlf";
 
 std::string stemIn(const std::string& directory, const Snapshot& snapshot)
@@ -24,13 +22,9 @@ bool isThere(const std::string& path)
     return WholeFile::at(path) != WholeFile::Identity();
 }
 
-template <std::size_t Width>
-std::array<std::byte, Width> littleEndian(std::size_t number)
+ByteSink sinkTo(WholeFile& file)
 {
-    std::array<std::byte, Width> bytes{};
-    for (std::size_t i = 0; i < Width; ++i)
-        bytes[i] = static_cast<std::byte>(number >> (8 * i));
-    return bytes;
+    return [&file](Bytes bytes) { file.write(bytes); };
 }
 
 } // namespace
@@ -59,19 +53,9 @@ WholeFile& Extraction::create(const std::string& ending)
 
 void Extraction::take(Bytes message)
 {
-    _kcap->write(littleEndian<4>(message.size()));
-    _kcap->write(message);
-    if (_dlf == nullptr)
-        return;
-    const auto read = ChannelMessage::read(message);
-    const auto record = read && read->type == ChannelMessage::kOrdinary ? read->record.from(1) : std::nullopt;
-    if (!record || record->size() < ChannelMessage::kHeaderSize - 1 || record->size() > kLongestRecord) {
+    writeKcap(sinkTo(*_kcap), message);
+    if (_dlf != nullptr && !writeDlf(sinkTo(*_dlf), message))
         ++_inKcapAlone;
-        return;
-    }
-    // The length as it is, whatever the record said.
-    _dlf->write(littleEndian<2>(record->size()));
-    _dlf->write(record->from(2)->bytes());
 }
 
 void Extraction::finish()

@@ -1,16 +1,12 @@
 #include "tools/Program.h"
 
+#include "capture/CaptureReader.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "support/Format.h"
-#include "support/Record.h"
-#include "tools/ByteWindow.h"
 #include "tools/Extraction.h"
 #include "tools/Harmless.h"
 #include "tools/Input.h"
-#include "tools/KcapScanner.h"
-#include "tools/RecordScanner.h"
 #include "tools/Snapshot.h"
-#include "voxd/capture/Capture.h"
 
 #include <algorithm>
 #include <chrono>
@@ -125,36 +121,28 @@ private:
     void decode(const std::string& file, Input& input, ByteWindow& window)
     {
         const Bytes begin = window.peek(8);
-        auto known = captureFormat(file);
+        const auto known = captureFormat(file);
         if (!known &&
             (file.ends_with(".kestrum") || textOf(begin).starts_with("<") || textOf(begin).starts_with("bplist")))
             return decodeSnapshot(file, input, window);
-        if (!known)
-            known = Record(begin).read(u32(0)).value_or(0) <= CaptureReader::kMaximumMessage ? CaptureFormat::Kcap
-                                                                                             : CaptureFormat::Dlf;
-        const auto told = [this](const Fault& fault) { tell(fault); };
-        if (*known == CaptureFormat::Kcap) {
-            KcapScanner scanner(window, told);
-            scan(scanner, input, window);
-        } else {
-            RecordScanner scanner(window, told, RecordScanner::Origin::Dlf);
-            scan(scanner, input, window);
-        }
+        const auto reader = CaptureReader::make(known.value_or(captureFormatFromBytes(begin)), window, OnDamage::Search,
+                                                [this](const CaptureFault& fault) { report(fault); });
+        read(*reader, input, window);
     }
 
-    void scan(MessageScanner& scanner, Input& input, ByteWindow& window)
+    void read(CaptureReader& reader, Input& input, ByteWindow& window)
     {
         for (bool mayGrow = input.mayGrow(); mayGrow;) {
-            while (const auto message = scanner.next(true))
+            while (const auto message = reader.next(true))
                 _decoding.take(*message);
             mayGrow = waitForMore(input);
             if (_isRestarted)
                 break;
             window.resume();
         }
-        while (const auto message = _isRestarted ? std::nullopt : scanner.next())
+        while (const auto message = _isRestarted ? std::nullopt : reader.next())
             _decoding.take(*message);
-        _missing += scanner.missing();
+        _missing += reader.missing();
     }
 
     bool waitForMore(Input& input)
@@ -195,7 +183,7 @@ private:
                 throw std::runtime_error(reason);
             complain(formatted("%s: %s; what raw records are left are shown", _file, reason));
         }
-        const Snapshot snapshot(file, list, [this](const Fault& fault) { tell(fault); });
+        const Snapshot snapshot(file, list, [this](const CaptureFault& fault) { report(fault); });
         _output->snapshot(snapshot.listing());
         std::optional<Extraction> extraction;
         if (!_options.extract.empty())
@@ -260,7 +248,7 @@ private:
             _remarks.write(formatted("messages missing: %lu\n", _missing));
     }
 
-    void tell(const Fault& fault)
+    void report(const CaptureFault& fault)
     {
         _skipped += fault.size;
         _isBad = true;

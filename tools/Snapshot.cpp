@@ -5,7 +5,6 @@
 #include "support/Base64.h"
 #include "support/Format.h"
 #include "support/Record.h"
-#include "tools/RecordScanner.h"
 
 #include <stdexcept>
 #include <utility>
@@ -71,13 +70,14 @@ Value Snapshot::salvaged(Bytes xml)
     return entries.empty() ? Value() : Value(makeDictionary({{"Data", makeArray(std::move(entries))}}));
 }
 
-Snapshot::Snapshot(std::string file, const Value& propertyList, MessageScanner::Tell tell) : _tell(std::move(tell))
+Snapshot::Snapshot(std::string file, const Value& propertyList, CaptureReader::OnFault onFault)
+    : _onFault(std::move(onFault))
 {
     const auto root = propertyList.dictionary();
     if (!root || (!root->contains("Timestamp") && !root->contains("Data")))
         throw std::runtime_error("the property list is no snapshot");
     const auto wrong = [this](const std::string& what, const Value& held, std::string_view due) {
-        _tell({0, 0, formatted("%s is of type %@ where %s is due", what, nameOf(held.kind()), due)});
+        _onFault({0, 0, formatted("%s is of type %@ where %s is due", what, nameOf(held.kind()), due)});
     };
     _listing = {std::move(file), textAt(*root, "Timestamp"), textAt(*root, "Description"), {}};
     for (const auto key : {"Timestamp", "Description"})
@@ -137,7 +137,7 @@ void Snapshot::recover(const PropertyLists& lists, const std::function<void(Byte
         if (const auto message = lists.toXml(tree))
             take(message->bytes());
         else
-            _tell({0, leavesOf(tree), "a tree cannot be serialised"});
+            _onFault({0, leavesOf(tree), "a tree cannot be serialised"});
     }
     // The stream lacks the first byte of each interval.
     std::size_t accounted = versionReport().size();
@@ -145,26 +145,26 @@ void Snapshot::recover(const PropertyLists& lists, const std::function<void(Byte
         accounted += interval.size() >= 2 ? interval.size() - 1 : 0;
     if (!_dlf || _dlf->size() <= accounted) {
         for (const auto& [entry, interval] : _intervals)
-            scan(interval.bytes(), 0, false, formatted("entry %lu", entry), take);
+            read(interval.bytes(), 0, RecordReader::Origin::Interval, formatted("entry %lu", entry), take);
         return;
     }
     if (!_intervals.empty())
-        _tell({0, 0,
-               formatted("the DLF stream has %lu bytes, of which the other entries account for %lu: it is taken",
-                         _dlf->size(), accounted)});
-    scan(_dlf->bytes().subspan(versionReport().size()), versionReport().size(), true, formatted("entry %lu", _dlfEntry),
-         take);
+        _onFault({0, 0,
+                  formatted("the DLF stream has %lu bytes, of which the other entries account for %lu: it is taken",
+                            _dlf->size(), accounted)});
+    read(_dlf->bytes().subspan(versionReport().size()), versionReport().size(), RecordReader::Origin::Dlf,
+         formatted("entry %lu", _dlfEntry), take);
 }
 
-void Snapshot::scan(Bytes bytes, std::uint64_t from, bool isDlf, const std::string& place,
+void Snapshot::read(Bytes bytes, std::uint64_t from, RecordReader::Origin origin, const std::string& place,
                     const std::function<void(Bytes)>& take) const
 {
     ByteWindow window(bytes);
-    const auto tell = [&](const Fault& fault) {
-        _tell({fault.offset + from, fault.size, formatted("%s: %s", place, fault.reason)});
+    const auto report = [&](const CaptureFault& fault) {
+        _onFault({fault.offset + from, fault.size, formatted("%s: %s", place, fault.reason)});
     };
-    RecordScanner scanner(window, tell, isDlf ? RecordScanner::Origin::Dlf : RecordScanner::Origin::Interval);
-    while (const auto message = scanner.next())
+    RecordReader reader(window, OnDamage::Search, report, origin);
+    while (const auto message = reader.next())
         take(*message);
 }
 

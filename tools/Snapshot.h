@@ -1,8 +1,8 @@
 #pragma once
 
+#include "capture/RecordReader.h"
 #include "support/Record.h"
 #include "support/Value.h"
-#include "tools/MessageScanner.h"
 
 #include <cstdint>
 #include <functional>
@@ -34,8 +34,8 @@ public:
     /// What can be read of a snapshot whose property list is damaged: its raw records. Null when there are none.
     static Value salvaged(Bytes xml);
 
-    /// Throws std::runtime_error when the property list is no snapshot. Whatever else is wrong with it is told.
-    Snapshot(std::string file, const Value& propertyList, MessageScanner::Tell tell);
+    /// Throws std::runtime_error when the property list is no snapshot. Whatever else is wrong with it is reported.
+    Snapshot(std::string file, const Value& propertyList, CaptureReader::OnFault onFault);
 
     const SnapshotListing& listing() const { return _listing; }
     /// The DLF stream as it was written; nothing when there is none.
@@ -48,7 +48,7 @@ public:
     void recover(const PropertyLists& lists, const std::function<void(Bytes)>& take) const;
 
 private:
-    void scan(Bytes bytes, std::uint64_t from, bool isDlf, const std::string& place,
+    void read(Bytes bytes, std::uint64_t from, RecordReader::Origin origin, const std::string& place,
               const std::function<void(Bytes)>& take) const;
 
     SnapshotListing _listing;
@@ -56,7 +56,7 @@ private:
     std::vector<Value> _trees;
     std::optional<Data> _dlf;
     std::size_t _dlfEntry = 0;
-    MessageScanner::Tell _tell;
+    CaptureReader::OnFault _onFault;
 };
 
 } // namespace kestrum

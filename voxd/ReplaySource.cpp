@@ -19,21 +19,22 @@ CaptureFormat formatOf(const std::string& path)
 } // namespace
 
 ReplaySource::ReplaySource(const std::string& path, bool loop, std::string_view technology)
-    : _path(path), _file(path, std::ios::binary), _reader(_file, formatOf(path)), _loop(loop), _technology(technology)
+    : _path(path), _format(formatOf(path)), _file(path, std::ios::binary), _loop(loop), _technology(technology)
 {
     // A directory opens, but cannot be read.
     if (!_file || (_file.peek(), _file.bad()))
         throw std::runtime_error(path + ": cannot be read");
+    rewind();
     bool empty = true;
     while (_technology.empty()) {
-        const auto message = _reader.next();
+        const auto message = _reader->next();
         if (!message)
             break;
         empty = false;
         _technology = technologyOf(*message).value_or(std::string_view());
     }
-    if (_technology.empty() && !fault().empty())
-        throw std::runtime_error(fault());
+    if (_technology.empty() && !_fault.empty())
+        throw std::runtime_error(_fault);
     if (_technology.empty())
         throw std::runtime_error(path + (empty ? ": holds no message" : ": no message tells its technology"));
     rewind();
@@ -41,30 +42,27 @@ ReplaySource::ReplaySource(const std::string& path, bool loop, std::string_view 
 
 std::optional<Source::Message> ReplaySource::next()
 {
-    auto message = _reader.next();
-    if (!message && _loop && _last && _reader.fault().empty()) {
+    auto message = _reader->next();
+    if (!message && _loop && _last && _fault.empty()) {
         rewind();
-        message = _reader.next();
+        message = _reader->next();
     }
     if (!message)
         return std::nullopt;
     _technology = technologyOf(*message).value_or(_technology);
     _last = _last.value_or(std::chrono::microseconds(0)) + gapBefore(*message);
-    return Message{*_last, *std::move(message)};
-}
-
-std::string ReplaySource::fault() const
-{
-    if (_reader.fault().empty())
-        return {};
-    return formatted("%s: at offset %lu: %s", _path, _reader.offset(), _reader.fault());
+    return Message{*_last, {message->begin(), message->end()}};
 }
 
 void ReplaySource::rewind()
 {
     _file.clear();
     _file.seekg(0);
-    _reader = CaptureReader(_file, formatOf(_path));
+    _window = std::make_unique<ByteWindow>(_file);
+    _fault.clear();
+    _reader = CaptureReader::make(_format, *_window, OnDamage::Stop, [this](const CaptureFault& fault) {
+        _fault = formatted("%s: at offset %lu: %s", _path, fault.offset, fault.reason);
+    });
     _lastStamp.reset();
 }
 

@@ -1,9 +1,10 @@
 #pragma once
 
+#include "capture/CaptureReader.h"
 #include "voxd/Source.h"
-#include "voxd/capture/Capture.h"
 
 #include <fstream>
+#include <memory>
 #include <string>
 
 namespace kestrum {
@@ -19,20 +20,25 @@ public:
     /// Opens the capture and finds its technology. Throws std::runtime_error, with what is wrong, when it cannot be
     /// read, is empty, or has nothing that tells its technology (then `technology`, when given, is taken).
     ReplaySource(const std::string& path, bool loop, std::string_view technology = {});
+    ReplaySource(const ReplaySource&) = delete;
+    ReplaySource& operator=(const ReplaySource&) = delete;
 
     std::optional<Message> next() override;
     std::string_view technology() const override { return _technology; }
 
-    /// Why the capture ended before its end, with file and offset; empty otherwise.
-    std::string fault() const;
+    /// Why the capture could not be read to its end, with file and offset; empty otherwise.
+    const std::string& fault() const { return _fault; }
 
 private:
     void rewind();
     std::chrono::microseconds gapBefore(Bytes message);
 
     std::string _path;
+    CaptureFormat _format;
     std::ifstream _file;
-    CaptureReader _reader;
+    std::unique_ptr<ByteWindow> _window;
+    std::unique_ptr<CaptureReader> _reader;
+    std::string _fault;
     bool _loop;
     std::string_view _technology;
     std::optional<std::chrono::microseconds> _last; // offset of the message given last

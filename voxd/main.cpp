@@ -1,3 +1,4 @@
+#include "capture/CaptureWriter.h"
 #include "platform/linux/LinuxClock.h"
 #include "platform/linux/LinuxSystemLog.h"
 #include "platform/linux/RuntimeDirectory.h"
@@ -7,7 +8,6 @@
 #include "voxd/Faults.h"
 #include "voxd/ReplaySource.h"
 #include "voxd/Service.h"
-#include "voxd/capture/Capture.h"
 #include "voxd/scenarios/Scenario.h"
 
 #include <CLI/CLI.hpp>
@@ -69,8 +69,9 @@ void writeCapture(Source& source, const Options& options)
 {
     auto file = openForWriting(options.write);
     const std::chrono::duration<double> end(options.seconds);
+    const auto sink = sinkTo(file);
     for (auto message = source.next(); message && message->at < end; message = source.next())
-        writeKcap(file, message->bytes);
+        writeKcap(sink, message->bytes);
     if (!file.flush())
         throw std::runtime_error(options.write + ": cannot be written to its end");
 }
@@ -101,8 +102,8 @@ int serve(QCoreApplication& application, const Options& options)
         }
     };
     Service service(settings, unsteady ? *unsteady : *source, lists, log,
-                    {.streamed = [&](Bytes message) { recorded([&] { writeKcap(record, message); }); },
-                     .dropped = [&](std::uint64_t count) { recorded([&] { writeKcapGap(record, count); }); }});
+                    {.streamed = [&](Bytes message) { recorded([&] { writeKcap(sinkTo(record), message); }); },
+                     .dropped = [&](std::uint64_t count) { recorded([&] { writeKcapGap(sinkTo(record), count); }); }});
     service.sourceEnded = [&] {
         const auto* const replay = dynamic_cast<const ReplaySource*>(source.get());
         if (replay != nullptr && !replay->fault().empty())

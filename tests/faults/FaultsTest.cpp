@@ -1,3 +1,4 @@
+#include "capture/CaptureWriter.h"
 #include "doubles/FileContents.h"
 #include "doubles/Places.h"
 #include "doubles/QtTestToolkit.h"
@@ -8,7 +9,6 @@
 #include "terminal/Demonstration.h"
 #include "terminal/Pseudoterminal.h"
 #include "ui/KestrumApp.h"
-#include "voxd/capture/Capture.h"
 
 #include <QApplication>
 #include <QKeyEvent>
@@ -41,7 +41,7 @@ public:
         std::filesystem::permissions(directory / "run", std::filesystem::perms::owner_all);
         std::ofstream capture(directory / "beats.kcap", std::ios::binary);
         for (int beat = 0; beat < 5000; ++beat)
-            writeKcap(capture,
+            writeKcap(sinkTo(capture),
                       bytesOf(propertyList(text("_sorted", "_sorted") +
                                            dictionary("0;Serving Cell", text("PCI", "101") + text("RSRP", "-97")) +
                                            text("1;Beat", std::to_string(beat)) + text("2;State", "camped") +

@@ -1,6 +1,6 @@
 #include "tools/Decoding.h"
-#include "Messages.h"
 #include "Tool.h"
+#include "capture/Messages.h"
 #include "platform/TelephonyService.h"
 #include "platform/linux/LinuxBundle.h"
 #include "platform/propertylist/PropertyListCodec.h"

@@ -1,15 +1,13 @@
-#include "Messages.h"
 #include "Tool.h"
+#include "capture/Messages.h"
 #include "doubles/Places.h"
 #include "doubles/ScratchDirectory.h"
-#include "voxd/capture/Capture.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <filesystem>
-#include <sstream>
 #include <sys/resource.h>
 
 namespace kestrum {
@@ -139,9 +137,7 @@ TEST_F(ProgramTest, MessagesBeforeTheOneThatTellsAreDecodedToo)
 
 TEST_F(ProgramTest, StatisticsCountTheMessagesThatARecordingNotesAsMissing)
 {
-    std::ostringstream note;
-    writeKcapGap(note, 17);
-    const auto ran = run({"--stats", capture(kcap(antennas(1)) + note.str() + kcap(antennas(2)) + note.str())});
+    const auto ran = run({"--stats", capture(kcap(antennas(1)) + note(17) + kcap(antennas(2)) + note(17))});
     EXPECT_EQ(ran.status, 0);
     EXPECT_THAT(ran.remarks, HasSubstr("total              2"));
     EXPECT_THAT(ran.remarks, EndsWith("bytes skipped: 0\nmessages missing: 34\n"));

@@ -1,12 +1,11 @@
 #include "tools/Snapshot.h"
-#include "Messages.h"
 #include "Tool.h"
+#include "capture/Messages.h"
 #include "doubles/DecodingDoubles.h"
 #include "doubles/ScratchDirectory.h"
 #include "platform/linux/LinuxBundle.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "tools/Decoding.h"
-#include "voxd/capture/Capture.h"
 #include "voxd/scenarios/Scenario.h"
 
 #include <gmock/gmock.h>
@@ -74,7 +73,8 @@ Recovered recovered(const Value& snapshot)
     LinuxBundle bundle({inCheckout("resources")});
     PropertyListCodec codec;
     Recovered result;
-    const Snapshot opened("a.kestrum", snapshot, [&](const Fault& fault) { result.faults.push_back(fault.reason); });
+    const Snapshot opened("a.kestrum", snapshot,
+                          [&](const CaptureFault& fault) { result.faults.push_back(fault.reason); });
     Decoding decoding({}, bundle, codec, nullptr, nullptr);
     opened.recover(codec, [&](Bytes message) {
         result.messages.emplace_back(textOf(message));

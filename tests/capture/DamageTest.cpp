@@ -1,8 +1,8 @@
-#include "Messages.h"
-#include "Tool.h"
-#include "tools/KcapScanner.h"
-#include "tools/RecordScanner.h"
-#include "voxd/capture/Capture.h"
+#include "capture/KcapReader.h"
+#include "capture/Messages.h"
+#include "capture/RecordReader.h"
+#include "doubles/FileContents.h"
+#include "doubles/Places.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -10,7 +10,6 @@
 
 #include <ctime>
 #include <random>
-#include <sstream>
 #include <tuple>
 
 namespace kestrum {
@@ -20,51 +19,42 @@ using namespace std::string_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
+using testing::StartsWith;
 
 struct Scanned {
     std::vector<std::string> messages;
-    std::vector<Fault> faults;
+    std::vector<CaptureFault> faults;
     std::uint64_t lost = 0;
     std::uint64_t missing = 0; ///< by the recording's notes
 };
 
-Scanned drained(MessageScanner& scanner)
+template <typename Reader, typename... Origin>
+Scanned scanned(const std::string& stream, Origin... origin)
 {
+    ByteWindow window(bytesOf(stream));
     Scanned result;
-    while (const auto message = scanner.next())
+    const auto report = [&](const CaptureFault& fault) {
+        result.faults.push_back(fault);
+        result.lost += fault.size;
+    };
+    Reader reader(window, OnDamage::Search, report, origin...);
+    while (const auto message = reader.next())
         result.messages.emplace_back(textOf(*message));
-    result.missing = scanner.missing();
+    result.missing = reader.missing();
     return result;
 }
 
-template <typename... Origin>
-struct Scan {
-    template <typename Scanner>
-    static Scanned as(const std::string& stream, Origin... origin)
-    {
-        ByteWindow window(bytesOf(stream));
-        std::vector<Fault> faults;
-        Scanner scanner(
-            window, [&](const Fault& fault) { faults.push_back(fault); }, origin...);
-        Scanned result = drained(scanner);
-        for (const auto& fault : faults)
-            result.lost += fault.size;
-        result.faults = faults;
-        return result;
-    }
-};
-
 Scanned scanKcap(const std::string& stream)
 {
-    return Scan<>::as<KcapScanner>(stream);
+    return scanned<KcapReader>(stream);
 }
 Scanned scanDlf(const std::string& stream)
 {
-    return Scan<RecordScanner::Origin>::as<RecordScanner>(stream, RecordScanner::Origin::Dlf);
+    return scanned<RecordReader>(stream, RecordReader::Origin::Dlf);
 }
 Scanned scanInterval(const std::string& stream)
 {
-    return Scan<RecordScanner::Origin>::as<RecordScanner>(stream, RecordScanner::Origin::Interval);
+    return scanned<RecordReader>(stream, RecordReader::Origin::Interval);
 }
 
 const std::string kFirst = message(0xB0C1, "first payload");
@@ -72,7 +62,7 @@ const std::string kSecond = message(0xB0C2, "second", kStamp + (100ull << 16));
 const std::string kThird = message(0xB17F, "the third one", kStamp + (200ull << 16));
 const std::string kXml = "<?xml version=\"1.0\"?><plist version=\"1.0\"><array/></plist>\n";
 
-TEST(KcapScanner, GivesMessagesAsTheyTravelled)
+TEST(KcapSearch, GivesMessagesAsTheyTravelled)
 {
     const auto prefixed = "\x81\x07"s + kSecond;
     const auto list = message(0, kXml, kStamp, 0xFF);
@@ -81,7 +71,7 @@ TEST(KcapScanner, GivesMessagesAsTheyTravelled)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(KcapScanner, GivesFragmentsAndUnknownTypesThatStandInOrder)
+TEST(KcapSearch, GivesFragmentsAndUnknownTypesThatStandInOrder)
 {
     const auto odd = message(0xB0C1, "odd", kStamp, 2);
     const auto got = scanKcap(kcap("abc") + kcap("") + kcap(kFirst) + kcap(odd) + kcap("x"));
@@ -89,7 +79,7 @@ TEST(KcapScanner, GivesFragmentsAndUnknownTypesThatStandInOrder)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(KcapScanner, FindsTheNextMessageBehindADamagedLength)
+TEST(KcapSearch, FindsTheNextMessageBehindADamagedLength)
 {
     const auto got = scanKcap(kcap(kFirst) + "\xFF\xFF\xFF\x7F" + kSecond + kcap(kThird));
     EXPECT_THAT(got.messages, ElementsAre(kFirst, kThird));
@@ -99,14 +89,14 @@ TEST(KcapScanner, FindsTheNextMessageBehindADamagedLength)
     EXPECT_EQ(got.faults[0].reason, "a message of 2147483647 bytes, allowed are 16777216");
 }
 
-TEST(KcapScanner, DoesNotTrustALengthBehindWhichNothingBegins)
+TEST(KcapSearch, DoesNotTrustALengthBehindWhichNothingBegins)
 {
     const auto got = scanKcap(littleEndian(kSecond.size() + 9, 4) + kSecond + kcap(kThird) + kcap(kFirst));
     EXPECT_THAT(got.messages, ElementsAre(kThird, kFirst));
     EXPECT_EQ(got.lost, kcap(kSecond).size());
 }
 
-TEST(KcapScanner, TellsOfALastMessageThatIsCutShort)
+TEST(KcapSearch, TellsOfALastMessageThatIsCutShort)
 {
     const auto whole = kcap(kFirst) + kcap(kSecond);
     const auto got = scanKcap(whole.substr(0, whole.size() - 3));
@@ -116,7 +106,9 @@ TEST(KcapScanner, TellsOfALastMessageThatIsCutShort)
     EXPECT_EQ(got.faults[0].size, kcap(kSecond).size() - 3);
 }
 
-TEST(KcapScanner, WaitsForTheRestWhileTheInputMayGrow)
+class GrowingCapture : public testing::TestWithParam<OnDamage> {};
+
+TEST_P(GrowingCapture, IsWaitedForWhereAMessageIsIncomplete)
 {
     const auto whole = kcap(kFirst);
     std::string there = whole.substr(0, 9);
@@ -126,24 +118,29 @@ TEST(KcapScanner, WaitsForTheRestWhileTheInputMayGrow)
         read += count;
         return count;
     });
-    KcapScanner scanner(window, [](const Fault&) { FAIL() << "nothing is wrong"; });
-    EXPECT_FALSE(scanner.next(true));
+    KcapReader reader(window, GetParam(), [](const CaptureFault&) { FAIL() << "nothing is wrong"; });
+    EXPECT_FALSE(reader.next(true));
     there = whole;
     window.resume();
-    const auto message = scanner.next(true);
+    const auto message = reader.next(true);
     ASSERT_TRUE(message);
     EXPECT_EQ(textOf(*message), kFirst);
-    EXPECT_FALSE(scanner.next(true));
+    EXPECT_FALSE(reader.next(true));
 }
 
-TEST(DlfScanner, PutsTheTypeByteBeforeEachRecord)
+INSTANTIATE_TEST_SUITE_P(Capture, GrowingCapture, testing::Values(OnDamage::Stop, OnDamage::Search),
+                         [](const auto& each) {
+                             return each.param == OnDamage::Stop ? "StoppingAtDamage" : "SearchingBehindDamage";
+                         });
+
+TEST(DlfSearch, PutsTheTypeByteBeforeEachRecord)
 {
     const auto got = scanDlf(kFirst.substr(1) + kSecond.substr(1) + kThird.substr(1));
     EXPECT_THAT(got.messages, ElementsAre(kFirst, kSecond, kThird));
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(DlfScanner, ReadsWhatASnapshotLeavesOfItsIntervals)
+TEST(DlfSearch, ReadsWhatASnapshotLeavesOfItsIntervals)
 {
     const auto prefixed = "\x81\x07"s + kSecond;
     const auto list = message(1, kXml, kStamp, 0xFF);
@@ -155,7 +152,7 @@ TEST(DlfScanner, ReadsWhatASnapshotLeavesOfItsIntervals)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(DlfScanner, FollowsALogWhoseTimeJumps)
+TEST(DlfSearch, FollowsALogWhoseTimeJumps)
 {
     const auto later = kStamp + (9'000'000'000ull << 16);
     const auto got = scanDlf(dlf(0xB0C1, "a") + dlf(0xB0C2, "b", later) + dlf(0xB0C1, "c", later));
@@ -163,13 +160,13 @@ TEST(DlfScanner, FollowsALogWhoseTimeJumps)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(DlfScanner, TakesRecordsWithoutTimeStamp)
+TEST(DlfSearch, TakesRecordsWithoutTimeStamp)
 {
     const auto got = scanDlf(dlf(0xB0C1, "a", 0) + dlf(0xB0C2, "b", 0) + dlf(0xB0C1, "c", 0));
     EXPECT_THAT(got.messages, ElementsAre(message(0xB0C1, "a", 0), message(0xB0C2, "b", 0), message(0xB0C1, "c", 0)));
 }
 
-TEST(DlfScanner, SkipsWhatIsNoRecord)
+TEST(DlfSearch, SkipsWhatIsNoRecord)
 {
     const auto got = scanDlf(kFirst.substr(1) + std::string(40, '#') + kSecond.substr(1) + kThird.substr(1));
     EXPECT_EQ(got.messages.size(), 3u);
@@ -177,7 +174,7 @@ TEST(DlfScanner, SkipsWhatIsNoRecord)
     EXPECT_FALSE(got.faults.empty());
 }
 
-TEST(DlfScanner, TellsOfALastRecordThatIsCutShort)
+TEST(DlfSearch, TellsOfALastRecordThatIsCutShort)
 {
     const auto whole = kFirst.substr(1) + kSecond.substr(1);
     const auto got = scanDlf(whole.substr(0, whole.size() - 2));
@@ -187,7 +184,7 @@ TEST(DlfScanner, TellsOfALastRecordThatIsCutShort)
     EXPECT_EQ(got.faults[0].offset, kFirst.size() - 1);
 }
 
-TEST(IntervalScanner, SplitsMessagesThatBearTheirTypes)
+TEST(IntervalSearch, SplitsMessagesThatBearTheirTypes)
 {
     const auto prefixed = "\x81\x07"s + kSecond;
     const auto odd = message(0x1183, "odd", kStamp, 2);
@@ -214,12 +211,12 @@ TEST_P(LyingLength, GivesWayToWhatFollows)
     EXPECT_EQ(got.lost, 0u);
 }
 
-INSTANTIATE_TEST_SUITE_P(IntervalScanner, LyingLength,
+INSTANTIATE_TEST_SUITE_P(IntervalSearch, LyingLength,
                          testing::Values(Lie{"CountsTheTypeByte", 1}, Lie{"TooLong", 5}, Lie{"MuchTooLong", 40'000},
                                          Lie{"TooShort", -4}),
                          [](const auto& each) { return std::string(each.param.name); });
 
-TEST(IntervalScanner, TakesAListThatIsLongerThanItsRecordCanCount)
+TEST(IntervalSearch, TakesAListThatIsLongerThanItsRecordCanCount)
 {
     auto list = kXml;
     list.insert(list.find("<array/>"), "<!--" + std::string(70'000, ' ') + "-->");
@@ -228,7 +225,7 @@ TEST(IntervalScanner, TakesAListThatIsLongerThanItsRecordCanCount)
     EXPECT_THAT(got.messages, ElementsAre(kFirst, service, kSecond));
 }
 
-TEST(IntervalScanner, AccountsForEveryByteThatIsNoMessage)
+TEST(IntervalSearch, AccountsForEveryByteThatIsNoMessage)
 {
     const auto got = scanInterval(kFirst + "fragment" + kSecond);
     EXPECT_EQ(got.messages.back(), kSecond);
@@ -315,14 +312,14 @@ std::string records(int count, std::uint64_t first, bool withTypes)
     return stream;
 }
 
-TEST(DlfScanner, TakesTheRecordsOfAModemThatHasNotHeardOfTheTime)
+TEST(DlfSearch, TakesTheRecordsOfAModemThatHasNotHeardOfTheTime)
 {
     const auto got = scanDlf(records(400, kSwitchedOn, false));
     EXPECT_THAT(got.messages, SizeIs(400));
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(DlfScanner, TakesARecordOf1980AmongOthers)
+TEST(DlfSearch, TakesARecordOf1980AmongOthers)
 {
     const auto odd = dlf(0xB0C1, "clock not set yet", kSwitchedOn);
     const auto got = scanDlf(odd + records(30, kStamp, false) + odd + odd + records(30, kStamp, false) + odd);
@@ -330,7 +327,7 @@ TEST(DlfScanner, TakesARecordOf1980AmongOthers)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(DlfScanner, ReadsAnIntervalOfAModemThatHasNotHeardOfTheTime)
+TEST(DlfSearch, ReadsAnIntervalOfAModemThatHasNotHeardOfTheTime)
 {
     const auto interval = records(40, kSwitchedOn, true);
     const auto got = scanDlf(interval.substr(1) + interval.substr(1));
@@ -340,7 +337,7 @@ TEST(DlfScanner, ReadsAnIntervalOfAModemThatHasNotHeardOfTheTime)
     EXPECT_THAT(scanInterval(interval).faults, IsEmpty());
 }
 
-TEST(KcapScanner, GivesAMessageThatHoldsACaptureInOnePiece)
+TEST(KcapSearch, GivesAMessageThatHoldsACaptureInOnePiece)
 {
     const auto holding = "a file: " + kcap(kFirst) + kcap(kSecond);
     const auto got = scanKcap(kcap(holding) + kcap(holding) + kcap("ab") + kcap(""));
@@ -348,16 +345,17 @@ TEST(KcapScanner, GivesAMessageThatHoldsACaptureInOnePiece)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(KcapScanner, KeepsOddMessagesBeforeACutEnd)
+TEST(KcapSearch, KeepsOddMessagesBeforeACutEnd)
 {
     const auto got = scanKcap(kcap("odd") + kcap("") + kcap("odder") + kcap(kFirst).substr(0, 20));
     EXPECT_THAT(got.messages, ElementsAre("odd", "", "odder"));
     EXPECT_THAT(got.faults, SizeIs(1));
 }
 
-TEST(KcapScanner, FindsABinaryPropertyListBehindDamage)
+TEST(KcapSearch, FindsABinaryPropertyListBehindDamage)
 {
     const auto list = contentsOf(inCheckout("fuzz/corpus/propertylist/all.bplist"));
+    ASSERT_THAT(list, StartsWith("bplist"));
     const auto got = scanKcap(kcap(kFirst) + "\xFF\xFF\xFF\xFFgarbage" + kcap(list) + kcap(list));
     EXPECT_THAT(got.messages, ElementsAre(kFirst, list, list));
 }
@@ -524,13 +522,6 @@ TEST(HostileStreams, OfServiceRecordsWhoseListsNeverEndAreScannedInLinearTime)
 }
 
 // Notes of missing messages.
-
-std::string note(std::uint64_t missing)
-{
-    std::ostringstream file;
-    writeKcapGap(file, missing);
-    return file.str();
-}
 
 TEST(KcapNotes, AreCountedAndAreNoMessages)
 {

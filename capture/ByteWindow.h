@@ -4,28 +4,31 @@
 
 #include <cstdint>
 #include <functional>
+#include <istream>
 #include <span>
 #include <vector>
 
 namespace kestrum {
 
-/// What is still to be read of a file, a pipe or memory, seen from its beginning. Holds as much as is looked at.
+/// The unread rest of a file, a pipe or memory. Holds only as much of it as is looked at.
 class ByteWindow {
 public:
-    /// Reads some bytes, blocking if need be; 0 when there are none (for now).
+    /// Reads some bytes, waiting for them where it must; 0 at the (present) end.
     using Read = std::function<std::size_t(std::span<std::byte>)>;
 
     explicit ByteWindow(Read read) : _read(std::move(read)) {}
-    /// Of bytes that outlive it.
+    /// The stream outlives the window.
+    explicit ByteWindow(std::istream& stream);
+    /// The bytes outlive the window.
     explicit ByteWindow(Bytes bytes);
 
-    /// All that is at hand, at least `count` bytes unless the input ends before; valid until the next call.
+    /// All bytes held, at least `count` unless the input ends before; valid until the next call.
     Bytes peek(std::size_t count);
-    /// `count` is not above what was peeked.
+    /// `count` is at most what was peeked.
     void skip(std::size_t count);
     /// Where in the input the window begins.
     std::uint64_t offset() const { return _offset; }
-    /// An end that was met need not be one any more.
+    /// Reads again where the input had ended: it may have grown.
     void resume() { _ended = false; }
 
 private:

@@ -1,8 +1,7 @@
-#include "tools/KcapScanner.h"
+#include "capture/KcapReader.h"
 
 #include "platform/ChannelMessage.h"
 #include "support/Format.h"
-#include "voxd/capture/Capture.h"
 
 #include <algorithm>
 
@@ -13,8 +12,8 @@ constexpr std::size_t kLengthSize = 4;
 constexpr std::size_t kHead = kLengthSize + ChannelMessage::kPrefixSize + ChannelMessage::kHeaderSize + 5;
 constexpr Field kRecordLength = u16(1);
 
-// How far lengths are followed ahead of a message that does not prove itself. Lengths that are none lead to one that
-// cannot be long before.
+// How far lengths are followed ahead of a message whose contents do not agree with its length. Arbitrary bytes taken
+// for lengths lead to an impossible one much sooner.
 constexpr std::size_t kLookAhead = 1 << 20;
 
 bool endsAsXml(Bytes list)
@@ -33,7 +32,7 @@ bool endsAsBinary(Bytes list)
     if (!textOf(list).starts_with("bplist") || list.size() < kTrailer)
         return false;
     const auto trailer = list.last(kTrailer);
-    const auto number = [&](std::size_t at) {
+    const auto number = [&](std::size_t at) { // big-endian
         std::uint64_t value = 0;
         for (const auto each : trailer.subspan(at, 8))
             value = value << 8 | std::to_integer<std::uint64_t>(each);
@@ -48,7 +47,7 @@ bool endsAsPropertyList(Bytes list)
     return isPropertyList(list) && (endsAsXml(list) || endsAsBinary(list));
 }
 
-// Told by the head alone, so that a search need not look at what each would-be message promises.
+// Decided by the head alone, so that a search need not read as far as every supposed length reaches.
 bool maybeBeginsMessage(Bytes head, std::size_t length)
 {
     if (isPropertyList(head))
@@ -76,9 +75,16 @@ bool isSound(Bytes message)
     return payload && endsAsPropertyList(payload->bytes());
 }
 
+/// How many messages are missing; nothing where no whole note stands.
+std::optional<std::uint64_t> gapIn(Bytes bytes)
+{
+    const Record note(bytes);
+    return note.read(u32(0)) == kKcapGap ? note.read64(4) : std::nullopt;
+}
+
 } // namespace
 
-KcapScanner::Look KcapScanner::look(std::size_t at)
+KcapReader::Look KcapReader::look(std::size_t at)
 {
     const Bytes head = _window.peek(at + kHead);
     if (head.size() <= at)
@@ -90,7 +96,7 @@ KcapScanner::Look KcapScanner::look(std::size_t at)
         const bool isWhole = _window.peek(at + kKcapGapSize).size() >= at + kKcapGapSize;
         return {isWhole ? Sound::Yes : Sound::Incomplete, kKcapGapSize};
     }
-    if (*length > CaptureReader::kMaximumMessage)
+    if (*length > kLongestMessage)
         return {Sound::No, *length};
     const std::size_t size = kLengthSize + *length;
     const Bytes all = _window.peek(at + size);
@@ -99,9 +105,9 @@ KcapScanner::Look KcapScanner::look(std::size_t at)
     return {isSound(all.subspan(at + kLengthSize, *length)) ? Sound::Yes : Sound::Perhaps, size};
 }
 
-// Whether the lengths lead on from `at`: to the end, to a message that proves itself, or far enough. Each part of the
-// stream is followed once: the messages on the way share what was found.
-bool KcapScanner::leadsOn(std::size_t at)
+// Whether the lengths lead on from `at`: to the end, to a message whose contents agree, or far enough. Each part of the
+// stream is followed once: the messages on the way share the result.
+bool KcapReader::leadsOn(std::size_t at)
 {
     if (_window.offset() + at <= _followedTo)
         return _leadsOn;
@@ -118,8 +124,7 @@ bool KcapScanner::leadsOn(std::size_t at)
     return _leadsOn;
 }
 
-// Yes: what stands at `at` cannot well be an accident. Incomplete: its rest would have to tell.
-KcapScanner::Sound KcapScanner::proof(std::size_t at)
+KcapReader::Sound KcapReader::proof(std::size_t at)
 {
     const Bytes all = _window.peek(at + kHead);
     const auto head = Record(all).from(at).value_or(Record({})).bytes();
@@ -128,7 +133,7 @@ KcapScanner::Sound KcapScanner::proof(std::size_t at)
         return Sound::Incomplete;
     if (*length == kKcapGap)
         return look(at).sound;
-    if (*length == 0 || *length > CaptureReader::kMaximumMessage)
+    if (*length == 0 || *length > kLongestMessage)
         return Sound::No;
     const Bytes begin = head.subspan(kLengthSize);
     if (begin.size() < std::min<std::size_t>(*length, kHead - kLengthSize))
@@ -139,40 +144,46 @@ KcapScanner::Sound KcapScanner::proof(std::size_t at)
     return sound == Sound::Perhaps && look(at + size).sound == Sound::Yes ? Sound::Yes : sound;
 }
 
-MessageScanner::Candidate KcapScanner::due()
+CaptureReader::Found KcapReader::found(const Look& look)
 {
-    const auto [sound, size] = look(0);
+    const auto [sound, size] = look;
     const std::size_t here = _window.peek(kLengthSize).size();
     if (sound == Sound::No)
-        return {.reason = formatted("a message of %lu bytes, allowed are %lu", size, CaptureReader::kMaximumMessage)};
+        return {.reason = formatted("a message of %lu bytes, allowed are %lu", size, kLongestMessage)};
     if (sound == Sound::Incomplete && size == 0)
         return {.incomplete = true, .reason = formatted("the length has only %lu of its 4 bytes", here)};
     if (sound == Sound::Incomplete)
         return {.incomplete = true, .reason = formatted("the last message ends %lu bytes short", size - here)};
-    if (sound == Sound::Yes || leadsOn(size))
-        return found(size);
-    // There is damage ahead: this length is true unless it hides a message.
-    for (std::size_t at = 1; at < size; ++at)
-        if (proof(at) == Sound::Yes)
-            return {.reason = formatted("no message follows the one of %lu bytes", size - kLengthSize)};
-    return {.size = size};
+    return {.size = size, .gap = gapIn(_window.peek(kKcapGapSize))};
 }
 
-MessageScanner::Candidate KcapScanner::chanced()
+CaptureReader::Found KcapReader::byLength()
+{
+    return found(look(0));
+}
+
+CaptureReader::Found KcapReader::inOrder()
+{
+    const auto here = look(0);
+    if (here.sound != Sound::Perhaps || leadsOn(here.size))
+        return found(here);
+    // There is damage ahead: this length is true unless it hides a message.
+    for (std::size_t at = 1; at < here.size; ++at)
+        if (proof(at) == Sound::Yes)
+            return {.reason = formatted("no message follows the one of %lu bytes", here.size - kLengthSize)};
+    return found(here);
+}
+
+CaptureReader::Found KcapReader::behindDamage()
 {
     const Sound sound = proof(0);
     if (sound != Sound::Yes)
         return {.incomplete = sound == Sound::Incomplete};
     _followedTo = 0;
-    return found(look(0).size);
+    return found(look(0));
 }
 
-MessageScanner::Candidate KcapScanner::found(std::size_t size)
-{
-    return {.size = size, .gap = kcapGap(_window.peek(kKcapGapSize))};
-}
-
-Bytes KcapScanner::message(std::size_t size)
+Bytes KcapReader::message(std::size_t size)
 {
     return _window.peek(size).subspan(kLengthSize, size - kLengthSize);
 }

@@ -1,7 +1,6 @@
-#include "tools/ByteWindow.h"
+#include "capture/ByteWindow.h"
 
 #include <algorithm>
-#include <cstring>
 
 namespace kestrum {
 namespace {
@@ -9,6 +8,13 @@ namespace {
 constexpr std::size_t kChunk = 256 << 10;
 
 } // namespace
+
+ByteWindow::ByteWindow(std::istream& stream)
+    : ByteWindow([&stream](std::span<std::byte> into) {
+          stream.read(reinterpret_cast<char*>(into.data()), static_cast<std::streamsize>(into.size()));
+          return static_cast<std::size_t>(stream.gcount());
+      })
+{}
 
 ByteWindow::ByteWindow(Bytes bytes)
     : ByteWindow([rest = bytes](std::span<std::byte> into) mutable {
@@ -22,7 +28,7 @@ ByteWindow::ByteWindow(Bytes bytes)
 Bytes ByteWindow::peek(std::size_t count)
 {
     while (_end - _begin < count && !_ended) {
-        // What lies before the window gives way when it is as long as the rest: each byte moves once on average.
+        // Bytes before the window are dropped once they are as many as those in it: each byte moves once on average.
         if (_begin >= _end - _begin) {
             std::copy(_held.begin() + static_cast<std::ptrdiff_t>(_begin),
                       _held.begin() + static_cast<std::ptrdiff_t>(_end), _held.begin());
