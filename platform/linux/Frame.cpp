@@ -1,38 +1,30 @@
 #include "platform/linux/Frame.h"
 
+#include "support/FieldWriter.h"
 #include "support/Format.h"
 
 #include <algorithm>
+#include <array>
 #include <cstring>
 
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kLengthSize = 4; // the length counts what follows it
-
-void append(std::vector<std::byte>& to, std::uint32_t number)
-{
-    for (unsigned shift = 0; shift < 32; shift += 8)
-        to.push_back(static_cast<std::byte>(number >> shift));
-}
-
-std::uint32_t number(const std::byte* at)
-{
-    std::uint32_t word = 0;
-    for (std::size_t i = 4; i-- > 0;)
-        word = (word << 8) | std::to_integer<std::uint32_t>(at[i]);
-    return word;
-}
+constexpr Field kLength = u32(0), kKind = u8(4), kMessageId = u32(5), kSerial = u32(9);
+constexpr std::size_t kLengthSize = kLength.end(); // the length counts what follows it
 
 } // namespace
 
 void appendFrame(std::vector<std::byte>& to, const Frame& frame)
 {
+    std::array<std::byte, kFrameHeader> header{};
+    FieldWriter(header)
+        .set(kLength, static_cast<std::int64_t>(kFrameHeader - kLengthSize + frame.payload.size()))
+        .set(kKind, static_cast<std::int64_t>(frame.kind))
+        .set(kMessageId, frame.messageId)
+        .set(kSerial, frame.serial);
     to.reserve(to.size() + kFrameHeader + frame.payload.size());
-    append(to, static_cast<std::uint32_t>(kFrameHeader - kLengthSize + frame.payload.size()));
-    to.push_back(static_cast<std::byte>(frame.kind));
-    append(to, static_cast<std::uint32_t>(frame.messageId));
-    append(to, frame.serial);
+    to.insert(to.end(), header.begin(), header.end());
     to.insert(to.end(), frame.payload.begin(), frame.payload.end());
 }
 
@@ -52,25 +44,27 @@ std::span<std::byte> FrameReader::room(std::size_t least)
 
 std::optional<Frame> FrameReader::next()
 {
-    if (!_fault.empty() || _end - _begin < kLengthSize)
+    const Record rest(Bytes(_buffer).subspan(_begin, _end - _begin));
+    const std::size_t length = rest.read(kLength).value_or(0);
+    if (!_fault.empty() || rest.size() < kLengthSize)
         return std::nullopt;
-    const std::byte* const at = _buffer.data() + _begin;
-    const std::size_t length = number(at);
-    // Judged as soon as it is there, lest a peer have us wait for bytes that mean nothing.
+    // Judged at once, so that no peer makes us wait for bytes that mean nothing.
     if (length < kFrameHeader - kLengthSize || length > kFrameHeader - kLengthSize + kMaximumPayload) {
         _fault = formatted("a frame of %lu bytes, allowed are %lu to %lu", length, kFrameHeader - kLengthSize,
                            kFrameHeader - kLengthSize + kMaximumPayload);
         return std::nullopt;
     }
-    if (_end - _begin > kLengthSize && (at[4] < std::byte{1} || at[4] > std::byte{3})) {
-        _fault = formatted("a frame of the unknown kind %u", std::to_integer<unsigned>(at[4]));
+    const auto kind = rest.read(kKind);
+    if (kind && (*kind < 1 || *kind > 3)) {
+        _fault = formatted("a frame of the unknown kind %u", *kind);
         return std::nullopt;
     }
-    if (_end - _begin < kLengthSize + length)
+    const auto frame = rest.slice(0, kLengthSize + length);
+    if (!frame)
         return std::nullopt;
-    _begin += kLengthSize + length;
-    return Frame{static_cast<Frame::Kind>(at[4]), static_cast<std::int32_t>(number(at + 5)), number(at + 9),
-                 Bytes(at + kFrameHeader, length - (kFrameHeader - kLengthSize))};
+    _begin += frame->size();
+    return Frame{static_cast<Frame::Kind>(*kind), static_cast<std::int32_t>(*frame->read(kMessageId)),
+                 *frame->read(kSerial), frame->bytes().subspan(kFrameHeader)};
 }
 
 } // namespace kestrum
