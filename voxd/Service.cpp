@@ -55,12 +55,12 @@ Service::Service(Settings settings, Source& source, const PropertyLists& lists, 
 
 Service::~Service() = default;
 
-std::string Service::start()
+std::optional<Problem> Service::start()
 {
-    if (auto wrong = secureRuntimeDirectory(_settings.directory); !wrong.empty())
-        return wrong;
-    if (auto wrong = _listener.listen(_settings.directory + "/" + std::string(vox::kServerPort)); !wrong.empty())
-        return wrong;
+    if (auto problem = secureRuntimeDirectory(_settings.directory))
+        return problem;
+    if (auto problem = _listener.listen(_settings.directory + "/" + std::string(vox::kServerPort)))
+        return problem;
     removeStaleSockets(_settings.directory, kCommandPorts);
     return {};
 }
@@ -126,8 +126,8 @@ LogChannelAnswer Service::openChannel(std::string_view address, std::unique_ptr<
         return refuse(address, vox::kTooManyChannels, "too many channels");
     const auto name = formatted("%s%d.%u", kCommandPorts, ::getpid(), ++_lastChannel);
     auto channel = std::make_unique<ServiceChannel>(_host, std::move(logPort));
-    if (const auto wrong = channel->listen(_settings.directory + "/" + name); !wrong.empty())
-        return refuse(address, vox::kNoReceiver, wrong);
+    if (const auto problem = channel->listen(_settings.directory + "/" + name))
+        return refuse(address, vox::kNoReceiver, problem->text);
     _channels.push_back(std::move(channel));
     _toldRefusals.clear();
     return {0, 0, name};

@@ -42,8 +42,7 @@ public:
     Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log, Witness witness);
     ~Service();
 
-    /// Empty on success, else what is wrong.
-    std::string start();
+    std::optional<Problem> start();
 
     /// Runs once when the source has ended and its last message has gone out.
     std::function<void()> sourceEnded;

@@ -39,7 +39,7 @@ ServiceChannel::~ServiceChannel()
                         _outbox.dropped() - _reportedDrops);
 }
 
-std::string ServiceChannel::listen(const std::string& path)
+std::optional<Problem> ServiceChannel::listen(const std::string& path)
 {
     _name = std::filesystem::path(path).filename().string();
     _commandTimeout.start(kCommandTimeout);

@@ -43,8 +43,8 @@ public:
     ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort, std::size_t heldBytes = kHeldBytes);
     ~ServiceChannel();
 
-    /// Listens for the client's commands. Empty on success, else what is wrong.
-    std::string listen(const std::string& path);
+    /// Listens for the client's commands.
+    std::optional<Problem> listen(const std::string& path);
 
     bool isStreaming() const { return _subscription.has_value(); }
     /// Sends the message when the client has asked for it, or holds it back.

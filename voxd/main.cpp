@@ -111,8 +111,8 @@ int serve(QCoreApplication& application, const Options& options)
         else
             log.write(Priority::Notice, "the log has ended; clients stay connected");
     };
-    if (const auto wrong = service.start(); !wrong.empty())
-        throw std::runtime_error(wrong);
+    if (const auto problem = service.start())
+        throw std::runtime_error(problem->text);
     std::cout << "voxd: serving " << source->technology() << " in " << runtimeDirectory() << std::endl;
     return QCoreApplication::exec();
 }

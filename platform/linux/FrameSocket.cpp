@@ -246,24 +246,24 @@ bool FrameConnection::waitForBytes(milliseconds timeout)
     return timeout.count() > 0 && _socket->waitForReadyRead(static_cast<int>(timeout.count()));
 }
 
-std::string FrameListener::listen(const std::string& path)
+std::optional<Problem> FrameListener::listen(const std::string& path)
 {
     if (path.size() >= sizeof sockaddr_un::sun_path)
-        return formatted("the path %s is too long for a socket (%lu bytes at most)", path,
-                         sizeof sockaddr_un::sun_path - 1);
+        return Problem{formatted("the path %s is too long for a socket (%lu bytes at most)", path,
+                                 sizeof sockaddr_un::sun_path - 1)};
     _name = nameAt(path);
     const auto directory = std::filesystem::path(path).parent_path().string();
     const DirectoryLock lock(directory, kLockTimeout);
     if (!lock.isHeld())
-        return formatted("another process keeps %s locked", directory);
+        return Problem{formatted("another process keeps %s locked", directory)};
     if (isStaleSocket(path))
         ::unlink(path.c_str());
     QObject::connect(&_server, &QLocalServer::newConnection, &_server, [this] { accept(); });
     if (_server.listen(QString::fromStdString(path)))
-        return {};
+        return std::nullopt;
     if (_server.serverError() == QAbstractSocket::AddressInUseError)
-        return formatted("another process listens at %s", path);
-    return formatted("cannot listen at %s: %s", path, _server.errorString().toStdString());
+        return Problem{formatted("another process listens at %s", path)};
+    return Problem{formatted("cannot listen at %s: %s", path, _server.errorString().toStdString())};
 }
 
 void FrameListener::accept()

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/linux/Frame.h"
+#include "support/Problem.h"
 
 #include <QLocalServer>
 #include <QLocalSocket>
@@ -8,6 +9,7 @@
 #include <chrono>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 
 namespace kestrum {
@@ -88,9 +90,9 @@ class FrameListener {
 public:
     explicit FrameListener(SystemLog& log) : _log(log) {}
 
-    /// Listens at the path, from which it removes the socket of a process that has gone. Empty on success, else
-    /// what is wrong; the socket of a process that lives is left alone. Waits up to 1 s for the directory's lock.
-    std::string listen(const std::string& path);
+    /// Listens at the path, from which it removes the socket of a process that has ended; that of a running process
+    /// is left alone. Waits up to 1 s for the directory's lock.
+    std::optional<Problem> listen(const std::string& path);
     /// Stops, and removes the socket.
     void close() { _server.close(); }
 

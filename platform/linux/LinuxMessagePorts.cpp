@@ -252,22 +252,22 @@ LinuxMessagePorts::LinuxMessagePorts(std::string directory, MainQueue& queue, Sy
 
 std::unique_ptr<LocalPort> LinuxMessagePorts::createLocal(std::string_view name, ReceiveHandler handler)
 {
-    const auto failed = [&](const std::string& why) {
-        _problem = why;
-        _log.write(Priority::Error, "Port %s: %s", name, why);
+    const auto failed = [&](Problem problem) {
+        _log.write(Priority::Error, "Port %s: %s", name, problem.text);
+        _problem = std::move(problem);
         return nullptr;
     };
     if (!isPortName(name))
-        return failed("not a name for a port");
-    if (const auto wrong = secureRuntimeDirectory(_directory); !wrong.empty())
-        return failed(wrong);
+        return failed({"not a name for a port"});
+    if (auto problem = secureRuntimeDirectory(_directory))
+        return failed(*std::move(problem));
     removeStaleSockets(_directory, std::string(name) + ".");
     auto receiver = std::make_shared<Receiver>(std::move(handler), _log);
     receiver->listener.accepted = [raw = receiver.get()](auto connection) { raw->take(std::move(connection)); };
     const auto path = _directory + "/" + vox::addressOfPort(name, ::getpid());
-    if (const auto wrong = receiver->listener.listen(path); !wrong.empty())
-        return failed(wrong);
-    _problem.clear();
+    if (auto problem = receiver->listener.listen(path))
+        return failed(*std::move(problem));
+    _problem.reset();
     // Of the listening alone: a receiver that is closed may live on in a task.
     receiver->listening = std::make_shared<int>();
     _listening.insert_or_assign(std::string(name), receiver->listening);

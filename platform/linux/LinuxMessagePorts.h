@@ -1,10 +1,12 @@
 #pragma once
 
 #include "platform/MessagePorts.h"
+#include "support/Problem.h"
 
 #include <functional>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 
 namespace kestrum {
@@ -24,15 +26,15 @@ public:
 
     /// Whether messages can reach a local port of this name.
     bool isListening(std::string_view name) const;
-    /// Why the last local port could not be made; empty when it could.
-    const std::string& problem() const { return _problem; }
+    /// Why the last local port could not be made; nothing when it could.
+    const std::optional<Problem>& problem() const { return _problem; }
 
 private:
     std::string _directory;
     MainQueue& _queue;
     SystemLog& _log;
     std::map<std::string, std::weak_ptr<const void>, std::less<>> _listening; // by name
-    std::string _problem;
+    std::optional<Problem> _problem;
 };
 
 } // namespace kestrum

@@ -66,7 +66,7 @@ private:
 
 std::string ofPorts(const LinuxMessagePorts& ports)
 {
-    return formatted("This display cannot be reached: %s.", ports.problem());
+    return formatted("This display cannot be reached: %s.", ports.problem().value_or(Problem()).text);
 }
 
 std::string inWords(const LogChannelAnswer& answer)
@@ -170,8 +170,8 @@ std::unique_ptr<VoxServerConnection> LinuxTelephonyService::connect(Notification
 {
     auto connection = FrameConnection::connectTo(_directory + "/" + std::string(vox::kServerPort), kTimeout, _log);
     if (!connection) {
-        _problem = !_ports.problem().empty() ? ofPorts(_ports)
-                                             : formatted("No telephony service can be reached in %s.", _directory);
+        _problem =
+            _ports.problem() ? ofPorts(_ports) : formatted("No telephony service can be reached in %s.", _directory);
         return nullptr;
     }
     _problem.clear();

@@ -37,33 +37,34 @@ std::string runtimeDirectory()
     return formatted("/tmp/kestrum-%u", ::getuid());
 }
 
-std::string secureRuntimeDirectory(const std::string& named)
+std::optional<Problem> secureRuntimeDirectory(const std::string& named)
 {
     // With a slash at its end, the name of a link would mean what the link leads to.
     const std::string directory = named.substr(0, named.find_last_not_of('/') + 1);
     if (!directory.starts_with('/'))
-        return formatted("the runtime directory %s is not an absolute path", named);
+        return Problem{formatted("the runtime directory %s is not an absolute path", named)};
     if (directory.size() > longestDirectory())
-        return formatted("the runtime directory %s is too long: %lu bytes, sockets in it leave room for %lu", directory,
-                         directory.size(), longestDirectory());
+        return Problem{formatted("the runtime directory %s is too long: %lu bytes, sockets in it leave room for %lu",
+                                 directory, directory.size(), longestDirectory())};
     std::error_code ignored; // mkdir below tells what is wrong with a parent that could not be made
     std::filesystem::create_directories(std::filesystem::path(directory).parent_path(), ignored);
     const bool made = ::mkdir(directory.c_str(), 0700) == 0;
     if (!made && errno != EEXIST)
-        return formatted("cannot create %s: %s", directory, std::strerror(errno));
+        return Problem{formatted("cannot create %s: %s", directory, std::strerror(errno))};
     struct stat found {};
     // lstat: in a directory that others can write, a link may have been laid.
     if (::lstat(directory.c_str(), &found) != 0)
-        return formatted("cannot look at %s: %s", directory, std::strerror(errno));
+        return Problem{formatted("cannot look at %s: %s", directory, std::strerror(errno))};
     if (!S_ISDIR(found.st_mode))
-        return formatted("%s is no directory", directory);
+        return Problem{formatted("%s is no directory", directory)};
     if (found.st_uid != ::geteuid())
-        return formatted("%s belongs to another user", directory);
+        return Problem{formatted("%s belongs to another user", directory)};
     if (made && ::chmod(directory.c_str(), 0700) == 0) // whatever the umask took away
-        return {};
+        return std::nullopt;
     if (const unsigned mode = found.st_mode & 0777; mode != 0700)
-        return formatted("%s has mode 0%u%u%u, but 0700 is needed", directory, mode >> 6, mode >> 3 & 7, mode & 7);
-    return {};
+        return Problem{
+            formatted("%s has mode 0%u%u%u, but 0700 is needed", directory, mode >> 6, mode >> 3 & 7, mode & 7)};
+    return std::nullopt;
 }
 
 bool isPortName(std::string_view name)

@@ -1,5 +1,8 @@
 #pragma once
 
+#include "support/Problem.h"
+
+#include <optional>
 #include <string>
 #include <string_view>
 
@@ -9,10 +12,10 @@ namespace kestrum {
 /// /tmp/kestrum-<uid>.
 std::string runtimeDirectory();
 
-/// Creates the directory with mode 0700 where there is none. Empty on success, else what is wrong: the path is
-/// relative or leaves no room for a display's socket in it, the directory cannot be made, belongs to another user, is
-/// open to others, or is no directory. The mode of a directory that exists is never changed.
-std::string secureRuntimeDirectory(const std::string& directory);
+/// Creates the directory with mode 0700 where there is none. It is a problem when the path is relative or leaves no
+/// room for a display's socket in it, and when the directory cannot be made, belongs to another user, is open to
+/// others, or is no directory. The mode of a directory that exists is never changed.
+std::optional<Problem> secureRuntimeDirectory(const std::string& directory);
 
 /// Whether a name may stand for a port: letters, digits, ".", "-" and "_", not beginning with ".".
 bool isPortName(std::string_view name);

@@ -345,6 +345,11 @@ TEST(RuntimeDirectory, IsTheOneNamedElseTheSessionsElseOneInTmp)
     EXPECT_EQ(runtimeDirectory(), "/tmp/kestrum-" + std::to_string(::getuid()));
 }
 
+std::string problemOf(const std::string& directory)
+{
+    return secureRuntimeDirectory(directory).value_or(Problem()).text;
+}
+
 TEST(RuntimeDirectory, IsRefusedWhenItBelongsToSomebodyElse)
 {
     if (::geteuid() != 0)
@@ -353,21 +358,21 @@ TEST(RuntimeDirectory, IsRefusedWhenItBelongsToSomebodyElse)
     const auto theirs = scratch / "theirs";
     std::filesystem::create_directory(theirs);
     ASSERT_EQ(::chown(theirs.c_str(), 65534, 65534), 0);
-    EXPECT_THAT(secureRuntimeDirectory(theirs), HasSubstr("belongs to another user"));
+    EXPECT_THAT(problemOf(theirs), HasSubstr("belongs to another user"));
 }
 
 TEST(RuntimeDirectory, SaysWhyItCannotBeMade)
 {
     const ScratchDirectory scratch;
     write(scratch / "file", "");
-    EXPECT_THAT(secureRuntimeDirectory(scratch / "file/inside"), HasSubstr("cannot create"));
-    EXPECT_THAT(secureRuntimeDirectory(scratch / "file"), HasSubstr("is no directory"));
+    EXPECT_THAT(problemOf(scratch / "file/inside"), HasSubstr("cannot create"));
+    EXPECT_THAT(problemOf(scratch / "file"), HasSubstr("is no directory"));
 }
 
 TEST(RuntimeDirectory, MayNotBeRelative)
 {
-    EXPECT_EQ(secureRuntimeDirectory("run"), "the runtime directory run is not an absolute path");
-    EXPECT_THAT(secureRuntimeDirectory(""), HasSubstr("is not an absolute path"));
+    EXPECT_EQ(problemOf("run"), "the runtime directory run is not an absolute path");
+    EXPECT_THAT(problemOf(""), HasSubstr("is not an absolute path"));
 }
 
 TEST(RuntimeDirectory, LeavesRoomForTheLongestSocketOfADisplay)
@@ -377,8 +382,8 @@ TEST(RuntimeDirectory, LeavesRoomForTheLongestSocketOfADisplay)
         return scratch / std::string(length - scratch.path().size() - 1, 'd');
     };
     // "/org.kestrum.vox.baseband-state-report.log.4194304" and the zero, of 108 bytes.
-    EXPECT_EQ(secureRuntimeDirectory(ofLength(57)), "");
-    EXPECT_THAT(secureRuntimeDirectory(ofLength(58)), HasSubstr("too long: 58 bytes, sockets in it leave room for 57"));
+    EXPECT_EQ(problemOf(ofLength(57)), "");
+    EXPECT_THAT(problemOf(ofLength(58)), HasSubstr("too long: 58 bytes, sockets in it leave room for 57"));
     EXPECT_FALSE(std::filesystem::exists(ofLength(58)));
 }
 

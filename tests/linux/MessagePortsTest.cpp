@@ -366,7 +366,7 @@ class RemotePortTest : public MessagePortsTest {
 protected:
     void SetUp() override
     {
-        ASSERT_EQ(listener.listen(directory / "command"), "");
+        ASSERT_FALSE(listener.listen(directory / "command"));
         listener.accepted = [this](auto connection) {
             service = std::move(connection);
             service->readable = [this] {
