@@ -55,9 +55,8 @@ CaptureReader::Found CaptureReader::find()
 Bytes CaptureReader::take(std::size_t size, const std::string& flaw)
 {
     reportSkipped();
-    _messageOffset = _window.offset();
     if (!flaw.empty())
-        _onFault({_messageOffset, 0, flaw});
+        _onFault({_window.offset(), 0, flaw});
     _given = size;
     return message(size);
 }

@@ -37,12 +37,10 @@ public:
     static std::unique_ptr<CaptureReader> make(CaptureFormat format, ByteWindow& window, OnDamage onDamage,
                                                OnFault onFault);
 
-    /// The next message, valid until the next call; nothing at the end, and where reading stops at damage. While the
+    /// The next message, valid until the next call, with the window at its beginning; nothing at the end, and where reading stops at damage. While the
     /// input may still grow, a message that is not yet complete is waited for.
     std::optional<Bytes> next(bool mayGrow = false);
-    /// Where the message begins that `next` gave last.
-    std::uint64_t offset() const { return _messageOffset; }
-    /// How many messages are missing up to there, as the capture's notes say.
+    /// How many messages are missing so far, as the capture's notes say.
     std::uint64_t missing() const { return _missing; }
 
 protected:
@@ -80,7 +78,7 @@ private:
     OnFault _onFault;
     bool _mayGrow = false, _hasStopped = false;
     std::size_t _given = 0; ///< bytes of the message given last, which are still in the window
-    std::uint64_t _messageOffset = 0, _missing = 0;
+    std::uint64_t _missing = 0;
     std::optional<CaptureFault> _skipping;
 };
 

@@ -44,11 +44,11 @@ std::optional<Messages> byLengths(Bytes file, CaptureFormat format)
     Messages messages;
     std::size_t behind = 0, notes = 0;
     while (const auto message = reader->next()) {
-        require(reader->offset() >= behind, "messages overlap");
+        require(window.offset() >= behind, "messages overlap");
         // Between messages stand nothing but whole notes.
-        require((reader->offset() - behind) % kKcapGapSize == 0, "a gap between two messages");
-        notes += (reader->offset() - behind) / kKcapGapSize;
-        behind = reader->offset();
+        require((window.offset() - behind) % kKcapGapSize == 0, "a gap between two messages");
+        notes += (window.offset() - behind) / kKcapGapSize;
+        behind = window.offset();
         const auto held = inFile(format, *message);
         require(behind + held.size() <= file.size() && textOf(file).substr(behind, held.size()) == held,
                 "not what the file holds");
@@ -82,8 +82,8 @@ Searched searched(Bytes file, unsigned kind)
                                         report);
     std::uint64_t behind = 0, size = 0;
     while (const auto message = reader->next()) {
-        require(result.messages.empty() || reader->offset() > behind, "a message that does not follow the last one");
-        behind = reader->offset();
+        require(result.messages.empty() || window.offset() > behind, "a message that does not follow the last one");
+        behind = window.offset();
         require(behind < file.size(), "a message outside the file");
         result.messages.emplace_back(textOf(*message));
         size += message->size();
