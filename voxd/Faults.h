@@ -14,19 +14,19 @@ namespace kestrum {
 class FrameConnection;
 class SystemLog;
 
-/// What the service does wrong on purpose, so that displays can be tested against it. Each fault strikes a few times, or
-/// for some seconds, and the service is as ever afterwards. It may stand still meanwhile.
+/// Faults of the service, for tests of displays against them. Each fault strikes a few times or for some seconds; the
+/// service may stand still meanwhile and works as usual afterwards.
 class Faults {
 public:
     /// For the help text: a line for each fault.
     static std::string help();
     static bool exists(std::string_view name);
 
-    /// Of names that exist. Each strike, and the end of each fault, is logged.
+    /// The names must exist. Each strike, and the end of each fault, is logged.
     Faults(const std::vector<std::string>& names, SystemLog& log);
     ~Faults();
 
-    /// Sends the frame, or does wrong. False when the connection has closed.
+    /// Sends the frame, or strikes instead. False when the connection has closed.
     bool send(FrameConnection& connection, const Frame& frame);
     /// The source with the changes of technology that were asked for. Null when none were; `source` outlives it.
     std::unique_ptr<Source> unsteady(Source& source);

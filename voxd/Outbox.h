@@ -8,7 +8,7 @@
 
 namespace kestrum {
 
-/// Messages that a client has not taken yet. At the bound the oldest go, whole, and are counted.
+/// Messages that a client has not taken yet. Beyond the capacity the oldest are dropped, whole, and counted.
 class Outbox {
 public:
     explicit Outbox(std::size_t capacity) : _capacity(capacity) {} ///< bytes
@@ -40,7 +40,7 @@ public:
 private:
     static std::size_t cost(const Data& message) { return message.size() + kOverhead; }
 
-    // Lest a flood of tiny messages cost far more memory than their bytes.
+    // Counted for each message, so that a flood of tiny ones cannot cost far more memory than their bytes.
     static constexpr std::size_t kOverhead = 64;
 
     std::size_t _capacity;

@@ -18,8 +18,8 @@ CaptureFormat formatOf(const std::string& path)
 
 } // namespace
 
-ReplaySource::ReplaySource(const std::string& path, bool loop, std::string_view technology)
-    : _path(path), _format(formatOf(path)), _file(path, std::ios::binary), _loop(loop), _technology(technology)
+ReplaySource::ReplaySource(const std::string& path, bool loop)
+    : _path(path), _format(formatOf(path)), _file(path, std::ios::binary), _loop(loop)
 {
     // A directory opens, but cannot be read.
     if (!_file || (_file.peek(), _file.bad()))

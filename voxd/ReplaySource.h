@@ -12,14 +12,14 @@ namespace kestrum {
 /// A capture as a source. Messages come in the rhythm of their time stamps, those without at the nominal spacing.
 class ReplaySource final : public Source {
 public:
-    /// Between messages that have no time of their own.
+    /// Between messages without a time stamp.
     static constexpr std::chrono::milliseconds kNominalSpacing{500};
-    /// A longer gap between two time stamps is a clock that was set, and counts as none.
+    /// A longer gap between two time stamps means that the clock was set, and counts as none.
     static constexpr std::chrono::hours kLongestGap{1};
 
-    /// Opens the capture and finds its technology. Throws std::runtime_error, with what is wrong, when it cannot be
-    /// read, is empty, or has nothing that tells its technology (then `technology`, when given, is taken).
-    ReplaySource(const std::string& path, bool loop, std::string_view technology = {});
+    /// Opens the capture and finds its technology. Throws std::runtime_error, with the reason, when it cannot be read,
+    /// is empty, or has no message that shows its technology.
+    ReplaySource(const std::string& path, bool loop);
     ReplaySource(const ReplaySource&) = delete;
     ReplaySource& operator=(const ReplaySource&) = delete;
 

@@ -129,14 +129,14 @@ LogChannelAnswer Service::openChannel(std::string_view address, std::unique_ptr<
     if (const auto problem = channel->listen(_settings.directory + "/" + name))
         return refuse(address, vox::kNoReceiver, problem->text);
     _channels.push_back(std::move(channel));
-    _toldRefusals.clear();
+    _loggedRefusals.clear();
     return {0, 0, name};
 }
 
 // Displays that are refused try again every 5 s: one line for each reason is enough until something changes.
 LogChannelAnswer Service::refuse(std::string_view address, std::int32_t code, std::string_view why)
 {
-    if (_toldRefusals.insert(code).second)
+    if (_loggedRefusals.insert(code).second)
         _log.write(Priority::Error, "refused a log channel to \"%s\": %s", address.substr(0, 200), why);
     return {vox::kServiceErrors, code, std::nullopt};
 }
@@ -223,7 +223,7 @@ void Service::changeTechnology()
 void Service::retire(Channels::iterator first, Channels::iterator last)
 {
     _retired.splice(_retired.end(), _channels, first, last);
-    _toldRefusals.clear();
+    _loggedRefusals.clear();
     QTimer::singleShot(0, &_due, [this] { _retired.clear(); });
 }
 

@@ -32,10 +32,10 @@ public:
     };
     static constexpr std::size_t kMaximumChannels = 16, kMaximumConnections = 64;
 
-    /// Is given all that goes out, in its order: for a recording.
+    /// Receives everything that goes out, in order: for a recording.
     struct Witness {
-        std::function<void(Bytes)> streamed = [](Bytes) {};                ///< each message, whichever client wants it
-        std::function<void(std::uint64_t)> dropped = [](std::uint64_t) {}; ///< so many, for one client, by now
+        std::function<void(Bytes)> streamed = [](Bytes) {};                ///< each message, for whichever client
+        std::function<void(std::uint64_t)> dropped = [](std::uint64_t) {}; ///< this many messages, for one client
     };
 
     /// All outlive the service.
@@ -80,7 +80,7 @@ private:
     FrameListener _listener;
     Clients _clients;
     Channels _channels, _retired;
-    std::set<std::int32_t> _toldRefusals; ///< since the last channel was opened or closed
+    std::set<std::int32_t> _loggedRefusals; ///< since the last channel was opened or closed
     unsigned _lastChannel = 0;
 
     std::string _technology;              // of the message streamed last

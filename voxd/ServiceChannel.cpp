@@ -18,8 +18,8 @@ constexpr std::int32_t kLogMessage = 0, kLossMessage = 1;
 
 } // namespace
 
-ServiceChannel::ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort, std::size_t heldBytes)
-    : _host(host), _logPort(std::move(logPort)), _listener(host.log), _outbox(heldBytes)
+ServiceChannel::ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort)
+    : _host(host), _logPort(std::move(logPort)), _listener(host.log), _outbox(kHeldBytes)
 {
     _logPort->closed = [this] { end(); };
     _logPort->readable = [this] { readLogPort(); };
@@ -67,7 +67,7 @@ void ServiceChannel::readCommands()
     }
 }
 
-// The client has nothing to say here; reading tells a malformed peer, and keeps the socket from filling up.
+// The client sends nothing here. Reading detects a malformed peer and keeps the socket from filling up.
 void ServiceChannel::readLogPort()
 {
     while (!_ended && _logPort->next())
@@ -117,7 +117,7 @@ void ServiceChannel::flush()
         if (_logPort->unsent() >= kSocketBytes)
             return; // `written` goes on
         const auto message = _outbox.take();
-        tellLosses();
+        sendLosses();
         if (!message) {
             if (std::exchange(_dropping, false)) {
                 const std::size_t dropped = _outbox.dropped() - std::exchange(_reportedDrops, _outbox.dropped());
@@ -131,10 +131,10 @@ void ServiceChannel::flush()
     }
 }
 
-// At its place in the stream: so many messages are missing before the next one.
-void ServiceChannel::tellLosses()
+// At the place in the stream where the messages are missing: before the next one.
+void ServiceChannel::sendLosses()
 {
-    const std::uint64_t missing = _outbox.dropped() - std::exchange(_toldDrops, _outbox.dropped());
+    const std::uint64_t missing = _outbox.dropped() - std::exchange(_sentDrops, _outbox.dropped());
     if (missing == 0)
         return;
     std::array<std::byte, sizeof missing> payload;

@@ -19,7 +19,7 @@ class SystemLog;
 /// Sends a frame, as `FrameConnection::send` does.
 using FrameSender = std::function<bool(FrameConnection&, const Frame&)>;
 
-/// One client's log channel: its commands come in at a port of its own, the log goes out to the client's port. It ends
+/// One client's log channel: it takes commands at a separate port and sends the log to the client's port. It ends
 /// when either side of it goes.
 class ServiceChannel {
 public:
@@ -28,7 +28,7 @@ public:
         std::function<std::string_view()> technology;
         std::function<void()> streamingChanged;
         std::function<void(ServiceChannel&)> ended; ///< at most once; must not destroy the channel at once
-        std::function<void(std::uint64_t)> dropped; ///< so many messages, for a client that does not read
+        std::function<void(std::uint64_t)> dropped; ///< this many messages, for a client that does not read
         FrameSender send;
         const PropertyLists& lists;
         SystemLog& log;
@@ -40,7 +40,7 @@ public:
     static constexpr std::chrono::seconds kCommandTimeout{10};
 
     /// `logPort` leads to the client's receiving port. `host` outlives the channel.
-    ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort, std::size_t heldBytes = kHeldBytes);
+    ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort);
     ~ServiceChannel();
 
     /// Listens for the client's commands.
@@ -56,7 +56,7 @@ private:
     void readLogPort();
     void obey(const Frame& frame);
     void flush();
-    void tellLosses();
+    void sendLosses();
     void end();
 
     const Host& _host;
@@ -67,7 +67,7 @@ private:
     std::optional<Subscription> _subscription; // nothing: not streaming
     Outbox _outbox;
     std::size_t _reportedDrops = 0; ///< in the system's log
-    std::size_t _toldDrops = 0;     ///< to the client
+    std::size_t _sentDrops = 0;     ///< reported to the client
     bool _dropping = false;
     bool _ended = false;
 };

@@ -24,7 +24,7 @@ public:
 
     /// The identifier (kVoxLogChannelTechnology_...) of the message that `next` gave last; before the first, that of
     /// the first. When it changes, the service closes its channels, so that the clients ask again, and sends the
-    /// message to those who come back.
+    /// message to those that reconnect.
     virtual std::string_view technology() const = 0;
 };
 

@@ -58,7 +58,7 @@ std::ofstream openForWriting(const std::string& path)
     return file;
 }
 
-// CLI11's ranges hold for what compares with nothing.
+// CLI11's ranges accept not-a-number.
 std::string notFinite(const std::string& text)
 {
     return std::isfinite(std::strtod(text.c_str(), nullptr)) ? std::string() : text + " is no finite number";
@@ -78,7 +78,7 @@ void writeCapture(Source& source, const Options& options)
 
 int serve(QCoreApplication& application, const Options& options)
 {
-    // A log or an output whose reader has gone stops nothing.
+    // A log or output that nothing reads any more must not end the service.
     std::signal(SIGPIPE, SIG_IGN);
     const TerminationSignals termination([&] { application.quit(); });
     LinuxSystemLog log(standardErrorSink("voxd"));

@@ -20,7 +20,7 @@ int areaCode(const World& world, std::size_t site, int first)
 GsmCell gsmCell(const World& world, std::size_t site)
 {
     const int number = static_cast<int>(site);
-    // A network colour code tells the networks at the border apart (3GPP TS 23.003).
+    // The network colour code distinguishes the networks at the border (3GPP TS 23.003).
     const int networkColour = world.sites()[site].abroad ? 5 : 2;
     return {3 * number + 1, 8 * networkColour + number % 8, 0x2A00 + 16 * number + 1, areaCode(world, site, 0x1101),
             1 + world.sites()[site].area};

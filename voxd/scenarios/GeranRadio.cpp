@@ -166,7 +166,7 @@ void GeranRadio::logPacketParameters(ModemLog& log) const
 
 RecordWriter GeranRadio::ranking()
 {
-    // Without UMTS cells: both lists begin at the same byte, so that one of them alone can be told.
+    // Without UMTS cells: both lists begin at the same byte, so that only one of them can be sent.
     const auto near = neighbors();
     RecordWriter record(0x4005, 15 + 7 * near.size());
     record.set(u8(14), static_cast<std::int64_t>(near.size()));

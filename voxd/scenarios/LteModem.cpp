@@ -111,7 +111,7 @@ private:
     }
     // RSRQ is reported from -19.5 to -3 dB (3GPP TS 36.133).
     static double inRange(double quality) { return std::clamp(quality, kLowestQuality, -3.0); }
-    /// The cells that can be told from the interference.
+    /// The cells that can be distinguished from the interference.
     std::vector<std::size_t> neighbors(std::size_t on) const
     {
         const std::size_t none = _world.sites().size();

@@ -110,7 +110,7 @@ RecordWriter UtraRadio::searcher(RrcState state)
 
 RecordWriter UtraRadio::ranking() const
 {
-    // Without GSM cells: both lists begin at the same byte, so that one of them alone can be told.
+    // Without GSM cells: both lists begin at the same byte, so that only one of them can be sent.
     auto cells = neighbors();
     cells.insert(cells.begin(), site());
     RecordWriter record(0x4005, 15 + 10 * cells.size());

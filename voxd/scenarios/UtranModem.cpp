@@ -136,7 +136,7 @@ private:
         for (std::size_t i = 0; i < near.size(); ++i) {
             const TddCell heard = tddCell(_world, near[i]);
             const double power = _coverage.level(near[i]) + 0.8 * _random.normal();
-            // Beyond the sixth the network has not told of a cell.
+            // The network lists no cell beyond the sixth.
             const Set set = i == 0 ? Active : i < 6 ? Monitored : Detected;
             record.part(kCells + kCell * i, kCell)
                 .set(u32(0).bits(0, 13), heard.uarfcn)
