@@ -3,7 +3,7 @@
 namespace kestrum {
 namespace {
 
-/// Asks for the order of a dictionary's keys; no value to be shown.
+/// Marks a dictionary whose keys are sorted; not a value to be shown.
 constexpr std::string_view kSortedMarker = "_sorted";
 
 void appendStep(std::string& pointer, std::string_view step)
@@ -37,7 +37,7 @@ void Changes::compare(const Value& now, Value& seen)
     if (isLeaf && now == seen)
         return;
     if (!isLeaf || seenDictionary || seenArray)
-        gone(seen);
+        removed(seen);
     if (dictionary) {
         seen = makeDictionary();
         compare(*dictionary, *seen.dictionary());
@@ -46,7 +46,7 @@ void Changes::compare(const Value& now, Value& seen)
         compare(*array, *seen.array());
     } else {
         seen = now;
-        tell(now);
+        report(now);
     }
 }
 
@@ -73,7 +73,7 @@ void Changes::compare(const Dictionary& now, Dictionary& seen)
     for (const auto& entry : seen) {
         if (isGone(entry)) {
             _path.push_back({&entry.key, 0});
-            gone(entry.value);
+            removed(entry.value);
             _path.pop_back();
         } else {
             kept.set(entry.key, entry.value);
@@ -95,28 +95,28 @@ void Changes::compare(const Array& now, Array& seen)
         return;
     for (std::size_t i = now.size(); i < seen.size(); ++i) {
         _path.push_back({nullptr, i});
-        gone(seen[i]);
+        removed(seen[i]);
         _path.pop_back();
     }
     seen = Array(std::vector<Value>(seen.begin(), seen.begin() + static_cast<std::ptrdiff_t>(now.size())));
 }
 
-void Changes::gone(const Value& seen)
+void Changes::removed(const Value& seen)
 {
     if (const auto dictionary = seen.dictionary())
         compare(Dictionary(), *dictionary);
     else if (const auto array = seen.array())
         compare(Array(), *array);
     else if (!seen.isNull())
-        tell({});
+        report({});
 }
 
-void Changes::tell(const Value& value)
+void Changes::report(const Value& value)
 {
     _pointer.clear();
     for (const auto& [key, index] : _path)
         appendStep(_pointer, key != nullptr ? std::string_view(*key) : std::string_view(std::to_string(index)));
-    _tell(_pointer, value);
+    _onChange(_pointer, value);
 }
 
 } // namespace kestrum

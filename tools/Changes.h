@@ -9,15 +9,15 @@
 
 namespace kestrum {
 
-/// Tells which values of a display changed since it was last looked at. Walks it side by side with a copy of what it
-/// saw, and builds no path but of what changed: it can look behind every message.
+/// Reports which values of a display changed since the last look. It walks the display side by side with a copy of the
+/// last one and builds paths only of changes, so that it is fast enough to look after every message.
 class Changes {
 public:
-    /// `path`: where the value stands in the display, as a JSON Pointer (RFC 6901): display names may be equal, keys
-    /// are not. `value`: a leaf; null when there is none any more.
-    using Tell = std::function<void(std::string_view path, const Value& value)>;
+    /// `path`: the value's place in the display, as a JSON Pointer (RFC 6901): display names may be equal, keys are
+    /// not. `value`: a leaf; null when it was removed.
+    using OnChange = std::function<void(std::string_view path, const Value& value)>;
 
-    explicit Changes(Tell tell) : _tell(std::move(tell)) {}
+    explicit Changes(OnChange onChange) : _onChange(std::move(onChange)) {}
 
     void look(const Value& display) { compare(display, _seen); }
 
@@ -31,10 +31,10 @@ private:
     void compare(const Value& now, Value& seen);
     void compare(const Dictionary& now, Dictionary& seen);
     void compare(const Array& now, Array& seen);
-    void gone(const Value& seen);
-    void tell(const Value& value);
+    void removed(const Value& seen);
+    void report(const Value& value);
 
-    Tell _tell;
+    OnChange _onChange;
     Value _seen;
     std::vector<Step> _path;
     std::string _pointer;

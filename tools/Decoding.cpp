@@ -13,10 +13,10 @@
 namespace kestrum {
 namespace {
 
-// Without a technology nothing can be shown of them.
+// Messages before the first that shows the technology cannot be decoded yet.
 constexpr std::size_t kMostEarlyBytes = 16 << 20;
 
-// What the generator keeps raw for a snapshot is let go this often.
+// After this many bytes the generator drops the raw records that it keeps for a snapshot.
 constexpr std::size_t kInterval = 256 << 10;
 
 /// The codes that a start command asks for.
@@ -74,7 +74,7 @@ private:
     LogLine _line;
 };
 
-// Standard output is the display's alone; and no date of today belongs into what a capture shows.
+// Standard output holds only the display; and a capture is shown without today's date.
 class Decoding::Quiet final : public Console, public Clock {
 public:
     void printLine(std::string_view) override {}
@@ -91,14 +91,14 @@ public:
 Decoding::Decoding(std::string_view technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then)
     : _bundle(bundle),
       _lists(lists),
-      _told(!technology.empty()),
+      _isTechnologyGiven(!technology.empty()),
       _then(std::move(then)),
       _watch(std::make_unique<Watch>()),
       _log(std::make_unique<Log>(std::move(log))),
       _quiet(std::make_unique<Quiet>()),
       _roles{*_log, *_quiet, *_quiet, _bundle, _lists, _watch.get()}
 {
-    if (_told)
+    if (_isTechnologyGiven)
         use(technology);
 }
 
@@ -106,7 +106,7 @@ Decoding::~Decoding() = default;
 
 void Decoding::take(Bytes message)
 {
-    if (!_told && tells(message))
+    if (!_isTechnologyGiven && adoptTechnologyOf(message))
         for (const auto& early : std::exchange(_early, {}))
             decode(early);
     if (_generator)
@@ -135,12 +135,12 @@ Tally Decoding::total() const
     return sum;
 }
 
-// True when a generator was made. A log that goes on in another technology gets another generator, as it would have
-// done live; a foreign record alone, of a code that no display of that technology takes, does not count.
-bool Decoding::tells(Bytes message)
+// True when a generator was made. A log that continues in another technology gets another generator, as on the live
+// channel. A record whose code no display of its technology takes does not count.
+bool Decoding::adoptTechnologyOf(Bytes message)
 {
-    const auto told = technologyOf(message);
-    if (!told || *told == _technology)
+    const auto technology = technologyOf(message);
+    if (!technology || *technology == _technology)
         return false;
     if (_generator) {
         const auto record = channelRecord(message);
@@ -148,13 +148,14 @@ bool Decoding::tells(Bytes message)
             return false;
         Log silent(nullptr);
         DecodingRoles roles{silent, *_quiet, *_quiet, _bundle, _lists};
-        const bool takes = record ? codesIn(*LogGenerator::generatorFromTechnology(*told, roles)).contains(record->code)
-                                  : !_lists.parse(message).isNull();
+        const bool takes =
+            record ? codesIn(*LogGenerator::generatorFromTechnology(*technology, roles)).contains(record->code)
+                   : !_lists.parse(message).isNull();
         if (!takes)
             return false;
         endInterval();
     }
-    use(*told);
+    use(*technology);
     return true;
 }
 
@@ -188,7 +189,7 @@ void Decoding::decode(Bytes message)
         _then(decoded);
 }
 
-// Counts what no decoder will see.
+// Counts messages that reach no decoder.
 Tally& Decoding::classified(Bytes message, Decoded& decoded, bool& reaches)
 {
     if (_technology == kVoxLogChannelTechnology_IFX) {

@@ -50,15 +50,14 @@ public:
     };
     using Then = std::function<void(const Decoded&)>;
 
-    /// `technology`: an identifier, or empty when the messages shall tell. Bundle and lists outlive the decoding;
+    /// `technology`: an identifier, or empty when the messages decide. Bundle and lists outlive the decoding;
     /// `then`, if there is one, is called behind each message.
     Decoding(std::string_view technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then);
     ~Decoding();
 
-    /// Messages that come before one that tells the technology are kept until then. Throws std::runtime_error when
-    /// too many do.
+    /// Messages are kept until one shows the technology. Throws std::runtime_error when too many come before it.
     void take(Bytes message);
-    /// No further message comes. Throws std::runtime_error when there were messages, and none told the technology.
+    /// No further message comes. Throws std::runtime_error when there were messages, and none showed the technology.
     void finish();
 
     /// Empty while it is not known.
@@ -73,7 +72,7 @@ private:
     class Log;
     class Quiet;
 
-    bool tells(Bytes message);
+    bool adoptTechnologyOf(Bytes message);
     void use(std::string_view technology);
     void decode(Bytes message);
     Tally& classified(Bytes message, Decoded& decoded, bool& reaches);
@@ -81,7 +80,7 @@ private:
 
     Bundle& _bundle;
     PropertyLists& _lists;
-    const bool _told;
+    const bool _isTechnologyGiven;
     std::string _technology;
     Then _then;
 

@@ -5,11 +5,11 @@
 
 namespace kestrum {
 
-/// A text that does nothing to a terminal: control characters, those that turn the direction of writing, and bytes that
-/// are no UTF-8 become \xnn. On one line.
+/// A text that is safe to show on a terminal, on one line: control characters, characters that change the writing
+/// direction, and bytes that are no UTF-8 become \xnn.
 std::string onOneLine(std::string_view raw);
 
-/// The same, less the ends of lines, which stay.
+/// The same, but line ends stay.
 std::string onLines(std::string_view raw);
 
 } // namespace kestrum

@@ -6,25 +6,24 @@
 
 namespace kestrum {
 
-/// The reader of our output has gone: nobody wants the rest.
+/// The reader of our output has closed it: the rest is not wanted.
 struct ClosedPipe {};
 
-/// What is decoded cannot be written.
+/// Standard output cannot be written.
 class OutputFailure : public std::runtime_error {
 public:
     using std::runtime_error::runtime_error;
 };
 
-/// Text on its way to a file descriptor, in large pieces. Throws ClosedPipe or
-/// OutputFailure, unless a loss is to be ignored.
+/// Text for a file descriptor, written in large pieces. Throws ClosedPipe or OutputFailure, unless losses are ignored.
 class OutputFile {
 public:
     enum class Loss { Throws, Ignored };
     explicit OutputFile(int descriptor, Loss loss = Loss::Throws);
 
-    /// What it was given by files and modems: harmless on a terminal, as it is elsewhere.
+    /// Text from files and modems: made harmless on a terminal, unchanged elsewhere.
     void write(std::string_view text);
-    /// What may move the cursor.
+    /// Our own text, which may move the cursor.
     void control(std::string_view text);
     void flush();
 

@@ -27,10 +27,10 @@ constexpr int kBadInput = 1, kUsageError = 2;
 /// A snapshot cannot be followed.
 struct WrongUsage {};
 constexpr std::uint64_t kMostFaultLines = 100;
-/// The display of a file that is followed is shown anew this often at most, as the panes are.
+/// The display of a followed file is shown again after this time at the earliest, as the panes are.
 constexpr std::chrono::milliseconds kRefresh{2000};
 
-/// How far a long run has come, on a terminal.
+/// Shows the progress of a long run on a terminal.
 class Progress {
 public:
     Progress(OutputFile& to, bool isWanted) : _to(to), _isWatched(isWanted && ::isatty(STDERR_FILENO) != 0) {}
@@ -79,7 +79,7 @@ public:
                 decode(file, &file == &_options.files.back());
             finish();
         } catch (const ClosedPipe&) {
-            return 0; // Nobody wants the rest.
+            return 0; // The rest is not wanted.
         } catch (const WrongUsage&) {
             complain(_file + ": a snapshot does not grow, and cannot be followed");
             return kUsageError;
@@ -95,7 +95,7 @@ private:
         try {
             Input input(file, _options.follow && isLast);
             do {
-                // What is decoded is shown before more is waited for.
+                // Shows what is decoded before it waits for more.
                 ByteWindow window([&](std::span<std::byte> into) {
                     _data.flush();
                     _remarks.flush();
@@ -115,7 +115,7 @@ private:
         _window = nullptr;
         if (_faults.lines > kMostFaultLines)
             complain(formatted("%s: %lu more places like these; %lu bytes skipped in them", _file,
-                               _faults.lines - kMostFaultLines, _faults.untold));
+                               _faults.lines - kMostFaultLines, _faults.unreported));
     }
 
     void decode(const std::string& file, Input& input, ByteWindow& window)
@@ -189,7 +189,7 @@ private:
         if (!_options.extract.empty())
             try {
                 const auto stem = std::filesystem::path(file).stem().string();
-                // What this run wrote is not replaced by its next snapshot.
+                // The next snapshot of this run does not replace what this one wrote.
                 const bool mayReplace = _options.force && _extracted.insert(stem).second;
                 extraction.emplace(_options.extract, snapshot, mayReplace ? Existing::Replaced : Existing::Kept);
             } catch (const std::exception& error) {
@@ -253,7 +253,7 @@ private:
         _skipped += fault.size;
         _isBad = true;
         if (++_faults.lines > kMostFaultLines) {
-            _faults.untold += fault.size;
+            _faults.unreported += fault.size;
             return;
         }
         const auto skipped = fault.size == 0 ? std::string() : formatted("; %lu bytes skipped", fault.size);
@@ -273,7 +273,7 @@ private:
 
     const DecodeOptions& _options;
     OutputFile _data{STDOUT_FILENO}, _remarks{STDERR_FILENO, OutputFile::Loss::Ignored};
-    // Not between rows that the same terminal shows as they come.
+    // Not between rows that the same terminal shows at once.
     Progress _progress{_remarks,
                        !_options.follow && (_options.format == OutputFormat::Tree ||
                                             _options.format == OutputFormat::Json || ::isatty(STDOUT_FILENO) == 0)};
@@ -284,7 +284,7 @@ private:
     std::string _file; ///< as it is called in remarks
     ByteWindow* _window = nullptr;
     struct {
-        std::uint64_t lines = 0, untold = 0;
+        std::uint64_t lines = 0, unreported = 0; ///< faults; bytes skipped in those without a line
     } _faults;
     std::uint64_t _skipped = 0, _missing = 0;
     std::set<std::string> _extracted; ///< stems of snapshots
@@ -297,7 +297,7 @@ private:
 
 int decodeFiles(const DecodeOptions& options, Bundle& bundle)
 {
-    // A reader that goes away is told by the write.
+    // The write reports a reader that has closed the pipe.
     std::signal(SIGPIPE, SIG_IGN);
     return Program(options, bundle).run();
 }

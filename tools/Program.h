@@ -12,11 +12,11 @@ class Bundle;
 /// What the command line asks for.
 struct DecodeOptions {
     std::vector<std::string> files; ///< "-": standard input
-    std::string technology;         ///< an identifier; empty: told from the messages
+    std::string technology;         ///< an identifier; empty: found in the messages
     OutputFormat format = OutputFormat::Tree;
     bool log = false, stats = false, follow = false;
     std::string extract; ///< a directory; empty: nothing is extracted
-    bool force = false;  ///< what is extracted replaces files
+    bool force = false;  ///< extracted files replace existing ones
 };
 
 /// Decodes the files, as parts of one log, onto standard output; all else goes to standard error. Gives the exit

@@ -76,8 +76,8 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, CaptureReader::O
     const auto root = propertyList.dictionary();
     if (!root || (!root->contains("Timestamp") && !root->contains("Data")))
         throw std::runtime_error("the property list is no snapshot");
-    const auto wrong = [this](const std::string& what, const Value& held, std::string_view due) {
-        _onFault({0, 0, formatted("%s is of type %@ where %s is due", what, nameOf(held.kind()), due)});
+    const auto wrong = [this](const std::string& what, const Value& held, std::string_view expected) {
+        _onFault({0, 0, formatted("%s is of type %@ where %s is due", what, nameOf(held.kind()), expected)});
     };
     _listing = {std::move(file), textAt(*root, "Timestamp"), textAt(*root, "Description"), {}};
     for (const auto key : {"Timestamp", "Description"})
