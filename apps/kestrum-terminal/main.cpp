@@ -35,7 +35,7 @@ int main(int argc, char** argv)
 
     const auto problem = TerminalToolkit::problem();
     if (!*text && problem) {
-        std::cerr << "kestrum-terminal: " << *problem << "; --text prints without one\n";
+        std::cerr << "kestrum-terminal: " << problem->text << "; --text prints without one\n";
         return 1;
     }
 

@@ -2,6 +2,7 @@
 
 #include "frontends/terminal/CrashSignals.h"
 #include "frontends/terminal/Text.h"
+#include "support/Problem.h"
 
 #include <optional>
 #include <string>
@@ -74,7 +75,7 @@ public:
     Screen& operator=(const Screen&) = delete;
 
     /// Why standard input and output cannot serve as a screen; nothing when they can.
-    static std::optional<std::string> problem();
+    static std::optional<Problem> problem();
 
     void open();
     void close(); ///< The terminal is as it was before `open`.

@@ -195,7 +195,7 @@ TerminalToolkit::TerminalToolkit(Charset charset) : _parts(std::make_unique<Part
 
 TerminalToolkit::~TerminalToolkit() = default;
 
-std::optional<std::string> TerminalToolkit::problem()
+std::optional<Problem> TerminalToolkit::problem()
 {
     return Screen::problem();
 }

@@ -2,6 +2,7 @@
 
 #include "frontends/terminal/Text.h"
 #include "platform/Toolkit.h"
+#include "support/Problem.h"
 
 #include <memory>
 #include <optional>
@@ -17,7 +18,7 @@ public:
     ~TerminalToolkit() override;
 
     /// Why there can be no screen here; nothing when there can.
-    static std::optional<std::string> problem();
+    static std::optional<Problem> problem();
 
     Rect mainScreenBounds() const override;
     Rect mainScreenApplicationFrame() const override;
