@@ -19,7 +19,7 @@ function(kestrum_folder name)
     endif()
     add_library(${name} STATIC ${arg_SOURCES})
     # An include root with this folder's own headers alone in it: <core/...> is found only by those
-    # who use core, and <platform/linux/...> not by those who use platform.
+    # who use core, and <platform/posix/...> not by those who use platform.
     set(root ${CMAKE_BINARY_DIR}/roots/${name})
     file(REMOVE_RECURSE ${root})
     file(MAKE_DIRECTORY ${root}/${arg_FOLDER})

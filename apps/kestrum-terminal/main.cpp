@@ -1,6 +1,6 @@
 #include "frontends/terminal/TerminalToolkit.h"
 #include "frontends/terminal/TextDisplay.h"
-#include "platform/linux/LinuxDevice.h"
+#include "platform/qt/LinuxDevice.h"
 #include "ui/KestrumApp.h"
 
 #include <CLI/CLI.hpp>
