@@ -5,8 +5,8 @@
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Icon.h"
 #include "frontends/qt/MainWindow.h"
-#include "frontends/qt/TerminationSignals.h"
 #include "frontends/qt/Type.h"
+#include "platform/qt/TerminationSignals.h"
 
 #include <QApplication>
 #include <cstdio>

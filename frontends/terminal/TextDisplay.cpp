@@ -1,9 +1,9 @@
 #include "frontends/terminal/TextDisplay.h"
 
-#include "frontends/terminal/Signals.h"
 #include "frontends/terminal/Text.h"
 #include "platform/MainQueue.h"
 #include "platform/Time.h"
+#include "platform/posix/SignalPipe.h"
 #include "support/Format.h"
 
 #include <QCoreApplication>
@@ -106,7 +106,7 @@ int printDisplay(MonitorRoles& roles, int refreshes)
 {
     std::signal(SIGPIPE, SIG_IGN); // a reader that goes away is told by the write
     int endedBy = 0;
-    Signals signals({SIGTERM, SIGHUP, SIGINT});
+    SignalPipe signals({SIGTERM, SIGHUP, SIGINT});
     QSocketNotifier signalled(signals.descriptor(), QSocketNotifier::Read);
     QObject::connect(&signalled, &QSocketNotifier::activated, [&] {
         for (const int each : signals.taken())
