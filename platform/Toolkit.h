@@ -112,7 +112,7 @@ public:
     virtual void reloadData() = 0;
 
     /// Within `cellForRowAtIndexPath`: a cell that may be used again for that row, of whatever kind; the cell that
-    /// last showed that same row comes first (`ReusePool` keeps them so). Null when there is none.
+    /// last showed that same row comes first. Null when there is none.
     virtual std::shared_ptr<ReusableCell> dequeueReusableCell(std::string_view reuseIdentifier) = 0;
 
     /// A new cell for this table. Its content area has the width of the table's rows from the start, so that it can

@@ -1,16 +1,48 @@
+#include "apps/kestrum-terminal/TextDisplay.h"
 #include "frontends/terminal/TerminalToolkit.h"
-#include "frontends/terminal/TextDisplay.h"
+#include "platform/posix/SignalPipe.h"
 #include "platform/qt/LinuxDevice.h"
 #include "ui/KestrumApp.h"
 
 #include <CLI/CLI.hpp>
 #include <QCoreApplication>
+#include <QSocketNotifier>
 
+#include <csignal>
 #include <fcntl.h>
 #include <iostream>
+#include <string>
 #include <unistd.h>
 
 using namespace kestrum;
+
+namespace {
+
+/// Prints the display to standard output, and gives the exit status. A signal that ends it leaves nothing behind; the
+/// status is then 128 and its number.
+int printDisplay(MonitorRoles& roles, int refreshes)
+{
+    std::signal(SIGPIPE, SIG_IGN); // a reader that goes away is told by the write
+    int endedBy = 0;
+    SignalPipe pipe({SIGTERM, SIGHUP, SIGINT});
+    QSocketNotifier signalled(pipe.descriptor(), QSocketNotifier::Read);
+    QObject::connect(&signalled, &QSocketNotifier::activated, [&] {
+        for (const int each : pipe.taken())
+            endedBy = each;
+        if (endedBy != 0)
+            QCoreApplication::quit();
+    });
+    TextDisplay display(roles, std::cout, refreshes, [](int status, const std::string& why) {
+        if (!why.empty())
+            std::cerr << "kestrum-terminal: " << why << '\n';
+        QCoreApplication::exit(status);
+    });
+    display.start();
+    const int status = QCoreApplication::exec();
+    return endedBy == 0 ? status : 128 + endedBy;
+}
+
+} // namespace
 
 int main(int argc, char** argv)
 {

@@ -1,8 +1,8 @@
 #pragma once
 
+#include "frontends/ReusePool.h"
 #include "frontends/qt/Cell.h"
-#include "platform/FollowedRow.h"
-#include "platform/ReusePool.h"
+#include "frontends/qt/FollowedRow.h"
 #include "platform/Toolkit.h"
 
 #include <QAbstractScrollArea>

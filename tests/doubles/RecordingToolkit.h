@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/ReusePool.h"
+#include "frontends/ReusePool.h"
 #include "platform/Toolkit.h"
 
 #include <algorithm>

@@ -1,17 +1,12 @@
-#include "frontends/terminal/TextDisplay.h"
+#include "apps/kestrum-terminal/TextDisplay.h"
 
 #include "frontends/terminal/Text.h"
+#include "platform/Clock.h"
 #include "platform/MainQueue.h"
-#include "platform/Time.h"
-#include "platform/posix/SignalPipe.h"
 #include "support/Format.h"
-
-#include <QCoreApplication>
-#include <QSocketNotifier>
 
 #include <cerrno>
 #include <chrono>
-#include <csignal>
 #include <cstring>
 #include <iostream>
 #include <utility>
@@ -100,28 +95,6 @@ void TextDisplay::updateViewControllerFromModel()
         end(1, formatted("standard output: %s", std::strerror(errno)));
     else if (!_out || --_refreshes == 0) // with its reader gone, the rest is not wanted
         end(0);
-}
-
-int printDisplay(MonitorRoles& roles, int refreshes)
-{
-    std::signal(SIGPIPE, SIG_IGN); // a reader that goes away is told by the write
-    int endedBy = 0;
-    SignalPipe signals({SIGTERM, SIGHUP, SIGINT});
-    QSocketNotifier signalled(signals.descriptor(), QSocketNotifier::Read);
-    QObject::connect(&signalled, &QSocketNotifier::activated, [&] {
-        for (const int each : signals.taken())
-            endedBy = each;
-        if (endedBy != 0)
-            QCoreApplication::quit();
-    });
-    TextDisplay display(roles, std::cout, refreshes, [](int status, const std::string& why) {
-        if (!why.empty())
-            std::cerr << "kestrum-terminal: " << why << '\n';
-        QCoreApplication::exit(status);
-    });
-    display.start();
-    const int status = QCoreApplication::exec();
-    return endedBy == 0 ? status : 128 + endedBy;
 }
 
 } // namespace kestrum

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::qt {
 
 /// A row of a table that is followed by its name while rows come and go around it. When the row itself goes, the one
 /// below takes its place, or the one above. Names that occur twice are told apart by where they stand.
@@ -61,4 +61,4 @@ private:
     std::vector<std::string> _names; ///< its own, then its neighbours'
 };
 
-} // namespace kestrum
+} // namespace kestrum::qt

@@ -44,8 +44,4 @@ private:
     std::unique_ptr<Timer> _patience;
 };
 
-/// The program that prints the display to standard output: runs the main loop, which must exist, and gives the exit
-/// status. A signal that ends it leaves nothing behind; the status is then 128 and its number.
-int printDisplay(MonitorRoles& roles, int refreshes);
-
 } // namespace kestrum
