@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/Toolkit.h"
+#include "platform/ReusableCell.h"
 
 #include <cstddef>
 #include <map>

@@ -4,6 +4,8 @@
 #include "platform/Clock.h"
 #include "platform/FileSystem.h"
 #include "platform/Preferences.h"
+#include "platform/TableScreen.h"
+#include "platform/Toolkit.h"
 #include "ui/ConnectionHint.h"
 
 #include <utility>

@@ -5,6 +5,7 @@
 #include "platform/MainQueue.h"
 #include "platform/PropertyLists.h"
 #include "platform/SystemLog.h"
+#include "platform/Toolkit.h"
 #include "support/Format.h"
 #include "ui/SharedApplication.h"
 

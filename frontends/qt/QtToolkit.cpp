@@ -6,6 +6,7 @@
 #include "frontends/qt/Icon.h"
 #include "frontends/qt/MainWindow.h"
 #include "frontends/qt/Type.h"
+#include "platform/ApplicationDelegate.h"
 #include "platform/qt/TerminationSignals.h"
 
 #include <QApplication>

@@ -3,7 +3,7 @@
 #include "frontends/ReusePool.h"
 #include "frontends/qt/Cell.h"
 #include "frontends/qt/FollowedRow.h"
-#include "platform/Toolkit.h"
+#include "platform/TableView.h"
 
 #include <QAbstractScrollArea>
 #include <QLabel>

@@ -1,7 +1,8 @@
 #pragma once
 
 #include "frontends/terminal/Screen.h"
-#include "platform/Toolkit.h"
+#include "platform/ScrollView.h"
+#include "platform/TableCell.h"
 
 #include <memory>
 #include <optional>

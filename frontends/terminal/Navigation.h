@@ -5,7 +5,9 @@
 #include "frontends/terminal/SaveScreen.h"
 #include "frontends/terminal/Screen.h"
 #include "frontends/terminal/Table.h"
-#include "platform/Toolkit.h"
+#include "platform/NavigationView.h"
+#include "platform/SaveInterface.h"
+#include "platform/TableScreen.h"
 
 #include <cstddef>
 #include <functional>

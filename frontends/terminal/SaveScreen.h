@@ -4,7 +4,7 @@
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/Screen.h"
 #include "frontends/terminal/Table.h"
-#include "platform/Toolkit.h"
+#include "platform/SaveInterface.h"
 
 #include <functional>
 #include <optional>

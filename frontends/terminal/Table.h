@@ -3,7 +3,7 @@
 #include "frontends/terminal/Cells.h"
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/Screen.h"
-#include "platform/Toolkit.h"
+#include "platform/TableView.h"
 
 #include <cstddef>
 #include <map>

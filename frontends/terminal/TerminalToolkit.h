@@ -1,7 +1,13 @@
 #pragma once
 
 #include "frontends/terminal/Text.h"
+#include "platform/ApplicationDelegate.h"
+#include "platform/NavigationView.h"
+#include "platform/SaveInterface.h"
+#include "platform/ScrollView.h"
+#include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
+#include "platform/Window.h"
 
 #include <memory>
 #include <optional>

@@ -2,7 +2,6 @@
 
 #include "doubles/Places.h"
 #include "doubles/QtTestToolkit.h"
-#include "platform/Toolkit.h"
 #include "posix/Scratch.h"
 #include "qtplatform/EventLoop.h"
 

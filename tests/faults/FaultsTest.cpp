@@ -2,7 +2,6 @@
 #include "doubles/Places.h"
 #include "doubles/QtTestToolkit.h"
 #include "frontends/qt/MainWindow.h"
-#include "platform/Toolkit.h"
 #include "platform/qt/LinuxDevice.h"
 #include "posix/Scratch.h"
 #include "terminal/Demonstration.h"
