@@ -21,9 +21,9 @@ constexpr std::chrono::duration<int> kPatience = 30s;
 
 void append(std::string& text, const KestrumModelNode& node, std::size_t depth)
 {
-    text.append(2 * depth, ' ').append(harmless(node.displayName()));
+    text.append(2 * depth, ' ').append(terminal::harmless(node.displayName()));
     if (const auto* value = node.value())
-        text.append(": ").append(harmless(*value));
+        text.append(": ").append(terminal::harmless(*value));
     text += '\n';
     if (const auto* children = node.childNodes())
         for (const auto& each : *children)

@@ -48,7 +48,7 @@ int main(int argc, char** argv)
 {
     // What the program opens first would take the place of a closed output.
     const bool hasOutput = fcntl(STDOUT_FILENO, F_GETFD) != -1;
-    const auto charset = chooseLocale();
+    const auto charset = terminal::chooseLocale();
     const QCoreApplication loop(argc, argv);
 
     CLI::App arguments("Cellular field test in a terminal. Keys: ? shows them.");
@@ -65,7 +65,7 @@ int main(int argc, char** argv)
         return arguments.exit(error) == 0 ? 0 : 2;
     }
 
-    const auto problem = TerminalToolkit::problem();
+    const auto problem = terminal::TerminalToolkit::problem();
     if (!*text && problem) {
         std::cerr << "kestrum-terminal: " << *problem << "; --text prints without one\n";
         return 1;
@@ -78,7 +78,7 @@ int main(int argc, char** argv)
     if (refreshes == 0)
         refreshes = kRefreshes;
 
-    TerminalToolkit toolkit(charset);
+    terminal::TerminalToolkit toolkit(charset);
     LinuxDevice device("kestrum-terminal", LinuxDevice::Output::Quiet);
     auto roles = device.applicationRoles(toolkit);
     int status = 0;

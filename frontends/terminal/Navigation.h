@@ -16,7 +16,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// A pane: rows, and what stands in the bottom line.
 class TerminalTableScreen final : public TableScreen {
@@ -99,4 +99,4 @@ private:
     std::string _lastJump;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -13,7 +13,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// Rows, one to a line, one of them chosen.
 class TerminalTable final : public TableView {
@@ -80,4 +80,4 @@ private:
     std::shared_ptr<ReusableCell> _reader;  // in no row: names are read with it
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

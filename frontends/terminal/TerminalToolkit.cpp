@@ -20,7 +20,7 @@
 #include <unistd.h>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -275,4 +275,4 @@ int TerminalToolkit::run(ApplicationDelegate& application)
     return status;
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -13,7 +13,7 @@
 #include <optional>
 #include <string>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// The UI toolkit on a terminal: standard input and output. Its main loop is the QCoreApplication's, which must exist.
 /// One at a time.
@@ -46,4 +46,4 @@ private:
     std::unique_ptr<Parts> _parts;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal
