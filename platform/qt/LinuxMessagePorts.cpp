@@ -63,32 +63,47 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
         schedule();
     }
 
+    // Something may have come.
     void schedule()
     {
-        if (queue == nullptr || std::exchange(scheduled, true) || delivering)
+        if (queue == nullptr)
             return;
-        queue->post([weak = weak_from_this()] {
-            if (const auto self = weak.lock())
-                self->deliver();
-        });
+        switch (state) {
+        case State::Idle:
+            state = State::Scheduled;
+            queue->post([weak = weak_from_this()] {
+                if (const auto self = weak.lock(); self && self->state == State::Scheduled)
+                    self->deliver();
+            });
+            break;
+        case State::Delivering:
+            state = State::DeliveringAndMoreCame;
+            break;
+        case State::Scheduled:
+        case State::DeliveringAndMoreCame:
+        case State::Closed:
+            break;
+        }
     }
 
     void deliver()
     {
-        scheduled = false;
-        delivering = true;
+        state = State::Delivering;
         const auto end = steady_clock::now() + kBatch;
         bool more = true;
-        while (more && open && steady_clock::now() < end) {
+        while (more && isOpen() && steady_clock::now() < end) {
             more = false;
             // By index: the handler may run a loop in which senders are added.
-            for (std::size_t i = 0; i < senders.size() && open; ++i)
+            for (std::size_t i = 0; i < senders.size() && isOpen(); ++i)
                 more |= deliverFrom(i);
             std::erase(senders, nullptr);
         }
-        delivering = false;
-        if (std::exchange(scheduled, false) || more)
-            schedule(); // also what came in a loop within the handler
+        if (!isOpen())
+            return;
+        more |= state == State::DeliveringAndMoreCame;
+        state = State::Idle;
+        if (more)
+            schedule();
     }
 
     // A turn of one sender; true when it may have more.
@@ -104,15 +119,17 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
             }
             if (frame->kind == Frame::Kind::Message)
                 handler(frame->messageId, frame->payload);
-            if (!open)
+            if (!isOpen())
                 return false;
         }
         return true;
     }
 
+    bool isOpen() const { return state != State::Closed; }
+
     void close()
     {
-        open = false;
+        state = State::Closed;
         listening.reset();
         listener.close();
         senders.clear();
@@ -123,7 +140,8 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
     std::shared_ptr<const void> listening; // there while new senders can come
     std::vector<std::shared_ptr<FrameConnection>> senders;
     MainQueue* queue = nullptr;
-    bool open = true, scheduled = false, delivering = false;
+    // More can come while messages are handed over: their handler may run a loop.
+    enum class State { Idle, Scheduled, Delivering, DeliveringAndMoreCame, Closed } state = State::Idle;
 };
 
 class SocketLocalPort final : public LocalPort {
