@@ -1,7 +1,7 @@
 #include "LogGenerator/LogGenerator.h"
 
+#include "platform/Clock.h"
 #include "platform/SystemLog.h"
-#include "platform/Time.h"
 #include "support/Format.h"
 
 namespace kestrum {

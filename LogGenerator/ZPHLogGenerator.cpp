@@ -2,8 +2,8 @@
 
 #include "LogGenerator/DlfVersionReport.h"
 #include "platform/Bundle.h"
+#include "platform/Clock.h"
 #include "platform/SystemLog.h"
-#include "platform/Time.h"
 #include "support/Format.h"
 
 #include <utility>

@@ -19,7 +19,7 @@ function(kestrum_folder name)
     endif()
     add_library(${name} STATIC ${arg_SOURCES})
     # An include root with this folder's own headers alone in it: <core/...> is found only by those
-    # who use core, and <platform/linux/...> not by those who use platform.
+    # who use core, and <platform/posix/...> not by those who use platform.
     set(root ${CMAKE_BINARY_DIR}/roots/${name})
     file(REMOVE_RECURSE ${root})
     file(MAKE_DIRECTORY ${root}/${arg_FOLDER})
@@ -28,6 +28,15 @@ function(kestrum_folder name)
         file(CREATE_LINK ${CMAKE_CURRENT_SOURCE_DIR}/${header} ${root}/${arg_FOLDER}/${header} SYMBOLIC)
     endforeach()
     target_include_directories(${name} PUBLIC ${root})
+    # Libraries of the adapters stay private: who uses the folder does not see their headers.
+    set(libraries PRIVATE ${arg_LIBRARIES})
+    if(KESTRUM_VERIFY_HEADERS)
+        list(TRANSFORM headers PREPEND ${root}/${arg_FOLDER}/)
+        set_source_files_properties(${headers} PROPERTIES SKIP_AUTOMOC ON) # their originals have theirs
+        target_sources(${name} PUBLIC FILE_SET HEADERS BASE_DIRS ${root} FILES ${headers})
+        set_target_properties(${name} PROPERTIES VERIFY_INTERFACE_HEADER_SETS ON)
+        set(libraries PUBLIC ${arg_LIBRARIES}) # a header is compiled with what its folder's users see
+    endif()
     # The fuzzer follows the paths through the product's code, not those through a target or a test.
     if(KESTRUM_FUZZ)
         target_compile_options(${name} PRIVATE -fsanitize=fuzzer-no-link)
@@ -44,6 +53,5 @@ function(kestrum_folder name)
     elseif(KESTRUM_PRECOMPILED AND NOT arg_LIBRARIES)
         target_precompile_headers(${name} REUSE_FROM support)
     endif()
-    # Libraries of the adapters stay private: who uses the folder does not see their headers.
-    target_link_libraries(${name} PRIVATE ${arg_LIBRARIES})
+    target_link_libraries(${name} ${libraries})
 endfunction()

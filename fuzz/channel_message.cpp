@@ -3,17 +3,13 @@
 //
 // Equal bytes give equal displays and logs; a display has no keys but those of its template and its sections' rows; the
 // interval's raw messages are kept as they came; the history keeps five entries at most.
+#include "FuzzedRoles.h"
 #include "LogGenerator/Failures.h"
 #include "LogGenerator/LogGenerator.h"
 #include "LogGenerator/ZPH_GSM/SimInfo.h"
 #include "Require.h"
 #include "core/KestrumModelNode.h"
-#include "doubles/MemoryBundle.h"
 #include "doubles/Places.h"
-#include "doubles/RecordingConsole.h"
-#include "doubles/RecordingLog.h"
-#include "doubles/VirtualClock.h"
-#include "platform/Roles.h"
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "support/Record.h"
@@ -74,14 +70,14 @@ std::string pathOf(std::string_view templateName)
 const PropertyListCodec kCodec;
 
 /// One generator, from its start on.
-class Run {
+class Run : public FuzzedRoles {
 public:
     Run(const Technology& technology, const Value& loadedTemplate) : _technology(technology)
     {
-        _bundle.paths = {pathOf(technology.templateName)};
+        bundle.paths = {pathOf(technology.templateName)};
         if (loadedTemplate)
             state.set("Template", loadedTemplate); // as read before: reading it is not what is tried here
-        _generator = LogGenerator::generatorFromTechnology(Value(technology.identifier), _roles);
+        _generator = LogGenerator::generatorFromTechnology(Value(technology.identifier), roles);
         require(_generator != nullptr, "no generator for the technology");
     }
 
@@ -119,7 +115,6 @@ public:
     }
 
     State state;
-    RecordingLog log;
 
 private:
     void checkHistory() const
@@ -131,11 +126,6 @@ private:
     }
 
     const Technology& _technology;
-    RecordingConsole _console;
-    VirtualClock _clock;
-    MemoryBundle _bundle;
-    PropertyListCodec _propertyLists;
-    DecodingRoles _roles{log, _console, _clock, _bundle, _propertyLists};
     std::unique_ptr<LogGenerator> _generator;
     std::vector<std::byte> _interval;
 };

@@ -1,6 +1,6 @@
 // The byte stream of a message port. However it is cut into pieces, the same frames come out, up to the same fault; and
 // what came out, written again, is what went in.
-#include "platform/linux/Frame.h"
+#include "platform/posix/Frame.h"
 #include "Require.h"
 
 #include <algorithm>

@@ -3,14 +3,10 @@
 //
 // Equal templates give equal displays; the template is not changed; every path of the tree leads to its node; a
 // generator that takes a display over goes on in that very display.
+#include "FuzzedRoles.h"
 #include "LogGenerator/LogGenerator.h"
 #include "Require.h"
 #include "core/KestrumModelNode.h"
-#include "doubles/MemoryBundle.h"
-#include "doubles/RecordingConsole.h"
-#include "doubles/RecordingLog.h"
-#include "doubles/VirtualClock.h"
-#include "platform/Roles.h"
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "support/Record.h"
@@ -40,7 +36,7 @@ std::vector<std::byte> patterned(LogCode code)
     return record;
 }
 
-class Run {
+class Run : public FuzzedRoles {
 public:
     Run(std::string_view technology, const Value& templateNode) : _technology(technology)
     {
@@ -53,7 +49,7 @@ public:
     }
 
     /// A new generator on the old state, as after a reconnection.
-    void restart() { _generator = LogGenerator::generatorFromTechnology(Value(_technology), _roles); }
+    void restart() { _generator = LogGenerator::generatorFromTechnology(Value(_technology), roles); }
 
     void receiveAll()
     {
@@ -63,16 +59,10 @@ public:
     }
 
     State state;
-    RecordingLog log;
 
 private:
     std::string_view _technology;
     std::vector<LogCode> _codes;
-    RecordingConsole _console;
-    VirtualClock _clock;
-    MemoryBundle _bundle;
-    PropertyListCodec _propertyLists;
-    DecodingRoles _roles{log, _console, _clock, _bundle, _propertyLists};
     std::unique_ptr<LogGenerator> _generator;
 };
 

@@ -57,7 +57,6 @@ inline constexpr std::string_view kVoxCellTechnology_GSM = "kVoxCellTechnology_G
 inline constexpr std::string_view kVoxCellTechnology_UMTS = "kVoxCellTechnology_UMTS";
 inline constexpr std::string_view kVoxCellTechnology_LTE = "kVoxCellTechnology_LTE";
 inline constexpr std::string_view kVoxCellTechnology_UTRAN2 = "kVoxCellTechnology_UTRAN2";
-inline constexpr std::string_view kVoxCellTechnology_CDMA = "kVoxCellTechnology_CDMA";
 inline constexpr std::string_view kVoxCellType_Serving = "kVoxCellType_Serving";
 inline constexpr std::string_view kVoxCellType_Neighbor = "kVoxCellType_Neighbor";
 // ... and its numbers.

@@ -1,9 +1,9 @@
 #include "tools/Decoding.h"
 
 #include "platform/ChannelMessage.h"
+#include "platform/Clock.h"
 #include "platform/PropertyLists.h"
 #include "platform/TelephonyService.h"
-#include "platform/Time.h"
 #include "support/Format.h"
 
 #include <algorithm>

@@ -1,5 +1,5 @@
 #include "platform/TelephonyService.h"
-#include "platform/linux/LinuxBundle.h"
+#include "platform/posix/LinuxBundle.h"
 #include "tools/Harmless.h"
 #include "tools/Program.h"
 

@@ -1,9 +1,11 @@
 #include "ui/KestrumApp.h"
 
 #include "core/KestrumModelNode.h"
+#include "platform/Clock.h"
 #include "platform/FileSystem.h"
 #include "platform/Preferences.h"
-#include "platform/Time.h"
+#include "platform/TableScreen.h"
+#include "platform/Toolkit.h"
 #include "ui/ConnectionHint.h"
 
 #include <utility>

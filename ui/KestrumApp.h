@@ -1,9 +1,10 @@
 #pragma once
 
 #include "core/KestrumModel.h"
+#include "platform/ApplicationDelegate.h"
 #include "platform/MainQueue.h"
 #include "platform/Roles.h"
-#include "platform/Toolkit.h"
+#include "platform/Window.h"
 #include "ui/DateFormatter.h"
 #include "ui/KestrumPaneController.h"
 #include "ui/KestrumSaveViewController.h"

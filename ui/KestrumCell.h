@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/ScrollView.h"
+#include "platform/TableView.h"
 #include "platform/Toolkit.h"
 
 #include <memory>

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
 
 #include <memory>

@@ -1,10 +1,11 @@
 #include "ui/KestrumSaveViewController.h"
 
+#include "platform/Clock.h"
 #include "platform/FileSystem.h"
 #include "platform/MainQueue.h"
 #include "platform/PropertyLists.h"
 #include "platform/SystemLog.h"
-#include "platform/Time.h"
+#include "platform/Toolkit.h"
 #include "support/Format.h"
 #include "ui/SharedApplication.h"
 

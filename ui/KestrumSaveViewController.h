@@ -1,7 +1,7 @@
 #pragma once
 
 #include "platform/Roles.h"
-#include "platform/Toolkit.h"
+#include "platform/SaveInterface.h"
 #include "support/Date.h"
 #include "support/Value.h"
 

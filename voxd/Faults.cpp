@@ -2,8 +2,8 @@
 
 #include "platform/SystemLog.h"
 #include "platform/TelephonyService.h"
-#include "platform/linux/FrameSocket.h"
-#include "platform/linux/VoxProtocol.h"
+#include "platform/posix/VoxProtocol.h"
+#include "platform/qt/FrameSocket.h"
 #include "support/Format.h"
 
 #include <algorithm>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/linux/Frame.h"
+#include "platform/posix/Frame.h"
 #include "voxd/Source.h"
 
 #include <cstddef>

@@ -1,8 +1,8 @@
 #include "voxd/Service.h"
 
 #include "platform/SystemLog.h"
-#include "platform/linux/RuntimeDirectory.h"
-#include "platform/linux/VoxProtocol.h"
+#include "platform/posix/RuntimeDirectory.h"
+#include "platform/posix/VoxProtocol.h"
 #include "support/Format.h"
 
 #include <algorithm>

@@ -2,7 +2,7 @@
 
 #include "platform/PropertyLists.h"
 #include "platform/TelephonyService.h"
-#include "platform/linux/FrameSocket.h"
+#include "platform/qt/FrameSocket.h"
 #include "voxd/ServiceChannel.h"
 #include "voxd/Source.h"
 

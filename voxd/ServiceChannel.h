@@ -1,7 +1,7 @@
 #pragma once
 
 #include "platform/PropertyLists.h"
-#include "platform/linux/FrameSocket.h"
+#include "platform/qt/FrameSocket.h"
 #include "voxd/Outbox.h"
 #include "voxd/Subscription.h"
 

@@ -1,22 +1,54 @@
+#include "apps/kestrum-terminal/TextDisplay.h"
 #include "frontends/terminal/TerminalToolkit.h"
-#include "frontends/terminal/TextDisplay.h"
-#include "platform/linux/LinuxDevice.h"
+#include "platform/posix/SignalPipe.h"
+#include "platform/qt/LinuxDevice.h"
 #include "ui/KestrumApp.h"
 
 #include <CLI/CLI.hpp>
 #include <QCoreApplication>
+#include <QSocketNotifier>
 
+#include <csignal>
 #include <fcntl.h>
 #include <iostream>
+#include <string>
 #include <unistd.h>
 
 using namespace kestrum;
+
+namespace {
+
+/// Prints the display to standard output, and gives the exit status. A signal that ends it leaves nothing behind; the
+/// status is then 128 and its number.
+int printDisplay(MonitorRoles& roles, int refreshes)
+{
+    std::signal(SIGPIPE, SIG_IGN); // a reader that goes away is told by the write
+    int endedBy = 0;
+    SignalPipe pipe({SIGTERM, SIGHUP, SIGINT});
+    QSocketNotifier signalled(pipe.descriptor(), QSocketNotifier::Read);
+    QObject::connect(&signalled, &QSocketNotifier::activated, [&] {
+        for (const int each : pipe.taken())
+            endedBy = each;
+        if (endedBy != 0)
+            QCoreApplication::quit();
+    });
+    TextDisplay display(roles, std::cout, refreshes, [](int status, const std::string& why) {
+        if (!why.empty())
+            std::cerr << "kestrum-terminal: " << why << '\n';
+        QCoreApplication::exit(status);
+    });
+    display.start();
+    const int status = QCoreApplication::exec();
+    return endedBy == 0 ? status : 128 + endedBy;
+}
+
+} // namespace
 
 int main(int argc, char** argv)
 {
     // What the program opens first would take the place of a closed output.
     const bool hasOutput = fcntl(STDOUT_FILENO, F_GETFD) != -1;
-    const auto charset = chooseLocale();
+    const auto charset = terminal::chooseLocale();
     const QCoreApplication loop(argc, argv);
 
     CLI::App arguments("Cellular field test in a terminal. Keys: ? shows them.");
@@ -33,7 +65,7 @@ int main(int argc, char** argv)
         return arguments.exit(error) == 0 ? 0 : 2;
     }
 
-    const auto problem = TerminalToolkit::problem();
+    const auto problem = terminal::TerminalToolkit::problem();
     if (!*text && problem) {
         std::cerr << "kestrum-terminal: " << problem->text << "; --text prints without one\n";
         return 1;
@@ -46,7 +78,7 @@ int main(int argc, char** argv)
     if (refreshes == 0)
         refreshes = kRefreshes;
 
-    TerminalToolkit toolkit(charset);
+    terminal::TerminalToolkit toolkit(charset);
     LinuxDevice device("kestrum-terminal", LinuxDevice::Output::Quiet);
     auto roles = device.applicationRoles(toolkit);
     int status = 0;

@@ -1,6 +1,6 @@
 #include "frontends/qt/QtToolkit.h"
 #include "platform/Toolkit.h"
-#include "platform/linux/LinuxDevice.h"
+#include "platform/qt/LinuxDevice.h"
 #include "ui/KestrumApp.h"
 
 int main()

@@ -1,8 +1,8 @@
 // Messages from one process to another through the message ports: this program sends to itself, started once more.
 #include "platform/SystemLog.h"
-#include "platform/linux/FrameSocket.h"
-#include "platform/linux/LinuxMessagePorts.h"
-#include "platform/linux/QtMainQueue.h"
+#include "platform/qt/FrameSocket.h"
+#include "platform/qt/LinuxMessagePorts.h"
+#include "platform/qt/QtMainQueue.h"
 #include "scenarios/Drive.h"
 
 #include <QCoreApplication>

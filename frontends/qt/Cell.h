@@ -1,6 +1,7 @@
 #pragma once
 
 #include "frontends/qt/Drawn.h"
+#include "platform/TableCell.h"
 
 #include <QWidget>
 #include <vector>

@@ -1,7 +1,8 @@
 #pragma once
 
 #include "frontends/qt/Colours.h"
-#include "platform/Toolkit.h"
+#include "platform/Label.h"
+#include "platform/ScrollView.h"
 
 #include <QFont>
 #include <QObject>

@@ -2,6 +2,7 @@
 
 #include "frontends/qt/Alert.h"
 #include "frontends/qt/Navigation.h"
+#include "platform/Window.h"
 
 namespace kestrum::qt {
 

@@ -5,6 +5,7 @@
 #include "frontends/qt/Motion.h"
 #include "frontends/qt/SaveSheet.h"
 #include "frontends/qt/Screen.h"
+#include "platform/NavigationView.h"
 
 #include <QPointer>
 

@@ -5,8 +5,9 @@
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Icon.h"
 #include "frontends/qt/MainWindow.h"
-#include "frontends/qt/TerminationSignals.h"
 #include "frontends/qt/Type.h"
+#include "platform/ApplicationDelegate.h"
+#include "platform/qt/TerminationSignals.h"
 
 #include <QApplication>
 #include <cstdio>

@@ -3,6 +3,7 @@
 #include "frontends/qt/Button.h"
 #include "frontends/qt/Table.h"
 #include "frontends/qt/Toolbar.h"
+#include "platform/SaveInterface.h"
 
 #include <QLineEdit>
 

@@ -3,6 +3,7 @@
 #include "frontends/qt/Table.h"
 #include "frontends/qt/Toolbar.h"
 #include "frontends/qt/Type.h"
+#include "platform/TableScreen.h"
 
 namespace kestrum::qt {
 

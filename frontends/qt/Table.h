@@ -1,9 +1,9 @@
 #pragma once
 
+#include "frontends/ReusePool.h"
 #include "frontends/qt/Cell.h"
-#include "platform/FollowedRow.h"
-#include "platform/ReusePool.h"
-#include "platform/Toolkit.h"
+#include "frontends/qt/FollowedRow.h"
+#include "platform/TableView.h"
 
 #include <QAbstractScrollArea>
 #include <QLabel>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/Toolkit.h"
+#include "platform/ToolbarItem.h"
 
 #include <QLabel>
 #include <QVariantAnimation>

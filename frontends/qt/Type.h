@@ -1,6 +1,7 @@
 #pragma once
 
-#include "platform/Toolkit.h"
+#include "platform/Font.h"
+#include "platform/Geometry.h"
 
 #include <QFont>
 #include <QRectF>

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <string>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 Area drawBox(Screen& screen, int rows, int columns)
 {
@@ -25,4 +25,4 @@ Area drawBox(Screen& screen, int rows, int columns)
     return {top + 1, left + 2, std::max(0, rows - 2), std::max(0, columns - 4)};
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -4,7 +4,7 @@
 #include <cmath>
 #include <stdexcept>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -148,4 +148,4 @@ void TerminalCell::draw(const Line& line) const
     line.part(_columns - kInset - 1, 1).put(0, mark(_accessory), {.colour = Colour::Accent});
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -1,7 +1,8 @@
 #pragma once
 
 #include "frontends/terminal/Screen.h"
-#include "platform/Toolkit.h"
+#include "platform/ScrollView.h"
+#include "platform/TableCell.h"
 
 #include <memory>
 #include <optional>
@@ -10,7 +11,7 @@
 
 /// What the rows of a table are made of. A row takes one line whatever its height in points, so only the x of a frame
 /// matters. A column is 10 points wide: the cells' inset is one column then, their gap between key and value five.
-namespace kestrum {
+namespace kestrum::terminal {
 
 inline constexpr double kPointsPerColumn = 10, kPointsPerLine = 20;
 
@@ -111,4 +112,4 @@ private:
     Subviews _content;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

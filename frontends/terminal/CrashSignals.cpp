@@ -10,7 +10,7 @@
 #include <curses.h>
 #include <term.h>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -89,4 +89,4 @@ CrashSignals::~CrashSignals()
         sigaction(kSignals[i], &before[i], nullptr);
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -2,7 +2,7 @@
 
 #include <termios.h>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// While the screen is up, the signals of a crash first give the terminal back, and then end the program as they would
 /// have done. Made once the terminal library has opened the screen; one at a time.
@@ -14,4 +14,4 @@ public:
     CrashSignals& operator=(const CrashSignals&) = delete;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

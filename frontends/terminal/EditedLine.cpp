@@ -4,7 +4,7 @@
 #include <cwchar>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -95,4 +95,4 @@ void EditedLine::eraseTo(std::size_t place)
     _cursor = std::min(place, _cursor);
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -5,7 +5,7 @@
 #include <cstddef>
 #include <string>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// One line of text under edit, and the place where the next character goes.
 class EditedLine {
@@ -27,4 +27,4 @@ private:
     std::size_t _cursor = 0;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -6,7 +6,7 @@
 #include <array>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -143,7 +143,7 @@ void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool
         if (!_jump->found)
             bottom.put(end + kGap, "no such row", {.colour = Colour::Danger});
         cursorRow = _bottom;
-        cursorColumn = kInset + 1 + kestrum::columns(_jump->name.beforeCursor());
+        cursorColumn = kInset + 1 + terminal::columns(_jump->name.beforeCursor());
     } else if (!_toolbarHidden) {
         drawToolbar(bottom, spinner);
     }
@@ -345,4 +345,4 @@ void TerminalNavigationView::handleCommand(wchar_t key)
     }
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

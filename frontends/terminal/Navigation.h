@@ -5,7 +5,9 @@
 #include "frontends/terminal/SaveScreen.h"
 #include "frontends/terminal/Screen.h"
 #include "frontends/terminal/Table.h"
-#include "platform/Toolkit.h"
+#include "platform/NavigationView.h"
+#include "platform/SaveInterface.h"
+#include "platform/TableScreen.h"
 
 #include <cstddef>
 #include <functional>
@@ -14,7 +16,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// A pane: rows, and what stands in the bottom line.
 class TerminalTableScreen final : public TableScreen {
@@ -97,4 +99,4 @@ private:
     std::string _lastJump;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -1,6 +1,6 @@
 #pragma once
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// Whoever shows something else than before asks for the screen to be drawn anew.
 class Repaint {
@@ -10,4 +10,4 @@ public:
     virtual void repaintLater() = 0;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <string_view>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -179,4 +179,4 @@ void TerminalSaveInterface::press(const Input& input)
     }
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

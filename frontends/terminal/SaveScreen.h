@@ -4,13 +4,13 @@
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/Screen.h"
 #include "frontends/terminal/Table.h"
-#include "platform/Toolkit.h"
+#include "platform/SaveInterface.h"
 
 #include <functional>
 #include <optional>
 #include <string>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// The field of the save screen.
 class TerminalTextField final : public TextField {
@@ -59,4 +59,4 @@ private:
     Area _descriptionArea, _saveArea, _cancelArea, _tableArea; // as last drawn, for the mouse
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -10,7 +10,7 @@
 #include <sys/ioctl.h>
 #include <unistd.h>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -317,7 +317,7 @@ int Line::put(int column, std::string_view text, Style style) const
 
 void Line::putRight(std::string_view text, Style style) const
 {
-    put(_end - _origin - kestrum::columns(text), text, style);
+    put(_end - _origin - terminal::columns(text), text, style);
 }
 
 void Line::fill(Style style) const
@@ -334,4 +334,4 @@ void Line::markCut(bool left, bool right) const
         put(_end - 1, {L"…", 1}, {.colour = Colour::Accent});
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -9,7 +9,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// Of the terminal's own palette.
 enum class Colour { Plain, Accent, Danger };
@@ -138,4 +138,4 @@ private:
     bool _chosen = false;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

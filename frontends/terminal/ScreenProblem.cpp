@@ -7,7 +7,7 @@
 #include <curses.h>
 #include <term.h>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 std::optional<Problem> Screen::problem()
 {
@@ -26,4 +26,4 @@ std::optional<Problem> Screen::problem()
     return std::nullopt;
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

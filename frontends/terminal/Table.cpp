@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -281,4 +281,4 @@ std::size_t TerminalTable::top() const
     return std::min(_top, _rows - std::min(_rows, height()));
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

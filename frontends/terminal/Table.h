@@ -3,7 +3,7 @@
 #include "frontends/terminal/Cells.h"
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/Screen.h"
-#include "platform/Toolkit.h"
+#include "platform/TableView.h"
 
 #include <cstddef>
 #include <map>
@@ -13,7 +13,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// Rows, one to a line, one of them chosen.
 class TerminalTable final : public TableView {
@@ -80,4 +80,4 @@ private:
     std::shared_ptr<ReusableCell> _reader;  // in no row: names are read with it
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -6,7 +6,7 @@
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/SaveScreen.h"
 #include "frontends/terminal/Screen.h"
-#include "frontends/terminal/Signals.h"
+#include "platform/posix/SignalPipe.h"
 
 #include <QCoreApplication>
 #include <QSocketNotifier>
@@ -20,7 +20,7 @@
 #include <unistd.h>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -156,7 +156,7 @@ struct TerminalToolkit::Parts final : Repaint {
     std::deque<Alert> alerts;
     QTimer repaint, turn;
     std::size_t spinnerPicture = 0;
-    std::optional<Signals> signals;
+    std::optional<SignalPipe> signals;
     std::unique_ptr<QSocketNotifier> input, signalled;
     bool ended = false;
 };
@@ -275,4 +275,4 @@ int TerminalToolkit::run(ApplicationDelegate& application)
     return status;
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -1,14 +1,20 @@
 #pragma once
 
 #include "frontends/terminal/Text.h"
+#include "platform/ApplicationDelegate.h"
+#include "platform/NavigationView.h"
+#include "platform/SaveInterface.h"
+#include "platform/ScrollView.h"
+#include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
+#include "platform/Window.h"
 #include "support/Problem.h"
 
 #include <memory>
 #include <optional>
 #include <string>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// The UI toolkit on a terminal: standard input and output. Its main loop is the QCoreApplication's, which must exist.
 /// One at a time.
@@ -41,4 +47,4 @@ private:
     std::unique_ptr<Parts> _parts;
 };
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -12,7 +12,7 @@
 #include <utility>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::terminal {
 
 namespace {
 
@@ -208,13 +208,13 @@ std::vector<std::string> wrapped(std::string_view text, int width)
     std::vector<std::string> lines;
     while (width > 1 && !text.empty()) {
         const auto line = text.substr(0, text.find('\n'));
-        const bool fits = kestrum::fits(line, width);
+        const bool fits = terminal::fits(line, width);
         auto end = fits ? line.size() : bytesIn(line, width);
         if (!fits) {
             // At a blank, unless that leaves a word which finds no line to itself anyway.
             const auto blank = line.rfind(' ', end);
             const auto next = blank == line.npos ? line : line.substr(blank + 1);
-            if (blank != line.npos && kestrum::fits(next.substr(0, next.find(' ')), width))
+            if (blank != line.npos && terminal::fits(next.substr(0, next.find(' ')), width))
                 end = blank;
         }
         lines.emplace_back(line.substr(0, end));
@@ -230,4 +230,4 @@ bool contains(std::string_view whole, std::string_view part)
     return folded(whole).find(folded(part)) != std::wstring::npos;
 }
 
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -7,7 +7,7 @@
 #include <vector>
 
 /// Text as a terminal shows it. Widths come from wcwidth(3), so the process runs in a UTF-8 locale.
-namespace kestrum {
+namespace kestrum::terminal {
 
 /// What the terminal can show.
 enum class Charset { Unicode, Ascii };
@@ -60,4 +60,4 @@ std::vector<std::string> wrapped(std::string_view text, int width);
 /// Whether `part` occurs in `whole`, upper and lower case alike.
 bool contains(std::string_view whole, std::string_view part);
 
-} // namespace kestrum
+} // namespace kestrum::terminal

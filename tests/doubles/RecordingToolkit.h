@@ -1,7 +1,13 @@
 #pragma once
 
-#include "platform/ReusePool.h"
+#include "frontends/ReusePool.h"
+#include "platform/ApplicationDelegate.h"
+#include "platform/NavigationView.h"
+#include "platform/SaveInterface.h"
+#include "platform/ScrollView.h"
+#include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
+#include "platform/Window.h"
 
 #include <algorithm>
 #include <functional>

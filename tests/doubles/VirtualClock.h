@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/Time.h"
+#include "platform/Clock.h"
 
 #include <map>
 #include <string>

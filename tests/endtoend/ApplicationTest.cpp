@@ -1,6 +1,6 @@
 #include "EndToEnd.h"
 #include "frontends/qt/MainWindow.h"
-#include "platform/linux/LinuxDevice.h"
+#include "platform/qt/LinuxDevice.h"
 #include "ui/KestrumApp.h"
 
 #include <QTest>

@@ -2,9 +2,8 @@
 
 #include "doubles/Places.h"
 #include "doubles/QtTestToolkit.h"
-#include "linux/EventLoop.h"
-#include "linux/Scratch.h"
-#include "platform/Toolkit.h"
+#include "posix/Scratch.h"
+#include "qtplatform/EventLoop.h"
 
 #include <QProcess>
 #include <gmock/gmock.h>

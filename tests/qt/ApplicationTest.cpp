@@ -2,12 +2,12 @@
 
 #include "core/KestrumModelNode.h"
 #include "doubles/MemoryFileSystem.h"
-#include "doubles/MonitorDoubles.h"
 #include "doubles/RecordingPreferences.h"
 #include "doubles/ScratchDirectory.h"
 #include "frontends/qt/Motion.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "ui/KestrumApp.h"
+#include "ui/ServedModem.h"
 
 namespace kestrum {
 namespace {
@@ -16,15 +16,6 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-constexpr const char* kMarker = "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
-constexpr const char* kCommands = "vox.commands";
-
-/// Two entries at least, so that the modem's wrapper dictionaries do not matter here.
-Value cellOf(const char* rssi)
-{
-    return makeDictionary({{"RSSI", rssi}, {"Band", makeDictionary({{"Now", "3"}, {"Before", "8"}})}});
-}
-
 /// The application in a real window, writing real files; the service and the clock are the test's.
 class TheApplicationInItsWindow : public testing::Test {
 protected:
@@ -32,7 +23,7 @@ protected:
     {
         qt::setMotionWanted(false);
         qt::FocusRing::instance().setShown(false);
-        _files.paths.insert(kMarker);
+        _files.paths.insert(kInternalInstall);
         _files.logDirectory = directory.path();
     }
     ~TheApplicationInItsWindow() override
@@ -52,25 +43,7 @@ protected:
         ASSERT_NE(_window, nullptr);
         ASSERT_TRUE(QTest::qWaitForWindowActive(_window));
     }
-    /// A service with an IFX modem.
-    void serve()
-    {
-        const Value reply = makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}});
-        doubles.ports.serve(kCommands, [data = _codec.toXml(reply)](const MemoryPorts::Request& request) {
-            const bool asked = request.reply == RemotePort::Reply::Awaited;
-            return MemoryPorts::Answer{0, asked ? data : std::nullopt};
-        });
-    }
-    /// A message that holds the whole display, and the refresh that finds it.
-    void show(const Value& display)
-    {
-        const auto data = _codec.toXml(display);
-        ASSERT_TRUE(data);
-        const auto bytes = data->bytes();
-        ASSERT_TRUE(doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0,
-                                       {reinterpret_cast<const char*>(bytes.data()), bytes.size()}));
-        doubles.queue.advance(2s);
-    }
+    void show(const Value& display) { ASSERT_TRUE(modem.show(display)); }
 
     qt::Navigation& navigation() { return *_window->root(); }
     std::string title() { return navigation().titleBar().title().toStdString(); }
@@ -116,6 +89,11 @@ protected:
 
 private:
     PropertyListCodec _codec;
+
+protected:
+    ServedModem modem{doubles, _codec};
+
+private:
     RecordingPreferences _preferences;
     MemoryFileSystem _files;
     ApplicationRoles _roles{{{doubles.log, doubles.console, doubles.clock, doubles.bundle, _codec, nullptr},
@@ -131,13 +109,13 @@ private:
 
 TEST_F(TheApplicationInItsWindow, ReturnsToTheRootUnderTheSheetWhenAMiddlePaneIsGone)
 {
-    serve();
+    modem.serve();
     launch();
-    show(makeDictionary({{"Serving", cellOf("-80 dBm")}, {"Neighbour", cellOf("-95 dBm")}}));
+    show(makeDictionary({{"Serving", ServedModem::cell("-80 dBm")}, {"Neighbour", ServedModem::cell("-95 dBm")}}));
     open("Serving");
     open("Band");
     openSaveScreen();
-    show(makeDictionary({{"Other", cellOf("-70 dBm")}, {"Neighbour", cellOf("-94 dBm")}}));
+    show(makeDictionary({{"Other", ServedModem::cell("-70 dBm")}, {"Neighbour", ServedModem::cell("-94 dBm")}}));
     EXPECT_EQ(title(), "Kestrum");
     EXPECT_THAT(rows(), ElementsAre("Other", "Neighbour"));
     ASSERT_NE(navigation().sheet(), nullptr);
@@ -153,7 +131,7 @@ TEST_F(TheApplicationInItsWindow, ReturnsToTheRootUnderTheSheetWhenAMiddlePaneIs
 
 TEST_F(TheApplicationInItsWindow, SavesAnEmptyHistory)
 {
-    serve();
+    modem.serve();
     launch();
     openSaveScreen();
     EXPECT_TRUE(navigation().sheet()->table().cellsInView().empty());

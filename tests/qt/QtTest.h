@@ -3,7 +3,10 @@
 #include "doubles/QtTestToolkit.h"
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/MainWindow.h"
+#include "platform/NavigationView.h"
+#include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
+#include "platform/Window.h"
 #include "ui/KestrumCell.h"
 
 #include <gmock/gmock.h>

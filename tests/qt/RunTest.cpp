@@ -1,5 +1,7 @@
 #include "QtTest.h"
 
+#include "platform/ApplicationDelegate.h"
+
 #include <QTimer>
 
 #include <csignal>

@@ -1,9 +1,9 @@
 #include "Demonstration.h"
 #include "Pseudoterminal.h"
+#include "apps/kestrum-terminal/TextDisplay.h"
 #include "core/KestrumModelNode.h"
 #include "doubles/MonitorDoubles.h"
 #include "doubles/Places.h"
-#include "frontends/terminal/TextDisplay.h"
 
 #include <gmock/gmock.h>
 

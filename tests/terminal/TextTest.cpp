@@ -8,7 +8,7 @@
 #include <sys/mman.h>
 #include <unistd.h>
 
-namespace kestrum {
+namespace kestrum::terminal {
 namespace {
 
 class TerminalText : public testing::Test {
@@ -215,4 +215,4 @@ TEST_F(TerminalEditedLine, LeavesOtherKeysAndControlCharactersAlone)
 }
 
 } // namespace
-} // namespace kestrum
+} // namespace kestrum::terminal

@@ -2,7 +2,7 @@
 #include "Tool.h"
 #include "capture/Messages.h"
 #include "platform/TelephonyService.h"
-#include "platform/linux/LinuxBundle.h"
+#include "platform/posix/LinuxBundle.h"
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <gmock/gmock.h>

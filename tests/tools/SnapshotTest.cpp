@@ -3,7 +3,7 @@
 #include "capture/Messages.h"
 #include "doubles/DecodingDoubles.h"
 #include "doubles/ScratchDirectory.h"
-#include "platform/linux/LinuxBundle.h"
+#include "platform/posix/LinuxBundle.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "tools/Decoding.h"
 #include "voxd/scenarios/Scenario.h"

@@ -2,6 +2,7 @@
 
 #include "doubles/ApplicationDoubles.h"
 #include "ui/ConnectionHint.h"
+#include "ui/ServedModem.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -13,16 +14,12 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-constexpr const char* kMarker = "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
-constexpr const char* kCommands = "vox.commands";
-
-/// Two entries at least, so that the modem's wrapper dictionaries do not matter here.
 Value cell(const char* rssi)
 {
-    return makeDictionary({{"RSSI", rssi}, {"Band", makeDictionary({{"Now", "3"}, {"Before", "8"}})}});
+    return ServedModem::cell(rssi);
 }
 
-/// The application on its doubles, with a telephony service that the test brings up and down.
+/// The application on its doubles.
 class KestrumAppTest : public testing::Test {
 protected:
     void TearDown() override { EXPECT_THAT(doubles.toolkit.record.faults, IsEmpty()); }
@@ -32,28 +29,13 @@ protected:
         app = KestrumApp::make(doubles.applicationRoles);
         app->applicationDidFinishLaunching();
     }
-    /// A service whose modem runs that technology.
-    void serve(std::string_view technology = "kVoxLogChannelTechnology_IFX")
-    {
-        doubles.propertyLists.parsed["reply"] = makeDictionary({{"GetTechnology", technology}});
-        doubles.ports.serve(kCommands, [](const MemoryPorts::Request& request) {
-            const bool asked = request.reply == RemotePort::Reply::Awaited;
-            return MemoryPorts::Answer{0, asked ? std::optional(Data(bytesOf("reply"))) : std::nullopt};
-        });
-    }
     void launchConnected()
     {
-        serve();
+        modem.serve();
         launch();
         doubles.queue.run();
     }
-    /// A message that holds the whole display, and the refresh that finds it.
-    void show(Value display)
-    {
-        doubles.propertyLists.parsed["message"] = std::move(display);
-        ASSERT_TRUE(doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0, "message"));
-        doubles.queue.advance(2s);
-    }
+    void show(const Value& display) { ASSERT_TRUE(modem.show(display)); }
     void showCells() { show(makeDictionary({{"Serving", cell("-80 dBm")}, {"Neighbor", cell("-95 dBm")}})); }
     void open(std::string_view key)
     {
@@ -66,6 +48,7 @@ protected:
     const std::vector<std::string>& path() const { return doubles.toolkit.navigation->path; }
 
     ApplicationDoubles doubles;
+    ServedModem modem{doubles, doubles.propertyLists};
     std::shared_ptr<KestrumApp> app;
 };
 
@@ -73,7 +56,7 @@ protected:
 
 TEST_F(KestrumAppTest, FirstScreenIsUpBeforeAnythingIsOpened)
 {
-    serve();
+    modem.serve();
     launch();
     EXPECT_TRUE(doubles.toolkit.window->visible);
     EXPECT_EQ(doubles.toolkit.windowFrame, (Rect{0, 0, 320, 480}));
@@ -100,7 +83,7 @@ TEST_F(KestrumAppTest, VeryFirstStatusIsConnectingWithoutDots)
 
 TEST_F(KestrumAppTest, MonitoringStartsOnlyWhileTheApplicationHasAModel)
 {
-    serve();
+    modem.serve();
     launch();
     app->applicationWillTerminate();
     doubles.queue.advance(10s);
@@ -122,13 +105,13 @@ TEST_F(KestrumAppTest, StatusFollowsConnectDataLossAndReconnect)
     doubles.queue.advance(2s);
     EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44") << "a refresh without new data";
 
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(2s);
     EXPECT_EQ(top().status(), "Connecting...");
     EXPECT_TRUE(top().isLoading());
     EXPECT_THAT(top().rows.texts(), ElementsAre("Serving", "Neighbor")) << "what was seen last stays";
 
-    serve();
+    modem.serve();
     doubles.queue.advance(5s);
     EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44") << "the old text until new data comes";
     EXPECT_FALSE(top().isLoading());
@@ -149,7 +132,7 @@ TEST_F(KestrumAppTest, UpdateMessageStandsWhileThereIsNoConnection)
 {
     launchConnected();
     showCells();
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(2s);
     app->updateViewControllerFromModel();
     EXPECT_EQ(app->updateMessage(), "Updated 2026-11-16 at 06:05:44");
@@ -163,7 +146,7 @@ TEST_F(KestrumAppTest, PaneThatIsOpenedOrRevealedShowsTheStatusOfTheMoment)
     open("Serving");
     EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:44");
 
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(2s);
     EXPECT_EQ(top().status(), "Connecting...");
     doubles.toolkit.navigation->pressBack();
@@ -185,7 +168,7 @@ TEST_F(KestrumAppTest, RootPaneSaysAfterTenSecondsWhatItWaitsFor)
     EXPECT_TRUE(top().isLoading());
     EXPECT_EQ(top().title(), "Kestrum");
 
-    serve();
+    modem.serve();
     doubles.queue.advance(5s);
     EXPECT_FALSE(top().isLoading());
     EXPECT_EQ(top().hint, "");
@@ -195,7 +178,7 @@ TEST_F(KestrumAppTest, ConnectionThatComesInTimeLeavesNoHint)
 {
     launch();
     doubles.queue.advance(7s);
-    serve();
+    modem.serve();
     doubles.queue.advance(20s);
     EXPECT_EQ(top().hint, "");
 }
@@ -204,7 +187,7 @@ TEST_F(KestrumAppTest, LostConnectionIsWaitedForTenSecondsAnew)
 {
     launchConnected();
     doubles.queue.advance(60s);
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(2s); // the refresh that finds it
     doubles.queue.advance(9999ms);
     EXPECT_EQ(top().hint, "");
@@ -217,7 +200,7 @@ TEST_F(KestrumAppTest, HintIsTheRootPanesWhateverIsOpen)
     launchConnected();
     showCells();
     open("Serving");
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(20s);
     EXPECT_EQ(top().hint, "");
     doubles.toolkit.navigation->pressBack();
@@ -389,9 +372,9 @@ TEST_F(KestrumAppTest, AnotherTechnologysDisplayClosesWhatWasOpenInTheOldOne)
     launchConnected();
     showCells();
     open("Serving");
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(2s);
-    serve("kVoxLogChannelTechnology_Zephra_LTE");
+    modem.serve("kVoxLogChannelTechnology_Zephra_LTE");
     doubles.queue.advance(5s);
     EXPECT_THAT(path(), ElementsAre("Kestrum"));
     EXPECT_THAT(top().rows.texts(), IsEmpty()) << "nothing of the old display looks current";
@@ -412,7 +395,7 @@ TEST_F(KestrumAppTest, WithoutTheInternalInstallMarkerNoPaneOffersSave)
 
 TEST_F(KestrumAppTest, WithTheInternalInstallMarkerEveryPaneOffersSave)
 {
-    doubles.files.paths.insert(kMarker);
+    doubles.files.paths.insert(kInternalInstall);
     launchConnected();
     EXPECT_TRUE(app->allowSaveButton());
     EXPECT_NE(top().saveButton(), nullptr);
@@ -423,7 +406,7 @@ TEST_F(KestrumAppTest, WithTheInternalInstallMarkerEveryPaneOffersSave)
 
 class KestrumAppSaveTest : public KestrumAppTest {
 protected:
-    KestrumAppSaveTest() { doubles.files.paths.insert(kMarker); }
+    KestrumAppSaveTest() { doubles.files.paths.insert(kInternalInstall); }
 
     RecordingNavigationView& navigation() { return *doubles.toolkit.navigation; }
     const Value& file(const char* path) { return doubles.propertyLists.files.at(path); }
@@ -514,8 +497,8 @@ TEST_F(KestrumAppSaveTest, CancelPressedTwiceClosesOnce)
 
 TEST_F(KestrumAppSaveTest, FailedWriteClosesTheScreenBehindItsAlert)
 {
-    doubles.propertyLists.writable = false;
     launchConnected();
+    doubles.propertyLists.writable = false;
     top().pressSave();
     navigation().presented->owner.savePressed();
     doubles.queue.run();
@@ -553,7 +536,7 @@ TEST_F(KestrumAppSaveTest, ScreenTakesTheKeyboardFromThePaneAndGivesItBackItsToo
     top().pressSave();
     EXPECT_EQ(top().resigned, 1);
 
-    doubles.ports.kill(kCommands);
+    modem.kill();
     doubles.queue.advance(2s);
     navigation().presented->owner.cancelPressed();
     doubles.queue.run();
@@ -626,7 +609,7 @@ TEST_F(KestrumAppTest, RunningMonitorKeepsTheChannelOpenUntilTheQueueIsDropped)
     app->applicationWillTerminate();
     EXPECT_TRUE(doubles.ports.hasLocal("org.kestrum.vox.baseband-state-report.log"));
     const int reloads = top().rows.reloads;
-    doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0, "message");
+    modem.send(cell("-80 dBm"));
     doubles.queue.advance(4s);
     EXPECT_EQ(top().rows.reloads, reloads) << "nobody is told any more";
 
@@ -637,8 +620,7 @@ TEST_F(KestrumAppTest, RunningMonitorKeepsTheChannelOpenUntilTheQueueIsDropped)
 TEST_F(KestrumAppTest, ModelOutlivesTheApplicationUnharmed)
 {
     launchConnected();
-    doubles.propertyLists.parsed["message"] = cell("-80 dBm");
-    doubles.ports.send("org.kestrum.vox.baseband-state-report.log", 0, "message");
+    modem.send(cell("-80 dBm"));
     app.reset();
     EXPECT_EQ(doubles.toolkit.record.windows, 0);
     doubles.queue.advance(10s);

@@ -1,4 +1,4 @@
-#include "platform/ReusePool.h"
+#include "frontends/ReusePool.h"
 
 #include <gtest/gtest.h>
 

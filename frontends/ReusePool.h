@@ -1,0 +1,31 @@
+#pragma once
+
+#include "platform/ReusableCell.h"
+
+#include <cstddef>
+#include <map>
+#include <memory>
+#include <string_view>
+
+namespace kestrum {
+
+/// The cells of a table that may be used again. A row gets back the cell that last showed it, so that a reload of an
+/// unchanged table keeps every row as it was.
+class ReusePool {
+public:
+    /// A row without a cell of its own gets another row's only when more than `kept` of them wait: until then it is
+    /// better served by a new cell of the right kind.
+    explicit ReusePool(std::size_t kept = 256) : _kept(kept) {}
+
+    /// A cell that no longer shows its row.
+    void put(std::size_t row, std::shared_ptr<ReusableCell> cell);
+    /// Null when there is none with that identifier.
+    std::shared_ptr<ReusableCell> take(std::size_t row, std::string_view reuseIdentifier);
+    void clear() { _cells.clear(); }
+
+private:
+    std::size_t _kept;
+    std::multimap<std::size_t, std::shared_ptr<ReusableCell>> _cells;
+};
+
+} // namespace kestrum

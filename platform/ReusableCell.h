@@ -1,0 +1,28 @@
+#pragma once
+
+#include "platform/TableCell.h"
+
+#include <memory>
+#include <string>
+#include <string_view>
+#include <utility>
+
+namespace kestrum {
+
+/// A cell as a table keeps it for reuse: controllers derive from it to hold on to what they added.
+class ReusableCell {
+public:
+    ReusableCell(std::unique_ptr<TableCell> cell, std::string_view reuseIdentifier)
+        : _cell(std::move(cell)), _reuseIdentifier(reuseIdentifier)
+    {}
+    virtual ~ReusableCell() = default;
+
+    TableCell& cell() { return *_cell; }
+    const std::string& reuseIdentifier() const { return _reuseIdentifier; }
+
+private:
+    std::unique_ptr<TableCell> _cell;
+    std::string _reuseIdentifier;
+};
+
+} // namespace kestrum

@@ -1,0 +1,17 @@
+#pragma once
+
+#include "platform/View.h"
+
+#include <memory>
+
+namespace kestrum {
+
+/// A strip that scrolls sideways when its content is wider than its frame. A tap on it that does not scroll
+/// reaches the row behind it.
+class ScrollView : public View {
+public:
+    virtual void addSubview(std::shared_ptr<View> view) = 0;
+    virtual void setContentSize(Size size) = 0;
+};
+
+} // namespace kestrum

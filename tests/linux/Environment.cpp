@@ -1,7 +1,0 @@
-#include "linux/EventLoop.h"
-
-namespace {
-
-[[maybe_unused]] const auto* const environment = testing::AddGlobalTestEnvironment(new kestrum::EventLoopEnvironment);
-
-} // namespace

@@ -1,0 +1,68 @@
+#pragma once
+
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace kestrum {
+
+/// A directory that goes with this object.
+class ScratchDirectory {
+public:
+    ScratchDirectory()
+    {
+        std::string name = (std::filesystem::temp_directory_path() / "kestrum-test-XXXXXX").string();
+        _path = ::mkdtemp(name.data());
+    }
+    ScratchDirectory(const ScratchDirectory&) = delete;
+    ScratchDirectory& operator=(const ScratchDirectory&) = delete;
+    ~ScratchDirectory()
+    {
+        std::error_code ignored;
+        std::filesystem::remove_all(_path, ignored);
+    }
+
+    const std::string& path() const { return _path; }
+    std::string operator/(const std::string& name) const { return _path + "/" + name; }
+
+private:
+    std::string _path;
+};
+
+/// Writes a file, and makes the directories above it.
+inline void writeFile(const std::string& path, std::string_view text)
+{
+    std::filesystem::create_directories(std::filesystem::path(path).parent_path());
+    std::ofstream(path) << text;
+}
+
+/// An environment variable of another value, or without one, as long as this object lives.
+class ScopedVariable {
+public:
+    ScopedVariable(const char* name, std::optional<std::string> value) : _name(name)
+    {
+        if (const char* before = std::getenv(name))
+            _before = before;
+        set(value);
+    }
+    ScopedVariable(const ScopedVariable&) = delete;
+    ScopedVariable& operator=(const ScopedVariable&) = delete;
+    ~ScopedVariable() { set(_before); }
+
+private:
+    void set(const std::optional<std::string>& value)
+    {
+        if (value)
+            ::setenv(_name, value->c_str(), 1);
+        else
+            ::unsetenv(_name);
+    }
+
+    const char* _name;
+    std::optional<std::string> _before;
+};
+
+} // namespace kestrum
