@@ -240,12 +240,6 @@ bool FrameConnection::waitUntilSent(milliseconds timeout)
     return isOpen();
 }
 
-bool FrameConnection::waitForBytes(milliseconds timeout)
-{
-    const ScopedFlag waiting(_waiting);
-    return timeout.count() > 0 && _socket->waitForReadyRead(static_cast<int>(timeout.count()));
-}
-
 std::string FrameListener::listen(const std::string& path)
 {
     if (path.size() >= sizeof sockaddr_un::sun_path)
