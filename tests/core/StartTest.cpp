@@ -252,12 +252,25 @@ TEST_F(Start, StartCommandThatCannotBeSerialisedFails)
     EXPECT_TRUE(model->isConnected());
 }
 
+TEST_F(Start, ThatAnExceptionLeavesIsNotInTheWayOfTheNext)
+{
+    whileAsked = [] { throw std::runtime_error("thrown"); };
+    EXPECT_THROW(model->startMonitor(), std::runtime_error);
+    whileAsked = nullptr;
+    model->restartMonitor();
+    EXPECT_TRUE(model->isConnected());
+}
+
 TEST_F(Start, WithoutALocalPortTheServiceIsAskedAllTheSame)
 {
     ports.createsLocal = false;
     model->startMonitor();
     EXPECT_THAT(telephony.channelsAsked, ElementsAre(kLogPort));
     EXPECT_FALSE(model->isConnected());
+    EXPECT_EQ(queue.timers(), 0u);
+    ports.createsLocal = true;
+    seconds(5);
+    EXPECT_TRUE(model->isConnected());
 }
 
 TEST_F(Start, RetryAfterASuccessfulRestartDoesNothing)
