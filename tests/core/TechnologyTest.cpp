@@ -124,6 +124,28 @@ TEST_P(TechnologyIdentifier, ChoosesItsGenerator)
     EXPECT_EQ(generator->technology(), GetParam().identifier);
 }
 
+TEST_P(TechnologyIdentifier, ItsGeneratorNamesItselfInItsLines)
+{
+    log.showsAddresses = true;
+    bundle.paths = {"UTRAN.plist"}; // without it that generator is not initialised
+    auto generator = LogGenerator::generatorFromTechnology(GetParam().identifier, roles);
+    const auto address = formatted("%p", static_cast<const void*>(generator.get()));
+    EXPECT_EQ(log.count("Creating Log object: " + address), 1u);
+    State state;
+    try {
+        generator->updateState(state, bytesOf("neither a record nor a list"));
+    } catch (const std::exception& failure) {
+        EXPECT_THAT(failure.what(), testing::HasSubstr("<GSMLogGenerator: " + address + ">"));
+    }
+    log.lines.clear();
+    generator.reset();
+    for (const auto& [priority, text] : log.lines) {
+        if (text.find("is destructed") != text.npos) {
+            EXPECT_THAT(text, testing::EndsWith("LogGenerator is destructed " + address));
+        }
+    }
+}
+
 INSTANTIATE_TEST_SUITE_P(OfEach, TechnologyIdentifier,
                          testing::Values(Known{"kVoxLogChannelTechnology_IFX", is<GSMLogGenerator>},
                                          Known{"kVoxLogChannelTechnology_Zephra_GSM", is<ZPH_GSMLogGenerator>},
