@@ -5,6 +5,7 @@
 #include "platform/SystemLog.h"
 #include "platform/TelephonyService.h"
 #include "support/Format.h"
+#include "support/ScopedFlag.h"
 
 #include <chrono>
 #include <exception>
@@ -33,9 +34,7 @@ void KestrumModel::startMonitor()
     if (_displayUpdateTimer || _starting)
         return;
     const auto self = shared_from_this();
-    _starting = true;
     const auto failure = failureOfAttempt();
-    _starting = false;
     _problem = failure ? problemOfAttempt() : "";
     if (failure) {
         logError(*failure);
@@ -50,6 +49,7 @@ void KestrumModel::startMonitor()
 
 std::optional<std::string> KestrumModel::failureOfAttempt()
 {
+    const ScopedFlag starting(_starting);
     if (!createPorts())
         return "Could not create the ports necessary";
     configureGenerator();

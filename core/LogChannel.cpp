@@ -29,6 +29,7 @@ constexpr std::string_view kGetTechnology = "GetTechnology";
 
 bool KestrumModel::createPorts()
 {
+    const auto self = shared_from_this();
     _recvPort = _roles.ports.createLocal(
         kLogChannelServiceName, [this](std::int32_t messageId, Bytes payload) { handleMessage(messageId, payload); });
     // Without a local port the channel is asked for all the same, on purpose: the service is the one to refuse it.
@@ -37,6 +38,7 @@ bool KestrumModel::createPorts()
         _recvPort->setInvalidationHandler([this, port = _recvPort.get()] { handleInvalidation(port); });
     }
 
+    const auto recvPort = _recvPort;
     auto connection = _roles.telephony.connect([this](std::string_view) { refresh(); });
     if (!connection) {
         logError("Could not create VoxServerConnection");
@@ -53,6 +55,9 @@ bool KestrumModel::createPorts()
         logError("Could not create a log channel (Vox returned null port)!");
         return false;
     }
+    // The wait for the answer serves tasks: one of them may have closed the channel.
+    if (_recvPort != recvPort)
+        return false;
     _sendPort = _roles.ports.createRemote(*answer.remotePort);
     if (!_sendPort) {
         logError("Could not create the remote port!");

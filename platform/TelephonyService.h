@@ -21,7 +21,8 @@ class VoxServerConnection {
 public:
     virtual ~VoxServerConnection() = default;
 
-    /// Asks the service to stream its log to the local port called `serviceName`. Gives up after 1 s, as a failure.
+    /// Asks the service to stream its log to the local port called `serviceName`. Waits up to 1 s for the answer,
+    /// serving timers and tasks meanwhile, which may destroy this connection; no answer is a failure.
     virtual LogChannelAnswer networkMonitorCreateLogChannel(std::string_view serviceName) = 0;
 };
 

@@ -21,6 +21,19 @@ int levelOf(Priority priority)
     return priority == Priority::Raw16 ? LOG_NOTICE : static_cast<int>(priority);
 }
 
+// Not within a character.
+std::string lineOf(std::string_view text)
+{
+    constexpr std::string_view kEllipsis = "\u2026";
+    if (text.size() <= LinuxSystemLog::kLongestLine)
+        return std::string(text);
+    auto end = LinuxSystemLog::kLongestLine - kEllipsis.size();
+    const auto continues = [&] { return (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80; };
+    for (int i = 0; i < 3 && continues(); ++i)
+        --end;
+    return std::string(text.substr(0, end)).append(kEllipsis);
+}
+
 } // namespace
 
 // Outlives the log when the thread hangs in its sink at the end.
@@ -49,7 +62,7 @@ struct LinuxSystemLog::Shared {
                 return;
             others.pop_front();
         }
-        (level > LOG_ERR ? others : errors).push_back({written++, level, std::string(text)});
+        (level > LOG_ERR ? others : errors).push_back({written++, level, lineOf(text)});
     }
 
     Line next()

@@ -18,8 +18,8 @@ struct CloseFile {
 };
 using File = std::unique_ptr<std::FILE, CloseFile>;
 
-/// The file's bytes; nothing when it cannot be read, or holds more than any property list may.
-std::optional<std::vector<std::byte>> contents(const std::string& path)
+/// The file's bytes; nothing when it cannot be read, or holds more than `most`.
+std::optional<std::vector<std::byte>> contents(const std::string& path, std::size_t most)
 {
     const File file(std::fopen(path.c_str(), "rb"));
     if (!file)
@@ -27,7 +27,7 @@ std::optional<std::vector<std::byte>> contents(const std::string& path)
     std::vector<std::byte> bytes;
     std::byte block[1 << 16];
     while (const std::size_t count = std::fread(block, 1, sizeof block, file.get())) {
-        if (count > PropertyListCodec::kMaxBytes - bytes.size())
+        if (count > most - bytes.size())
             return std::nullopt;
         bytes.insert(bytes.end(), block, block + count);
     }
@@ -51,7 +51,7 @@ std::optional<std::string> xmlText(const Value& value)
 PropertyListCodec::Parsed PropertyListCodec::parseWithError(Bytes bytes, Value spent) const
 {
     try {
-        if (bytes.size() > kMaxBytes)
+        if (bytes.size() > _maxBytes)
             throw propertylist::Refusal{"too many bytes"};
         return {textOf(bytes).starts_with(propertylist::kBinaryMagic) ? propertylist::readBinary(bytes)
                                                                       : propertylist::readXml(bytes, std::move(spent))};
@@ -78,14 +78,14 @@ std::optional<Data> PropertyListCodec::toXml(const Value& value) const
 
 Value PropertyListCodec::load(const std::string& path) const
 {
-    const auto bytes = contents(path);
+    const auto bytes = contents(path, _maxBytes);
     return bytes ? parse(*bytes) : Value();
 }
 
 PropertyLists::Stored PropertyListCodec::write(const Dictionary& dictionary, const std::string& path) const
 {
     const auto text = xmlText(std::make_shared<Dictionary>(dictionary));
-    if (!text || text->size() > kMaxBytes)
+    if (!text || text->size() > _maxBytes)
         return Stored::Failed;
     if (const auto directory = std::filesystem::path(path).parent_path(); !directory.empty()) {
         std::error_code ignored; // a directory that is missing still shows when the file is made

@@ -22,6 +22,9 @@ public:
     /// Bytes of a serialised list, and of all its texts and data.
     static constexpr std::size_t kMaxBytes = std::size_t{256} << 20;
 
+    /// `maxBytes`: of a serialised list, the same for all that is read and all that is written into files.
+    explicit PropertyListCodec(std::size_t maxBytes = kMaxBytes) : _maxBytes(maxBytes) {}
+
     /// Null for what is no property list, as `parseWithError`.
     Value parse(Bytes bytes) const override;
     Value parseOver(Bytes bytes, Value spent) const override;
@@ -45,6 +48,7 @@ public:
     Parsed parseWithError(Bytes bytes, Value spent = {}) const;
 
 private:
+    std::size_t _maxBytes;
     mutable WholeFile::Identity _lastWritten;
 };
 

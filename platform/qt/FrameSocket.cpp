@@ -2,6 +2,7 @@
 
 #include "platform/SystemLog.h"
 #include "support/Format.h"
+#include "support/ScopedFlag.h"
 
 #include <QTimer>
 
@@ -70,17 +71,6 @@ bool isStaleSocket(const std::string& path)
     ::close(probe);
     return refused;
 }
-
-class ScopedFlag {
-public:
-    explicit ScopedFlag(bool& flag) : _flag(flag) { _flag = true; }
-    ScopedFlag(const ScopedFlag&) = delete;
-    ScopedFlag& operator=(const ScopedFlag&) = delete;
-    ~ScopedFlag() { _flag = false; }
-
-private:
-    bool& _flag;
-};
 
 // Keeps two processes from clearing and taking the same address at the same time.
 class DirectoryLock {
@@ -238,12 +228,6 @@ bool FrameConnection::waitUntilSent(milliseconds timeout)
             return false;
     }
     return isOpen();
-}
-
-bool FrameConnection::waitForBytes(milliseconds timeout)
-{
-    const ScopedFlag waiting(_waiting);
-    return timeout.count() > 0 && _socket->waitForReadyRead(static_cast<int>(timeout.count()));
 }
 
 std::optional<Problem> FrameListener::listen(const std::string& path)

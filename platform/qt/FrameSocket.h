@@ -45,11 +45,9 @@ public:
     /// The system's socket, for what is no frame.
     int descriptor() const { return static_cast<int>(_socket->socketDescriptor()); }
 
-    // Waits serve nothing else and run no handler: look at `isOpen` and `next` afterwards.
-    /// Until nothing is kept; false when time is up or the connection closed.
+    /// Waits until nothing is kept; false when time is up or the connection closed. Serves nothing else and runs no
+    /// handler: look at `isOpen` and `next` afterwards.
     bool waitUntilSent(std::chrono::milliseconds timeout);
-    /// For bytes; false when time is up or the connection closed.
-    bool waitForBytes(std::chrono::milliseconds timeout);
 
     // From the event loop: bytes have come; the other side has gone; some kept bytes went.
     std::function<void()> readable, closed, written;

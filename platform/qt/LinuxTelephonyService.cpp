@@ -6,6 +6,7 @@
 #include "platform/qt/LinuxMessagePorts.h"
 #include "support/Format.h"
 
+#include <QEventLoop>
 #include <QTimer>
 
 #include <algorithm>
@@ -40,17 +41,33 @@ public:
             return;
         _names.push_back(std::move(name));
         if (_names.size() == 1)
-            _queue.post([weak = weak_from_this()] {
-                if (const auto self = weak.lock())
-                    self->handOver();
-            });
+            post();
+    }
+
+    // The wait for an answer serves the queue; who waits is told of nothing meanwhile.
+    void hold() { _held = true; }
+    void release()
+    {
+        _held = false;
+        if (!_names.empty())
+            post();
     }
 
 private:
     static constexpr std::size_t kLongestName = 256, kMostNames = 16;
 
+    void post()
+    {
+        _queue.post([weak = weak_from_this()] {
+            if (const auto self = weak.lock())
+                self->handOver();
+        });
+    }
+
     void handOver()
     {
+        if (_held)
+            return;
         // The handler may end the connection, and with it what is left.
         const auto self = weak_from_this();
         constexpr int kThisTask = 1;
@@ -62,6 +79,7 @@ private:
     TelephonyService::NotificationHandler _handler;
     MainQueue& _queue;
     std::vector<std::string> _names; // that wait for their turn
+    bool _held = false;
 };
 
 std::string ofPorts(const LinuxMessagePorts& ports)
@@ -85,78 +103,120 @@ std::string inWords(const LogChannelAnswer& answer)
     }
 }
 
+// A connection's socket and the answer that is awaited on it. The wait serves tasks, which may end the connection.
+struct Link {
+    struct Awaited {
+        explicit Awaited(std::uint32_t as) : serial(as) {}
+
+        std::uint32_t serial;
+        QEventLoop loop;
+        std::optional<LogChannelAnswer> answer;
+    };
+
+    Link(std::unique_ptr<FrameConnection> with, TelephonyService::NotificationHandler handler, MainQueue& queue)
+        : connection(std::move(with)), notifications(std::make_shared<Notifications>(std::move(handler), queue))
+    {
+        connection->readable = [this] { read(); };
+        connection->closed = [this] {
+            read(); // the answer may have come before
+            quit();
+        };
+    }
+
+    LogChannelAnswer request(const std::string& address)
+    {
+        Awaited reply(++lastSerial);
+        if (!connection->send({Frame::Kind::Request, vox::kCreateLogChannel, reply.serial, bytesOf(address)}))
+            return failure(EPIPE);
+        notifications->hold();
+        awaited = &reply;
+        QTimer::singleShot(kTimeout, Qt::PreciseTimer, &reply.loop, &QEventLoop::quit);
+        reply.loop.exec();
+        awaited = nullptr;
+        notifications->release();
+        if (reply.answer)
+            return *std::move(reply.answer);
+        return failure(connection && connection->isOpen() ? ETIMEDOUT : EPIPE);
+    }
+
+    // In turns, so that a flood takes no longer than silence; what is left comes with the next event. After the other
+    // side has gone there is no next event, and what is left is bounded.
+    void read()
+    {
+        for (int i = 0; i < kTurn || !connection->isOpen(); ++i) {
+            const auto frame = connection->next();
+            if (!frame)
+                return;
+            take(*frame);
+        }
+        if (!std::exchange(scheduled, true))
+            QTimer::singleShot(0, context.get(), [this] {
+                scheduled = false;
+                read();
+            });
+    }
+
+    void take(const Frame& frame)
+    {
+        if (awaited == nullptr || awaited->answer || frame.kind != Frame::Kind::Reply ||
+            frame.serial != awaited->serial)
+            return notifications->take(frame);
+        auto decoded = vox::decodeAnswer(frame.payload);
+        awaited->answer = decoded ? *std::move(decoded) : failure(EBADMSG);
+        quit();
+    }
+
+    void quit()
+    {
+        if (awaited != nullptr)
+            awaited->loop.quit();
+    }
+
+    void close()
+    {
+        context.reset();
+        connection.reset();
+        quit();
+    }
+
+    static LogChannelAnswer failure(int number) { return {vox::kSystemErrors, number, std::nullopt}; }
+
+    static constexpr int kTurn = 256;
+
+    std::unique_ptr<FrameConnection> connection;
+    std::shared_ptr<Notifications> notifications;
+    Awaited* awaited = nullptr;
+    std::uint32_t lastSerial = 0;
+    bool scheduled = false;                                         // more reading
+    std::unique_ptr<QObject> context = std::make_unique<QObject>(); // ends the reading with the connection
+};
+
 class SocketServerConnection final : public VoxServerConnection {
 public:
-    SocketServerConnection(std::unique_ptr<FrameConnection> connection, TelephonyService::NotificationHandler handler,
-                           const LinuxMessagePorts& ports, MainQueue& queue, std::string& problem)
-        : _connection(std::move(connection)),
-          _notifications(std::make_shared<Notifications>(std::move(handler), queue)),
-          _ports(ports),
-          _problem(problem)
-    {
-        _connection->readable = [this] { readNotifications(); };
-    }
+    SocketServerConnection(std::shared_ptr<Link> link, const LinuxMessagePorts& ports, std::string& problem)
+        : _link(std::move(link)), _ports(ports), _problem(problem)
+    {}
+    ~SocketServerConnection() override { _link->close(); }
 
     LogChannelAnswer networkMonitorCreateLogChannel(std::string_view serviceName) override
     {
         // Without its port the display would run and hear nothing.
         if (!_ports.isListening(serviceName)) {
             _problem = ofPorts(_ports);
-            return {vox::kSystemErrors, ENOTCONN, std::nullopt};
+            return Link::failure(ENOTCONN);
         }
-        auto answer = request(vox::addressOfPort(serviceName, ::getpid()));
-        _problem = answer.errorCode == 0 ? "" : inWords(answer);
-        readNotifications(); // what came behind the answer
+        // The wait may end this connection.
+        const auto link = _link;
+        auto& problem = _problem;
+        auto answer = link->request(vox::addressOfPort(serviceName, ::getpid()));
+        problem = answer.errorCode == 0 ? "" : inWords(answer);
         return answer;
     }
 
 private:
-    LogChannelAnswer request(const std::string& address)
-    {
-        const auto end = steady_clock::now() + kTimeout;
-        const auto left = [&] { return ceil<milliseconds>(end - steady_clock::now()); };
-        if (!_connection->send({Frame::Kind::Request, vox::kCreateLogChannel, ++_serial, bytesOf(address)}) ||
-            !_connection->waitUntilSent(left()))
-            return {vox::kSystemErrors, EPIPE, std::nullopt};
-        do {
-            // A flood of other frames takes no longer than silence.
-            while (const auto frame = left().count() > 0 ? _connection->next() : std::nullopt) {
-                if (frame->kind != Frame::Kind::Reply || frame->serial != _serial)
-                    _notifications->take(*frame);
-                else if (auto decoded = vox::decodeAnswer(frame->payload))
-                    return *std::move(decoded);
-                else
-                    return {vox::kSystemErrors, EBADMSG, std::nullopt};
-            }
-        } while (_connection->waitForBytes(left()));
-        return {vox::kSystemErrors, _connection->isOpen() ? ETIMEDOUT : EPIPE, std::nullopt};
-    }
-
-    void readNotifications()
-    {
-        // In turns: what is left comes with the next event.
-        for (int i = 0; i < kTurn; ++i) {
-            const auto frame = _connection->next();
-            if (!frame)
-                return;
-            _notifications->take(*frame);
-        }
-        if (!std::exchange(_scheduled, true))
-            QTimer::singleShot(0, &_context, [this] {
-                _scheduled = false;
-                readNotifications();
-            });
-    }
-
-    static constexpr int kTurn = 256;
-
-    std::unique_ptr<FrameConnection> _connection;
-    std::shared_ptr<Notifications> _notifications;
+    std::shared_ptr<Link> _link;
     const LinuxMessagePorts& _ports;
     std::string& _problem;
-    std::uint32_t _serial = 0;
-    bool _scheduled = false; // more reading
-    QObject _context;        // ends the reading with the connection
 };
 
 } // namespace
@@ -175,8 +235,8 @@ std::unique_ptr<VoxServerConnection> LinuxTelephonyService::connect(Notification
         return nullptr;
     }
     _problem.clear();
-    return std::make_unique<SocketServerConnection>(std::move(connection), std::move(handler), _ports, _queue,
-                                                    _problem);
+    return std::make_unique<SocketServerConnection>(
+        std::make_shared<Link>(std::move(connection), std::move(handler), _queue), _ports, _problem);
 }
 
 } // namespace kestrum

@@ -1,5 +1,6 @@
 #include "LogGenerator/ArrayLock.h"
 
+#include "LogGenerator/Base.h"
 #include "doubles/CountedArrayLock.h"
 
 #include <gtest/gtest.h>
@@ -104,6 +105,36 @@ TEST(ArrayLockDeathTest, SecondThreadIsRefusedInADebugBuild)
         "one thread decodes in a process");
 }
 #endif
+
+// The array itself changes between locking and unlocking, and not before or after.
+
+class RewriteUnderTheLock : public testing::Test {
+protected:
+    RewriteUnderTheLock()
+    {
+        counts.onLock = [this] { atLock = Value(deepCopy(node)); };
+        counts.onUnlock = [this] { atUnlock = Value(deepCopy(node)); };
+    }
+
+    ArrayRef node = makeArray({"a", "b"});
+    CountedArrayLock counts;
+    Value atLock, atUnlock;
+};
+
+TEST_F(RewriteUnderTheLock, RemovesTheElements)
+{
+    Base::clearElementsInArray(SectionRef(node));
+    EXPECT_EQ(atLock, Value(makeArray({"a", "b"})));
+    EXPECT_EQ(atUnlock, Value(makeArray()));
+}
+
+TEST_F(RewriteUnderTheLock, ReplacesTheElements)
+{
+    Base::replaceArray(SectionRef(node), {"c"});
+    EXPECT_EQ(atLock, Value(makeArray({"a", "b"})));
+    EXPECT_EQ(atUnlock, Value(makeArray({"c"})));
+    EXPECT_EQ(counts.locked, 1);
+}
 
 } // namespace
 } // namespace kestrum

@@ -192,6 +192,20 @@ INSTANTIATE_TEST_SUITE_P(Zones, DlfZone,
                                          ZoneCase{"SecondsAreCutTowardZeroInTheWest", -1059, false, 0xFFEF}), // -17
                          [](const auto& each) { return std::string(each.param.name); });
 
+TEST_F(Dlf, ZoneIsThatOfTheTimeOfWriting)
+{
+    const auto zoneAndFlag = [this] {
+        const auto dlf = generator.generateDlfFromState(doubles.state);
+        return std::pair(numberAt(dlf->bytes(), 85, 2), numberAt(dlf->bytes(), 87, 2));
+    };
+    doubles.clock.zone = {std::chrono::hours(2), true};
+    doubles.clock.zoneAfterChange = {std::chrono::hours(1), false};
+    doubles.clock.zoneChange = doubles.clock.date + std::chrono::seconds(1);
+    EXPECT_EQ(zoneAndFlag(), std::pair(std::uint64_t{120}, std::uint64_t{1}));
+    doubles.clock.date = doubles.clock.zoneChange;
+    EXPECT_EQ(zoneAndFlag(), std::pair(std::uint64_t{60}, std::uint64_t{0}));
+}
+
 TEST_F(Dlf, LeavesOutTheFirstByteOfEachInterval)
 {
     const auto first = bytesFrom({1, 2, 3}), second = bytesFrom({4, 5});

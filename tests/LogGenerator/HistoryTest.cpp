@@ -40,6 +40,13 @@ protected:
     State state;
 };
 
+TEST_F(History, CreationIsLoggedWithTheGeneratorsAddress)
+{
+    doubles.log.showsAddresses = true;
+    const Plain other(doubles.roles);
+    EXPECT_EQ(doubles.log.lines.back().second, formatted("Creating Log object: %p", static_cast<const void*>(&other)));
+}
+
 TEST_F(History, CreationOfAGeneratorIsLogged)
 {
     EXPECT_THAT(doubles.log.lines, ElementsAre(RecordingLog::Line(Priority::Warning, "Creating Log object: 0x0")));
@@ -100,6 +107,20 @@ TEST_F(History, DisplayIsCopiedAtItsTopLevelAlone)
     const auto kept = entry(0).at("Display").dictionary();
     EXPECT_EQ(kept->at("RAT"), Value("GSM"));
     EXPECT_EQ(kept->at("Cell").dictionary(), cell);
+}
+
+TEST_F(History, DisplayStateAndExtraInfoAreCopiedAtTheirTopLevel)
+{
+    auto displayState = makeArray({"raw"});
+    auto extraInfo = makeDictionary({{"Sequence", 1}});
+    state.set("DisplayState", displayState);
+    state.set("Display", makeDictionary());
+    state.set("ExtraInfo", extraInfo);
+    generator.generateLogUsingState(state);
+    displayState->append("more");
+    extraInfo->set("Sequence", 2);
+    EXPECT_EQ(entry(0).at("DisplayState"), Value(makeArray({"raw"})));
+    EXPECT_EQ(entry(0).at("ExtraInfo"), Value(makeDictionary({{"Sequence", 1}})));
 }
 
 TEST_F(History, ArrayDisplayIsCopiedToo)

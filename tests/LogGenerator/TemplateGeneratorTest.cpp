@@ -47,6 +47,21 @@ TEST_F(TemplateGenerator, DestructionIsLoggedUnderOneNameForAll)
     EXPECT_THAT(doubles.console.printed, ElementsAre("Deallocing ClassIndex"));
 }
 
+TEST_F(TemplateGenerator, LinesNameTheIndexAndTheGeneratorInTheirPlaces)
+{
+    doubles.log.showsAddresses = true;
+    auto index = std::make_unique<sample::Index>(doubles.roles);
+    const auto shown = [](const void* address) { return formatted("%p", address); };
+    const auto ofIndex = shown(index.get());
+    auto other = std::make_unique<sample::Generator>(doubles.roles, std::move(index));
+    const auto ofGenerator = shown(other.get());
+    EXPECT_EQ(doubles.log.count("Creating ZPHLogGenerator2 object with " + ofIndex), 1u);
+    other->getDisplayFromState(doubles.state);
+    EXPECT_EQ(doubles.log.count("Initialized class index: " + ofIndex + ", Self: " + ofGenerator), 1u);
+    other.reset();
+    EXPECT_EQ(doubles.log.lines.back().second, "ZPH_GSMLogGenerator is destructed " + ofGenerator);
+}
+
 TEST_F(TemplateGenerator, KeepsABoundedIntervalOfRawRecordsAndLogsWhatItDrops)
 {
     const std::vector<std::byte> invalid(1 << 20, std::byte{7});
@@ -85,6 +100,15 @@ TEST_F(TemplateGenerator, FirstRecordMakesTheDisplayBeforeItIsDecoded)
     EXPECT_EQ(neighbors(), Value(makeArray({"7"})));
     EXPECT_EQ(display()->at("Legend"), Value("values in dBm"));
     EXPECT_EQ(doubles.state.at("ExtraInfo"), Value(makeDictionary()));
+}
+
+TEST_F(TemplateGenerator, NewDisplayHasANewExtraInfo)
+{
+    const auto old = makeDictionary({{"Sequence", 7}});
+    doubles.state.set("ExtraInfo", old);
+    generator->getDisplayFromState(doubles.state);
+    EXPECT_EQ(doubles.state.at("ExtraInfo"), Value(makeDictionary()));
+    EXPECT_EQ(Value(old), Value(makeDictionary({{"Sequence", 7}}))) << "history may hold it";
 }
 
 TEST_F(TemplateGenerator, CallThatMakesTheDisplayReturnsNothingAndLaterOnesReturnIt)
@@ -145,7 +169,7 @@ TEST_F(TemplateGenerator, TemplateThatIsNoDictionaryCannotBeLoaded)
 {
     doubles.propertyLists.files["Sample.plist"] = makeArray({"x"});
     generator->getDisplayFromState(doubles.state);
-    EXPECT_EQ(doubles.log.count("Cannot load template for display"), 1u);
+    EXPECT_THAT(doubles.log.errors(), testing::Contains("Cannot load template for display").Times(1));
     EXPECT_FALSE(doubles.state.contains("Template"));
 }
 

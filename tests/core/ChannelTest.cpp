@@ -76,7 +76,7 @@ TEST_F(Channel, DeathWhileTheReplyIsAwaitedEndsTheAttempt)
     model->startMonitor();
     EXPECT_EQ(queue.now(), std::chrono::milliseconds(0)); // the wait ended at once
     EXPECT_THAT(log.errors(), ElementsAre(" ***** Created ports (send=0x0, recv=0x0)",
-                                          " ***** Could not send the GetTechnology command (got error=-3)",
+                                          " ***** No response to GetTechnology; cannot configure",
                                           "No log generator technology works"));
     whileAsked = nullptr;
     serve();
@@ -200,7 +200,7 @@ TEST_F(Channel, RestartWhileTheReplyIsAwaitedWithAnEarlierGeneratorFailsAtTheSta
     };
     model->restartMonitor();
     EXPECT_THAT(log.errors(), ElementsAre(" ***** Created ports (send=0x0, recv=0x0)",
-                                          " ***** Could not send the GetTechnology command (got error=-3)",
+                                          " ***** No response to GetTechnology; cannot configure",
                                           " ***** Could not send the START command (got error=-1)"));
     EXPECT_FALSE(model->isConnected());
     queue.run();
@@ -223,13 +223,92 @@ TEST_F(Channel, ModelLetGoWhileTheReplyIsAwaitedEndsItsAttempt)
     EXPECT_FALSE(ports.hasLocal(kLogPort));
 }
 
-TEST_F(Channel, NotificationOfTheServiceRefreshes)
+// The creation of the log channel serves the queue, as the wait for the reply does.
+
+class ChannelCreation : public Channel {
+protected:
+    /// Runs in the wait for the service's answer.
+    void inTheWait(std::function<void()> task)
+    {
+        telephony.answersAfter = std::chrono::milliseconds(500);
+        telephony.whileCreating = [this, task] {
+            telephony.whileCreating = nullptr;
+            queue.post(std::chrono::milliseconds(1), task);
+        };
+    }
+};
+
+TEST_F(ChannelCreation, ServesTimersWhileItWaits)
+{
+    int ticks = 0;
+    const auto timer = queue.repeat(std::chrono::milliseconds(100), [&] { ++ticks; });
+    telephony.answersAfter = std::chrono::milliseconds(500);
+    model->startMonitor();
+    EXPECT_EQ(ticks, 5);
+    EXPECT_TRUE(model->isConnected());
+}
+
+TEST_F(ChannelCreation, GivesUpOnASilentServiceAfterASecond)
+{
+    telephony.answersAfter = std::chrono::milliseconds(1001);
+    model->startMonitor();
+    EXPECT_EQ(queue.now(), std::chrono::milliseconds(1000));
+    EXPECT_THAT(
+        log.errors(),
+        ElementsAre(testing::MatchesRegex("_VoxServerConnectionNetworkMonitorCreateLogChannel returns error: [0-9]+!"),
+                    "Could not create the ports necessary"));
+    EXPECT_FALSE(ports.hasLocal(kLogPort));
+}
+
+TEST_F(ChannelCreation, IsInVainWhenTheChannelIsClosedMeanwhile)
+{
+    inTheWait([this] { model->destroyPorts(); });
+    model->startMonitor();
+    EXPECT_THAT(log.errors(), ElementsAre("Could not create the ports necessary"));
+    EXPECT_FALSE(model->isConnected());
+    EXPECT_THAT(ports.requests, IsEmpty());
+    telephony.answersAfter = std::chrono::milliseconds(0);
+    seconds(5);
+    EXPECT_TRUE(model->isConnected());
+}
+
+TEST_F(ChannelCreation, IsNotNestedByAStartAndEndedByARestart)
+{
+    inTheWait([this] { model->startMonitor(); });
+    model->startMonitor();
+    EXPECT_TRUE(model->isConnected());
+    EXPECT_THAT(telephony.channelsAsked, testing::SizeIs(1));
+
+    inTheWait([this] { model->restartMonitor(); });
+    model->restartMonitor();
+    EXPECT_FALSE(model->isConnected());
+    EXPECT_THAT(telephony.channelsAsked, testing::SizeIs(2));
+    queue.run();
+    EXPECT_EQ(queue.tasks(), 1u); // the retry
+}
+
+TEST_F(ChannelCreation, GoesOnWithAModelThatWasLetGo)
+{
+    inTheWait([this] {
+        model->setObserver(nullptr);
+        model.reset();
+    });
+    model->startMonitor();
+    EXPECT_EQ(model, nullptr);
+    EXPECT_EQ(queue.timers(), 1u); // it runs on, held by its timer
+    queue.drop();
+    EXPECT_FALSE(ports.hasLocal(kLogPort));
+}
+
+TEST_F(Channel, HearsNoNotificationSinceItsConnectionGoesWithTheCall)
 {
     model->updateWithData(bytesOf("anything"));
-    telephony.whileCreating = [](const auto& notify) { notify("any name"); };
+    telephony.whileCreating = [this] { telephony.notify("any name"); };
+    telephony.answersAfter = std::chrono::milliseconds(500);
     model->startMonitor();
     queue.run();
-    EXPECT_THAT(told, ElementsAre("update", "status"));
+    EXPECT_THAT(told, ElementsAre("status"));
+    EXPECT_EQ(telephony.openConnections(), 0);
 }
 
 TEST_F(Channel, RefreshOfADeadChannelInvalidatesOnce)

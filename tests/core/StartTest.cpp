@@ -38,7 +38,7 @@ TEST_F(Start, OpensTheChannelAsksTheTechnologyAndStartsTheLog)
     EXPECT_EQ(ports.requests[1].receiveTimeout, std::chrono::seconds(0));
     EXPECT_EQ(ports.requests[1].reply, RemotePort::Reply::None);
     EXPECT_EQ(queue.timers(), 1u);
-    EXPECT_EQ(telephony.openConnections, 0);
+    EXPECT_EQ(telephony.openConnections(), 0);
 }
 
 TEST_F(Start, LogsItsSteps)
@@ -116,7 +116,7 @@ TEST_P(FailingStart, SaysWhyAndClosesTheChannel)
     EXPECT_THAT(log.errors(), testing::ElementsAreArray(GetParam().lines));
     EXPECT_FALSE(model->isConnected());
     EXPECT_FALSE(ports.hasLocal(kLogPort));
-    EXPECT_EQ(telephony.openConnections, 0);
+    EXPECT_EQ(telephony.openConnections(), 0);
     EXPECT_EQ(queue.timers(), 0u);
 }
 
@@ -252,12 +252,25 @@ TEST_F(Start, StartCommandThatCannotBeSerialisedFails)
     EXPECT_TRUE(model->isConnected());
 }
 
+TEST_F(Start, ThatAnExceptionLeavesIsNotInTheWayOfTheNext)
+{
+    whileAsked = [] { throw std::runtime_error("thrown"); };
+    EXPECT_THROW(model->startMonitor(), std::runtime_error);
+    whileAsked = nullptr;
+    model->restartMonitor();
+    EXPECT_TRUE(model->isConnected());
+}
+
 TEST_F(Start, WithoutALocalPortTheServiceIsAskedAllTheSame)
 {
     ports.createsLocal = false;
     model->startMonitor();
     EXPECT_THAT(telephony.channelsAsked, ElementsAre(kLogPort));
     EXPECT_FALSE(model->isConnected());
+    EXPECT_EQ(queue.timers(), 0u);
+    ports.createsLocal = true;
+    seconds(5);
+    EXPECT_TRUE(model->isConnected());
 }
 
 TEST_F(Start, RetryAfterASuccessfulRestartDoesNothing)

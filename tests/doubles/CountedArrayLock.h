@@ -3,6 +3,7 @@
 #include "LogGenerator/ArrayLock.h"
 #include "platform/RecursiveMutex.h"
 
+#include <functional>
 #include <memory>
 
 namespace kestrum {
@@ -16,13 +17,24 @@ public:
     CountedArrayLock& operator=(const CountedArrayLock&) = delete;
 
     int locked = 0, unlocked = 0;
+    std::function<void()> onLock, onUnlock; ///< run while it is locked
 
 private:
     class Mutex final : public RecursiveMutex {
     public:
         explicit Mutex(CountedArrayLock& counts) : _counts(counts) {}
-        void lock() override { ++_counts.locked; }
-        void unlock() override { ++_counts.unlocked; }
+        void lock() override
+        {
+            ++_counts.locked;
+            if (_counts.onLock)
+                _counts.onLock();
+        }
+        void unlock() override
+        {
+            ++_counts.unlocked;
+            if (_counts.onUnlock)
+                _counts.onUnlock();
+        }
 
     private:
         CountedArrayLock& _counts;

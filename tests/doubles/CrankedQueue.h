@@ -33,7 +33,7 @@ public:
     {
         auto shared = std::make_shared<std::function<void()>>(std::move(action));
         _timers.push_back(shared);
-        schedule(interval, shared);
+        schedule(_now + interval, interval, shared);
         return std::make_unique<Repetition>(std::move(shared));
     }
 
@@ -101,7 +101,7 @@ private:
 
     struct Tick {
         CrankedQueue* queue;
-        Duration interval;
+        Duration due, interval;
         std::weak_ptr<std::function<void()>> timer;
 
         void operator()() const
@@ -109,12 +109,18 @@ private:
             const auto action = timer.lock();
             if (!action || !*action)
                 return;
-            queue->schedule(interval, action);
             (*action)();
+            // Only now: a wait within the action does not run the action again. Its timer may have gone in it.
+            constexpr int kThisCall = 1;
+            if (action.use_count() > kThisCall && *action)
+                queue->schedule(std::max(due + interval, queue->_now), interval, action);
         }
     };
 
-    void schedule(Duration interval, const Action& action) { post(interval, Tick{this, interval, action}); }
+    void schedule(Duration due, Duration interval, const Action& action)
+    {
+        _due.emplace(due, Tick{this, due, interval, action});
+    }
 
     // A wait within a task has moved the time already.
     void moveTo(Duration time)

@@ -5,6 +5,7 @@
 #include "platform/TelephonyService.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <map>
 #include <utility>
 #include <vector>
@@ -16,9 +17,6 @@ namespace kestrum {
 class MemoryPorts final : public MessagePorts {
 public:
     using Duration = std::chrono::milliseconds;
-
-    /// The status of a message to a port that is closed.
-    static constexpr std::int32_t kInvalid = -3;
 
     explicit MemoryPorts(CrankedQueue& queue) : _queue(queue) {}
 
@@ -51,34 +49,31 @@ public:
     }
 
     /// A message from another process to the local port of that name. Whether there is one that takes it.
-    bool send(const std::string& name, std::int32_t messageId, std::string_view payload)
+    bool send(std::string_view name, std::int32_t messageId, std::string_view payload)
     {
-        const auto port = _locals[name].lock();
-        if (!port || !port->valid || port->deliveryQueue == nullptr)
+        const auto port = local(name);
+        if (!port)
             return false;
-        port->deliveryQueue->post([receiver = std::weak_ptr(port), messageId, data = Data(bytesOf(payload))] {
-            // Whatever is still under way when the port closes is lost. Its handler may close it.
-            if (const auto end = receiver.lock(); end && end->valid)
-                end->handler(messageId, data.bytes());
-        });
+        port->messages.push_back({messageId, Data(bytesOf(payload))});
+        port->deliver();
         return true;
     }
 
     /// The local port of that name becomes invalid by itself.
-    void invalidateLocal(const std::string& name)
+    void invalidateLocal(std::string_view name)
     {
-        if (const auto port = _locals[name].lock())
+        if (const auto port = local(name))
             port->invalidate();
     }
-    bool hasLocal(const std::string& name) { return !_locals[name].expired(); }
+    bool hasLocal(std::string_view name) const { return local(name) != nullptr; }
 
     std::unique_ptr<LocalPort> createLocal(std::string_view name, ReceiveHandler handler) override
     {
-        if (!createsLocal)
+        if (!createsLocal || hasLocal(name))
             return nullptr;
         auto end = std::make_shared<LocalEnd>(_queue);
         end->handler = std::move(handler);
-        _locals[std::string(name)] = end;
+        _locals.insert_or_assign(std::string(name), end);
         return std::make_unique<Local>(std::move(end));
     }
 
@@ -117,8 +112,28 @@ private:
     };
     struct LocalEnd : End {
         using End::End;
+
+        struct Message {
+            std::int32_t id;
+            Data payload;
+        };
+
+        /// Hands over what waits for the delivery queue.
+        void deliver()
+        {
+            if (deliveryQueue == nullptr)
+                return;
+            for (auto& message : std::exchange(messages, {}))
+                deliveryQueue->post([receiver = weak_from_this(), message = std::move(message)] {
+                    // What is still under way when the port closes is lost. Its handler may close it.
+                    if (const auto end = std::static_pointer_cast<LocalEnd>(receiver.lock()); end && end->valid)
+                        end->handler(message.id, message.payload.bytes());
+                });
+        }
+
         ReceiveHandler handler;
         MainQueue* deliveryQueue = nullptr;
+        std::vector<Message> messages;
     };
 
     template <typename Role, typename EndType>
@@ -141,7 +156,11 @@ private:
     class Local final : public PortOn<LocalPort, LocalEnd> {
     public:
         using PortOn::PortOn;
-        void setDeliveryQueue(MainQueue& queue) override { _end->deliveryQueue = &queue; }
+        void setDeliveryQueue(MainQueue& queue) override
+        {
+            _end->deliveryQueue = &queue;
+            _end->deliver();
+        }
     };
 
     class Remote final : public PortOn<RemotePort, End> {
@@ -157,16 +176,14 @@ private:
             const Request request{_name, messageId, Data(payload), sendTimeout, receiveTimeout, reply};
             _ports.requests.push_back(request);
             if (!end->valid)
-                return {kInvalid, std::nullopt};
+                return {EPIPE, std::nullopt};
             const auto server = _server;
             const Answer answer = server(request);
             if (answer.status != 0 || reply == Reply::None)
                 return {answer.status, std::nullopt};
             const bool inTime = answer.reply && answer.after <= receiveTimeout;
-            end->queue.turn(inTime ? answer.after : receiveTimeout, [&] { return !end->valid; });
-            if (!end->valid)
-                return {kInvalid, std::nullopt};
-            return {0, inTime ? answer.reply : std::nullopt};
+            const bool ended = end->queue.turn(inTime ? answer.after : receiveTimeout, [&] { return !end->valid; });
+            return {0, inTime && !ended ? answer.reply : std::nullopt};
         }
 
     private:
@@ -175,53 +192,123 @@ private:
         Server _server;
     };
 
+    /// The open local port of that name.
+    std::shared_ptr<LocalEnd> local(std::string_view name) const
+    {
+        const auto found = _locals.find(name);
+        const auto port = found == _locals.end() ? nullptr : found->second.lock();
+        return port && port->valid ? port : nullptr;
+    }
+
     CrankedQueue& _queue;
     std::map<std::string, Server> _servers;
-    std::map<std::string, std::weak_ptr<LocalEnd>> _locals;
+    std::map<std::string, std::weak_ptr<LocalEnd>, std::less<>> _locals;
     std::vector<std::pair<std::string, std::weak_ptr<End>>> _remotes;
 };
 
 /// A telephony service that answers as the test says.
 class MemoryTelephony final : public TelephonyService {
 public:
+    using Duration = std::chrono::milliseconds;
+    static constexpr Duration kPatience{1000};
+    static constexpr std::int32_t kSystemErrors = 2; ///< the domain of errno's
+
+    /// Makes log channels to the local ports of `ports`.
+    MemoryTelephony(CrankedQueue& queue, const MemoryPorts& ports) : _queue(queue), _ports(ports) {}
+
     std::unique_ptr<VoxServerConnection> connect(NotificationHandler handler) override
     {
-        return reachable ? std::make_unique<Connection>(*this, std::move(handler)) : nullptr;
+        if (!reachable)
+            return nullptr;
+        auto end = std::make_shared<End>();
+        end->handler = std::move(handler);
+        std::erase_if(_ends, [](const auto& each) { return each.expired(); });
+        _ends.push_back(end);
+        return std::make_unique<Connection>(*this, std::move(end));
     }
 
     std::string problem() const override { return why; }
 
+    /// Tells all that are connected.
+    void notify(const std::string& name)
+    {
+        for (const auto& each : _ends)
+            if (const auto end = each.lock(); end && std::ranges::find(end->names, name) == end->names.end()) {
+                end->names.push_back(name);
+                if (end->names.size() == 1)
+                    handOverLater(end);
+            }
+    }
+    int openConnections() const
+    {
+        return static_cast<int>(std::ranges::count_if(_ends, [](const auto& each) { return !each.expired(); }));
+    }
+
     bool reachable = true;
     std::string why; ///< there is no channel
     LogChannelAnswer answer{0, 0, "vox.commands"};
-    /// Runs while a log channel is being created, with the connection's notification handler.
-    std::function<void(const NotificationHandler&)> whileCreating;
+    Duration answersAfter{0};            ///< more than `kPatience`: too late
+    std::function<void()> whileCreating; ///< runs when a log channel is asked for
 
     std::vector<std::string> channelsAsked;
-    int openConnections = 0;
 
 private:
+    /// What a connection shares with the tasks for it.
+    struct End {
+        NotificationHandler handler;
+        std::vector<std::string> names; ///< of notifications that wait for their turn
+        bool held = false, closed = false;
+    };
+
     class Connection final : public VoxServerConnection {
     public:
-        Connection(MemoryTelephony& service, NotificationHandler handler)
-            : _service(service), _handler(std::move(handler))
-        {
-            ++_service.openConnections;
-        }
-        ~Connection() override { --_service.openConnections; }
+        Connection(MemoryTelephony& service, std::shared_ptr<End> end) : _service(service), _end(std::move(end)) {}
+        ~Connection() override { _end->closed = true; }
 
         LogChannelAnswer networkMonitorCreateLogChannel(std::string_view serviceName) override
         {
-            _service.channelsAsked.emplace_back(serviceName);
-            if (_service.whileCreating)
-                _service.whileCreating(_handler);
-            return _service.answer;
+            // The wait may end this connection.
+            return _service.create(serviceName, _end);
         }
 
     private:
         MemoryTelephony& _service;
-        NotificationHandler _handler;
+        std::shared_ptr<End> _end;
     };
+
+    LogChannelAnswer create(std::string_view serviceName, const std::shared_ptr<End> end)
+    {
+        channelsAsked.emplace_back(serviceName);
+        if (!_ports.hasLocal(serviceName))
+            return {kSystemErrors, ENOTCONN, std::nullopt};
+        if (const auto run = whileCreating) // a copy: it may set another
+            run();
+        const bool inTime = answersAfter <= kPatience;
+        end->held = true;
+        _queue.turn(inTime ? answersAfter : kPatience, [&] { return end->closed; });
+        end->held = false;
+        if (!end->names.empty())
+            handOverLater(end);
+        if (end->closed)
+            return {kSystemErrors, EPIPE, std::nullopt};
+        return inTime ? answer : LogChannelAnswer{kSystemErrors, ETIMEDOUT, std::nullopt};
+    }
+
+    void handOverLater(const std::weak_ptr<End>& waiting)
+    {
+        _queue.post([waiting] {
+            const auto end = waiting.lock();
+            if (!end || end->held)
+                return;
+            for (const auto& name : std::exchange(end->names, {}))
+                if (!end->closed && end->handler)
+                    end->handler(name);
+        });
+    }
+
+    CrankedQueue& _queue;
+    const MemoryPorts& _ports;
+    std::vector<std::weak_ptr<End>> _ends;
 };
 
 } // namespace kestrum

@@ -8,16 +8,18 @@
 namespace kestrum {
 
 /// Property lists that the test lays down: files by path, parsed bytes by their text. What is not laid down is no
-/// property list.
+/// property list. What is serialised is laid down.
 class MemoryPropertyLists final : public PropertyLists {
 public:
-    Value parse(Bytes bytes) const override { return find(parsed, std::string(textOf(bytes))); }
+    Value parse(Bytes bytes) const override { return deepCopy(find(parsed, std::string(textOf(bytes)))); }
     Value parseOver(Bytes bytes, Value /*spent*/) const override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override
     {
         if (value.isNull() || !writable)
             return std::nullopt;
-        return Data(bytesOf(describe(value)));
+        const auto text = describe(value);
+        parsed.insert_or_assign(text, withoutNulls(value));
+        return Data(bytesOf(text));
     }
     Value load(const std::string& path) const override { return deepCopy(find(files, path)); }
     Stored write(const Dictionary& dictionary, const std::string& path) const override
@@ -26,16 +28,35 @@ public:
             return Stored::Failed;
         if (taken.contains(path))
             return Stored::NameTaken;
-        files[path] = deepCopy(std::make_shared<Dictionary>(dictionary));
+        files[path] = withoutNulls(std::make_shared<Dictionary>(dictionary));
         return Stored::Written;
     }
 
-    std::map<std::string, Value> parsed;
+    mutable std::map<std::string, Value> parsed; ///< what was serialised too
     mutable std::map<std::string, Value> files;
     std::set<std::string> taken; ///< paths at which something else stands
     bool writable = true;
 
 private:
+    /// A deep copy.
+    static Value withoutNulls(const Value& value)
+    {
+        if (const auto dictionary = value.dictionary()) {
+            auto copy = std::make_shared<Dictionary>();
+            for (const auto& entry : *dictionary)
+                if (entry.value)
+                    copy->set(entry.key, withoutNulls(entry.value));
+            return copy;
+        }
+        if (const auto array = value.array()) {
+            auto copy = makeArray();
+            for (const auto& element : *array)
+                if (element)
+                    copy->append(withoutNulls(element));
+            return copy;
+        }
+        return value;
+    }
     static Value find(const std::map<std::string, Value>& among, const std::string& key)
     {
         const auto found = among.find(key);

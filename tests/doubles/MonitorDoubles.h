@@ -10,7 +10,7 @@ namespace kestrum {
 struct MonitorDoubles : DecodingDoubles {
     CrankedQueue queue{clock};
     MemoryPorts ports{queue};
-    MemoryTelephony telephony;
+    MemoryTelephony telephony{queue, ports};
 
     MonitorRoles monitorRoles{roles, queue, ports, telephony};
 

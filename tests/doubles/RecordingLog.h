@@ -3,19 +3,25 @@
 #include "platform/SystemLog.h"
 
 #include <algorithm>
+#include <functional>
 #include <string>
 #include <utility>
 #include <vector>
 
 namespace kestrum {
 
-/// Keeps the lines, addresses shown as null.
+/// Keeps the lines, addresses shown as null unless the test wants them.
 class RecordingLog final : public SystemLog {
 public:
     using Line = std::pair<Priority, std::string>;
 
-    void write(Priority priority, std::string_view text) override { lines.emplace_back(priority, text); }
-    const void* shownAddress(const void*) const override { return nullptr; }
+    void write(Priority priority, std::string_view text) override
+    {
+        lines.emplace_back(priority, text);
+        if (const auto run = onWrite) // a copy: it may set another
+            run(text);
+    }
+    const void* shownAddress(const void* address) const override { return showsAddresses ? address : nullptr; }
 
     std::vector<std::string> texts(Priority priority) const
     {
@@ -32,6 +38,8 @@ public:
     }
 
     std::vector<Line> lines;
+    bool showsAddresses = false;
+    std::function<void(std::string_view text)> onWrite; ///< runs behind each line
 };
 
 } // namespace kestrum

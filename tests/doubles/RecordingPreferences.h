@@ -20,11 +20,12 @@ public:
     bool synchronize(std::string_view domain) override
     {
         done({"synchronize", domain});
-        return true;
+        return writable;
     }
     void postChanged(std::string_view domain, std::string_view key) override { done({"changed", domain, key}); }
 
     std::vector<std::string> calls;
+    bool writable = true;
     std::function<void()> onCall; ///< runs before a call is kept
 
 private:

@@ -11,11 +11,11 @@ namespace kestrum {
 class VirtualClock final : public Clock {
 public:
     Date now() const override { return date; }
-    Zone zoneAt(Date) const override { return zone; }
+    Zone zoneAt(Date at) const override { return at < zoneChange ? zone : zoneAfterChange; }
     /// Of a pattern's letters y, M, d, H, m and s are known, each as often as its field has digits.
     std::string localText(Date at, std::string_view pattern) const override
     {
-        const std::string digits = dateText(at + zone.offset);
+        const std::string digits = dateText(at + zoneAt(at).offset);
         const std::map<char, std::string> fields{{'y', digits.substr(0, 4)},  {'M', digits.substr(5, 2)},
                                                  {'d', digits.substr(8, 2)},  {'H', digits.substr(11, 2)},
                                                  {'m', digits.substr(14, 2)}, {'s', digits.substr(17, 2)}};
@@ -38,6 +38,8 @@ public:
     Date date = Date(std::chrono::sys_days(std::chrono::year{2026} / 11 / 16)) + std::chrono::hours{6} +
                 std::chrono::minutes{5} + std::chrono::seconds{42};
     Zone zone{std::chrono::seconds{0}, false};
+    Date zoneChange = Date::max();
+    Zone zoneAfterChange = zone;
 };
 
 } // namespace kestrum

@@ -42,7 +42,7 @@ TEST(RuntimeDirectory, IsRefusedWhenItBelongsToSomebodyElse)
 TEST(RuntimeDirectory, SaysWhyItCannotBeMade)
 {
     const ScratchDirectory scratch;
-    write(scratch / "file", "");
+    writeFile(scratch / "file", "");
     EXPECT_THAT(problemOf(scratch / "file/inside"), HasSubstr("cannot create"));
     EXPECT_THAT(problemOf(scratch / "file"), HasSubstr("is no directory"));
 }

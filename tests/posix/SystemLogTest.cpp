@@ -57,6 +57,30 @@ TEST(LinuxSystemLog, WritesInOrderWithTheirLevels)
     EXPECT_THAT(sink.state->lines, ElementsAre(Line{3, "one"}, Line{4, "two"}, Line{5, "three"}, Line{5, "four"}));
 }
 
+TEST(LinuxSystemLog, CutsLongLinesBetweenCharactersAndMarksThem)
+{
+    const StuckSink sink;
+    sink.open();
+    const std::string longest(8192, 'x'), euros = [] {
+        std::string text;
+        for (int i = 0; i < 1'000'000; ++i)
+            text += "\u20AC"; // three bytes
+        return text;
+    }();
+    {
+        LinuxSystemLog log(sink);
+        log.write(Priority::Error, longest);
+        log.write(Priority::Error, longest + "y");
+        log.write(Priority::Error, euros);
+        log.write(Priority::Error, std::string(10'000, '\x80')); // no text at all
+    }
+    ASSERT_EQ(sink.state->lines.size(), 4u);
+    EXPECT_EQ(sink.state->lines[0].second, longest);
+    EXPECT_EQ(sink.state->lines[1].second, std::string(8189, 'x') + "\u2026");
+    EXPECT_EQ(sink.state->lines[2].second, euros.substr(0, 8187) + "\u2026");
+    EXPECT_EQ(sink.state->lines[3].second, std::string(8186, '\x80') + "\u2026");
+}
+
 TEST(LinuxSystemLog, NeverWaitsForADaemonThatHangsAndCountsWhatIsLost)
 {
     const StuckSink sink;

@@ -156,6 +156,19 @@ TEST_F(Files, WhatIsNoPropertyListIsNotLoaded)
     EXPECT_TRUE(codec.load(scratch.file("text")).isNull());
 }
 
+TEST_F(Files, TheLongestThatIsWrittenIsLoadedAndNothingLongerIsEither)
+{
+    ASSERT_EQ(codec.write(snapshot, scratch.file("a")), Stored::Written);
+    const auto size = std::filesystem::file_size(scratch.file("a"));
+    for (const bool fits : {true, false}) {
+        const PropertyListCodec small(fits ? size : size - 1);
+        EXPECT_EQ(small.write(snapshot, scratch.file(fits ? "b" : "c")), fits ? Stored::Written : Stored::Failed);
+        EXPECT_EQ(!small.load(scratch.file("a")).isNull(), fits);
+        EXPECT_EQ(small.parseWithError(bytesOf(contentsOf(scratch.file("a")))).reason, fits ? "" : "too many bytes");
+    }
+    EXPECT_FALSE(std::filesystem::exists(scratch.file("c")));
+}
+
 TEST_F(Files, AnEndlessFileIsNotLoaded)
 {
     EXPECT_TRUE(codec.load("/dev/zero").isNull());

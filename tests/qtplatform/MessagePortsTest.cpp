@@ -61,17 +61,6 @@ protected:
 
 class LocalPortTest : public MessagePortsTest {};
 
-TEST_F(LocalPortTest, HandsMessagesOverInTheOrderSent)
-{
-    const auto port = makeLocal();
-    ASSERT_TRUE(port);
-    const auto peer = RawSocket::connectTo(address("log"));
-    peer.send(frame(kMessage, 0, 0, "one") + frame(kMessage, -3, 0, "two") + frame(kMessage, 0, 0, ""));
-    ASSERT_TRUE(eventually([&] { return received.size() == 3; }));
-    EXPECT_THAT(received, ElementsAre(Received{0, "one"}, Received{-3, "two"}, Received{0, ""}));
-    EXPECT_THAT(log.lines, IsEmpty());
-}
-
 TEST_F(LocalPortTest, StandsInADirectoryForThisUserAlone)
 {
     LinuxMessagePorts inNew(directory / "new", queue, log);
@@ -157,20 +146,6 @@ TEST_F(LocalPortTest, ClearsAwayTheSocketsOfProcessesThatHaveGone)
     EXPECT_FALSE(std::filesystem::exists(directory / "log.1"));
     EXPECT_TRUE(std::filesystem::exists(directory / "log.2"));
     EXPECT_TRUE(std::filesystem::exists(directory / "logbook.1")) << "another port's";
-}
-
-TEST_F(LocalPortTest, HandsNothingOverWithoutAQueue)
-{
-    const auto port = ports.createLocal("log", [this](std::int32_t id, Bytes payload) {
-        received.push_back({id, std::string(textOf(payload))});
-    });
-    const auto peer = RawSocket::connectTo(address("log"));
-    peer.send(frame(kMessage, 0, 0, "early"));
-    settle();
-    EXPECT_THAT(received, IsEmpty());
-    port->setDeliveryQueue(queue);
-    ASSERT_TRUE(eventually([&] { return !received.empty(); }));
-    EXPECT_THAT(received, ElementsAre(Received{0, "early"}));
 }
 
 TEST_F(LocalPortTest, AMalformedFrameClosesThatPeerAloneWithOneLine)
@@ -298,69 +273,6 @@ TEST_F(LocalPortTest, RefusesAProcessOfAnotherUser)
     EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("refused process " + std::to_string(child) + " of user 65534")));
 }
 
-TEST_F(LocalPortTest, RunsItsInvalidationHandlerOnceAndLater)
-{
-    const auto port = makeLocal();
-    int runs = 0;
-    port->setInvalidationHandler([&] { ++runs; });
-    port->invalidate();
-    port->invalidate();
-    EXPECT_FALSE(port->isValid());
-    EXPECT_EQ(runs, 0) << "not within the call";
-    ASSERT_TRUE(eventually([&] { return runs == 1; }));
-    settle();
-    EXPECT_EQ(runs, 1);
-}
-
-TEST_F(LocalPortTest, RemovingTheInvalidationHandlerCancelsItsPendingRun)
-{
-    const auto port = makeLocal();
-    port->setInvalidationHandler([] { ADD_FAILURE() << "ran"; });
-    port->invalidate();
-    port->setInvalidationHandler({});
-    settle();
-}
-
-TEST_F(LocalPortTest, MayBeDestroyedInItsInvalidationHandler)
-{
-    auto port = makeLocal();
-    bool ran = false;
-    const auto held = std::make_shared<int>(5);
-    port->setInvalidationHandler([&ran, &port, held] {
-        port.reset();
-        ran = *held == 5;
-    });
-    port->invalidate();
-    EXPECT_TRUE(eventually([&] { return ran; }));
-    EXPECT_FALSE(port);
-}
-
-TEST_F(LocalPortTest, MayBeDestroyedInItsReceiveHandler)
-{
-    std::unique_ptr<LocalPort> port;
-    std::vector<std::string> seen;
-    port = ports.createLocal("log", [&](std::int32_t, Bytes payload) {
-        port.reset();
-        seen.emplace_back(textOf(payload)); // still there
-    });
-    port->setDeliveryQueue(queue);
-    const auto peer = RawSocket::connectTo(address("log"));
-    peer.send(frame(kMessage, 0, 0, "first") + frame(kMessage, 0, 0, "second"));
-    ASSERT_TRUE(eventually([&] { return peer.isAbandoned(); }));
-    settle();
-    EXPECT_THAT(seen, ElementsAre("first"));
-}
-
-TEST_F(LocalPortTest, HandsNothingOverOnceInvalid)
-{
-    const auto port = makeLocal();
-    const auto peer = RawSocket::connectTo(address("log"));
-    peer.send(frame(kMessage, 0, 0, "too late"));
-    port->invalidate();
-    settle();
-    EXPECT_THAT(received, IsEmpty());
-}
-
 /// The other end of a remote port: a listener whose answers the test writes.
 class RemotePortTest : public MessagePortsTest {
 protected:
@@ -410,32 +322,6 @@ TEST_F(MessagePortsTest, ARemotePortIsNotMadeWhereNobodyListens)
     EXPECT_FALSE(ports.createRemote(""));
 }
 
-TEST_F(RemotePortTest, SendsOneWayWithoutAwaitingAnything)
-{
-    const auto sent = port->sendRequest(0, bytesOf("start"), 1s, 0ms, RemotePort::Reply::None);
-    EXPECT_EQ(sent.status, 0);
-    EXPECT_FALSE(sent.reply);
-    ASSERT_TRUE(eventually([&] { return !arrived.empty(); }));
-    EXPECT_THAT(arrived, ElementsAre(Received{0, "start"}));
-}
-
-TEST_F(RemotePortTest, GivesTheReply)
-{
-    answer = [&](const Frame& each) { reply(each, "the answer"); };
-    const auto sent = request("question");
-    EXPECT_EQ(sent.status, 0);
-    ASSERT_TRUE(sent.reply);
-    EXPECT_EQ(textOf(sent.reply->bytes()), "the answer");
-}
-
-TEST_F(RemotePortTest, TellsAnEmptyReplyFromNone)
-{
-    answer = [&](const Frame& each) { reply(each, ""); };
-    const auto sent = request("question");
-    ASSERT_TRUE(sent.reply);
-    EXPECT_TRUE(sent.reply->empty());
-}
-
 TEST_F(RemotePortTest, ServesTimersAndMessagesWhileItWaits)
 {
     const auto local = makeLocal();
@@ -451,34 +337,6 @@ TEST_F(RemotePortTest, ServesTimersAndMessagesWhileItWaits)
     EXPECT_TRUE(request("question").reply);
     EXPECT_THAT(received, ElementsAre(Received{0, "meanwhile"}));
     EXPECT_GT(ticks, 3);
-}
-
-TEST_F(RemotePortTest, GivesNoReplyWhenNoneComesInTime)
-{
-    const auto before = std::chrono::steady_clock::now();
-    const auto sent = request("question", 50ms);
-    EXPECT_GE(std::chrono::steady_clock::now() - before, 50ms);
-    EXPECT_EQ(sent.status, 0);
-    EXPECT_FALSE(sent.reply);
-    EXPECT_TRUE(port->isValid());
-}
-
-TEST_F(RemotePortTest, ThrowsALateReplyAway)
-{
-    std::optional<Frame> first;
-    answer = [&](const Frame& each) {
-        if (!first)
-            first = each;
-        else {
-            reply(*first, "late");
-            reply(each, "in time");
-        }
-    };
-    EXPECT_FALSE(request("one", 20ms).reply);
-    ASSERT_TRUE(eventually([&] { return first.has_value(); }));
-    const auto second = request("two");
-    ASSERT_TRUE(second.reply);
-    EXPECT_EQ(textOf(second.reply->bytes()), "in time");
 }
 
 TEST_F(RemotePortTest, TellsTheRepliesOfNestedRequestsApart)
@@ -531,26 +389,6 @@ TEST_F(RemotePortTest, TakesTheReplyThatCameJustBeforeItsOwnerWent)
     const auto sent = request("question");
     ASSERT_TRUE(sent.reply);
     EXPECT_EQ(textOf(sent.reply->bytes()), "last words");
-}
-
-TEST_F(RemotePortTest, MayBeDestroyedWhileAReplyIsAwaited)
-{
-    port->setInvalidationHandler([] { ADD_FAILURE() << "a destroyed port has nobody to tell"; });
-    queue.post([&] { port.reset(); });
-    RemotePort& borrowed = *port;
-    const auto sent = borrowed.sendRequest(0, bytesOf("question"), 1s, 20s, RemotePort::Reply::Awaited);
-    EXPECT_FALSE(sent.reply);
-    EXPECT_FALSE(port);
-    settle();
-}
-
-TEST_F(RemotePortTest, AnInvalidPortGivesAStatusOtherThanZero)
-{
-    port->invalidate();
-    EXPECT_FALSE(port->isValid());
-    EXPECT_NE(request("question").status, 0);
-    settle();
-    EXPECT_THAT(arrived, IsEmpty());
 }
 
 TEST_F(RemotePortTest, AMalformedReplyInvalidatesWithOneLine)

@@ -17,7 +17,7 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// A service that a thread of the test plays on a plain socket, since the client does not serve the event loop.
+/// A service that a thread of the test plays on a plain socket, so that it can be slow.
 class TelephonyServiceTest : public testing::Test {
 protected:
     ~TelephonyServiceTest() override
@@ -120,6 +120,48 @@ TEST_F(TelephonyServiceTest, GivesUpOnASilentServiceAfterASecond)
     EXPECT_LT(took, 5s);
     connection.reset();
     EXPECT_TRUE(eventually([&] { return over.load(); }));
+}
+
+TEST_F(TelephonyServiceTest, ServesTimersAndTasksWhileItWaits)
+{
+    constexpr int kEnough = 5;
+    std::atomic<int> ticks = 0, tasks = 0;
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        while (client.isOpen() && !client.isAbandoned() && (ticks < kEnough || tasks < 1))
+            std::this_thread::yield();
+        client.send(frame(kReply, 1, 1, words(0, 0) + "port"));
+    });
+    const auto connection = telephony.connect({});
+    const auto timer = queue.repeat(1ms, [&] { ++ticks; });
+    queue.post([&] { ++tasks; });
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("log").remotePort, "port");
+    EXPECT_GE(ticks, kEnough);
+    EXPECT_EQ(tasks, 1);
+}
+
+TEST_F(TelephonyServiceTest, MayBeDestroyedWhileItWaits)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        client.receive(1); // until the client goes
+    });
+    auto connection = telephony.connect([](std::string_view) { ADD_FAILURE() << "heard"; });
+    queue.post([&] { connection.reset(); });
+    EXPECT_EQ(connection->networkMonitorCreateLogChannel("log").errorCode, EPIPE);
+    EXPECT_FALSE(connection);
+}
+
+TEST_F(TelephonyServiceTest, TakesTheAnswerThatCameBehindManyNotificationsJustBeforeTheServiceWent)
+{
+    play([&](RawSocket& client) {
+        client.receive(kRequestSize);
+        std::string bytes;
+        for (int i = 0; i < 1000; ++i)
+            bytes += frame(kMessage, 2, 0, "name");
+        client.send(bytes + frame(kReply, 1, 1, words(0, 0) + "port"));
+    });
+    EXPECT_EQ(telephony.connect({})->networkMonitorCreateLogChannel("log").remotePort, "port");
 }
 
 TEST_F(TelephonyServiceTest, FailsAtOnceWhenTheServiceGoes)

@@ -33,6 +33,8 @@ public:
     bool waitFor(std::string_view text);
     bool waitForEnd();
     bool waitForStop();
+    /// Takes in all that the program has written by now.
+    void takeInTheRest();
 
     std::string row(int row) const; ///< without trailing blanks
     std::string text() const;       ///< all rows, each with a newline
@@ -77,7 +79,6 @@ public:
 
 private:
     void takeIn(int milliseconds);
-    void takeInTheRest();
     void answer();
     void report(int button, int row, int column, char action);
     int rows() const;

@@ -265,26 +265,32 @@ TEST_F(KestrumSaveViewControllerTest, TouchingARowClosesTheKeyboardAndKeepsTheRo
 /// The same with real files.
 class SnapshotFile : public KestrumSaveViewControllerTest {
 protected:
-    void save(const std::string& directory)
+    void save(const std::string& directory) { save(directory, roles); }
+    void save(const std::string& directory, ApplicationRoles& with)
     {
         doubles.files.logDirectory = directory;
         controller = std::make_unique<KestrumSaveViewController>(
-            roles, application,
+            with, application,
             makeArray({makeDictionary(
                 {{"Description", "DLF binary (3 bytes)"}, {"DLF", Data(bytesOf("abc"))}, {"Bell", "\a"}})}));
         view().field.typed = "Mast <3> & more";
         controller->savePressed();
     }
 
+    ApplicationRoles rolesWith(PropertyLists& lists)
+    {
+        return {{{doubles.log, doubles.console, doubles.clock, doubles.bundle, lists},
+                 doubles.queue,
+                 doubles.ports,
+                 doubles.telephony},
+                doubles.preferences,
+                doubles.files,
+                doubles.toolkit};
+    }
+
     ScratchDirectory scratch;
     PropertyListCodec codec;
-    ApplicationRoles roles{{{doubles.log, doubles.console, doubles.clock, doubles.bundle, codec},
-                            doubles.queue,
-                            doubles.ports,
-                            doubles.telephony},
-                           doubles.preferences,
-                           doubles.files,
-                           doubles.toolkit};
+    ApplicationRoles roles = rolesWith(codec);
 };
 
 TEST_F(SnapshotFile, ReadsBackFromADirectoryThatDidNotExist)
@@ -308,17 +314,24 @@ TEST_F(SnapshotFile, DirectoryThatCannotBeMadeIsTold)
                                                   scratch.file("file/logs/KestrumSnapshot-1794809142.kestrum")));
 }
 
+TEST_F(SnapshotFile, LargerThanWhatIsReadIsRefusedWithTheAlert)
+{
+    save(scratch.path());
+    const auto path = scratch.file("KestrumSnapshot-1794809142.kestrum");
+    PropertyListCodec small(std::filesystem::file_size(path) - 1);
+    ApplicationRoles withSmall = rolesWith(small);
+    std::filesystem::remove(path);
+    save(scratch.path(), withSmall);
+    EXPECT_FALSE(std::filesystem::exists(path));
+    EXPECT_THAT(doubles.toolkit.alerts,
+                ElementsAre(RecordingToolkit::Alert{"File Error", "Unable to write file to disk", "Close"}));
+}
+
 TEST_F(SnapshotFile, OfTwoDisplaysInOneSecondThereAreTwo)
 {
     save(scratch.path());
     PropertyListCodec another;
-    ApplicationRoles second{{{doubles.log, doubles.console, doubles.clock, doubles.bundle, another},
-                             doubles.queue,
-                             doubles.ports,
-                             doubles.telephony},
-                            doubles.preferences,
-                            doubles.files,
-                            doubles.toolkit};
+    ApplicationRoles second = rolesWith(another);
     KestrumSaveViewController(second, application, makeArray()).savePressed();
     EXPECT_TRUE(codec.load(scratch.file("KestrumSnapshot-1794809142.kestrum")));
     EXPECT_TRUE(codec.load(scratch.file("KestrumSnapshot-1794809143.kestrum")));
