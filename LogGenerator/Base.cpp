@@ -8,15 +8,6 @@
 
 namespace kestrum {
 
-std::vector<LogCode> codesOf(std::span<const Layout> layouts, std::initializer_list<LogCode> others)
-{
-    std::vector<LogCode> codes;
-    codes.reserve(layouts.size() + others.size());
-    std::ranges::transform(layouts, std::back_inserter(codes), &Layout::code);
-    codes.insert(codes.end(), others);
-    return codes;
-}
-
 void Base::initWithDict(ClassDictionary& classDict, CodeDictionary& codeDict)
 {
     classDict[std::string(getSectionName())] = this;
@@ -31,10 +22,40 @@ void Base::updateSectionRef(const Value& node)
 
 void Base::updateLogCodeDict(CodeDictionary& codeDict)
 {
-    const auto codes = getLogCodeArray();
-    roles.log.write(Priority::Warning, "Array Count: %d", static_cast<int>(codes.size()));
-    for (const LogCode code : codes)
-        codeDict[formatted("%u", code)].push_back(this);
+    roles.log.write(Priority::Warning, "Array Count: %d", static_cast<int>(_traits.layouts.size()));
+    for (const auto& layout : _traits.layouts)
+        codeDict[layout.code].push_back(this);
+}
+
+std::vector<LogCode> Base::getLogCodeArray() const
+{
+    std::vector<LogCode> codes;
+    std::ranges::transform(_traits.layouts, std::back_inserter(codes), &Layout::code);
+    return codes;
+}
+
+void Base::updateWithData(Record data, LogCode logCode)
+{
+    roles.log.write(_traits.entryPriority, _traits.entryLine);
+    const auto known = std::ranges::find(_traits.layouts, logCode, &Layout::code);
+    if (known == _traits.layouts.end() && _traits.foreignCode == ForeignCode::Reported)
+        return reportUnknown(logCode);
+    if (known == _traits.layouts.end() && _traits.foreignCode == ForeignCode::Ignored)
+        return;
+    const Layout layout = known == _traits.layouts.end() ? Layout{logCode} : *known;
+    if (data.size() >= layout.minimumLength)
+        decode(data, layout);
+    else if (roles.watch != nullptr)
+        roles.watch->tooShort();
+}
+
+void Base::decode(Record data, const Layout& layout)
+{
+    if (layout.list)
+        replaceArray(sectionRef,
+                     listed(data, layout.list->elements, data.read(layout.list->count).value_or(0), layout.rows));
+    else
+        publish(data, layout.rows);
 }
 
 void Base::clearElementsInArray(const SectionRef& array)
@@ -64,13 +85,8 @@ std::int16_t Base::lookUpECNO(std::uint32_t linear)
         return 0;
     // Counted rather than searched for: energies vary too much for a search to be foreseen by the processor.
     const auto step = std::ranges::count_if(kAbove, [linear](std::uint32_t above) { return linear <= above; });
-    // Below the scale 0 stands for "no energy": it is shown like full scale, on purpose.
+    // Kept: below the scale 0 stands for "no energy", which reads like full scale.
     return step == std::ssize(kAbove) ? std::int16_t{0} : static_cast<std::int16_t>(-1 - step);
-}
-
-void Base::logEntry() const
-{
-    roles.log.write(entryPriority(), entryLine());
 }
 
 void Base::logError(std::string_view text) const
@@ -83,35 +99,6 @@ void Base::reportUnknown(LogCode logCode) const
     logError(formatted("Received an unknown log message: %d", static_cast<std::int32_t>(logCode)));
 }
 
-bool Base::accepts(Record data, LogCode logCode, LogCode expected, std::size_t minimumLength, Foreign foreign) const
-{
-    logEntry();
-    if (logCode == expected)
-        return holds(data, minimumLength);
-    if (foreign == Foreign::Reported)
-        reportUnknown(logCode);
-    return false;
-}
-
-bool Base::holds(Record data, std::size_t minimumLength) const
-{
-    if (data.size() >= minimumLength)
-        return true;
-    if (roles.watch != nullptr)
-        roles.watch->tooShort();
-    return false;
-}
-
-bool Base::publish(Record data, LogCode logCode, std::span<const Layout> layouts) const
-{
-    const auto layout = std::ranges::find(layouts, logCode, &Layout::code);
-    if (layout == layouts.end())
-        return false;
-    if (holds(data, layout->minimumLength))
-        publish(data, layout->rows);
-    return true;
-}
-
 void Base::publish(Record data, std::span<const Row> rows) const
 {
     if (auto* node = sectionRef.dictionary())
@@ -122,6 +109,12 @@ void Base::publish(std::string_view key, std::string_view text) const
 {
     if (auto* node = sectionRef.dictionary())
         node->setText(key, text);
+}
+
+void Base::publish(std::string_view key, Reading reading) const
+{
+    if (auto* node = sectionRef.dictionary())
+        node->set(key, reading);
 }
 
 void Base::publish(std::string_view key, Value value) const

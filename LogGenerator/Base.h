@@ -8,13 +8,13 @@
 #include <algorithm>
 #include <concepts>
 #include <cstdint>
-#include <initializer_list>
 #include <map>
 #include <memory>
 #include <optional>
 #include <span>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
 
 namespace kestrum {
@@ -23,8 +23,8 @@ class Base;
 
 /// Section name to section. The class index owns the sections.
 using ClassDictionary = std::map<std::string, Base*, std::less<>>;
-/// A log code's decimal text to the sections that subscribed to it, in the order in which they did.
-using CodeDictionary = std::map<std::string, std::vector<Base*>, std::less<>>;
+/// A log code to the sections that subscribed to it, in the order in which they did.
+using CodeDictionary = std::unordered_map<LogCode, std::vector<Base*>>;
 
 /// A section's node in the display: a dictionary or an array that the generator state owns. Harmless when it was
 /// never set, is of the other shape, or is gone.
@@ -61,23 +61,42 @@ private:
     Watched<Array> _array;
 };
 
-/// One record of a dictionary section: records of `code` shorter than `minimumLength` bytes (header included) are
-/// dropped silently, longer ones shown by the rows.
-struct Layout {
-    LogCode code;
-    std::size_t minimumLength;
-    std::span<const Row> rows;
+/// Elements inside a record, as many as a field of it says.
+struct Repeated {
+    Field count;
+    Elements elements;
 };
 
-/// Whether the shortest record of each layout holds all of its fields.
-constexpr bool rowsFit(std::span<const Layout> layouts)
+/// A record that a section takes. Without rows it is decoded by the section's own code.
+struct Layout {
+    LogCode code;
+    std::size_t minimumLength = 0;     ///< in bytes, header included: a shorter record is dropped silently
+    std::span<const Row> rows = {};    ///< of the section's dictionary, or of each element of its list
+    std::optional<Repeated> list = {}; ///< where the section is a list: its elements
+};
+
+/// Whether the shortest record of each layout holds all of its fields, and each element all of its own.
+constexpr bool fits(std::span<const Layout> layouts)
 {
-    return std::ranges::all_of(layouts,
-                               [](const Layout& layout) { return reach(layout.rows) <= layout.minimumLength; });
+    return std::ranges::all_of(layouts, [](const Layout& layout) {
+        if (layout.list)
+            return layout.list->count.end() <= layout.minimumLength &&
+                   reach(layout.rows) <= layout.list->elements.length;
+        return reach(layout.rows) <= layout.minimumLength;
+    });
 }
 
-/// The codes of the layouts, then the others.
-std::vector<LogCode> codesOf(std::span<const Layout> layouts, std::initializer_list<LogCode> others = {});
+/// What a section does with a record of a code that it does not list.
+enum class ForeignCode { Reported, Ignored, Decoded };
+
+/// What a section is, but for code of its own.
+struct SectionTraits {
+    std::string_view name;                ///< the key under which the section's node stands in the template
+    std::span<const Layout> layouts = {}; ///< none for a section that only shows what the template says
+    std::string_view entryLine = name;    ///< the line that each record logs first
+    Priority entryPriority = Priority::Warning;
+    ForeignCode foreignCode = ForeignCode::Reported;
+};
 
 /// A section of the display: decodes records of the codes it names into its node.
 ///
@@ -85,21 +104,20 @@ std::vector<LogCode> codesOf(std::span<const Layout> layouts, std::initializer_l
 /// a record does not carry keeps its value. A list section rewrites its array.
 class Base {
 public:
-    explicit Base(DecodingRoles& decodingRoles) : roles(decodingRoles) {}
+    /// `traits` is a constant: what it refers to outlives the section.
+    Base(DecodingRoles& decodingRoles, const SectionTraits& traits) : roles(decodingRoles), _traits(traits) {}
     virtual ~Base() = default;
     Base(const Base&) = delete;
     Base& operator=(const Base&) = delete;
 
-    /// Registers the section under its name and its codes. An operation, not the constructor: it calls what
-    /// subclasses override.
+    /// Registers the section under its name and its codes.
     void initWithDict(ClassDictionary& classDict, CodeDictionary& codeDict);
 
-    /// The key under which the section's node stands in the template.
-    virtual std::string_view getSectionName() const = 0;
-    /// The codes it decodes; none for a section that only shows what the template says.
-    virtual std::vector<LogCode> getLogCodeArray() const = 0;
-    /// Decodes one record, header included.
-    virtual void updateWithData(Record data, LogCode logCode) = 0;
+    std::string_view getSectionName() const { return _traits.name; }
+    /// The codes it decodes, in the order in which it registers them.
+    std::vector<LogCode> getLogCodeArray() const;
+    /// Decodes one record, header included: logs the entry line, leaves out foreign codes and short records.
+    virtual void updateWithData(Record data, LogCode logCode);
 
     void updateSectionRef(const Value& node);
     void updateLogCodeDict(CodeDictionary& codeDict);
@@ -124,30 +142,18 @@ public:
     static std::int16_t lookUpECNO(std::uint32_t linear);
 
 protected:
-    /// The line that every call of `updateWithData` logs first: the section's name unless said otherwise.
-    virtual std::string_view entryLine() const { return getSectionName(); }
-    virtual Priority entryPriority() const { return Priority::Warning; }
-    void logEntry() const;
-    void logError(std::string_view text) const;
+    /// Shows a record that is long enough, by its layout. A section overrides it for what is particular to it.
+    virtual void decode(Record data, const Layout& layout);
 
+    void logError(std::string_view text) const;
     /// "Received an unknown log message: %d"
     void reportUnknown(LogCode logCode) const;
 
-    /// What a section with one code shares with all others: the entry line, and whether the record is of that code
-    /// and long enough. A foreign code is reported, or ignored where the section says so.
-    enum class Foreign { Reported, Ignored };
-    bool accepts(Record data, LogCode logCode, LogCode expected, std::size_t minimumLength,
-                 Foreign foreign = Foreign::Reported) const;
-
-    /// Whether the record is at least that long; tells the watch, if there is one, when it is not.
-    bool holds(Record data, std::size_t minimumLength) const;
-
-    /// Shows the record by the layout of its code. False when no layout is of that code.
-    bool publish(Record data, LogCode logCode, std::span<const Layout> layouts) const;
     /// Shows the rows in the section's dictionary.
     void publish(Record data, std::span<const Row> rows) const;
     /// Sets one key of the section's dictionary.
     void publish(std::string_view key, std::string_view text) const;
+    void publish(std::string_view key, Reading reading) const;
     void publish(std::string_view key, Value value) const;
     void publish(std::string_view key, const char* text) const { publish(key, std::string_view(text)); }
     void publish(std::string_view key, const std::string& text) const { publish(key, std::string_view(text)); }
@@ -161,6 +167,9 @@ protected:
 
     DecodingRoles& roles;
     SectionRef sectionRef;
+
+private:
+    const SectionTraits& _traits;
 };
 
 } // namespace kestrum

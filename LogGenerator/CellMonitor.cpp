@@ -26,7 +26,7 @@ void showCell(const Value& cell, std::span<const CellRow> rows, Dictionary* into
         if (!number && !row.whenMissing.empty())
             log.write(Priority::Error, row.whenMissing);
         if (number && into != nullptr)
-            show(row, static_cast<std::uint32_t>(*number), *into);
+            into->set(row.key, Reading(row.quantity, static_cast<std::uint32_t>(*number)));
     }
 }
 

@@ -11,13 +11,20 @@ namespace kestrum {
 
 class SystemLog;
 
+/// `Ordinary`, but for the number that a cell has where it was not measured: its text is empty.
+template <const Quantity& Ordinary>
+inline constexpr Quantity kWhereMeasured{
+    [](Quantity::Raw raw) { return signed16(fieldOf(raw)) == INT16_MAX ? std::string() : Ordinary.text(raw); },
+    [](Quantity::Raw raw) { return signed16(fieldOf(raw)) == INT16_MAX ? kNotANumber : Ordinary.number(raw); },
+    Ordinary.unit};
+
 /// One line of a cell's layout: the number's key in the cell, the key it is shown under, what is logged at error
-/// priority when the cell lacks it (nothing for an empty text), how it is worded.
+/// priority when the cell lacks it (nothing for an empty text), what it means.
 struct CellRow {
     std::string_view number;
     std::string_view key;
     std::string_view whenMissing;
-    Conversion conversion = decimal;
+    QuantityRef quantity = decimalSigned32;
 };
 
 /// Sets the key of each row whose number the cell has; the other keys keep their values. Without a dictionary it only

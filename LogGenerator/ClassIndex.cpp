@@ -1,12 +1,16 @@
 #include "LogGenerator/ClassIndex.h"
 
 #include "platform/Console.h"
+#include "support/Format.h"
+
+#include <algorithm>
 
 namespace kestrum {
 
 ClassIndex::ClassIndex(DecodingRoles& decodingRoles)
-    : _parsedOnce(decodingRoles.propertyLists), roles{decodingRoles.log,    decodingRoles.console, decodingRoles.clock,
-                                                      decodingRoles.bundle, _parsedOnce,           decodingRoles.watch}
+    : roles{decodingRoles.log,    decodingRoles.console, decodingRoles.clock,
+            decodingRoles.bundle, _parsedOnce,           decodingRoles.watch},
+      _parsedOnce(decodingRoles.propertyLists)
 {}
 
 ClassIndex::~ClassIndex()
@@ -22,17 +26,16 @@ Base* ClassIndex::getClass(std::string_view sectionName) const
 
 const std::vector<Base*>* ClassIndex::getSubscribers(LogCode logCode) const
 {
-    if (const auto known = _subscribers.find(logCode); known != _subscribers.end())
-        return known->second;
-    const auto found = codeDictionary.find(formatted("%u", logCode));
-    return found == codeDictionary.end() ? nullptr : (_subscribers[logCode] = &found->second);
+    const auto found = codeDictionary.find(logCode);
+    return found == codeDictionary.end() ? nullptr : &found->second;
 }
 
 std::vector<std::string> ClassIndex::getAllLogCodes() const
 {
     std::vector<std::string> codes;
     for (const auto& [code, subscribers] : codeDictionary)
-        codes.push_back(code);
+        codes.push_back(formatted("%u", code));
+    std::ranges::sort(codes);
     return codes;
 }
 

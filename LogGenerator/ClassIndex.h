@@ -4,7 +4,6 @@
 #include "LogGenerator/ParsedOnce.h"
 
 #include <memory>
-#include <unordered_map>
 
 namespace kestrum {
 
@@ -20,15 +19,10 @@ public:
     Base* getClass(std::string_view sectionName) const;
     /// The sections that subscribed to the code, in their order; null when there are none.
     const std::vector<Base*>* getSubscribers(LogCode logCode) const;
-    /// The decimal texts of all codes, in the registry's order.
+    /// The decimal texts of all codes, in the order of the texts.
     std::vector<std::string> getAllLogCodes() const;
     /// Logs what the registry is; diagnostics only.
     void status() const;
-
-private:
-    ParsedOnce _parsedOnce;
-    /// What `getSubscribers` found: it is asked for every record, by number.
-    mutable std::unordered_map<LogCode, const std::vector<Base*>*> _subscribers;
 
 protected:
     template <typename Section>
@@ -42,6 +36,9 @@ protected:
     DecodingRoles roles; ///< as given, but for the property lists
     ClassDictionary classDict;
     CodeDictionary codeDictionary;
+
+private:
+    ParsedOnce _parsedOnce; ///< the sections', through `roles`
 };
 
 } // namespace kestrum

@@ -26,44 +26,45 @@ LogGenerator::LogGenerator(DecodingRoles& roles) : _roles(roles)
 
 void LogGenerator::updateHistoryInState(State& state) const
 {
-    auto history = state.at("History").array();
+    auto history = state.at(StateKey::kHistory).array();
     if (!history) {
         history = makeArray();
-        state.set("History", history);
+        state.set(StateKey::kHistory, history);
     }
     if (history->size() >= kHistoryLength)
         history->removeFirst(history->size() - (kHistoryLength - 1));
 
     const auto date = dateText(_roles.clock.now());
-    history->append(makeDictionaryUntilNull({{"DisplayState", shallowCopy(state.at("DisplayState"))},
-                                             {"Display", shallowCopy(state.at("Display"))},
-                                             {"ExtraInfo", shallowCopy(state.at("ExtraInfo"))},
-                                             {"Date", date},
-                                             {"Description", formatted("Snapshot (%@)", date)}}));
+    history->append(makeDictionaryUntilNull({{StateKey::kDisplayState, shallowCopy(state.at(StateKey::kDisplayState))},
+                                             {StateKey::kDisplay, shallowCopy(state.at(StateKey::kDisplay))},
+                                             {StateKey::kExtraInfo, shallowCopy(state.at(StateKey::kExtraInfo))},
+                                             {StateKey::kDate, date},
+                                             {StateKey::kDescription, formatted("Snapshot (%@)", date)}}));
 }
 
 LogGenerator::Origin LogGenerator::originOfDisplay(const State& state) const
 {
-    const Value* display = state.find("Display");
+    const Value* display = state.find(StateKey::kDisplay);
     if (display == nullptr || display->isNull())
         return Origin::None;
     const auto origin = state.at(kOrigin).dictionary();
-    if (!origin || !isSameContainer(origin->at("Display"), *display))
+    if (!origin || !isSameContainer(origin->at(StateKey::kDisplay), *display))
         return Origin::Unknown;
     return origin->at("Technology") == Value(technology()) ? Origin::Own : Origin::Other;
 }
 
 void LogGenerator::setDisplay(State& state, Value display) const
 {
-    state.set("Display", display);
-    state.set(kOrigin, makeDictionary({{"Technology", technology()}, {"Display", std::move(display)}}));
+    state.set(StateKey::kDisplay, display);
+    state.set(kOrigin, makeDictionary({{"Technology", technology()}, {StateKey::kDisplay, std::move(display)}}));
 }
 
 void LogGenerator::dropForeignDisplay(State& state) const
 {
     if (originOfDisplay(state) != Origin::Other)
         return;
-    for (const auto key : {"Display", "DisplayState", "ExtraInfo", "Template", "Lookup"})
+    for (const char* key :
+         {StateKey::kDisplay, StateKey::kDisplayState, StateKey::kExtraInfo, StateKey::kTemplate, StateKey::kLookup})
         state.remove(key);
     state.remove(kOrigin);
 }

@@ -1,17 +1,13 @@
 #pragma once
 
+#include "LogGenerator/State.h"
 #include "platform/Roles.h"
 #include "support/Bytes.h"
-#include "support/Value.h"
 
 #include <memory>
 #include <string_view>
 
 namespace kestrum {
-
-/// All that a run knows: "Display", "DisplayState", "ExtraInfo", "History", and "Template" and "Lookup" where a
-/// technology has them. The model owns it; it outlives every generator.
-using State = Dictionary;
 
 /// Interprets the diagnostic log of one baseband technology. It keeps its decoding machinery alone; what it decodes
 /// goes into the state. Main thread only.

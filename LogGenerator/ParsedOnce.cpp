@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-Value ParsedOnce::parse(Bytes bytes) const
+Value ParsedOnce::parse(Bytes bytes)
 {
     if (textOf(bytes) != textOf(_bytes)) {
         _value = _lists.parseOver(bytes, std::exchange(_value, {}));

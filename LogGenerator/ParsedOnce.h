@@ -6,16 +6,15 @@
 
 namespace kestrum {
 
-/// Property lists that remember the list they parsed last: up to five sections read the list of one record, and a
-/// service that has nothing new to say repeats itself. Who parses shares the value with the others, and leaves it as
-/// it is.
+/// Property lists that remember the list they parsed last: up to five sections read the list of one record, and the
+/// service often sends the same list again. Callers share the value and do not change it.
 class ParsedOnce final : public PropertyLists {
 public:
-    explicit ParsedOnce(const PropertyLists& lists) : _lists(lists) {}
+    explicit ParsedOnce(PropertyLists& lists) : _lists(lists) {}
 
-    Value parse(Bytes bytes) const override;
+    Value parse(Bytes bytes) override;
     /// What it parsed last is spent instead.
-    Value parseOver(Bytes bytes, Value /*spent*/) const override { return parse(bytes); }
+    Value parseOver(Bytes bytes, Value /*spent*/) override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override { return _lists.toXml(value); }
     Value load(const std::string& path) const override { return _lists.load(path); }
     Stored write(const Dictionary& dictionary, const std::string& path) const override
@@ -24,9 +23,9 @@ public:
     }
 
 private:
-    const PropertyLists& _lists;
-    mutable std::vector<std::byte> _bytes;
-    mutable Value _value; ///< what `_bytes` are
+    PropertyLists& _lists;
+    std::vector<std::byte> _bytes;
+    Value _value; ///< what `_bytes` are
 };
 
 } // namespace kestrum

@@ -1,6 +1,5 @@
 #include "LogGenerator/PropertyListRecord.h"
 
-#include "platform/ChannelMessage.h"
 #include "platform/PropertyLists.h"
 #include "platform/SystemLog.h"
 #include "platform/TelephonyService.h"
@@ -11,7 +10,7 @@ namespace {
 bool holds(const Dictionary& dictionary, std::string_view key, std::string_view text)
 {
     const Value* value = dictionary.find(key);
-    return value != nullptr && value->string() != nullptr && *value->string() == text;
+    return value != nullptr && *value == text;
 }
 
 } // namespace

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/ChannelMessage.h"
 #include "platform/Roles.h"
 #include "support/Record.h"
 #include "support/Value.h"

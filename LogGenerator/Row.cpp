@@ -6,7 +6,7 @@ void show(Record record, std::span<const Row> rows, Dictionary& into)
 {
     for (const auto& row : rows)
         if (const auto raw = record.read(row.field))
-            show(row, *raw, into);
+            into.set(row.key, Reading(row.quantity, *raw));
 }
 
 } // namespace kestrum

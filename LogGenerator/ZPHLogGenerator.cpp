@@ -29,7 +29,7 @@ void ZPHLogGenerator::moveBinDataToState(State& state)
     if (interval.dropped > 0)
         _roles.log.write(Priority::Warning, "Too many raw records for one interval: the oldest %lu were dropped",
                          interval.dropped);
-    state.set("DisplayState", Data(std::move(interval.bytes)));
+    state.set(StateKey::kDisplayState, Data(std::move(interval.bytes)));
 }
 
 std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) const
@@ -45,10 +45,10 @@ std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) co
         _roles.log.write(Priority::Raw16, "Could not write DLF header (result=%d)", result);
         return std::nullopt;
     }
-    if (const auto history = state.at("History").array()) {
+    if (const auto history = state.at(StateKey::kHistory).array()) {
         for (const auto& entry : *history) {
             const auto dictionary = entry.dictionary();
-            const Value recorded = dictionary ? dictionary->at("DisplayState") : Value();
+            const Value recorded = dictionary ? dictionary->at(StateKey::kDisplayState) : Value();
             if (recorded.isNull())
                 continue;
             if (recorded.data() == nullptr) {
@@ -68,7 +68,7 @@ std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) co
 
 ArrayRef ZPHLogGenerator::getSaveContentsFromState(const State& state) const
 {
-    const auto history = state.at("History").array();
+    const auto history = state.at(StateKey::kHistory).array();
     auto contents = history ? std::make_shared<Array>(*history) : makeArray();
     if (const auto dlf = generateDlfFromState(state))
         contents->append(makeDictionary(

@@ -61,7 +61,7 @@ void ZPHLogGenerator2::updateWithData(Bytes message)
 
 Value ZPHLogGenerator2::processTemplate(const Value& node) const
 {
-    if (node.string() != nullptr)
+    if (node.isText())
         return node;
     if (const auto dictionary = node.dictionary()) {
         auto processed = makeDictionary();
@@ -89,7 +89,7 @@ Value ZPHLogGenerator2::processTemplate(const Value& node) const
 
 void ZPHLogGenerator2::printDict(const Value& node) const
 {
-    if (node.string() != nullptr)
+    if (node.isText())
         return;
     if (const auto dictionary = node.dictionary()) {
         for (const auto& entry : *dictionary)
@@ -104,7 +104,7 @@ void ZPHLogGenerator2::printDict(const Value& node) const
 
 Value ZPHLogGenerator2::loadTemplate(State& state) const
 {
-    if (Value known = state.at("Template"))
+    if (Value known = state.at(StateKey::kTemplate))
         return known;
     const auto path = _roles.bundle.pathForResource(_pListName, "plist");
     const Value loaded = path ? _roles.propertyLists.load(*path) : Value();
@@ -112,13 +112,13 @@ Value ZPHLogGenerator2::loadTemplate(State& state) const
         _roles.log.write(Priority::Error, "Cannot load template for display");
         return {};
     }
-    state.set("Template", loaded);
+    state.set(StateKey::kTemplate, loaded);
     return loaded;
 }
 
 bool ZPHLogGenerator2::isOwnDisplay(const State& state) const
 {
-    const Value* display = state.find("Display");
+    const Value* display = state.find(StateKey::kDisplay);
     return display != nullptr && display->borrowedDictionary() != nullptr &&
            display->borrowedDictionary() == _display.dictionary();
 }
@@ -126,10 +126,10 @@ bool ZPHLogGenerator2::isOwnDisplay(const State& state) const
 Value ZPHLogGenerator2::getDisplayFromState(State& state)
 {
     if (isOwnDisplay(state))
-        return state.at("Display");
+        return state.at(StateKey::kDisplay);
 
     dropForeignDisplay(state);
-    const Value existing = state.at("Display");
+    const Value existing = state.at(StateKey::kDisplay);
     if (originOfDisplay(state) == Origin::Own) {
         takeOver(loadTemplate(state), existing);
         _display = SectionRef(existing);
@@ -147,7 +147,7 @@ Value ZPHLogGenerator2::getDisplayFromState(State& state)
     const Value built = processTemplate(loaded);
     printDict(built);
     setDisplay(state, built);
-    state.set("ExtraInfo", makeDictionary());
+    state.set(StateKey::kExtraInfo, makeDictionary());
     _display = SectionRef(built);
     return existing;
 }

@@ -13,7 +13,6 @@ namespace kestrum {
 namespace {
 
 constexpr std::string_view kTitle = "Kestrum";
-constexpr std::string_view kSorted = "_sorted";
 constexpr char kOrderSeparator = ';';
 
 /// What stands before the first ";" of a key, and what behind it.
@@ -35,7 +34,7 @@ std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary,
     std::vector<const Dictionary::Entry*> entries;
     entries.reserve(dictionary.size());
     for (const auto& entry : dictionary)
-        if (entry.key != kSorted && entry.value)
+        if (entry.key != kSortedKey && entry.value)
             entries.push_back(&entry);
     // Part by part: ";" sorts behind the digits, and would put "10;" before "1;". No numbers are read: "10" stands
     // before "2" on purpose.
@@ -66,8 +65,8 @@ public:
 private:
     KestrumModelNodeRef make(std::string name, const Value& object, const Path& path)
     {
-        if (const auto* text = object.string())
-            return std::make_shared<KestrumModelLeafNode>(std::move(name), *text);
+        if (auto text = object.text())
+            return std::make_shared<KestrumModelLeafNode>(std::move(name), *std::move(text));
         if (const auto dictionary = object.dictionary())
             return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*dictionary, path));
         if (const auto array = object.array())
@@ -77,7 +76,7 @@ private:
 
     KestrumModelNodes childrenOf(const Dictionary& dictionary, const Path& path)
     {
-        const Value* marker = dictionary.find(kSorted);
+        const Value* marker = dictionary.find(kSortedKey);
         const bool sorted = marker != nullptr && !marker->isNull();
         const auto entries = shownEntries(dictionary, sorted);
         KestrumModelNodes children;

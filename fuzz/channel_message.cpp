@@ -67,7 +67,7 @@ std::string pathOf(std::string_view templateName)
     return inCheckout("resources/").append(templateName).append(".plist");
 }
 
-const PropertyListCodec kCodec;
+PropertyListCodec kCodec;
 
 /// One generator, from its start on.
 class Run : public FuzzedRoles {
@@ -141,7 +141,7 @@ bool isListing(const Technology& technology, const Value& value)
         });
     if (const auto array = value.array())
         return std::ranges::all_of(*array, [&](const Value& each) { return isListing(technology, each); });
-    return value.string() != nullptr;
+    return value.isText();
 }
 
 /// Whether the display has no keys but those of the template beside it and of the rows listed inside it.

@@ -14,7 +14,7 @@
 namespace kestrum::fuzz {
 namespace {
 
-const PropertyListCodec kCodec;
+PropertyListCodec kCodec;
 
 /// What a person is shown of it, and its messages; nothing where it is refused.
 std::vector<std::string> recovered(const Value& list)

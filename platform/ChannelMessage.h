@@ -31,6 +31,11 @@ struct ChannelMessage {
     std::optional<std::uint64_t> timeStamp() const;
 };
 
+/// The telephony service's own records, property lists behind a header.
+inline constexpr LogCode kSimFilesRecord = ChannelMessage::kExtraCodes;        ///< a dictionary of elementary files
+inline constexpr LogCode kCellMonitorRecord = ChannelMessage::kExtraCodes + 1; ///< an array of cells
+inline constexpr LogCode kPdpContextsRecord = ChannelMessage::kExtraCodes + 2; ///< an array of rows
+
 /// Code and time stamp of a log record.
 struct ChannelRecord {
     LogCode code;            ///< 0xFF0000 + the code when the type is 0xFF

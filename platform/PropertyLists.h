@@ -16,10 +16,10 @@ public:
 
     /// Any form (XML or binary), told apart by the bytes. Null for anything that is no property list; nothing that
     /// the bytes hold can crash, hang or exhaust memory.
-    virtual Value parse(Bytes bytes) const = 0;
-    /// The same, possibly made of the containers of a value that is spent: lists of one kind come again and again.
-    /// Containers that somebody else still holds are left alone.
-    virtual Value parseOver(Bytes bytes, Value spent) const = 0;
+    virtual Value parse(Bytes bytes) = 0;
+    /// Like `parse`, but may reuse the memory of `spent`: pass a value that is no longer read. Containers that are
+    /// shared stay as they are.
+    virtual Value parseOver(Bytes bytes, Value spent) = 0;
 
     /// The XML form, version 1.0. Nulls are left out, characters that XML forbids become U+FFFD.
     /// Nothing when the value is null or nested too deeply.

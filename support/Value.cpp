@@ -28,10 +28,24 @@ Value::Value(DictionaryRef dictionary)
 
 Value::Kind Value::kind() const
 {
-    constexpr Kind kinds[] = {Kind::Null,    Kind::String, Kind::Integer, Kind::Integer, Kind::Real,
-                              Kind::Boolean, Kind::Date,   Kind::Data,    Kind::Array,   Kind::Dictionary};
+    constexpr Kind kinds[] = {Kind::Null,    Kind::String, Kind::String, Kind::Integer, Kind::Integer,   Kind::Real,
+                              Kind::Boolean, Kind::Date,   Kind::Data,   Kind::Array,   Kind::Dictionary};
     static_assert(std::size(kinds) == std::variant_size_v<decltype(_held)>);
     return kinds[_held.index()];
+}
+
+std::optional<std::string> Value::text() const
+{
+    if (const auto* held = std::get_if<Reading>(&_held))
+        return held->text();
+    const auto* held = std::get_if<std::string>(&_held);
+    return held ? std::optional(*held) : std::nullopt;
+}
+
+std::optional<Reading> Value::reading() const
+{
+    const auto* held = std::get_if<Reading>(&_held);
+    return held ? std::optional(*held) : std::nullopt;
 }
 
 std::optional<std::int64_t> Value::integer() const
@@ -94,6 +108,19 @@ std::optional<std::int32_t> Value::int32() const
     return std::nullopt;
 }
 
+void Value::startOver()
+{
+    if (auto* text = std::get_if<std::string>(&_held))
+        text->clear();
+    else if (const auto* array = std::get_if<ArrayRef>(&_held); array != nullptr && array->use_count() == 1)
+        (*array)->startOver();
+    else if (const auto* dictionary = std::get_if<DictionaryRef>(&_held);
+             dictionary != nullptr && dictionary->use_count() == 1)
+        (*dictionary)->startOver();
+    else
+        _held = std::monostate();
+}
+
 template <typename Container>
 Container& Value::become()
 {
@@ -117,9 +144,8 @@ Dictionary& Value::becomeDictionary()
     return become<Dictionary>();
 }
 
-void Value::assignText(std::string_view text, Wording wording)
+void Value::assignText(std::string_view text)
 {
-    _wording = wording;
     auto* held = std::get_if<std::string>(&_held);
     if (held == nullptr)
         _held = std::string(text);
@@ -129,7 +155,7 @@ void Value::assignText(std::string_view text, Wording wording)
 
 bool operator==(const Value& left, const Value& right)
 {
-    if (left._held.index() != right._held.index())
+    if (left.kind() != right.kind())
         return false;
     switch (left.kind()) {
     case Value::Kind::Array: {
@@ -150,7 +176,9 @@ bool operator==(const Value& left, const Value& right)
     case Value::Kind::Null:
         return true;
     case Value::Kind::String:
-        return *left.string() == *right.string();
+        if (const auto reading = left.reading(); reading && reading == right.reading())
+            return true;
+        return left == std::string_view(right.reading() ? right.reading()->text() : std::get<std::string>(right._held));
     case Value::Kind::Integer:
         return left.integer() == right.integer() && left.unsignedInteger() == right.unsignedInteger();
     case Value::Kind::Real:
@@ -161,6 +189,14 @@ bool operator==(const Value& left, const Value& right)
         return left.date() == right.date();
     }
     return false;
+}
+
+bool Value::is(std::string_view text) const
+{
+    if (const auto* held = std::get_if<std::string>(&_held))
+        return *held == text;
+    const auto* held = std::get_if<Reading>(&_held);
+    return held != nullptr && held->text() == text;
 }
 
 std::string_view nameOf(Value::Kind kind)
@@ -213,16 +249,15 @@ std::size_t Dictionary::indexOf(std::string_view key) const
         while (at < _size && _entries[at].key != key)
             ++at;
     }
-    if (at == _size)
-        return kNotThere;
-    _next = at + 1;
-    return at;
+    return at == _size ? kNotThere : at;
 }
 
-const Value* Dictionary::find(std::string_view key) const
+std::size_t Dictionary::advanceTo(std::string_view key)
 {
     const std::size_t at = indexOf(key);
-    return at == kNotThere ? nullptr : &_entries[at].value;
+    if (at != kNotThere)
+        _next = at + 1;
+    return at;
 }
 
 Value Dictionary::at(std::string_view key) const
@@ -231,9 +266,18 @@ Value Dictionary::at(std::string_view key) const
     return found ? *found : Value();
 }
 
-Value& Dictionary::slotElsewhere(std::string_view key)
+Value& Dictionary::slot(std::string_view key)
 {
-    if (const std::size_t at = indexOf(key); at != kNotThere)
+    const std::size_t before = _size;
+    Value& value = reuse(key);
+    if (_size > before)
+        value.startOver();
+    return value;
+}
+
+Value& Dictionary::reuseElsewhere(std::string_view key)
+{
+    if (const std::size_t at = advanceTo(key); at != kNotThere)
         return _entries[at].value;
     dropSpares(); // one of them may have this key
     if (_entries.empty())
@@ -326,7 +370,7 @@ void describeInto(std::string& text, const Value& value)
         text += "null";
         break;
     case Value::Kind::String:
-        text += '"' + *value.string() + '"';
+        text += '"' + *value.text() + '"';
         break;
     case Value::Kind::Integer:
         text += value.integer() ? formatted("%ld", *value.integer()) : formatted("%lu", *value.unsignedInteger());

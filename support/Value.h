@@ -2,6 +2,7 @@
 
 #include "support/Bytes.h"
 #include "support/Date.h"
+#include "support/Reading.h"
 
 #include <concepts>
 #include <cstdint>
@@ -25,13 +26,8 @@ class Dictionary;
 using ArrayRef = std::shared_ptr<Array>;
 using DictionaryRef = std::shared_ptr<Dictionary>;
 
-/// What a text was made of: a raw value, by a line of a layout. Equal wordings give equal texts.
-struct Wording {
-    const void* line = nullptr; ///< of a constant layout; only compared
-    std::uint32_t raw = 0;
-
-    friend bool operator==(const Wording&, const Wording&) = default;
-};
+/// Under this key, a dictionary asks to be shown in the order of its keys; of "n;Name" only the name is shown.
+inline constexpr char kSortedKey[] = "_sorted";
 
 /// A node of the display, of a template, of the generator state or of a property list.
 /// Arrays and dictionaries have identity: copies of the Value share the container. All else is a plain value.
@@ -43,8 +39,9 @@ public:
     Value(std::string text) : _held(std::move(text)) {}
     Value(std::string_view text) : _held(std::string(text)) {}
     Value(const char* text) : _held(std::string(text)) {}
-    Value(ArrayRef array);           ///< null for a null reference
-    Value(DictionaryRef dictionary); ///< null for a null reference
+    Value(ArrayRef array);                     ///< null for a null reference
+    Value(DictionaryRef dictionary);           ///< null for a null reference
+    Value(Reading reading) : _held(reading) {} ///< a string, whose text is made when it is read
     Value(Data data) : _held(std::move(data)) {}
     Value(Date date) : _held(date) {}
     Value(std::floating_point auto real) : _held(static_cast<double>(real)) {}
@@ -63,10 +60,12 @@ public:
 
     Kind kind() const;
     bool isNull() const { return kind() == Kind::Null; }
+    bool isText() const { return kind() == Kind::String; }
     explicit operator bool() const { return !isNull(); }
 
     /// What the value holds when it is of that kind; else nothing (a null pointer, an empty optional).
-    const std::string* string() const { return std::get_if<std::string>(&_held); }
+    std::optional<std::string> text() const;              ///< of a string, readings included
+    std::optional<Reading> reading() const;               ///< nothing for a plain string
     std::optional<std::int64_t> integer() const;          ///< nothing above 2^63-1 too
     std::optional<std::uint64_t> unsignedInteger() const; ///< nothing below 0
     std::optional<double> real() const;
@@ -77,6 +76,7 @@ public:
     DictionaryRef dictionary() const;
     /// The same, borrowed from the value.
     const Dictionary* borrowedDictionary() const;
+    const std::string* borrowedString() const { return std::get_if<std::string>(&_held); } ///< null for a reading
 
     /// A 32-bit number: an integer in range, or a real without fraction in range. A boolean is no number.
     std::optional<std::int32_t> int32() const;
@@ -85,31 +85,42 @@ public:
     Array& becomeArray();
     Dictionary& becomeDictionary();
 
-    /// Makes this a string, reusing the storage of the one it holds.
-    void assignText(std::string_view text, Wording wording = {});
-    /// Whether it is the text that was assigned with this wording: then nothing has to be worded anew. Most fields of
-    /// most records have not changed since the last one.
-    bool isWorded(const Wording& wording) const { return wording == _wording; }
+    /// Forgets what it holds, but keeps the memory: a text or a container becomes empty (null when somebody else holds
+    /// the container), all else null.
+    void startOver();
 
-    /// Equal kind and contents, containers compared element by element (dictionaries without regard to order).
-    /// Not for self-referring structures.
+    /// Makes this a string, reusing the storage of the one it holds.
+    void assignText(std::string_view text);
+    void assign(Reading reading)
+    {
+        if (auto* held = std::get_if<Reading>(&_held))
+            *held = reading;
+        else
+            _held = reading;
+    }
+
+    /// Equal kind and contents: strings and readings by their texts, containers element by element (dictionaries
+    /// without regard to order). Not for self-referring structures.
     friend bool operator==(const Value& left, const Value& right);
+    friend bool operator==(const Value& value, std::string_view text) { return value.is(text); }
+    friend bool operator==(const Value& value, const char* text) { return value.is(text); }
+    /// Whether it is a string, a reading included, with this text.
+    bool is(std::string_view text) const;
 
 private:
     template <typename Container>
     Container& become();
 
-    std::variant<std::monostate, std::string, std::int64_t, std::uint64_t, double, bool, Date, Data, ArrayRef,
+    std::variant<std::monostate, std::string, Reading, std::int64_t, std::uint64_t, double, bool, Date, Data, ArrayRef,
                  DictionaryRef>
         _held;
-    Wording _wording;
 };
 
 /// The kind's name as it is put into messages: "string", "integer", ...
 std::string_view nameOf(Value::Kind kind);
 
-/// Values in order. `startOver` keeps what stood there, as spares, whose storage is then filled again. Lists are
-/// rewritten thousands of times a second, mostly with as much as before.
+/// Values in order. `startOver` keeps the elements as spares, whose memory is used again: lists are rewritten thousands
+/// of times a second, mostly with as much as before.
 class Array {
 public:
     Array() = default;
@@ -128,17 +139,18 @@ public:
     void startOver() { _size = 0; } ///< empty, as after `clear`
     void dropSpares();
     void reserve(std::size_t count) { _elements.reserve(count); }
-    /// Appends a value that is still to be set: a spare one as it is, or null.
+    /// Appends a null value, an empty text or an empty container, whichever stood there.
     Value& slot()
     {
-        if (_size == _elements.size())
-            _elements.emplace_back();
-        return _elements[_size++];
+        Value& value = reuse();
+        value.startOver();
+        return value;
     }
-    void append(Value element) { slot() = std::move(element); }
-    void appendText(std::string_view text) { slot().assignText(text); }
+    void append(Value element) { reuse() = std::move(element); }
+    void append(Reading reading) { reuse().assign(reading); }
+    void appendText(std::string_view text) { reuse().assignText(text); }
     /// Appends a dictionary without entries.
-    Dictionary& appendRow() { return slot().becomeDictionary(); }
+    Dictionary& appendRow() { return reuse().becomeDictionary(); }
     /// `count` is not above `size()`.
     void removeFirst(std::size_t count)
     {
@@ -155,12 +167,20 @@ public:
     auto end() { return _elements.begin() + static_cast<std::ptrdiff_t>(_size); }
 
 private:
+    /// Appends a value that is to be set at once: a spare one, or null.
+    Value& reuse()
+    {
+        if (_size == _elements.size())
+            _elements.emplace_back();
+        return _elements[_size++];
+    }
+
     std::vector<Value> _elements; ///< the spares behind the others
     std::size_t _size = 0;
 };
 
 /// Values under string keys, in the order in which the keys first came. `startOver` keeps the entries as spares; keys
-/// that come again in their order find their storage.
+/// that come again in their order use their memory again.
 class Dictionary {
 public:
     struct Entry {
@@ -177,44 +197,20 @@ public:
     bool empty() const { return _size == 0; }
 
     /// The value under `key`, null when there is none.
-    const Value* find(std::string_view key) const;
-    Value* find(std::string_view key) { return const_cast<Value*>(std::as_const(*this).find(key)); }
+    const Value* find(std::string_view key) const { return valueAt(indexOf(key)); }
+    Value* find(std::string_view key) { return const_cast<Value*>(valueAt(advanceTo(key))); }
     /// As `find`, as a value: the null value when there is none.
     Value at(std::string_view key) const;
     bool contains(std::string_view key) const { return find(key) != nullptr; }
 
-    /// The value under `key`. A key that is not there is appended, its value still to be set: a spare one as it is, or
-    /// null.
-    Value& slot(std::string_view key)
-    {
-        const auto expected = _entries.begin() + static_cast<std::ptrdiff_t>(_next);
-        if (expected == _entries.end() || expected->key != key)
-            return slotElsewhere(key);
-        if (_next++ == _size)
-            takeSpare();
-        return expected->value;
-    }
+    /// The value under `key`. A key that is not there is appended with a null value, an empty text or an empty
+    /// container, whichever stood there.
+    Value& slot(std::string_view key);
     /// Replaces the value under `key` in its place, or appends the key.
-    void set(std::string_view key, Value value) { slot(key) = std::move(value); }
+    void set(std::string_view key, Value value) { reuse(key) = std::move(value); }
+    void set(std::string_view key, Reading reading) { reuse(key).assign(reading); }
     /// As `set`, without allocating when a text of that length stands there already.
-    void setText(std::string_view key, std::string_view text) { slot(key).assignText(text); }
-    /// As `set` with a text: `word` makes it and assigns it to the value it is given, unless it stands there already.
-    template <std::invocable<Value&> Word>
-    void setWorded(std::string_view key, const Wording& wording, Word word)
-    {
-        if (Value& value = slot(key); !value.isWorded(wording))
-            word(value);
-    }
-    /// `setWorded` for the usual case, without a look at the key: whether the next entry has this wording, and stays.
-    /// Only for lines that always word the same key.
-    bool passWorded(const Wording& wording)
-    {
-        if (_next == _entries.size() || !_entries[_next].value.isWorded(wording))
-            return false;
-        if (_next++ == _size)
-            takeSpare();
-        return true;
-    }
+    void setText(std::string_view key, std::string_view text) { reuse(key).assignText(text); }
     void remove(std::string_view key);
     void clear();
     void startOver() ///< empty, as after `clear`
@@ -236,8 +232,20 @@ private:
     // Below this many keys a look through them is faster than the index.
     static constexpr std::size_t kIndexFrom = 48;
 
+    /// The value under `key`, which is to be set at once: that of a new key is a spare one, or null.
+    Value& reuse(std::string_view key)
+    {
+        const auto expected = _entries.begin() + static_cast<std::ptrdiff_t>(_next);
+        if (expected == _entries.end() || expected->key != key)
+            return reuseElsewhere(key);
+        if (_next++ == _size)
+            takeSpare();
+        return expected->value;
+    }
+    Value& reuseElsewhere(std::string_view key);
+    const Value* valueAt(std::size_t index) const { return index == kNotThere ? nullptr : &_entries[index].value; }
     std::size_t indexOf(std::string_view key) const;
-    Value& slotElsewhere(std::string_view key);
+    std::size_t advanceTo(std::string_view key); ///< as `indexOf`; moves `_next` behind the entry
     void takeSpare()
     {
         if (++_size > kIndexFrom)
@@ -249,7 +257,7 @@ private:
     std::size_t _size = 0;
     // Decoders set their keys in the same order each time, or ask for the same one: the entry behind the last one
     // found is tried first, then that itself. Not above `_size`.
-    mutable std::size_t _next = 0;
+    std::size_t _next = 0;
     // Kept beyond a few dozen keys only: property lists from outside may hold many thousands. Sorted, for keys can be
     // chosen to collide in any hash.
     std::map<std::string, std::size_t, std::less<>> _index;

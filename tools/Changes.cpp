@@ -3,9 +3,6 @@
 namespace kestrum {
 namespace {
 
-/// Marks a dictionary whose keys are sorted; not a value to be shown.
-constexpr std::string_view kSortedMarker = "_sorted";
-
 void appendStep(std::string& pointer, std::string_view step)
 {
     pointer += '/';
@@ -54,7 +51,7 @@ void Changes::compare(const Dictionary& now, Dictionary& seen)
 {
     std::size_t shown = 0;
     for (const auto& [key, value] : now) {
-        if (value.isNull() || key == kSortedMarker)
+        if (value.isNull() || key == kSortedKey)
             continue;
         ++shown;
         if (!seen.contains(key))

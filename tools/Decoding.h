@@ -63,7 +63,7 @@ public:
     /// Empty while it is not known.
     const std::string& technology() const { return _technology; }
     /// The display dictionary; null when there is none.
-    Value display() const { return _state.at("Display"); }
+    Value display() const { return _state.at(StateKey::kDisplay); }
     const Statistics& statistics() const { return _statistics; }
     Tally total() const;
 

@@ -9,6 +9,7 @@
 #include <nlohmann/json.hpp>
 
 #include <algorithm>
+#include <charconv>
 #include <cstdio>
 #include <utility>
 
@@ -29,7 +30,7 @@ Json jsonOf(const Value& value)
 {
     switch (value.kind()) {
     case Value::Kind::String:
-        return *value.string();
+        return *value.text();
     case Value::Kind::Integer:
         if (const auto number = value.integer())
             return *number;
@@ -75,10 +76,19 @@ void appendJson(std::string& to, std::string_view raw)
     to += '"';
 }
 
+/// The shortest decimal text that reads back as the number.
+std::string numberText(double number)
+{
+    char digits[32];
+    return {digits, std::to_chars(std::begin(digits), std::end(digits), number).ptr};
+}
+
 /// A value in a cell of a table or a line of a tree: a text as it is.
 std::string plainText(const Value& value)
 {
-    return value.string() != nullptr ? *value.string() : value.isNull() ? std::string() : text(jsonOf(value));
+    if (auto words = value.text())
+        return *std::move(words);
+    return value.isNull() ? std::string() : text(jsonOf(value));
 }
 
 Json jsonOf(const SnapshotListing& listing)
@@ -113,8 +123,8 @@ void list(const SnapshotListing& listing, OutputFile& to)
 /// Remarks that do not belong among the data.
 class RemarkingOutput : public Output {
 public:
-    RemarkingOutput(bool withLog, OutputFile& data, OutputFile& remarks)
-        : _data(data), _remarks(remarks), _withLog(withLog)
+    RemarkingOutput(Contents contents, OutputFile& data, OutputFile& remarks)
+        : _data(data), _remarks(remarks), _withLog(contents.log)
     {}
 
     void logLine(Priority priority, std::string_view line) override
@@ -179,9 +189,10 @@ private:
 /// in a file without a name.
 class JsonOutput final : public Output {
 public:
-    JsonOutput(bool withLog, OutputFile& data) : _data(data), _log(withLog ? std::tmpfile() : nullptr, std::fclose)
+    JsonOutput(Contents contents, OutputFile& data)
+        : _data(data), _log(contents.log ? std::tmpfile() : nullptr, std::fclose)
     {
-        if (withLog && !_log)
+        if (contents.log && !_log)
             throw OutputFailure(std::system_error(errno, std::generic_category(), "a temporary file").what());
     }
 
@@ -235,7 +246,9 @@ private:
 
 class JsonlOutput final : public RemarkingOutput {
 public:
-    using RemarkingOutput::RemarkingOutput;
+    JsonlOutput(Contents contents, OutputFile& data, OutputFile& remarks)
+        : RemarkingOutput(contents, data, remarks), _withNumbers(contents.numbers)
+    {}
 
     void message(const Decoding& decoding, const Decoding::Decoded& decoded) override
     {
@@ -253,16 +266,26 @@ public:
     }
 
 private:
+    const bool _withNumbers;
     std::string _changed;
     Changes _changes{[this](std::string_view path, const Value& value) {
         if (!_changed.empty())
             _changed += ',';
         appendJson(_changed, path);
         _changed += ':';
-        if (value.string() != nullptr)
-            appendJson(_changed, *value.string());
+        const auto reading = value.reading();
+        const auto number = _withNumbers && reading ? reading->number() : std::nullopt;
+        if (number)
+            _changed += "{\"text\":";
+        if (const auto words = value.text())
+            appendJson(_changed, *words);
         else
             _changed += text(jsonOf(value));
+        if (number) {
+            _changed += ",\"number\":" + numberText(*number) + ",\"unit\":";
+            appendJson(_changed, reading->unit());
+            _changed += '}';
+        }
     }};
 };
 
@@ -303,9 +326,9 @@ std::string guarded(std::string text)
 
 class CsvOutput final : public RemarkingOutput {
 public:
-    CsvOutput(bool withLog, OutputFile& data, OutputFile& remarks) : RemarkingOutput(withLog, data, remarks)
+    CsvOutput(Contents contents, OutputFile& data, OutputFile& remarks) : RemarkingOutput(contents, data, remarks)
     {
-        _data.write("time,code,path,value\r\n");
+        _data.write("time,code,path,value,number,unit\r\n");
     }
 
     void message(const Decoding& decoding, const Decoding::Decoded& decoded) override
@@ -335,25 +358,29 @@ private:
         _data.write(cell(path));
         _data.write(",");
         _data.write(cell(guarded(plainText(value))));
+        const auto reading = value.reading();
+        const auto number = reading ? reading->number() : std::nullopt;
+        _data.write("," + (number ? numberText(*number) : "") + ',');
+        _data.write(number ? cell(reading->unit()) : "");
         _data.write("\r\n");
     }};
 };
 
 } // namespace
 
-std::unique_ptr<Output> Output::make(OutputFormat format, bool withLog, OutputFile& data, OutputFile& remarks)
+std::unique_ptr<Output> Output::make(OutputFormat format, Contents contents, OutputFile& data, OutputFile& remarks)
 {
     switch (format) {
     case OutputFormat::Json:
-        return std::make_unique<JsonOutput>(withLog, data);
+        return std::make_unique<JsonOutput>(contents, data);
     case OutputFormat::Jsonl:
-        return std::make_unique<JsonlOutput>(withLog, data, remarks);
+        return std::make_unique<JsonlOutput>(contents, data, remarks);
     case OutputFormat::Csv:
-        return std::make_unique<CsvOutput>(withLog, data, remarks);
+        return std::make_unique<CsvOutput>(contents, data, remarks);
     case OutputFormat::Tree:
         break;
     }
-    return std::make_unique<TreeOutput>(withLog, data, remarks);
+    return std::make_unique<TreeOutput>(contents, data, remarks);
 }
 
 } // namespace kestrum

@@ -1,6 +1,7 @@
 #include "tools/Snapshot.h"
 
 #include "LogGenerator/DlfVersionReport.h"
+#include "LogGenerator/State.h"
 #include "platform/PropertyLists.h"
 #include "support/Base64.h"
 #include "support/Format.h"
@@ -30,8 +31,7 @@ std::uint64_t leavesOf(const Value& value)
 
 std::optional<std::string> textAt(const Dictionary& dictionary, std::string_view key)
 {
-    const Value held = dictionary.at(key);
-    return held.string() != nullptr ? std::optional(*held.string()) : std::nullopt;
+    return dictionary.at(key).text();
 }
 
 /// The bytes of base64 up to where it is cut off or damaged.
@@ -56,7 +56,7 @@ Value Snapshot::salvaged(Bytes xml)
     constexpr std::string_view kData = "<data>";
     const auto text = textOf(xml);
     std::vector<Value> entries;
-    for (const char* key : {"DisplayState", "DLF"}) {
+    for (const char* key : {StateKey::kDisplayState, "DLF"}) {
         const auto mark = formatted("<key>%s</key>", key);
         for (auto at = text.find(mark); at != text.npos; at = text.find(mark, at)) {
             at += mark.size();
@@ -81,7 +81,7 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, CaptureReader::O
     };
     _listing = {std::move(file), textAt(*root, "Timestamp"), textAt(*root, "Description"), {}};
     for (const auto key : {"Timestamp", "Description"})
-        if (root->contains(key) && root->at(key).string() == nullptr)
+        if (root->contains(key) && !root->at(key).isText())
             wrong(formatted("\"%s\"", key), root->at(key), "a string");
     if (!root->contains("Data"))
         return;
@@ -96,7 +96,7 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, CaptureReader::O
         if (const auto entry = element.dictionary()) {
             listed.description = textAt(*entry, "Description").value_or("");
             listed.date = textAt(*entry, "Date").value_or("");
-            const Value dlf = entry->at("DLF"), state = entry->at("DisplayState");
+            const Value dlf = entry->at("DLF"), state = entry->at(StateKey::kDisplayState);
             if (dlf.data() != nullptr) {
                 listed.content = "DLF";
                 listed.size = dlf.data()->size();
@@ -108,7 +108,7 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, CaptureReader::O
                 listed.content = "records";
                 listed.size = state.data()->size();
                 _intervals.emplace_back(index, *state.data());
-            } else if (state.string() != nullptr || state.dictionary() || state.array()) {
+            } else if (state.isText() || state.dictionary() || state.array()) {
                 listed.content = "tree";
                 listed.size = leavesOf(state);
                 _trees.push_back(state);
@@ -131,7 +131,7 @@ Bytes Snapshot::versionReport() const
     return isReport ? dlf.first(kDlfVersionReportSize) : Bytes();
 }
 
-void Snapshot::recover(const PropertyLists& lists, const std::function<void(Bytes)>& take) const
+void Snapshot::recover(PropertyLists& lists, const std::function<void(Bytes)>& take) const
 {
     for (const auto& tree : _trees) {
         if (const auto message = lists.toXml(tree))

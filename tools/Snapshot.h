@@ -45,7 +45,7 @@ public:
 
     /// Gives every channel message that can be recovered, in order: from the intervals' raw records, which are whole,
     /// or, where those are missing, from the DLF stream; the trees of an IFX modem serialised anew.
-    void recover(const PropertyLists& lists, const std::function<void(Bytes)>& take) const;
+    void recover(PropertyLists& lists, const std::function<void(Bytes)>& take) const;
 
 private:
     void read(Bytes bytes, std::uint64_t from, RecordReader::Origin origin, const std::string& place,

@@ -1,5 +1,6 @@
 #include "ui/KestrumSaveViewController.h"
 
+#include "LogGenerator/State.h"
 #include "platform/Clock.h"
 #include "platform/FileSystem.h"
 #include "platform/MainQueue.h"
@@ -63,12 +64,11 @@ std::shared_ptr<ReusableCell> KestrumSaveViewController::cellForRowAtIndexPath(T
 
     const auto history = _saveHistory.array();
     const auto entry = history && indexPath.row < history->size() ? (*history)[indexPath.row].dictionary() : nullptr;
-    const Value description = entry ? entry->at("Description") : Value();
+    const Value description = entry ? entry->at(StateKey::kDescription) : Value();
     auto& cell = reusable->cell();
     cell.textLabel().setFont(kRowFont);
     // An entry without a description is a blank row: it is saved like the others.
-    cell.textLabel().setText(description.string() ? std::optional<std::string_view>(*description.string())
-                                                  : std::nullopt);
+    cell.textLabel().setText(description.text());
     cell.setAccessory(Accessory::CheckMark);
     return reusable;
 }
@@ -81,8 +81,9 @@ void KestrumSaveViewController::didSelectRowAtIndexPath(TableView&, std::optiona
 void KestrumSaveViewController::savePressed()
 {
     const auto text = saveDescription().text();
-    const auto snapshot = makeDictionaryUntilNull(
-        {{"Timestamp", dateText(_timeStamp)}, {"Data", _saveHistory}, {"Description", text ? Value(*text) : Value()}});
+    const auto snapshot = makeDictionaryUntilNull({{"Timestamp", dateText(_timeStamp)},
+                                                   {"Data", _saveHistory},
+                                                   {StateKey::kDescription, text ? Value(*text) : Value()}});
     auto moment = std::chrono::floor<std::chrono::seconds>(_roles.clock.now()).time_since_epoch();
     const auto last = moment + kMostNames;
     std::string path;

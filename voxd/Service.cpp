@@ -27,7 +27,7 @@ constexpr std::string_view kTechnologyChanged = "kVoxTechnologyChangedNotificati
 
 } // namespace
 
-Service::Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log, Witness witness)
+Service::Service(Settings settings, Source& source, PropertyLists& lists, SystemLog& log, Witness witness)
     : _settings(std::move(settings)),
       _source(source),
       _log(log),

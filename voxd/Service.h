@@ -39,7 +39,7 @@ public:
     };
 
     /// All outlive the service.
-    Service(Settings settings, Source& source, const PropertyLists& lists, SystemLog& log, Witness witness);
+    Service(Settings settings, Source& source, PropertyLists& lists, SystemLog& log, Witness witness);
     ~Service();
 
     std::optional<Problem> start();

@@ -89,8 +89,8 @@ void ServiceChannel::obey(const Frame& frame)
         if (reply && !_host.send(*_commands, {Frame::Kind::Reply, frame.messageId, frame.serial, reply->bytes()}))
             return end();
     }
-    if (const auto state = command->at("SetState"); const auto* text = state.string()) {
-        if (*text == "Streaming")
+    if (const auto state = command->at("SetState"); state.isText()) {
+        if (state == "Streaming")
             _subscription.emplace(*command);
         else
             _subscription.reset();

@@ -30,7 +30,7 @@ public:
         std::function<void(ServiceChannel&)> ended; ///< at most once; must not destroy the channel at once
         std::function<void(std::uint64_t)> dropped; ///< this many messages, for a client that does not read
         FrameSender send;
-        const PropertyLists& lists;
+        PropertyLists& lists;
         SystemLog& log;
     };
 

@@ -5,7 +5,6 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kExtraCodes = 0xFF0000;
 constexpr std::int32_t kLargestCode = 0xFFFF;
 
 } // namespace
@@ -23,7 +22,7 @@ Subscription::Subscription(const Dictionary& command)
                 _codes->insert(base + static_cast<LogCode>(*code));
     };
     add("SetZephraLogCodes", 0);
-    add("SetVoxExtraCodes", kExtraCodes);
+    add("SetVoxExtraCodes", ChannelMessage::kExtraCodes);
 }
 
 bool Subscription::wants(Bytes message) const

@@ -42,7 +42,7 @@ std::string scenarioNames()
     return lines;
 }
 
-std::unique_ptr<Source> makeSource(const Options& options, const PropertyLists& lists)
+std::unique_ptr<Source> makeSource(const Options& options, PropertyLists& lists)
 {
     if (!options.replay.empty())
         return std::make_unique<ReplaySource>(options.replay, options.loop);
@@ -82,7 +82,7 @@ int serve(QCoreApplication& application, const Options& options)
     std::signal(SIGPIPE, SIG_IGN);
     const TerminationSignals termination([&] { application.quit(); });
     LinuxSystemLog log(standardErrorSink("voxd"));
-    const PropertyListCodec lists;
+    PropertyListCodec lists;
     const auto source = makeSource(options, lists);
     std::ofstream record;
     if (!options.record.empty())
@@ -170,7 +170,7 @@ int main(int argc, char** argv)
 
     try {
         if (!options.write.empty()) {
-            const PropertyListCodec lists;
+            PropertyListCodec lists;
             writeCapture(*makeSource(options, lists), options);
             return 0;
         }

@@ -13,8 +13,6 @@
 namespace kestrum {
 namespace {
 
-constexpr std::string_view kSorted = "_sorted";
-
 /// A log code, and what decodes its records.
 struct Decoder {
     LogCode code;
@@ -43,7 +41,7 @@ std::string_view C2KLogGenerator::technology() const
 void C2KLogGenerator::updateState(State& state, Bytes withData)
 {
     getDisplayFromState(state);
-    updateFromLog(withData, state.at("Lookup").dictionary(), state);
+    updateFromLog(withData, state.at(StateKey::kLookup).dictionary(), state);
 }
 
 void C2KLogGenerator::updateFromLog(Bytes message, const DictionaryRef& usingLookup, State& usingState)
@@ -70,9 +68,9 @@ void C2KLogGenerator::processTemplate(const Dictionary& templateNode, const Dict
             auto display = makeDictionary();
             processTemplate(*level, display, storeLookupIntoDict);
             storeDisplayIntoDict->set(key, display);
-        } else if (value == Value(kSorted)) {
-            storeDisplayIntoDict->set(key, kSorted);
-        } else if (const auto* identifier = value.string()) {
+        } else if (value == kSortedKey) {
+            storeDisplayIntoDict->set(key, kSortedKey);
+        } else if (const auto identifier = value.text()) {
             storeDisplayIntoDict->set(key, "");
             if (!storeLookupIntoDict.contains(*identifier))
                 storeLookupIntoDict.set(*identifier, makeArray());
@@ -87,10 +85,10 @@ void C2KLogGenerator::processTemplate(const Dictionary& templateNode, const Dict
 Value C2KLogGenerator::getDisplayFromState(State& state) const
 {
     dropForeignDisplay(state);
-    if (Value existing = state.at("Display"))
+    if (Value existing = state.at(StateKey::kDisplay))
         return existing;
 
-    Value loaded = state.at("Template");
+    Value loaded = state.at(StateKey::kTemplate);
     if (!loaded) {
         const auto path = _roles.bundle.pathForResource("C2KTemplate", "plist");
         loaded = path ? _roles.propertyLists.load(*path) : Value();
@@ -98,13 +96,13 @@ Value C2KLogGenerator::getDisplayFromState(State& state) const
             _roles.log.write(Priority::Error, "Cannot load C2K template for display");
             return {};
         }
-        state.set("Template", loaded);
+        state.set(StateKey::kTemplate, loaded);
     }
     auto display = makeDictionary(), lookup = makeDictionary();
     processTemplate(*loaded.dictionary(), display, *lookup);
     setDisplay(state, display);
-    state.set("Lookup", lookup);
-    state.set("ExtraInfo", makeDictionary());
+    state.set(StateKey::kLookup, lookup);
+    state.set(StateKey::kExtraInfo, makeDictionary());
     return display;
 }
 

@@ -21,11 +21,17 @@ constexpr Link kReverse{"kRLDataRate", "RLDataSeqNum",  "RLDataSent",
                                        "RLDataSeqNum2", "RLDataSent2"};
 // clang-format on
 
+std::string rate(double kilobits)
+{
+    return formatted("%.2f kbps", kilobits);
+}
+constexpr Quantity kRate = computedQuantity<rate>("kbps");
+
 /// Publishes the rate since the previous record, and keeps this one's numbers for the next.
 void publishRate(C2KContext& context, const Link& link, std::uint32_t sequence, std::uint64_t bitsSent)
 {
     State& state = context.state;
-    const auto extraInfo = state.at("ExtraInfo").dictionary();
+    const auto extraInfo = state.at(StateKey::kExtraInfo).dictionary();
     const auto note = [&](std::string_view key, const Value& value) {
         if (extraInfo)
             extraInfo->set(key, value);
@@ -38,7 +44,7 @@ void publishRate(C2KContext& context, const Link& link, std::uint32_t sequence, 
         // Across the wrap of the number nothing is published: the difference alone would not show it.
         if (sequence > before && elapsed >= 1) {
             const auto bits = static_cast<double>(static_cast<std::int64_t>(bitsSent - *previousSent));
-            context.publish(link.identifier, formatted("%.2f kbps", bits / (elapsed * 1024.0)));
+            context.publish(link.identifier, Reading::computed(kRate, bits / (elapsed * 1024.0)));
         }
         note(link.previousSequence, before);
         note(link.previousSent, *previousSent);

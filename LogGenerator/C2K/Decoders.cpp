@@ -10,13 +10,16 @@ void C2KContext::publish(std::string_view identifier, std::string_view text) con
     atPlacesOf(identifier, [text](Dictionary& node, const std::string& key) { node.setText(key, text); });
 }
 
+void C2KContext::publish(std::string_view identifier, Reading reading) const
+{
+    atPlacesOf(identifier, [reading](Dictionary& node, const std::string& key) { node.set(key, reading); });
+}
+
 void C2KContext::publish(Record record, std::span<const Row> rows) const
 {
     for (const auto& row : rows)
         if (const auto raw = record.read(row.field))
-            atPlacesOf(row.key, [&](Dictionary& node, const std::string& key) {
-                row.conversion.set(node, key, {&row, *raw});
-            });
+            publish(row.key, Reading(row.quantity, *raw));
 }
 
 void C2KContext::rejectLength(std::string_view line) const

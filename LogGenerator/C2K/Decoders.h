@@ -23,6 +23,7 @@ public:
 
     /// Sets the text at all places of the identifier, up to the first that is none.
     void publish(std::string_view identifier, std::string_view text) const;
+    void publish(std::string_view identifier, Reading reading) const;
     /// The same with what `set` makes of the value that stands there.
     template <std::invocable<Value&> Set>
     void publish(std::string_view identifier, Set set) const
@@ -58,9 +59,9 @@ void C2KContext::atPlacesOf(std::string_view identifier, Set set) const
         const Value* node = entry ? entry->find("dict") : nullptr;
         const Value* key = entry ? entry->find("key") : nullptr;
         const auto dictionary = node != nullptr ? node->dictionary() : nullptr;
-        if (!dictionary || key == nullptr || key->string() == nullptr)
+        if (!dictionary || key == nullptr || key->borrowedString() == nullptr)
             return;
-        set(*dictionary, *key->string());
+        set(*dictionary, *key->borrowedString());
     }
 }
 

@@ -1,4 +1,5 @@
 #include "LogGenerator/C2K/Decoders.h"
+#include "LogGenerator/C2K/Quantities.h"
 #include "platform/SystemLog.h"
 
 #include <cmath>
@@ -30,7 +31,7 @@ unsigned lengthOf(Record record)
 /// is left out leaves a gap in the index.
 void listStrengths(Record record, const PilotList& list, std::uint32_t count, Dictionary& shown)
 {
-    shown.setText("_sorted", "_sorted");
+    shown.setText(kSortedKey, kSortedKey);
     for (std::uint32_t i = 0; i < count; ++i) {
         const auto pilot = record.slice(list.first + list.size * i, list.size);
         if (!pilot)
@@ -39,8 +40,8 @@ void listStrengths(Record record, const PilotList& list, std::uint32_t count, Di
         if (pn == list.leftOut)
             continue;
         const double ratio = pilot->read(list.energy).value_or(0) / 512.0;
-        shown.setText(formatted("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
-                      formatted("%+.2f dB", 10.0 * std::log10(ratio)));
+        shown.set(formatted("%d;%d", static_cast<std::int32_t>(i), static_cast<std::int32_t>(pn)),
+                  Reading::computed(kPilotStrength, 10.0 * std::log10(ratio)));
     }
 }
 

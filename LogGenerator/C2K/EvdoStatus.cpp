@@ -8,7 +8,7 @@ namespace {
 constexpr std::size_t kLength = 50;
 constexpr std::uint32_t kFirstStateWithLink = 4; // Access, Connected
 
-std::string named(std::uint32_t raw, std::span<const std::string_view> names)
+std::string nameOrReserved(std::uint32_t raw, std::span<const std::string_view> names)
 {
     return raw < names.size() ? std::string(names[raw]) : formatted("[Reserved %d]", static_cast<std::int32_t>(raw));
 }
@@ -17,30 +17,30 @@ std::string deviceState(std::uint32_t raw)
 {
     constexpr std::string_view kNames[] = {"Inactive [0]", "Acquisition [1]", "Sync [2]",
                                            "Idle [3]",     "Access [4]",      "Connected [5]"};
-    return named(raw, kNames);
+    return nameOrReserved(raw, kNames);
 }
 
 std::string sessionState(std::uint32_t raw)
 {
     constexpr std::string_view kNames[] = {"Closed [0]", "AMP setup [1]", "AT-initiated neg [2]", "Initiated neg [3]",
                                            "Open [4]"};
-    return named(raw, kNames);
+    return nameOrReserved(raw, kNames);
 }
 
-std::string signedDbm(std::uint32_t raw)
-{
-    return formatted("%+d dBm", static_cast<std::int8_t>(raw));
-}
+constexpr Quantity kSignedDbm{[](Quantity::Raw raw) { return formatted("%+d dBm", signed8(fieldOf(raw))); },
+                              numberOf<signed8>, "dBm"};
 
 std::string_view withoutLink(std::uint32_t)
 {
     return "N/A";
 }
 
-std::string pnOffset(std::uint32_t raw)
-{
-    return raw == 0xFFFF ? "Invalid Value" : formatted("%d × 64chips", static_cast<std::int32_t>(raw));
-}
+constexpr Quantity::Raw kInvalidOffset = 0xFFFF;
+constexpr Quantity kPnOffset{
+    [](Quantity::Raw raw) {
+        return raw == kInvalidOffset ? "Invalid Value" : formatted("%d × 64chips", signed32(fieldOf(raw)));
+    },
+    [](Quantity::Raw raw) { return raw == kInvalidOffset ? kNotANumber : numberOf<signed32>(raw); }, "× 64chips"};
 
 std::string uati(std::uint32_t raw)
 {
@@ -51,25 +51,25 @@ std::string uati(std::uint32_t raw)
 constexpr Field kDeviceState = u8(36);
 
 constexpr Row kTuning[] = {
-    {u16(13).bits(0, 10),  "kChannel",            decimal},
-    {kDeviceState,         "k1xEVDODeviceState",  deviceState},
-    {u16(13).bits(11, 15), "kBandClass",          bandClassName},
-    {u8(15),               "kRxAGC0",             signedDbm},
+    {u16(13).bits(0, 10),  "kChannel",            decimalSigned32},
+    {kDeviceState,         "k1xEVDODeviceState",  named<deviceState>},
+    {u16(13).bits(11, 15), "kBandClass",          named<bandClassName>},
+    {u8(15),               "kRxAGC0",             kSignedDbm},
 };
 // The second chain and the transmitter mean something only while there is a link.
 constexpr Row kLink[] = {
-    {u8(16),               "kRxAGC1",             signedDbm},
-    {u8(17),               "kTxAGC",              signedDbm},
+    {u8(16),               "kRxAGC1",             kSignedDbm},
+    {u8(17),               "kTxAGC",              kSignedDbm},
 };
 constexpr Row kNoLink[] = {
-    {u8(16),               "kRxAGC1",             withoutLink},
-    {u8(17),               "kTxAGC",              withoutLink},
+    {u8(16),               "kRxAGC1",             named<withoutLink>},
+    {u8(17),               "kTxAGC",              named<withoutLink>},
 };
 constexpr Row kSession[] = {
-    {u16(18),              "kServingPNOffset",    pnOffset},
-    {u8(37),               "kSessionState",       sessionState},
-    {u32(38).bits(0, 23),  "kUATI24",             uati},
-    {u8(41),               "kColorCode",          decimal},
+    {u16(18),              "kServingPNOffset",    kPnOffset},
+    {u8(37),               "kSessionState",       named<sessionState>},
+    {u32(38).bits(0, 23),  "kUATI24",             named<uati>},
+    {u8(41),               "kColorCode",          decimalSigned32},
 };
 // clang-format on
 static_assert(reach(kTuning) <= kLength && reach(kLink) <= kLength && reach(kSession) <= kLength);

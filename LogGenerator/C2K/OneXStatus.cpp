@@ -1,5 +1,6 @@
 #include "LogGenerator/C2K/BandClass.h"
 #include "LogGenerator/C2K/Decoders.h"
+#include "LogGenerator/C2K/Quantities.h"
 #include "LogGenerator/C2K/Subpackets.h"
 #include "platform/SystemLog.h"
 
@@ -34,34 +35,50 @@ std::string deviceState(std::uint32_t raw)
 }
 
 /// Receive AGC: 334/1000 dB a step, 0 at -63.248 dBm.
-std::string receiveAgc(std::uint32_t raw)
+constexpr double receiveAgc(std::uint32_t raw)
 {
-    return formatted("%+.2f dBm", static_cast<std::int8_t>(raw) * 334 / 1000.0 - 63.248);
+    return signed8(raw) * 334 / 1000.0 - 63.248;
 }
 
 /// Transmit AGC in tenths of dBm.
-std::string transmitAgc(std::uint32_t raw)
+constexpr double transmitAgc(std::uint32_t raw)
 {
-    return formatted("%+.2f dBm", static_cast<std::int16_t>(raw) / 10.0);
+    return signed16(raw) / 10.0;
 }
+
+template <auto Level>
+constexpr Quantity kSignedDbm{[](Quantity::Raw raw) { return formatted("%+.2f dBm", Level(fieldOf(raw))); },
+                              numberOf<Level>, "dBm"};
+
+std::string referenceStrength(double decibels)
+{
+    return formatted("(ref pilot) %+.2f dB", decibels);
+}
+constexpr Quantity kReferenceStrength = computedQuantity<referenceStrength>("dB");
+
+std::string oldFrameErrors(double percent)
+{
+    return formatted("%.02f%% (old)", percent);
+}
+constexpr Quantity kOldFrameErrors = computedQuantity<oldFrameErrors>("%");
 
 // clang-format off
 // From the first byte of their subpacket.
 constexpr Field kDeviceState = u8(4);
 
 constexpr Row kStateRows[] = {
-    {kDeviceState, "k1xDeviceState",  deviceState},
+    {kDeviceState, "k1xDeviceState",  named<deviceState>},
 };
 constexpr Row kChain0[] = {
-    {u8(4),        "k1xRx0BandClass", bandClassName},
-    {u16(6),       "k1xRx0ChanNum",   decimal},
-    {u8(10),       "k1xRxAGC0",       receiveAgc},
+    {u8(4),        "k1xRx0BandClass", named<bandClassName>},
+    {u16(6),       "k1xRx0ChanNum",   decimalSigned32},
+    {u8(10),       "k1xRxAGC0",       kSignedDbm<receiveAgc>},
 };
 constexpr Row kChain1[] = {
-    {u8(5),        "k1xRx1BandClass", bandClassName},
-    {u16(8),       "k1xRx1ChanNum",   decimal},
-    {u8(11),       "k1xRxAGC1",       receiveAgc},
-    {u16(12),      "k1xTxAGC",        transmitAgc},
+    {u8(5),        "k1xRx1BandClass", named<bandClassName>},
+    {u16(8),       "k1xRx1ChanNum",   decimalSigned32},
+    {u8(11),       "k1xRxAGC1",       kSignedDbm<receiveAgc>},
+    {u16(12),      "k1xTxAGC",        kSignedDbm<transmitAgc>},
 };
 // clang-format on
 constexpr std::size_t kRfLength = std::max(reach(kChain0), reach(kChain1));
@@ -84,16 +101,16 @@ void listPilots(Record activeSet, Dictionary& shown)
     const auto reference = field(u16(10));
     const std::size_t size = (std::size_t{6} * m + 15) / 4 * 4;
 
-    shown.setText("_sorted", "_sorted");
+    shown.setText(kSortedKey, kSortedKey);
     for (std::uint32_t j = 0; j < count; ++j) {
         const auto pnField = activeSet.slice(12 + size * j, 2);
         const auto energyField = activeSet.slice(24 + 4 * m + size * j, 2);
         if (!pnField || !energyField)
             break;
         const auto pn = pnField->read(u16(0)).value_or(0);
-        const double strength = strengthDb(n, gain, k, energyField->read(u16(0)).value_or(0));
-        shown.setText(formatted("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
-                      pn == reference ? formatted("(ref pilot) %+.2f dB", strength) : formatted("%+.2f dB", strength));
+        shown.set(formatted("%d;%d", static_cast<std::int32_t>(j), static_cast<std::int32_t>(pn)),
+                  Reading::computed(pn == reference ? QuantityRef(kReferenceStrength) : QuantityRef(kPilotStrength),
+                                    strengthDb(n, gain, k, energyField->read(u16(0)).value_or(0))));
     }
 }
 
@@ -131,7 +148,7 @@ void decodeOneXStatus(Record record, C2KContext& context)
 
     // The last call's frame errors, once, after it ended.
     if (const auto ratio = context.state.at("TrafficFER").real(); ratio && !inTraffic) {
-        context.publish("k1xTrafficFER", formatted("%.02f%% (old)", *ratio * 100.0));
+        context.publish("k1xTrafficFER", Reading::computed(kOldFrameErrors, *ratio * 100.0));
         context.state.remove("TrafficFER");
     }
 }

@@ -34,16 +34,16 @@ constexpr Field kVersion    = u8(13);
 constexpr Field kSystemType = u32(46);
 
 constexpr Row kRoaming[] = {
-    {u32(42),  "k1xRoamingHome",    roamingIndicator},
+    {u32(42),  "k1xRoamingHome",    named<roamingIndicator>},
 };
 constexpr Row kIdentifiers[] = {
-    {u16(50),  "kSystemId",         decimal},
-    {u16(52),  "kNetworkId",        decimal},
+    {u16(50),  "kSystemId",         decimalSigned32},
+    {u16(52),  "kNetworkId",        decimalSigned32},
 };
 constexpr Row kBase[] = {
-    {u8(131),  "kPacketZoneId",     decimal},
-    {u16(184), "kBaseId",           decimal}, // beyond the minimum length: records without it leave it as it was
-    {u8(133),  "kProtocolRevision", decimal},
+    {u8(131),  "kPacketZoneId",     decimalSigned32},
+    {u16(184), "kBaseId",           decimalSigned32}, // beyond the minimum length: records without it leave it as it was
+    {u8(133),  "kProtocolRevision", decimalSigned32},
 };
 // clang-format on
 static_assert(reach(kRoaming) <= kMinimumLength && reach(kIdentifiers) <= kMinimumLength);

@@ -14,6 +14,12 @@ constexpr Field kFrameError = u8(24); // from the subpacket's first byte; not 0:
 constexpr float kNewWeight = 0.015625F;
 constexpr float kOldWeight = 0.984375F;
 
+std::string frameErrors(double percent)
+{
+    return formatted("%.02f%%", percent);
+}
+constexpr Quantity kFrameErrors = computedQuantity<frameErrors>("%");
+
 } // namespace
 
 void decodeTrafficDemodulation(Record record, C2KContext& context)
@@ -35,7 +41,7 @@ void decodeTrafficDemodulation(Record record, C2KContext& context)
     if (const auto previous = context.state.at("TrafficFER").real())
         ratio += static_cast<float>(*previous) * kOldWeight;
     context.state.set("TrafficFER", ratio);
-    context.publish("k1xTrafficFER", formatted("%.02f%%", ratio * 100.0F));
+    context.publish("k1xTrafficFER", Reading::computed(kFrameErrors, ratio * 100.0F));
 }
 
 } // namespace kestrum

@@ -43,15 +43,15 @@ void GSMLogGenerator::updateState(State& state, Bytes withData)
             kNoObjectLine, "Could not deserialize the object");
     const Value processed = processObject(received);
     dropForeignDisplay(state);
-    _spent = state.at("DisplayState");
-    state.set("DisplayState", received);
+    _spent = state.at(StateKey::kDisplayState);
+    state.set(StateKey::kDisplayState, received);
     setDisplay(state, processed);
-    state.set("ExtraInfo", makeDictionary());
+    state.set(StateKey::kExtraInfo, makeDictionary());
 }
 
 Value GSMLogGenerator::processObject(const Value& object)
 {
-    if (object.string() != nullptr)
+    if (object.isText())
         return object;
     if (const auto dictionary = object.dictionary()) {
         auto processed = makeDictionary();
@@ -80,7 +80,7 @@ Value GSMLogGenerator::generateLogUsingState(State& state)
 {
     dropForeignDisplay(state);
     updateHistoryInState(state);
-    return state.at("Display");
+    return state.at(StateKey::kDisplay);
 }
 
 DictionaryRef GSMLogGenerator::getStartCommand() const
@@ -90,7 +90,7 @@ DictionaryRef GSMLogGenerator::getStartCommand() const
 
 ArrayRef GSMLogGenerator::getSaveContentsFromState(const State& state) const
 {
-    const auto history = state.at("History").array();
+    const auto history = state.at(StateKey::kHistory).array();
     return history ? std::make_shared<Array>(*history) : makeArray();
 }
 

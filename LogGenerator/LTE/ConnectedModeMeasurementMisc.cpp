@@ -1,39 +1,33 @@
 #include "LogGenerator/LTE/ConnectedModeMeasurementMisc.h"
 
-#include "LogGenerator/LTE/Conversions.h"
+#include "LogGenerator/LTE/Quantities.h"
 
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 29;
-
 // clang-format off
-constexpr Row kLayout[] = {
-    {u16(17), "E-ARFCN",                  decimal},
-    {u16(19), "Serving Physical Cell ID", decimal},
-    {u16(21), "Subframe Number",          decimal},
+constexpr Row kRows[] = {
+    {u16(17), "E-ARFCN",                  decimalSigned32},
+    {u16(19), "Serving Physical Cell ID", decimalSigned32},
+    {u16(21), "Subframe Number",          decimalSigned32},
     {u16(23), "Serving Filtered RSRP",    inDbm<rsrpQuarterDb>},
     {u16(25), "Serving Filtered RSRQ",    inDb<rsrqEighthDb>},
 };
 // clang-format on
-static_assert(reach(kLayout) <= kMinimumLength);
+
+constexpr Layout kLayouts[] = {
+    {.code = 0xB179, .minimumLength = 29, .rows = kRows},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Connected mode LTE Intra-frequency Measurement",
+    .layouts = kLayouts,
+};
 
 } // namespace
 
-std::string_view ConnectedModeMeasurementMisc::getSectionName() const
-{
-    return "Connected mode LTE Intra-frequency Measurement";
-}
-
-std::vector<LogCode> ConnectedModeMeasurementMisc::getLogCodeArray() const
-{
-    return {0xB179};
-}
-
-void ConnectedModeMeasurementMisc::updateWithData(Record data, LogCode logCode)
-{
-    if (accepts(data, logCode, 0xB179, kMinimumLength))
-        publish(data, kLayout);
-}
+ConnectedModeMeasurementMisc::ConnectedModeMeasurementMisc(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits)
+{}
 
 } // namespace kestrum

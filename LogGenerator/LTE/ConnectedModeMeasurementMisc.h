@@ -8,11 +8,7 @@ namespace kestrum {
 /// filtered ones of 3GPP TS 36.331.
 class ConnectedModeMeasurementMisc final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+    explicit ConnectedModeMeasurementMisc(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

@@ -6,44 +6,43 @@
 namespace kestrum {
 namespace {
 
-std::string_view bandwidth(std::uint32_t resourceBlocks)
+constexpr LogCode kServingCellRecord = 0xB0C2, kAntennasRecord = 0xB0C1;
+
+/// A channel bandwidth (3GPP TS 36.101) by its number of resource blocks.
+struct Bandwidth {
+    std::uint32_t resourceBlocks;
+    double megahertz;
+    std::string_view text;
+};
+
+const Bandwidth& bandwidthOf(Quantity::Raw resourceBlocks)
 {
-    switch (resourceBlocks) {
-    case 6:
-        return "1.4 MHz";
-    case 15:
-        return "3 MHz";
-    case 25:
-        return "5 MHz";
-    case 50:
-        return "10 MHz";
-    case 75:
-        return "15 MHz";
-    case 100:
-        return "20 MHz";
-    default:
-        return "Unknown";
-    }
+    static constexpr Bandwidth kBandwidths[] = {
+        {6, 1.4, "1.4 MHz"}, {15, 3, "3 MHz"},   {25, 5, "5 MHz"},
+        {50, 10, "10 MHz"},  {75, 15, "15 MHz"}, {100, 20, "20 MHz"},
+    };
+    static constexpr Bandwidth kUnknown{0, kNotANumber, "Unknown"};
+    const auto* found = std::ranges::find(kBandwidths, resourceBlocks, &Bandwidth::resourceBlocks);
+    return found != std::end(kBandwidths) ? *found : kUnknown;
 }
 
-// clang-format off
-constexpr std::size_t kAntennasLength = 22;
-constexpr Row kAntennas[] = {{u8(20), "Num Tx Antennas", decimal}};
-static_assert(reach(kAntennas) <= kAntennasLength);
+constexpr Quantity kBandwidth{[](Quantity::Raw raw) { return std::string(bandwidthOf(raw).text); },
+                              [](Quantity::Raw raw) { return bandwidthOf(raw).megahertz; }, "MHz"};
 
-constexpr std::size_t kServingCellLength = 38;
+// clang-format off
+constexpr Row kAntennas[] = {{u8(20), "Num Tx Antennas", decimalSigned32}};
+
 constexpr Row kServingCell[] = {
-    {u16(14), "Physical Cell ID",    decimal},
-    {u16(16), "Download Frequency",  decimal},
-    {u16(18), "Upload Frequency",    decimal},
-    {u8(20),  "Download Bandwidth",  bandwidth},
-    {u8(21),  "Upload Bandwidth",    bandwidth},
-    // Words are printed signed, on purpose: from 2^31 they show negative.
-    {u32(22), "Cell Identity",       decimal},
-    {u16(26), "Tracking Area Code",  decimal},
-    {u32(28), "Freq Band Indicator", decimal},
+    {u16(14), "Physical Cell ID",    decimalSigned32},
+    {u16(16), "Download Frequency",  decimalSigned32},
+    {u16(18), "Upload Frequency",    decimalSigned32},
+    {u8(20),  "Download Bandwidth",  kBandwidth},
+    {u8(21),  "Upload Bandwidth",    kBandwidth},
+    // Kept: words are printed signed. From 2^31 they show negative.
+    {u32(22), "Cell Identity",       decimalSigned32},
+    {u16(26), "Tracking Area Code",  decimalSigned32},
+    {u32(28), "Freq Band Indicator", decimalSigned32},
 };
-static_assert(reach(kServingCell) <= kServingCellLength);
 
 constexpr CellRow kMonitoredCell[] = {
     {kVoxCell_TAC,            "Tracking Area Code",  "Serving Cell Info: Failed to retrieve TAC\n"},
@@ -54,41 +53,32 @@ constexpr CellRow kMonitoredCell[] = {
 };
 // clang-format on
 
+constexpr Layout kLayouts[] = {
+    {.code = kServingCellRecord, .minimumLength = 38, .rows = kServingCell},
+    {.code = kAntennasRecord, .minimumLength = 22, .rows = kAntennas},
+    {.code = kCellMonitorRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Serving Cell Info",
+    .layouts = kLayouts,
+    .entryLine = "LTE Serving Cell Info",
+};
+
 } // namespace
 
-std::string_view LTEServingCellInfo::getSectionName() const
-{
-    return "Serving Cell Info";
-}
+LTEServingCellInfo::LTEServingCellInfo(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> LTEServingCellInfo::getLogCodeArray() const
+void LTEServingCellInfo::decode(Record data, const Layout& layout)
 {
-    return {0xB0C2, 0xB0C1, 0xFF0001};
-}
-
-void LTEServingCellInfo::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    switch (logCode) {
-    case 0xB0C1:
-        if (!holds(data, kAntennasLength))
-            return;
-        publish(data, kAntennas);
-        // Shown and reported all the same, on purpose.
-        return reportUnknown(logCode);
-    case 0xB0C2:
-        if (!holds(data, kServingCellLength))
-            return;
-        publish(data, kServingCell);
-        // The frequencies above stand for the cell monitor's.
-        if (auto* node = sectionRef.dictionary())
-            node->remove("UARFCN");
-        return;
-    case 0xFF0001:
+    if (layout.code == kCellMonitorRecord)
         return showServingCell(data, {kVoxCellTechnology_LTE}, kMonitoredCell, sectionRef.dictionary(), roles);
-    default:
-        reportUnknown(logCode);
-    }
+    publish(data, layout.rows);
+    if (layout.code == kAntennasRecord)
+        reportUnknown(layout.code); // kept: field logs show the line although the record is decoded
+    else if (auto* node = sectionRef.dictionary())
+        node->remove("UARFCN"); // the cell monitor's, which this record's frequencies replace
 }
 
 } // namespace kestrum

@@ -8,14 +8,10 @@ namespace kestrum {
 /// telephony service's cell monitor.
 class LTEServingCellInfo final : public Base {
 public:
-    using Base::Base;
+    explicit LTEServingCellInfo(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "LTE Serving Cell Info"; }
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

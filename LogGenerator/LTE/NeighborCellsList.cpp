@@ -1,11 +1,9 @@
 #include "LogGenerator/LTE/NeighborCellsList.h"
 
-#include "LogGenerator/LTE/Conversions.h"
+#include "LogGenerator/LTE/Quantities.h"
 
 namespace kestrum {
 namespace {
-
-constexpr std::size_t kMinimumLength = 21;
 
 constexpr Field kCountLessOne = u16(19).bits(6, 10);
 
@@ -18,22 +16,22 @@ constexpr Field kAverageRsrq = u16(6).bits(0, 6);
 constexpr Field kFrameOffset = u32(12).bits(0, 10);
 constexpr Field kSampleOffset = u32(12).bits(11, 29);
 
-// RSRP has steps of half a dB here, twice those of the serving cell's records, on purpose.
+// RSRP has steps of half a dB here, twice those of the serving cell's records.
 // clang-format off
 constexpr Row kCell[] = {
-    {kPhysicalCellId,    "Physical Cell ID",    decimal},
+    {kPhysicalCellId,    "Physical Cell ID",    decimalSigned32},
     {kMeasuredRssi,      "Measured RSSI",       inDbm<powerHalfDb>},
     {kMeasuredRsrp,      "Measured RSRP",       inDbm<powerHalfDb>},
     {kAverageRsrp,       "Average RSRP",        inDbm<powerHalfDb>},
     {kMeasuredRsrq,      "Measured RSRQ",       inDb<rsrqQuarterDb>},
     {kAverageRsrq,       "Average RSRQ",        inDb<rsrqQuarterDb>},
     {u16(6).bits(7, 13), "Srxlev",              inWholeDbm<srxlev>},
-    {u16(8),             "Frequency Offset",    decimal},
-    {kFrameOffset,       "Ant 0 Frame Offset",  decimal},
-    {kSampleOffset,      "Ant 0 Sample Offset", decimal},
-    // Antenna 1 shows the very bits of antenna 0, on purpose: what stands behind them is not read.
-    {kFrameOffset,       "Ant 1 Frame Offset",  decimal},
-    {kSampleOffset,      "Ant 1 Sample Offset", decimal},
+    {u16(8),             "Frequency Offset",    decimalSigned32},
+    {kFrameOffset,       "Ant 0 Frame Offset",  decimalSigned32},
+    {kSampleOffset,      "Ant 0 Sample Offset", decimalSigned32},
+    // Kept: antenna 1 shows the bits of antenna 0. What stands behind them is not read.
+    {kFrameOffset,       "Ant 1 Frame Offset",  decimalSigned32},
+    {kSampleOffset,      "Ant 1 Sample Offset", decimalSigned32},
 };
 // clang-format on
 
@@ -49,23 +47,22 @@ constexpr struct {
     {kMeasuredRsrq, rsrqQuarterDb}, {kAverageRsrq, rsrqQuarterDb},
 };
 
+constexpr Layout kLayouts[] = {
+    {.code = 0xB180, .minimumLength = 21},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Neighbor Cells List",
+    .layouts = kLayouts,
+};
+
 } // namespace
 
-std::string_view NeighborCellsList::getSectionName() const
-{
-    return "Neighbor Cells List";
-}
+NeighborCellsList::NeighborCellsList(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> NeighborCellsList::getLogCodeArray() const
+void NeighborCellsList::decode(Record data, const Layout&)
 {
-    return {0xB180};
-}
-
-void NeighborCellsList::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, 0xB180, kMinimumLength))
-        return;
-    clearElementsInArray(sectionRef);
     const std::uint32_t count = data.read(kCountLessOne).value_or(0) + 1;
     roles.log.write(Priority::Warning, "Number of neighboring cells being reported: %d\n",
                     static_cast<std::int32_t>(count));
@@ -79,7 +76,7 @@ void NeighborCellsList::logMeasurements(Record cell) const
 {
     const auto raw = [cell](Field field) { return cell.read(field).value_or(0); };
     roles.log.write(Priority::Warning, "Physical Cell ID: %d\n", static_cast<std::int32_t>(raw(kPhysicalCellId)));
-    // One label for RSSI, RSRP and RSRQ alike, on purpose.
+    // Kept: one label for RSSI, RSRP and RSRQ alike.
     for (const auto& [field, quantity] : kLogged)
         roles.log.write(Priority::Warning, "Measured RSSI: %lf\n", quantity(raw(field)));
 }

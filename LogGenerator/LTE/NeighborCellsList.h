@@ -7,13 +7,11 @@ namespace kestrum {
 /// The neighbour cells measured in idle mode, one row a cell: log code 0xB180.
 class NeighborCellsList final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+    explicit NeighborCellsList(DecodingRoles& decodingRoles);
 
 private:
+    void decode(Record data, const Layout& layout) override;
+
     void logMeasurements(Record cell) const;
 };
 

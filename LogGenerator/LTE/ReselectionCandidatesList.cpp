@@ -3,37 +3,35 @@
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 21;
-
 // Of the 16-bit count only the low byte counts.
 constexpr Field kCount = u8(19);
 // Candidates stand 4 bytes apart though each is longer: a payload lies over the next header. The modem packs them so; a
 // wider stride would misread the second candidate.
 constexpr std::size_t kFirst = 21, kStride = 4;
 
-constexpr Row kPriority[] = {{u16(0), "Candidate Priority", decimal}};
+constexpr Row kPriority[] = {{u16(0), "Candidate Priority", decimalSigned32}};
 constexpr Field kRatType = u16(2);
 constexpr std::size_t kHeaderSize = 4;
 
 // The payloads, from the candidate's first byte.
 // clang-format off
 constexpr Row kLte[] = {
-    {u16(4),             "E ARFCN", decimal},
-    {u16(6).bits(7, 15), "Cell ID", decimal},
+    {u16(4),             "E ARFCN", decimalSigned32},
+    {u16(6).bits(7, 15), "Cell ID", decimalSigned32},
 };
 constexpr Row kUtran[] = {
-    {u16(4), "U ARFCN", decimal},
-    {u16(6), "PSC",     decimal},
+    {u16(4), "U ARFCN", decimalSigned32},
+    {u16(6), "PSC",     decimalSigned32},
 };
 constexpr Row kGeran[] = {
-    {u16(4), "ARFCN",   decimal},
-    {u8(6),  "Band",    decimal},
-    {u8(7),  "BSIC ID", decimal},
+    {u16(4), "ARFCN",   decimalSigned32},
+    {u8(6),  "Band",    decimalSigned32},
+    {u8(7),  "BSIC ID", decimalSigned32},
 };
 constexpr Row kCdma[] = {
-    {u8(4),   "Band",    decimal},
-    {u16(8),  "Channel", decimal},
-    {u16(10), "Pilot",   decimal},
+    {u8(4),   "Band",    decimalSigned32},
+    {u16(8),  "Channel", decimalSigned32},
+    {u16(10), "Pilot",   decimalSigned32},
 };
 
 constexpr struct Rat {
@@ -49,39 +47,48 @@ constexpr struct Rat {
 // clang-format on
 constexpr Rat kUnknownRat{"??", {}};
 
+const Rat& ratOf(std::uint32_t type)
+{
+    return type < std::size(kRats) ? kRats[type] : kUnknownRat;
+}
+
+std::string_view ratName(std::uint32_t type)
+{
+    return ratOf(type).name;
+}
+
 /// Appends the row of the candidate that begins with these bytes; false unless all of its fields are there.
 bool appendCandidate(Array& list, Record candidate)
 {
     const auto type = candidate.read(kRatType);
     if (!type)
         return false;
-    const Rat& rat = *type < std::size(kRats) ? kRats[*type] : kUnknownRat;
+    const Rat& rat = ratOf(*type);
     if (candidate.size() < std::max(kHeaderSize, reach(rat.payload)))
         return false;
     Dictionary& row = list.appendRow();
     show(candidate, kPriority, row);
-    row.setText("Candidate RAT Type", rat.name);
+    row.set("Candidate RAT Type", Reading(named<ratName>, *type));
     show(candidate, rat.payload, row);
     return true;
 }
 
+constexpr Layout kLayouts[] = {
+    {.code = 0xB186, .minimumLength = 21},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Reselection Candidates List",
+    .layouts = kLayouts,
+};
+
 } // namespace
 
-std::string_view ReselectionCandidatesList::getSectionName() const
-{
-    return "Reselection Candidates List";
-}
+ReselectionCandidatesList::ReselectionCandidatesList(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> ReselectionCandidatesList::getLogCodeArray() const
+void ReselectionCandidatesList::decode(Record data, const Layout&)
 {
-    return {0xB186};
-}
-
-void ReselectionCandidatesList::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, 0xB186, kMinimumLength))
-        return;
-    clearElementsInArray(sectionRef);
     const std::size_t count = data.read(kCount).value_or(0);
     replaceArray(sectionRef, [&](Array& list) {
         for (std::size_t i = 0; i < count; ++i) {

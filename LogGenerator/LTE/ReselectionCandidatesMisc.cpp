@@ -3,33 +3,26 @@
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 21;
-
 // clang-format off
-constexpr Row kLayout[] = {
-    {u8(13),  "Version",         decimal},
-    {u16(15), "Serving EARFCN",  decimal},
-    {u16(17), "Serving Cell ID", decimal},
+constexpr Row kRows[] = {
+    {u8(13),  "Version",         decimalSigned32},
+    {u16(15), "Serving EARFCN",  decimalSigned32},
+    {u16(17), "Serving Cell ID", decimalSigned32},
 };
 // clang-format on
-static_assert(reach(kLayout) <= kMinimumLength);
+
+constexpr Layout kLayouts[] = {
+    {.code = 0xB186, .minimumLength = 21, .rows = kRows},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Reselection Candidates",
+    .layouts = kLayouts,
+};
 
 } // namespace
 
-std::string_view ReselectionCandidatesMisc::getSectionName() const
-{
-    return "Reselection Candidates";
-}
-
-std::vector<LogCode> ReselectionCandidatesMisc::getLogCodeArray() const
-{
-    return {0xB186};
-}
-
-void ReselectionCandidatesMisc::updateWithData(Record data, LogCode logCode)
-{
-    if (accepts(data, logCode, 0xB186, kMinimumLength))
-        publish(data, kLayout);
-}
+ReselectionCandidatesMisc::ReselectionCandidatesMisc(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

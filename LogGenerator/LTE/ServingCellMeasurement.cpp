@@ -1,38 +1,26 @@
 #include "LogGenerator/LTE/ServingCellMeasurement.h"
 
-#include "LogGenerator/LTE/Conversions.h"
+#include "LogGenerator/LTE/Quantities.h"
 
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 33;
-
-int power(std::uint32_t raw)
+constexpr int power(std::uint32_t raw)
 {
     return static_cast<int>(raw) - 30;
 }
 
-std::string powerOrAbsent(std::uint32_t raw)
-{
-    return raw == 64 ? "Not Present" : inWholeDbm<power>(raw);
-}
-
 /// Search thresholds are sent in steps of 2 dB.
-int threshold(std::uint32_t raw)
+constexpr int threshold(std::uint32_t raw)
 {
     return 2 * static_cast<int>(raw);
 }
 
-std::string intraSearch(std::uint32_t raw)
-{
-    return raw == 32 ? "Not Present" : formatted("%d dB", threshold(raw));
-}
-
-/// A ratio like the other threshold, yet worded as a power, on purpose.
-std::string nonIntraSearch(std::uint32_t raw)
-{
-    return raw == 32 ? "Not Present" : inWholeDbm<threshold>(raw);
-}
+/// `Ordinary`, but for the raw value that marks what is absent.
+template <std::uint32_t Absent, const Quantity& Ordinary>
+constexpr Quantity kOrAbsent{
+    [](Quantity::Raw raw) { return raw == Absent ? std::string("Not Present") : Ordinary.text(raw); },
+    [](Quantity::Raw raw) { return raw == Absent ? kNotANumber : Ordinary.number(raw); }, Ordinary.unit};
 
 std::string_view trueOrFalse(std::uint32_t raw)
 {
@@ -40,47 +28,43 @@ std::string_view trueOrFalse(std::uint32_t raw)
 }
 
 // clang-format off
-constexpr Row kLayout[] = {
-    {u8(13),               "Version",                               decimal},
-    {u16(17),              "E-ARFCN",                               decimal},
-    {u16(19).bits(0, 8),   "Physical Cell ID",                      decimal},
-    {u16(19).bits(9, 12),  "Serving Layer Priority",                decimal},
+constexpr Row kRows[] = {
+    {u8(13),               "Version",                               decimalSigned32},
+    {u16(17),              "E-ARFCN",                               decimalSigned32},
+    {u16(19).bits(0, 8),   "Physical Cell ID",                      decimalSigned32},
+    {u16(19).bits(9, 12),  "Serving Layer Priority",                decimalSigned32},
     {u32(21).bits(0, 8),   "Measured RSRP",                         inDbm<rsrpQuarterDb>},
     {u32(21).bits(9, 17),  "Average RSRP",                          inDbm<rsrpQuarterDb>},
     {u32(21).bits(18, 24), "Measured RSRQ",                         inDb<rsrqQuarterDb>},
     {u32(21).bits(25, 31), "Average RSRQ",                          inDb<rsrqQuarterDb>},
     {u32(25).bits(0, 8),   "Measured RSSI",                         inDbm<powerHalfDb>},
     {u32(25).bits(9, 14),  "Qrxlevmin",                             inWholeDbm<qrxlevmin>},
-    {u32(25).bits(15, 21), "P_Max",                                 powerOrAbsent},
-    // Six bits never reach the marker for absent, 64. The field is no wider, on purpose.
-    {u32(25).bits(22, 27), "Max UE Tx Power",                       powerOrAbsent},
-    // A ratio, worded as a power on purpose.
+    {u32(25).bits(15, 21), "P_Max",                                 kOrAbsent<64, inWholeDbm<power>>},
+    // Kept: six bits wide, so that the marker for absent, 64, is never reached.
+    {u32(25).bits(22, 27), "Max UE Tx Power",                       kOrAbsent<64, inWholeDbm<power>>},
+    // Kept: a ratio, worded as a power.
     {u32(29).bits(0, 6),   "Srxlev",                                inWholeDbm<srxlev>},
-    {u32(29).bits(7, 12),  "Num of Consecutive DRX Cycles of S < 0", decimal},
-    {u32(29).bits(13, 18), "S Intra Search",                        intraSearch},
-    {u32(29).bits(19, 24), "S Non Intra Search",                    nonIntraSearch},
-    {u32(29).bit(25),      "Measurement Rules Updated",             trueOrFalse},
-    {u32(29).bits(26, 29), "Measurement Rules",                     decimal},
+    {u32(29).bits(7, 12),  "Num of Consecutive DRX Cycles of S < 0", decimalSigned32},
+    {u32(29).bits(13, 18), "S Intra Search",                        kOrAbsent<32, inWholeDb<threshold>>},
+    // Kept: a ratio like the other threshold, worded as a power.
+    {u32(29).bits(19, 24), "S Non Intra Search",                    kOrAbsent<32, inWholeDbm<threshold>>},
+    {u32(29).bit(25),      "Measurement Rules Updated",             named<trueOrFalse>},
+    {u32(29).bits(26, 29), "Measurement Rules",                     decimalSigned32},
 };
 // clang-format on
-static_assert(reach(kLayout) == kMinimumLength);
+
+constexpr Layout kLayouts[] = {
+    {.code = 0xB17F, .minimumLength = 33, .rows = kRows},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Serving Cell Measurements",
+    .layouts = kLayouts,
+};
 
 } // namespace
 
-std::string_view ServingCellMeasurement::getSectionName() const
-{
-    return "Serving Cell Measurements";
-}
-
-std::vector<LogCode> ServingCellMeasurement::getLogCodeArray() const
-{
-    return {0xB17F};
-}
-
-void ServingCellMeasurement::updateWithData(Record data, LogCode logCode)
-{
-    if (accepts(data, logCode, 0xB17F, kMinimumLength))
-        publish(data, kLayout);
-}
+ServingCellMeasurement::ServingCellMeasurement(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

@@ -8,11 +8,7 @@ namespace kestrum {
 /// of cell reselection (3GPP TS 36.304).
 class ServingCellMeasurement final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+    explicit ServingCellMeasurement(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

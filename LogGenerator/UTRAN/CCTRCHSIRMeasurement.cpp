@@ -3,8 +3,6 @@
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 17;
-
 constexpr Field kTransportChannels = u16(14).bits(6, 11);
 constexpr Field kCount = u16(14).bits(12, 15);
 
@@ -16,42 +14,38 @@ constexpr Elements entries(std::size_t transportChannels)
 
 // clang-format off
 constexpr Row kEntry[] = {
-    {u8(0), "CCTRCH ID", decimal},
-    {u8(1), "TSNUM",     decimal},
+    {u8(0), "CCTRCH ID", decimalSigned32},
+    {u8(1), "TSNUM",     decimalSigned32},
 };
 // clang-format on
 constexpr Elements kSirs{2, 1};
 constexpr std::size_t kSirCount = 6;
 static_assert(kSirs.first + kSirs.stride * kSirCount == entries(0).length);
 
-std::string sir(Record entry)
-{
-    return decimal(entry.read(u8(0)).value_or(0));
-}
-
 void showEntry(Record entry, Dictionary& row)
 {
     show(entry, kEntry, row);
-    listed(entry, kSirs, kSirCount, sir)(row.slot("SIR").becomeArray());
+    listed(entry, kSirs, kSirCount, u8(0), decimalSigned32)(row.slot("SIR").becomeArray());
 }
+
+constexpr Layout kLayouts[] = {
+    {.code = 0xD00C, .minimumLength = 17},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "CCTRCH SIR",
+    .layouts = kLayouts,
+    .entryLine = "CCTRCH SIR Measurement",
+    .foreignCode = ForeignCode::Ignored,
+};
 
 } // namespace
 
-std::string_view CCTRCHSIRMeasurement::getSectionName() const
-{
-    return "CCTRCH SIR";
-}
+CCTRCHSIRMeasurement::CCTRCHSIRMeasurement(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> CCTRCHSIRMeasurement::getLogCodeArray() const
+void CCTRCHSIRMeasurement::decode(Record data, const Layout&)
 {
-    return {0xD00C};
-}
-
-void CCTRCHSIRMeasurement::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, 0xD00C, kMinimumLength, Foreign::Ignored))
-        return;
-    clearElementsInArray(sectionRef);
     const auto channels = data.read(kTransportChannels).value_or(0);
     replaceArray(sectionRef, listed(data, entries(channels), data.read(kCount).value_or(0), showEntry));
 }

@@ -8,14 +8,10 @@ namespace kestrum {
 /// log code 0xD00C.
 class CCTRCHSIRMeasurement final : public Base {
 public:
-    using Base::Base;
+    explicit CCTRCHSIRMeasurement(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "CCTRCH SIR Measurement"; }
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

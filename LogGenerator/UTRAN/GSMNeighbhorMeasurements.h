@@ -1,17 +1,13 @@
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/PlaceholderList.h"
 
 namespace kestrum {
 
 /// The GSM neighbour cells: log code 0xD00E. Empty after every record, on purpose.
-class GSMNeighbhorMeasurements final : public Base {
+class GSMNeighbhorMeasurements final : public PlaceholderList {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+    explicit GSMNeighbhorMeasurements(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

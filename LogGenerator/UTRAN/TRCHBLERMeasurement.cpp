@@ -3,36 +3,30 @@
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 17;
-
 constexpr Field kCount = u16(14).bits(6, 11);
 constexpr Elements kChannels{17, 2};
 // clang-format off
 constexpr Row kChannel[] = {
-    {u8(0), "TRCH ID",               decimal},
-    {u8(1), "TRCH BLER Measurement", decimal},
+    {u8(0), "TRCH ID",               decimalSigned32},
+    {u8(1), "TRCH BLER Measurement", decimalSigned32},
 };
 // clang-format on
-static_assert(reach(kChannel) == kChannels.length);
+
+constexpr Layout kLayouts[] = {
+    {.code = 0xD00C, .minimumLength = 17, .rows = kChannel, .list = {{kCount, kChannels}}},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "TRCH BLER",
+    .layouts = kLayouts,
+    .entryLine = "TRCH BLER Measurement",
+    .entryPriority = Priority::Notice,
+    .foreignCode = ForeignCode::Ignored,
+};
 
 } // namespace
 
-std::string_view TRCHBLERMeasurement::getSectionName() const
-{
-    return "TRCH BLER";
-}
-
-std::vector<LogCode> TRCHBLERMeasurement::getLogCodeArray() const
-{
-    return {0xD00C};
-}
-
-void TRCHBLERMeasurement::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, 0xD00C, kMinimumLength, Foreign::Ignored))
-        return;
-    clearElementsInArray(sectionRef);
-    replaceArray(sectionRef, listed(data, kChannels, data.read(kCount).value_or(0), kChannel));
-}
+TRCHBLERMeasurement::TRCHBLERMeasurement(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

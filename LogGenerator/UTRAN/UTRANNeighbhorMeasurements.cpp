@@ -3,20 +3,16 @@
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kMinimumLength = 21;
-
 constexpr Field kCount = u8(16).bits(1, 7);
-// The cells begin far behind the fields that come before them, on purpose. Of each 16 bytes the first 4 are read.
+// Kept: the cells begin far behind the fields that come before them. Of each 16 bytes the first 4 are read.
 constexpr Elements kCells{168, 16, 4};
 
 constexpr Field kCellSet = u32(0).bits(29, 30);
 constexpr std::uint32_t kNoCellSet = 3;
 
-/// A 256th of the raw value and no offset, on purpose.
-std::string filteredRscp(std::uint32_t raw)
-{
-    return formatted("%f", raw / 256.0);
-}
+// Kept: a 256th of the raw value, without an offset and a unit.
+constexpr Quantity kFilteredRscp{[](Quantity::Raw raw) { return formatted("%f", fieldOf(raw) / 256.0); },
+                                 [](Quantity::Raw raw) { return fieldOf(raw) / 256.0; }};
 
 std::string_view cellSet(std::uint32_t raw)
 {
@@ -31,11 +27,11 @@ std::string_view trueOrFalse(std::uint32_t raw)
 
 // clang-format off
 constexpr Row kCell[] = {
-    {u32(0).bits(0, 13),  "UARFCN",      decimal},
-    {u32(0).bits(14, 20), "Cell ID",     decimal},
-    {u32(0).bits(21, 28), "Filter RSCP", filteredRscp},
-    {kCellSet,            "Status",      cellSet},
-    {u32(0).bit(31),      "inJDCS",      trueOrFalse},
+    {u32(0).bits(0, 13),  "UARFCN",      decimalSigned32},
+    {u32(0).bits(14, 20), "Cell ID",     decimalSigned32},
+    {u32(0).bits(21, 28), "Filter RSCP", kFilteredRscp},
+    {kCellSet,            "Status",      named<cellSet>},
+    {u32(0).bit(31),      "inJDCS",      named<trueOrFalse>},
 };
 // clang-format on
 static_assert(reach(kCell) == kCells.length);
@@ -47,23 +43,24 @@ void showCell(Record cell, Dictionary& row)
         row.remove("Status");
 }
 
+constexpr Layout kLayouts[] = {
+    {.code = 0xD00A, .minimumLength = 21},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Neighbor Cell List",
+    .layouts = kLayouts,
+    .entryLine = "NeighbhorMeasurements List",
+    .foreignCode = ForeignCode::Ignored,
+};
+
 } // namespace
 
-std::string_view UTRANNeighbhorMeasurements::getSectionName() const
-{
-    return "Neighbor Cell List";
-}
+UTRANNeighbhorMeasurements::UTRANNeighbhorMeasurements(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> UTRANNeighbhorMeasurements::getLogCodeArray() const
+void UTRANNeighbhorMeasurements::decode(Record data, const Layout&)
 {
-    return {0xD00A};
-}
-
-void UTRANNeighbhorMeasurements::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, 0xD00A, kMinimumLength, Foreign::Ignored))
-        return;
-    clearElementsInArray(sectionRef);
     replaceArray(sectionRef, listed(data, kCells, data.read(kCount).value_or(0), showCell));
 }
 

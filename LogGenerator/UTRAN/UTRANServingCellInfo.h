@@ -7,11 +7,10 @@ namespace kestrum {
 /// Identity and access restrictions of the serving cell: log code 0xD0E2 and the telephony service's cell monitor.
 class UTRANServingCellInfo final : public Base {
 public:
-    using Base::Base;
+    explicit UTRANServingCellInfo(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -28,41 +28,32 @@ int receivedPower(std::int16_t agc)
     return (agc + 512) / 10 - 106; // truncated toward zero
 }
 
-std::string decibels(std::uint32_t raw)
-{
-    return formatted("%d dB", static_cast<std::int32_t>(raw));
-}
-
-// clang-format off
-constexpr Quantity kShownCode{"Scrambling Code", decimal};
-constexpr Quantity kShownRscp{"RSCP",            decibels}; // "dB", though it is in dBm: kept on purpose
-constexpr Quantity kShownEcNo{"Energy Per Chip", decibels};
-// clang-format on
-
 void showCell(Record cell, Record measurement, int power, Dictionary& row)
 {
     const int energyPerChip = Base::lookUpECNO(energyOf(measurement));
-    show(kShownCode, cell.read(kScramblingCode).value_or(0), row);
-    show(kShownRscp, static_cast<std::uint32_t>(power + energyPerChip), row);
-    show(kShownEcNo, static_cast<std::uint32_t>(energyPerChip), row);
+    row.set("Scrambling Code", Reading(decimalSigned32, cell.read(kScramblingCode).value_or(0)));
+    // Kept: "dB", though it is a level in dBm.
+    row.set("RSCP", Reading(inWholeDb<signed32>, static_cast<std::uint32_t>(power + energyPerChip)));
+    row.set("Energy Per Chip", Reading(inWholeDb<signed32>, static_cast<std::uint32_t>(energyPerChip)));
 }
+
+constexpr Layout kLayouts[] = {
+    {.code = searcher::kCode, .minimumLength = searcher::kMinimumLength},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Active Set",
+    .layouts = kLayouts,
+    .entryLine = "ActiveSet",
+};
 
 } // namespace
 
-std::string_view ActiveSet::getSectionName() const
-{
-    return "Active Set";
-}
+ActiveSet::ActiveSet(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> ActiveSet::getLogCodeArray() const
+void ActiveSet::decode(Record data, const Layout&)
 {
-    return {searcher::kCode};
-}
-
-void ActiveSet::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, searcher::kCode, searcher::kMinimumLength))
-        return;
     const int power = receivedPower(static_cast<std::int16_t>(data.read(searcher::kReceiveAgc).value_or(0)));
     const std::size_t count = data.read(searcher::kCount).value_or(0);
     const Elements measurements{searcher::kCells.first + searcher::kCells.stride * count, searcher::kMeasurementSize};

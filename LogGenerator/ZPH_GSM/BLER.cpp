@@ -3,38 +3,35 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kCode = 0x4116;
-constexpr std::size_t kMinimumLength = 16;
-
-constexpr Row kWindow[] = {{u16(14), "Window Size", decimal}};
+constexpr Row kWindow[] = {{u16(14), "Window Size", decimalSigned32}};
 constexpr Field kCount = u8(13);
 constexpr Elements kChannels{16, 9};
 // clang-format off
 constexpr Row kChannel[] = {
-    {u8(0),  "Transport Channel ID",  decimal},
-    {u32(1), "CRC Received",          decimal},
-    {u32(5), "CRC Received in Error", decimal},
+    {u8(0),  "Transport Channel ID",  decimalSigned32},
+    {u32(1), "CRC Received",          decimalSigned32},
+    {u32(5), "CRC Received in Error", decimalSigned32},
 };
 // clang-format on
-static_assert(reach(kWindow) <= kMinimumLength && reach(kChannel) == kChannels.length);
+static_assert(reach(kChannel) == kChannels.length);
+
+constexpr Layout kLayouts[] = {
+    {.code = 0x4116, .minimumLength = 16, .rows = kWindow},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "BLER",
+    .layouts = kLayouts,
+};
 
 } // namespace
 
-std::string_view BLER::getSectionName() const
-{
-    return "BLER";
-}
+BLER::BLER(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> BLER::getLogCodeArray() const
+void BLER::decode(Record data, const Layout& layout)
 {
-    return {kCode};
-}
-
-void BLER::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, kCode, kMinimumLength))
-        return;
-    publish(data, kWindow);
+    publish(data, layout.rows);
     publish("Transport Channels", listed(data, kChannels, data.read(kCount).value_or(0), kChannel));
 }
 

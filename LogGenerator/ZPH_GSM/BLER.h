@@ -7,11 +7,10 @@ namespace kestrum {
 /// Block errors of the UMTS transport channels: log code 0x4116.
 class BLER final : public Base {
 public:
-    using Base::Base;
+    explicit BLER(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -1,20 +1,16 @@
 #include "LogGenerator/ZPH_GSM/CellChangeCounters.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view CellChangeCounters::getSectionName() const
-{
-    return "Cell Change Counters";
-}
+constexpr SectionTraits kTraits{
+    .name = "Cell Change Counters",
+    .entryLine = "CellChangeCounters",
+    .foreignCode = ForeignCode::Ignored,
+};
 
-std::vector<LogCode> CellChangeCounters::getLogCodeArray() const
-{
-    return {};
-}
+} // namespace
 
-void CellChangeCounters::updateWithData(Record, LogCode)
-{
-    logEntry();
-}
+CellChangeCounters::CellChangeCounters(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

@@ -7,14 +7,7 @@ namespace kestrum {
 /// A place in the display that no record fills.
 class CellChangeCounters final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "CellChangeCounters"; }
+    explicit CellChangeCounters(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

@@ -1,20 +1,17 @@
 #include "LogGenerator/ZPH_GSM/CodingScheme.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view CodingScheme::getSectionName() const
-{
-    return "Coding Scheme";
-}
+constexpr SectionTraits kTraits{
+    .name = "Coding Scheme",
+    // Kept: the word of another section.
+    .entryLine = "CellChangeCounters",
+    .foreignCode = ForeignCode::Ignored,
+};
 
-std::vector<LogCode> CodingScheme::getLogCodeArray() const
-{
-    return {};
-}
+} // namespace
 
-void CodingScheme::updateWithData(Record, LogCode)
-{
-    logEntry();
-}
+CodingScheme::CodingScheme(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

@@ -3,22 +3,21 @@
 #include "LogGenerator/ZPH_GSM/SearcherCells.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view DetectedSet::getSectionName() const
-{
-    return "Detected Set";
-}
+constexpr Layout kLayouts[] = {
+    {.code = searcher::kCode, .minimumLength = searcher::kMinimumLength},
+};
+static_assert(fits(kLayouts));
 
-std::vector<LogCode> DetectedSet::getLogCodeArray() const
-{
-    return {searcher::kCode};
-}
+constexpr SectionTraits kTraits{
+    .name = "Detected Set",
+    .layouts = kLayouts,
+    .entryLine = "DetectedSet",
+};
 
-void DetectedSet::updateWithData(Record data, LogCode logCode)
-{
-    // Which cells belong to it is not known: it stays empty.
-    if (accepts(data, logCode, searcher::kCode, searcher::kMinimumLength))
-        clearElementsInArray(sectionRef);
-}
+} // namespace
+
+DetectedSet::DetectedSet(DecodingRoles& decodingRoles) : PlaceholderList(decodingRoles, kTraits) {}
 
 } // namespace kestrum

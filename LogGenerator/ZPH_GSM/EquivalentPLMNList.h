@@ -7,11 +7,10 @@ namespace kestrum {
 /// The networks that count as the serving one (3GPP TS 24.008), one row each: log code 0x7150.
 class EquivalentPLMNList final : public Base {
 public:
-    using Base::Base;
+    explicit EquivalentPLMNList(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -20,7 +20,7 @@ std::string_view networkControlOrder(std::uint32_t raw)
 std::string_view packetFlowContext(std::uint32_t raw)
 {
     static constexpr std::string_view kNames[] = {"Not Supported", "Supported"};
-    return raw == kNotSent ? "Available" : nameIn(kNames, raw); // not "Not Available", on purpose
+    return raw == kNotSent ? "Available" : nameIn(kNames, raw); // kept: not "Not Available"
 }
 
 std::string_view accessThreshold(std::uint32_t raw)
@@ -38,13 +38,11 @@ std::string_view accessThreshold(std::uint32_t raw)
     return raw == kNotSent ? "Not Available" : nameIn(kNames, raw);
 }
 
-std::string_view t3192(std::uint32_t raw)
-{
-    static constexpr std::string_view kNames[] = {
-        "500 ms", "1000 ms", "1500 ms", "0 ms", "80 ms", "120 ms", "160 ms", "200 ms",
-    };
-    return raw < std::size(kNames) ? kNames[raw] : "?? ms";
-}
+/// The timer T3192 (3GPP TS 44.060) in milliseconds.
+constexpr int kT3192Values[] = {500, 1000, 1500, 0, 80, 120, 160, 200};
+constexpr Quantity kT3192{
+    [](Quantity::Raw raw) { return raw < std::size(kT3192Values) ? formatted("%d ms", kT3192Values[raw]) : "?? ms"; },
+    [](Quantity::Raw raw) { return raw < std::size(kT3192Values) ? kT3192Values[raw] : kNotANumber; }, "ms"};
 
 std::string_view accessBurst(std::uint32_t raw)
 {
@@ -69,64 +67,56 @@ std::string_view operatingMode(std::uint32_t raw)
 
 // clang-format off
 constexpr Row kSi13[] = {
-    {u8(14), "SI13 Position",             si13Position},
+    {u8(14), "SI13 Position",             named<si13Position>},
 };
 constexpr Row kControl[] = {
-    {u8(15), "Network Control Order",     networkControlOrder},
-    {u8(13), "PFC Supported",             packetFlowContext},
-    {u8(14), "Priority Access Threshold", accessThreshold},
+    {u8(15), "Network Control Order",     named<networkControlOrder>},
+    {u8(13), "PFC Supported",             named<packetFlowContext>},
+    {u8(14), "Priority Access Threshold", named<accessThreshold>},
 };
 constexpr Row kTimers[] = {
-    {u8(15), "T3192",                     t3192},
-    {u8(17), "Access Burst Type",         accessBurst},
-    {u8(16), "DRX Timer Max",             decimal},
+    {u8(15), "T3192",                     kT3192},
+    {u8(17), "Access Burst Type",         named<accessBurst>},
+    {u8(16), "DRX Timer Max",             decimalSigned32},
 };
 constexpr Row kPbcch[] = {
-    {u8(13), "PBCCH Present",             decimal},
+    {u8(13), "PBCCH Present",             decimalSigned32},
 };
 constexpr Row kPacketStatus[] = {
-    {u8(16), "Ext Measurement Order",     decimal},
-    {u8(13), "Packet PSI Status",         decimal},
-    {u8(33), "Packet SI Status",          supported},
-    {u8(14), "Count LR",                  decimal},
-    {u8(15), "Count HR",                  decimal},
+    {u8(16), "Ext Measurement Order",     decimalSigned32},
+    {u8(13), "Packet PSI Status",         decimalSigned32},
+    {u8(33), "Packet SI Status",          named<supported>},
+    {u8(14), "Count LR",                  decimalSigned32},
+    {u8(15), "Count HR",                  decimalSigned32},
 };
 constexpr Row kServingPlmn[] = {
-    {u8(13), "Network Operating Mode",    operatingMode},
+    {u8(13), "Network Operating Mode",    named<operatingMode>},
 };
 constexpr Row kMeasurements[] = {
-    {u8(26), "Cell Reselect Hysteresis",  applied},
+    {u8(26), "Cell Reselect Hysteresis",  named<applied>},
 };
 
-constexpr Layout kLayouts[] = {
-    {0x51F5, 18, kControl},
-    {0x7135, 32, kServingPlmn},
-    {0x51F6, 24, kTimers},
-    {0x51FB, 34, kPbcch},
-    {0x51FD, 35, kPacketStatus},
-    {0x51F4, 15, kSi13},
-    {0x5137, 29, kMeasurements},
-};
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = 0x51F5, .minimumLength = 18, .rows = kControl},
+    {.code = 0x7135, .minimumLength = 32, .rows = kServingPlmn},
+    {.code = 0x51F6, .minimumLength = 24, .rows = kTimers},
+    {.code = 0x51FB, .minimumLength = 34, .rows = kPbcch},
+    {.code = 0x51FD, .minimumLength = 35, .rows = kPacketStatus},
+    {.code = 0x51F4, .minimumLength = 15, .rows = kSi13},
+    {.code = 0x5137, .minimumLength = 29, .rows = kMeasurements},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "GPRS Information",
+    .layouts = kLayouts,
+    .entryLine = "GPRSInformation",
+};
 
 } // namespace
 
-std::string_view GPRSInformation::getSectionName() const
-{
-    return "GPRS Information";
-}
-
-std::vector<LogCode> GPRSInformation::getLogCodeArray() const
-{
-    return codesOf(kLayouts);
-}
-
-void GPRSInformation::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
-}
+GPRSInformation::GPRSInformation(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

@@ -8,14 +8,7 @@ namespace kestrum {
 /// and 0x7135.
 class GPRSInformation final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "GPRSInformation"; }
+    explicit GPRSInformation(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

@@ -43,56 +43,46 @@ std::string_view onOrOff(std::uint32_t raw)
     return raw != 0 ? "ON" : "OFF";
 }
 
-std::string seconds(std::uint32_t raw)
-{
-    return formatted("%d sec", static_cast<std::int32_t>(raw));
-}
+constexpr Quantity kSeconds{[](Quantity::Raw raw) { return formatted("%d sec", signed32(fieldOf(raw))); },
+                            numberOf<signed32>, "sec"};
 
 // clang-format off
 constexpr Row kState[] = {
-    {u8(13),  "RR State",         rrState},
-    {u8(14),  "RR Sub State",     decimal},
-    {u8(15),  "RR Status",        decimal},
-    {u8(16),  "RR Mode",          rrMode},
+    {u8(13),  "RR State",         named<rrState>},
+    {u8(14),  "RR Sub State",     decimalSigned32},
+    {u8(15),  "RR Status",        decimalSigned32},
+    {u8(16),  "RR Mode",          named<rrMode>},
 };
 constexpr Row kMeasurements[] = {
-    {u8(15),  "Serving Rx Level", decimal},
-    {u32(16), "Rx Quality Full",  decimal},
-    {u32(20), "Rx Quality Sub",   decimal},
+    {u8(15),  "Serving Rx Level", decimalSigned32},
+    {u32(16), "Rx Quality Full",  decimalSigned32},
+    {u32(20), "Rx Quality Sub",   decimalSigned32},
 };
 constexpr Row kTransmission[] = {
-    {u8(19),  "DTX Used",         onOrOff},
+    {u8(19),  "DTX Used",         named<onOrOff>},
 };
 constexpr Row kTimers[] = {
-    {u8(16),  "DRX Used",         seconds},
+    {u8(16),  "DRX Used",         kSeconds},
 };
 
-constexpr Layout kLayouts[] = {
-    {0x512C, 17, kState},
-    {0x5137, 29, kMeasurements},
-    {0x5072, 20, kTransmission},
-    {0x51F6, 24, kTimers},
-};
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = 0x512C, .minimumLength = 17, .rows = kState},
+    {.code = 0x5137, .minimumLength = 29, .rows = kMeasurements},
+    {.code = 0x5072, .minimumLength = 20, .rows = kTransmission},
+    {.code = 0x51F6, .minimumLength = 24, .rows = kTimers},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "GSM RR Info",
+    .layouts = kLayouts,
+    .entryLine = "GSMRRInfo",
+};
 
 } // namespace
 
-std::string_view GSMRRInfo::getSectionName() const
-{
-    return "GSM RR Info";
-}
-
-std::vector<LogCode> GSMRRInfo::getLogCodeArray() const
-{
-    return codesOf(kLayouts);
-}
-
-void GSMRRInfo::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
-}
+GSMRRInfo::GSMRRInfo(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

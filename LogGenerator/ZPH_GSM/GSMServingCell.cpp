@@ -6,32 +6,19 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kCellMonitor = 0xFF0001;
-
-std::string dbm(std::uint32_t raw)
-{
-    return formatted("%d dBm", static_cast<std::int32_t>(raw)); // not negated, on purpose
-}
-
 // clang-format off
 constexpr Row kMeasurements[] = {
-    {u8(15),               "RSSI",               dbm},
-    {u32(16).bits(0, 15),  "C1 Value",           decimal},
-    {u32(20).bits(0, 15),  "C2 Value",           decimal},
+    {u8(15),               "RSSI",               inWholeDbm<signed32>}, // kept: not negated
+    {u32(16).bits(0, 15),  "C1 Value",           decimalSigned32},
+    {u32(20).bits(0, 15),  "C2 Value",           decimalSigned32},
 };
 constexpr Row kDedicatedAllocation[] = {
-    {u16(13).bits(0, 7),   "MA Dedicated ARFCN", decimal},
+    {u16(13).bits(0, 7),   "MA Dedicated ARFCN", decimalSigned32},
 };
 constexpr Row kIdentity[] = {
-    {u16(17),              "Cell ID",            decimal},
-    {u16(13),              "ARFCN",              decimal},
-    {u16(15),              "BSIC",               decimal},
-};
-
-constexpr Layout kLayouts[] = {
-    {0x5134, 26, kIdentity},
-    {0x5137, 29, kMeasurements},
-    {0x5076, 17, kDedicatedAllocation},
+    {u16(17),              "Cell ID",            decimalSigned32},
+    {u16(13),              "ARFCN",              decimalSigned32},
+    {u16(15),              "BSIC",               decimalSigned32},
 };
 
 constexpr CellRow kCell[] = {
@@ -39,27 +26,31 @@ constexpr CellRow kCell[] = {
     {kVoxCell_ARFCN,  "ARFCN",   "GSMServingCell: Failed to retrieve ARFCN\n"},
 };
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = 0x5134, .minimumLength = 26, .rows = kIdentity},
+    {.code = 0x5137, .minimumLength = 29, .rows = kMeasurements},
+    {.code = 0x5076, .minimumLength = 17, .rows = kDedicatedAllocation},
+    {.code = kCellMonitorRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "GSM Serving Cell",
+    .layouts = kLayouts,
+    .entryLine = "GSMServingCell",
+};
 
 } // namespace
 
-std::string_view GSMServingCell::getSectionName() const
-{
-    return "GSM Serving Cell";
-}
+GSMServingCell::GSMServingCell(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> GSMServingCell::getLogCodeArray() const
+void GSMServingCell::decode(Record data, const Layout& layout)
 {
-    return codesOf(kLayouts, {kCellMonitor});
-}
-
-void GSMServingCell::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (logCode == kCellMonitor)
+    if (layout.code == kCellMonitorRecord)
         showServingCell(data, {kVoxCellTechnology_GSM}, kCell, sectionRef.dictionary(), roles);
-    else if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
+    else
+        publish(data, layout.rows);
 }
 
 } // namespace kestrum

@@ -8,14 +8,10 @@ namespace kestrum {
 /// monitor. C1 and C2 are the reselection criteria of 3GPP TS 45.008.
 class GSMServingCell final : public Base {
 public:
-    using Base::Base;
+    explicit GSMServingCell(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "GSMServingCell"; }
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -3,9 +3,6 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kCode = 0x4221;
-constexpr std::size_t kMinimumLength = 18;
-
 std::string_view carrier(std::uint32_t raw)
 {
     static constexpr std::string_view kNames[] = {"Single Carrier", "MIMO", "Dual Carrier", "Reserved"};
@@ -16,7 +13,7 @@ std::string_view carrier(std::uint32_t raw)
 constexpr Row kChannel[] = {
     {u8(13),              "Version",      decimalUnsigned},
     {u16(14).bits(0, 9),  "Sub Frames",   decimalUnsigned},
-    {u8(15).bits(2, 3),   "Carrier Info", carrier},
+    {u8(15).bits(2, 3),   "Carrier Info", named<carrier>},
 };
 constexpr Row kProcess[] = {
     {u8(0),               "Process ID",   decimalUnsigned},
@@ -28,28 +25,29 @@ constexpr Row kProcess[] = {
 
 constexpr Field kPrimaryCount = u8(16), kSecondaryCount = u8(17);
 constexpr Elements kPrimary{18, 9};
-// The secondary processes lie 162 bytes further for each primary one, though that takes 9: on purpose.
+// Kept: the secondary processes lie 162 bytes further for each primary one, though that takes 9.
 constexpr std::size_t kRoomForPrimary = 162;
 
-static_assert(reach(kChannel) <= kMinimumLength && reach(kProcess) == kPrimary.length);
+static_assert(reach(kProcess) == kPrimary.length);
+
+constexpr Layout kLayouts[] = {
+    {.code = 0x4221, .minimumLength = 18, .rows = kChannel},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "HSDPA Info",
+    .layouts = kLayouts,
+    .foreignCode = ForeignCode::Ignored,
+};
 
 } // namespace
 
-std::string_view HSDPAInformation::getSectionName() const
-{
-    return "HSDPA Info";
-}
+HSDPAInformation::HSDPAInformation(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> HSDPAInformation::getLogCodeArray() const
+void HSDPAInformation::decode(Record data, const Layout& layout)
 {
-    return {kCode};
-}
-
-void HSDPAInformation::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, kCode, kMinimumLength, Foreign::Ignored))
-        return;
-    publish(data, kChannel);
+    publish(data, layout.rows);
     const std::size_t primary = data.read(kPrimaryCount).value_or(0);
     const std::size_t secondary = data.read(kSecondaryCount).value_or(0);
     const Elements behind{kPrimary.first + kRoomForPrimary * primary, kPrimary.stride};

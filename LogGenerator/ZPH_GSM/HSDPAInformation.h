@@ -7,11 +7,10 @@ namespace kestrum {
 /// HARQ processes of HSDPA (3GPP TS 25.321): log code 0x4221.
 class HSDPAInformation final : public Base {
 public:
-    using Base::Base;
+    explicit HSDPAInformation(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

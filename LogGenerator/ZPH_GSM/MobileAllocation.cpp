@@ -3,36 +3,29 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kCode = 0x51F8;
-constexpr std::size_t kMinimumLength = 15;
-
-constexpr Row kHopping[] = {{u8(13), "HSN", decimal}};
+constexpr Row kHopping[] = {{u8(13), "HSN", decimalSigned32}};
 constexpr Field kCount = u8(14);
 constexpr Elements kArfcns{15, 2};
 
-std::string arfcn(Record entry)
-{
-    return decimal(entry.read(u16(0)).value_or(0));
-}
+constexpr Layout kLayouts[] = {
+    {.code = 0x51F8, .minimumLength = 15, .rows = kHopping},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Mobile Allocation",
+    .layouts = kLayouts,
+    .entryLine = "MobileAllocation",
+};
 
 } // namespace
 
-std::string_view MobileAllocation::getSectionName() const
-{
-    return "Mobile Allocation";
-}
+MobileAllocation::MobileAllocation(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> MobileAllocation::getLogCodeArray() const
+void MobileAllocation::decode(Record data, const Layout& layout)
 {
-    return {kCode};
-}
-
-void MobileAllocation::updateWithData(Record data, LogCode logCode)
-{
-    if (!accepts(data, logCode, kCode, kMinimumLength))
-        return;
-    publish(data, kHopping);
-    publish("ARFCNs", listed(data, kArfcns, data.read(kCount).value_or(0), arfcn));
+    publish(data, layout.rows);
+    publish("ARFCNs", listed(data, kArfcns, data.read(kCount).value_or(0), u16(0), decimalSigned32));
 }
 
 } // namespace kestrum

@@ -3,22 +3,21 @@
 #include "LogGenerator/ZPH_GSM/SearcherCells.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view MonitoredSet::getSectionName() const
-{
-    return "Monitored Set";
-}
+constexpr Layout kLayouts[] = {
+    {.code = searcher::kCode, .minimumLength = searcher::kMinimumLength},
+};
+static_assert(fits(kLayouts));
 
-std::vector<LogCode> MonitoredSet::getLogCodeArray() const
-{
-    return {searcher::kCode};
-}
+constexpr SectionTraits kTraits{
+    .name = "Monitored Set",
+    .layouts = kLayouts,
+    .entryLine = "MonitoredSet",
+};
 
-void MonitoredSet::updateWithData(Record data, LogCode logCode)
-{
-    // Which cells belong to it is not known: it stays empty.
-    if (accepts(data, logCode, searcher::kCode, searcher::kMinimumLength))
-        clearElementsInArray(sectionRef);
-}
+} // namespace
+
+MonitoredSet::MonitoredSet(DecodingRoles& decodingRoles) : PlaceholderList(decodingRoles, kTraits) {}
 
 } // namespace kestrum

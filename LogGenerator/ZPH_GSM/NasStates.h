@@ -54,7 +54,7 @@ inline std::string_view registrationState(std::uint32_t raw)
     return nameIn(kNames, raw);
 }
 
-inline constexpr Row kServiceState[] = {{u8(13), "MM Service State", registrationState}};
+inline constexpr Row kServiceState[] = {{u8(13), "MM Service State", named<registrationState>}};
 static_assert(reach(kServiceState) <= kMinimumLength);
 
 } // namespace kestrum::nas

@@ -6,77 +6,67 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kMeasurements = 0x5137, kColourCodes = 0x51FF, kCellMonitor = 0xFF0001;
+constexpr LogCode kMeasurements = 0x5137, kColourCodes = 0x51FF;
 
-constexpr std::size_t kMeasurementsLength = 29;
 constexpr Field kMeasurementCount = u8(28);
 constexpr Elements kMeasured{29, 14};
 constexpr Field kArfcn = u16(0);
 // clang-format off
 constexpr Row kMeasuredCell[] = {
-    {kArfcn, "ARFCN",    decimal},
-    {u8(2),  "RSSI",     decimal},
-    {u32(3), "C1 Value", decimal},
+    {kArfcn, "ARFCN",    decimalSigned32},
+    {u8(2),  "RSSI",     decimalSigned32},
+    {u32(3), "C1 Value", decimalSigned32},
 };
 // clang-format on
 static_assert(reach(kMeasuredCell) <= kMeasured.length);
 
-constexpr std::size_t kColourCodesLength = 15;
 constexpr Field kColourCodeCount = u8(14);
 constexpr Elements kColoured{15, 4};
 constexpr Field kBsic = u8(2);
 
-constexpr Quantity kColourCode{"BSIC", decimal};
-
-std::string level(std::uint32_t raw)
+/// Kept: doubled.
+constexpr int doubled(std::uint32_t raw)
 {
-    constexpr std::int16_t kNotMeasured = 32767;
-    const auto rssi = static_cast<std::int16_t>(raw);
-    return rssi == kNotMeasured ? "" : formatted("%d dBm", 2 * rssi); // doubled on purpose
+    return 2 * signed16(raw);
 }
 
 // clang-format off
 constexpr CellRow kMonitoredCell[] = {
     {kVoxCell_ARFCN, "ARFCN", "NeighboringCells: Failed to retrieve ARFCN\n"},
-    {kVoxCell_RSSI,  "RSSI",  "NeighboringCells: Failed to retrieve RSSI\n", level},
+    {kVoxCell_RSSI,  "RSSI",  "NeighboringCells: Failed to retrieve RSSI\n", kWhereMeasured<inWholeDbm<doubled>>},
 };
 // clang-format on
 
+constexpr Layout kLayouts[] = {
+    {.code = kMeasurements, .minimumLength = 29},
+    {.code = kColourCodes, .minimumLength = 15},
+    {.code = kCellMonitorRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Neighboring Cells",
+    .layouts = kLayouts,
+    .entryLine = "NeighboringCells",
+};
+
 } // namespace
 
-std::string_view NeighboringCells::getSectionName() const
-{
-    return "Neighboring Cells";
-}
+NeighboringCells::NeighboringCells(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> NeighboringCells::getLogCodeArray() const
+void NeighboringCells::decode(Record data, const Layout& layout)
 {
-    return {kMeasurements, kColourCodes, kCellMonitor};
-}
-
-void NeighboringCells::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    switch (logCode) {
-    case kMeasurements:
+    if (layout.code == kMeasurements)
         listMeasurements(data);
-        break;
-    case kColourCodes:
+    else if (layout.code == kColourCodes)
         learnColourCodes(data);
-        break;
-    case kCellMonitor:
+    else
         replaceArray(sectionRef,
                      [&](Array& list) { appendNeighbors(list, data, kVoxCellTechnology_GSM, kMonitoredCell, roles); });
-        break;
-    default:
-        reportUnknown(logCode);
-    }
 }
 
 void NeighboringCells::learnColourCodes(Record data)
 {
-    if (!holds(data, kColourCodesLength))
-        return;
     arfcnToBsic.clear();
     const std::size_t count = data.read(kColourCodeCount).value_or(0);
     for (std::size_t i = 0; i < count; ++i) {
@@ -89,12 +79,10 @@ void NeighboringCells::learnColourCodes(Record data)
 
 void NeighboringCells::listMeasurements(Record data) const
 {
-    if (!holds(data, kMeasurementsLength))
-        return;
     const auto measured = [this](Record cell, Dictionary& row) {
         show(cell, kMeasuredCell, row);
         if (const auto known = arfcnToBsic.find(cell.read(kArfcn).value_or(0)); known != arfcnToBsic.end())
-            show(kColourCode, known->second, row);
+            row.set("BSIC", Reading(decimalSigned32, known->second));
     };
     replaceArray(sectionRef, listed(data, kMeasured, data.read(kMeasurementCount).value_or(0), measured));
 }

@@ -10,16 +10,11 @@ namespace kestrum {
 /// from the telephony service's cell monitor.
 class NeighboringCells final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "NeighboringCells"; }
+    explicit NeighboringCells(DecodingRoles& decodingRoles);
 
 private:
+    void decode(Record data, const Layout& layout) override;
+
     void learnColourCodes(Record data);
     void listMeasurements(Record data) const;
 

@@ -1,20 +1,16 @@
 #include "LogGenerator/ZPH_GSM/NonRankedGSMSet.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view NonRankedGSMSet::getSectionName() const
-{
-    return "Non-Ranked GSM Set";
-}
+constexpr SectionTraits kTraits{
+    .name = "Non-Ranked GSM Set",
+    .entryLine = "NonRankedGSMSet",
+    .foreignCode = ForeignCode::Ignored,
+};
 
-std::vector<LogCode> NonRankedGSMSet::getLogCodeArray() const
-{
-    return {};
-}
+} // namespace
 
-void NonRankedGSMSet::updateWithData(Record, LogCode)
-{
-    logEntry();
-}
+NonRankedGSMSet::NonRankedGSMSet(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

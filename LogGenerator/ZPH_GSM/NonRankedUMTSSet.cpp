@@ -1,20 +1,16 @@
 #include "LogGenerator/ZPH_GSM/NonRankedUMTSSet.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view NonRankedUMTSSet::getSectionName() const
-{
-    return "Non-Ranked UMTS Set";
-}
+constexpr SectionTraits kTraits{
+    .name = "Non-Ranked UMTS Set",
+    .entryLine = "NonRankedUMTSSet",
+    .foreignCode = ForeignCode::Ignored,
+};
 
-std::vector<LogCode> NonRankedUMTSSet::getLogCodeArray() const
-{
-    return {};
-}
+} // namespace
 
-void NonRankedUMTSSet::updateWithData(Record, LogCode)
-{
-    logEntry();
-}
+NonRankedUMTSSet::NonRankedUMTSSet(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

@@ -3,20 +3,26 @@
 #include "LogGenerator/PropertyListRecord.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view PDPContextList::getSectionName() const
-{
-    return "PDP Context Info";
-}
+constexpr Layout kLayouts[] = {
+    {.code = kPdpContextsRecord},
+};
+static_assert(fits(kLayouts));
 
-std::vector<LogCode> PDPContextList::getLogCodeArray() const
-{
-    return {0xFF0002};
-}
+constexpr SectionTraits kTraits{
+    .name = "PDP Context Info",
+    .layouts = kLayouts,
+    .entryLine = "PDPContextList",
+    .foreignCode = ForeignCode::Decoded,
+};
 
-void PDPContextList::updateWithData(Record data, LogCode)
+} // namespace
+
+PDPContextList::PDPContextList(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
+
+void PDPContextList::decode(Record data, const Layout&)
 {
-    logEntry();
     if (const auto contexts = PDPContextArray(data, roles).contexts())
         replaceArray(sectionRef, {contexts->begin(), contexts->end()});
 }

@@ -8,15 +8,11 @@ namespace kestrum {
 /// section.
 class PDPContextList final : public Base {
 public:
-    using Base::Base;
+    explicit PDPContextList(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
+private:
     /// Does not look at the code: a record of any code is taken for one of PDP contexts.
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "PDPContextList"; }
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

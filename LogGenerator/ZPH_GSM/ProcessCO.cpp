@@ -5,32 +5,25 @@
 namespace kestrum {
 namespace {
 
-constexpr Row kMobilityManagement[] = {{u8(13), "MM State", nas::mmState}};
+constexpr Row kMobilityManagement[] = {{u8(13), "MM State", named<nas::mmState>}};
 // clang-format off
-constexpr Layout kLayouts[] = {
-    {nas::kMmState,      nas::kMinimumLength, kMobilityManagement},
-    {nas::kRegistration, nas::kMinimumLength, nas::kServiceState},
-};
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = nas::kMmState, .minimumLength = nas::kMinimumLength, .rows = kMobilityManagement},
+    {.code = nas::kRegistration, .minimumLength = nas::kMinimumLength, .rows = nas::kServiceState},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Process CO",
+    .layouts = kLayouts,
+    // Kept: the word of another section.
+    .entryLine = "ProcessCS",
+};
 
 } // namespace
 
-std::string_view ProcessCO::getSectionName() const
-{
-    return "Process CO";
-}
-
-std::vector<LogCode> ProcessCO::getLogCodeArray() const
-{
-    return codesOf(kLayouts);
-}
-
-void ProcessCO::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
-}
+ProcessCO::ProcessCO(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

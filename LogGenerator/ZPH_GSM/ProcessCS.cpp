@@ -30,34 +30,26 @@ std::string_view updateStatus(std::uint32_t raw)
 
 // clang-format off
 constexpr Row kMobilityManagement[] = {
-    {u8(13), "MM State",        nas::mmState},
-    {u8(14), "MM Sub State",    mmSubstate},
-    {u8(15), "LU Reject Cause", updateStatus}, // shows the status, on purpose
-};
-constexpr Layout kLayouts[] = {
-    {nas::kMmState,      nas::kMinimumLength, kMobilityManagement},
-    {nas::kRegistration, nas::kMinimumLength, nas::kServiceState},
+    {u8(13), "MM State",        named<nas::mmState>},
+    {u8(14), "MM Sub State",    named<mmSubstate>},
+    {u8(15), "LU Reject Cause", named<updateStatus>}, // kept: shows the status
 };
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = nas::kMmState, .minimumLength = nas::kMinimumLength, .rows = kMobilityManagement},
+    {.code = nas::kRegistration, .minimumLength = nas::kMinimumLength, .rows = nas::kServiceState},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Process CS",
+    .layouts = kLayouts,
+    .entryLine = "ProcessCS",
+};
 
 } // namespace
 
-std::string_view ProcessCS::getSectionName() const
-{
-    return "Process CS";
-}
-
-std::vector<LogCode> ProcessCS::getLogCodeArray() const
-{
-    return codesOf(kLayouts);
-}
-
-void ProcessCS::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
-}
+ProcessCS::ProcessCS(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

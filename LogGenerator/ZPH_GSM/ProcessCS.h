@@ -7,14 +7,7 @@ namespace kestrum {
 /// Circuit-switched mobility management (MM, 3GPP TS 24.008) and registration: log codes 0x7131 and 0x7132.
 class ProcessCS final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "ProcessCS"; }
+    explicit ProcessCS(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

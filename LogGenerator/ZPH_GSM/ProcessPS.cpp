@@ -50,37 +50,29 @@ std::string_view updateStatus(std::uint32_t raw)
     return nameIn(kNames, raw);
 }
 
-// Under the keys of circuit-switched mobility management, on purpose.
+// Kept: the keys are those of circuit-switched mobility management.
 // clang-format off
 constexpr Row kMobilityManagement[] = {
-    {u8(13), "MM State",            gmmState},
-    {u8(14), "MM Sub State",        gmmSubstate},
-    {u8(15), "Attach Reject Cause", updateStatus},
-};
-constexpr Layout kLayouts[] = {
-    {nas::kGmmState,     nas::kMinimumLength, kMobilityManagement},
-    {nas::kRegistration, nas::kMinimumLength, nas::kServiceState},
+    {u8(13), "MM State",            named<gmmState>},
+    {u8(14), "MM Sub State",        named<gmmSubstate>},
+    {u8(15), "Attach Reject Cause", named<updateStatus>},
 };
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = nas::kGmmState, .minimumLength = nas::kMinimumLength, .rows = kMobilityManagement},
+    {.code = nas::kRegistration, .minimumLength = nas::kMinimumLength, .rows = nas::kServiceState},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Process PS",
+    .layouts = kLayouts,
+    .entryLine = "ProcessPS",
+};
 
 } // namespace
 
-std::string_view ProcessPS::getSectionName() const
-{
-    return "Process PS";
-}
-
-std::vector<LogCode> ProcessPS::getLogCodeArray() const
-{
-    return codesOf(kLayouts);
-}
-
-void ProcessPS::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
-}
+ProcessPS::ProcessPS(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

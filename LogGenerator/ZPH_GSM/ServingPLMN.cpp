@@ -7,7 +7,7 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kServingPlmn = 0x7135, kCellMonitor = 0xFF0001;
+constexpr LogCode kServingPlmn = 0x7135;
 
 std::string_view selectionMode(std::uint32_t raw)
 {
@@ -48,47 +48,44 @@ std::string networkCode(std::uint32_t identity)
 
 // clang-format off
 constexpr Row kSelection[] = {
-    {u8(14),           "PLMN Sel Mod",        selectionMode},
+    {u8(14),           "PLMN Sel Mod",        named<selectionMode>},
 };
 constexpr Row kNetwork[] = {
-    {kIdentity,        "Mobile Country Code", countryCode},
-    {kIdentity,        "Mobile Network Code", networkCode},
-    {u16BigEndian(18), "Location Area Code",  decimal}, // as it is on the air, unlike all else
-    {u8(20),           "Routing Area Code",   decimal},
-    {u8(14),           "Service Type",        serviceType},
+    {kIdentity,        "Mobile Country Code", named<countryCode>},
+    {kIdentity,        "Mobile Network Code", named<networkCode>},
+    {u16BigEndian(18), "Location Area Code",  decimalSigned32}, // as it is on the air, unlike all else
+    {u8(20),           "Routing Area Code",   decimalSigned32},
+    {u8(14),           "Service Type",        named<serviceType>},
 };
-constexpr Layout kLayouts[] = {
-    {kServingPlmn,       32,                  kNetwork},
-    {nas::kRegistration, nas::kMinimumLength, kSelection},
-};
-
 constexpr CellRow kCell[] = {
     {kVoxCell_MCC, "Mobile Country Code", "ServingPLMN: Failed to retrieve MCC\n"},
     {kVoxCell_MNC, "Mobile Network Code", "ServingPLMN: Failed to retrieve MNC\n"},
     {kVoxCell_LAC, "Location Area Code",  "ServingPLMN: Failed to retrieve LAC\n"},
 };
 // clang-format on
-static_assert(rowsFit(kLayouts));
+
+constexpr Layout kLayouts[] = {
+    {.code = kServingPlmn, .minimumLength = 32, .rows = kNetwork},
+    {.code = nas::kRegistration, .minimumLength = nas::kMinimumLength, .rows = kSelection},
+    {.code = kCellMonitorRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "Serving PLMN",
+    .layouts = kLayouts,
+};
 
 } // namespace
 
-std::string_view ServingPLMN::getSectionName() const
-{
-    return "Serving PLMN";
-}
+ServingPLMN::ServingPLMN(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> ServingPLMN::getLogCodeArray() const
+void ServingPLMN::decode(Record data, const Layout& layout)
 {
-    return codesOf(kLayouts, {kCellMonitor});
-}
-
-void ServingPLMN::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (logCode == kCellMonitor)
+    if (layout.code == kCellMonitorRecord)
         showServingCell(data, {kVoxCellTechnology_GSM, kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
-    else if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
+    else
+        publish(data, layout.rows);
 }
 
 } // namespace kestrum

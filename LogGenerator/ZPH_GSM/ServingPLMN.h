@@ -8,11 +8,10 @@ namespace kestrum {
 /// The network's codes are three characters from a record and plain numbers from the cell monitor.
 class ServingPLMN final : public Base {
 public:
-    using Base::Base;
+    explicit ServingPLMN(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -6,8 +6,6 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kSimFiles = 0xFF0000;
-
 struct File {
     std::string_view key; ///< in the service's dictionary
     std::string_view shownAs;
@@ -32,6 +30,18 @@ constexpr File kFiles[] = {
 };
 // clang-format on
 
+constexpr Layout kLayouts[] = {
+    {.code = kSimFilesRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "SIM Info",
+    .layouts = kLayouts,
+    .entryLine = "SimInfo",
+    .foreignCode = ForeignCode::Ignored,
+};
+
 } // namespace
 
 LogCode_0xFF0000::LogCode_0xFF0000(Record record, DecodingRoles& roles)
@@ -43,21 +53,10 @@ LogCode_0xFF0000::LogCode_0xFF0000(Record record, DecodingRoles& roles)
     throw UnknownDataException();
 }
 
-std::string_view SimInfo::getSectionName() const
-{
-    return "SIM Info";
-}
+SimInfo::SimInfo(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> SimInfo::getLogCodeArray() const
+void SimInfo::decode(Record data, const Layout&)
 {
-    return {kSimFiles};
-}
-
-void SimInfo::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (logCode != kSimFiles)
-        return;
     const LogCode_0xFF0000 record(data, roles);
     for (const auto& file : kFiles)
         if (const Value* contents = record.files()->find(file.key))

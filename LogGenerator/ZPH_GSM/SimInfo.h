@@ -29,15 +29,11 @@ private:
 /// technologies show the same section.
 class SimInfo final : public Base {
 public:
-    using Base::Base;
+    explicit SimInfo(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
+private:
     /// LogCode_0xFF0000::UnknownDataException leaves it.
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "SimInfo"; }
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -6,8 +6,7 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kRrcState = 0x4125, kTransmitPower = 0x4031, kServingCell = 0x4127, kCiphering = 0x4157,
-                  kCellMonitor = 0xFF0001;
+constexpr LogCode kRrcState = 0x4125, kTransmitPower = 0x4031, kServingCell = 0x4127, kCiphering = 0x4157;
 
 std::string_view rrcState(std::uint32_t raw)
 {
@@ -24,23 +23,16 @@ std::string_view enabled(std::uint32_t raw)
 
 // clang-format off
 constexpr Row kState[] = {
-    {u8(13),  "RRC State",          rrcState},
+    {u8(13),  "RRC State",          named<rrcState>},
 };
 constexpr Row kIdentity[] = {
-    {u32(21), "Cell ID",            decimal},
-    {u32(17), "Downlink Frequency", decimal},
-    {u32(13), "Uplink Frequency",   decimal},
-    {u16(25), "URA ID",             decimal},
+    {u32(21), "Cell ID",            decimalSigned32},
+    {u32(17), "Downlink Frequency", decimalSigned32},
+    {u32(13), "Uplink Frequency",   decimalSigned32},
+    {u16(25), "URA ID",             decimalSigned32},
 };
 constexpr Row kSecurity[] = {
-    {u8(13),  "Ciphering",          enabled},
-};
-
-constexpr std::size_t kServingCellLength = 29;
-constexpr Layout kLayouts[] = {
-    {kRrcState,    14,                 kState},
-    {kServingCell, kServingCellLength, kIdentity},
-    {kCiphering,   19,                 kSecurity},
+    {u8(13),  "Ciphering",          named<enabled>},
 };
 
 constexpr CellRow kCell[] = {
@@ -49,42 +41,48 @@ constexpr CellRow kCell[] = {
     {kVoxCell_ScramblingCode, "Scrambling Code", "UMTSRRInfo: Failed to retrieve Scrambling Code\n"},
 };
 // clang-format on
-static_assert(rowsFit(kLayouts));
+std::string decibelMilliwatts(double level)
+{
+    return formatted("%4.2lf dBm", level);
+}
+constexpr Quantity kMeanPower = computedQuantity<decibelMilliwatts>("dBm");
 
-constexpr std::size_t kTransmitPowerLength = 16;
 constexpr Field kEntryCount = u8(14);
 constexpr Elements kEntries{16, 14};
 constexpr Field kAgc = u16(4); // signed, 0.1 dB above -70 dBm, less 512; 0 means no value
 
+constexpr Layout kLayouts[] = {
+    {.code = kRrcState, .minimumLength = 14, .rows = kState},
+    {.code = kTransmitPower, .minimumLength = 16},
+    {.code = kServingCell, .minimumLength = 29, .rows = kIdentity},
+    {.code = kCiphering, .minimumLength = 19, .rows = kSecurity},
+    {.code = kCellMonitorRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "UMTS RR Info",
+    .layouts = kLayouts,
+    .entryLine = "UMTSRRInfo",
+};
+
 } // namespace
 
-std::string_view UMTSRRInfo::getSectionName() const
-{
-    return "UMTS RR Info";
-}
+UMTSRRInfo::UMTSRRInfo(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> UMTSRRInfo::getLogCodeArray() const
+void UMTSRRInfo::decode(Record data, const Layout& layout)
 {
-    return {kRrcState, kTransmitPower, kServingCell, kCiphering, kCellMonitor};
-}
-
-void UMTSRRInfo::updateWithData(Record data, LogCode logCode)
-{
-    logEntry();
-    if (logCode == kCellMonitor)
-        showServingCell(data, {kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
-    else if (logCode == kTransmitPower)
-        showTransmitPower(data);
-    else if (!publish(data, logCode, kLayouts))
-        reportUnknown(logCode);
-    else if (logCode == kServingCell && data.size() >= kServingCellLength)
+    if (layout.code == kCellMonitorRecord)
+        return showServingCell(data, {kVoxCellTechnology_UMTS}, kCell, sectionRef.dictionary(), roles);
+    if (layout.code == kTransmitPower)
+        return showTransmitPower(data);
+    publish(data, layout.rows);
+    if (layout.code == kServingCell)
         forgetMonitoredFrequency();
 }
 
 void UMTSRRInfo::showTransmitPower(Record data) const
 {
-    if (!holds(data, kTransmitPowerLength))
-        return;
     double sum = 0.0;
     int values = 0;
     const std::size_t count = data.read(kEntryCount).value_or(0);
@@ -99,7 +97,7 @@ void UMTSRRInfo::showTransmitPower(Record data) const
         sum += power;
         ++values;
     }
-    publish("Transmit Power", formatted("%4.2lf dBm", sum / values)); // not a number without any value
+    publish("Transmit Power", Reading::computed(kMeanPower, sum / values)); // not a number without any value
 }
 
 void UMTSRRInfo::forgetMonitoredFrequency() const

@@ -8,16 +8,11 @@ namespace kestrum {
 /// 0x4031, 0x4127 and 0x4157, and the telephony service's cell monitor.
 class UMTSRRInfo final : public Base {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "UMTSRRInfo"; }
+    explicit UMTSRRInfo(DecodingRoles& decodingRoles);
 
 private:
+    void decode(Record data, const Layout& layout) override;
+
     void showTransmitPower(Record data) const;
     void forgetMonitoredFrequency() const;
 };

@@ -1,20 +1,16 @@
 #include "LogGenerator/ZPH_GSM/UMTSRRMeasurement.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view UMTSRRMeasurement::getSectionName() const
-{
-    return "UMTS RR Measurement";
-}
+constexpr SectionTraits kTraits{
+    .name = "UMTS RR Measurement",
+    .entryLine = "UMTSRRMeasurement",
+    .foreignCode = ForeignCode::Ignored,
+};
 
-std::vector<LogCode> UMTSRRMeasurement::getLogCodeArray() const
-{
-    return {};
-}
+} // namespace
 
-void UMTSRRMeasurement::updateWithData(Record, LogCode)
-{
-    logEntry();
-}
+UMTSRRMeasurement::UMTSRRMeasurement(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
 } // namespace kestrum

@@ -7,82 +7,67 @@
 namespace kestrum {
 namespace {
 
-constexpr LogCode kCellMonitor = 0xFF0001;
-
 constexpr Field kCount = u8(13);
 constexpr Elements kRanked{ranking::kFirstCell, 10};
 
-std::string rscp(std::uint32_t raw)
+// Kept: levels, worded as ratios.
+constexpr int rscp(std::uint32_t raw)
 {
-    return formatted("%d dB", static_cast<std::int8_t>(raw) - 21);
+    return signed8(raw) - 21;
 }
 
-std::string rankedRscp(std::uint32_t raw)
+constexpr double halfDb(std::uint32_t raw)
 {
-    return formatted("%d dB", static_cast<std::int16_t>(raw));
+    return signed8(raw) * 0.5;
 }
-
-std::string halfDb(std::uint32_t raw)
-{
-    return formatted("%f dB", static_cast<std::int8_t>(raw) * 0.5);
-}
+constexpr Quantity kHalfDb{[](Quantity::Raw raw) { return formatted("%f dB", halfDb(fieldOf(raw))); }, numberOf<halfDb>,
+                           "dB"};
 
 // clang-format off
 constexpr Row kRankedCell[] = {
-    {u16(2), "Scrambling Code",    decimal},
-    {u8(4),  "RSCP",               rscp},
-    {u8(7),  "Energy Per Chip",    halfDb},
+    {u16(2), "Scrambling Code",    decimalSigned32},
+    {u8(4),  "RSCP",               inWholeDb<rscp>},
+    {u8(7),  "Energy Per Chip",    kHalfDb},
     {u16(0), "Downlink Frequency", decimalSigned16},
     {u16(8), "Ranking Value",      decimalSigned16},
-    {u16(5), "Rank Cell RSCP",     rankedRscp},
+    {u16(5), "Rank Cell RSCP",     inWholeDb<signed16>},
 };
 // clang-format on
-static_assert(reach(kRankedCell) == kRanked.length);
-
-constexpr std::int16_t kNotMeasured = 32767;
-
-std::string monitoredRscp(std::uint32_t raw)
-{
-    const auto value = static_cast<std::int16_t>(raw);
-    return value == kNotMeasured ? "" : formatted("%d dBm", value);
-}
-
-std::string monitoredEcNo(std::uint32_t raw)
-{
-    const auto value = static_cast<std::int16_t>(raw);
-    return value == kNotMeasured ? "" : formatted("%d dB", value);
-}
 
 // clang-format off
 constexpr CellRow kMonitoredCell[] = {
     {kVoxCell_UARFCN,         "UARFCN",          "UMTSSet: Failed to retrieve UARFCN\n"},
     {kVoxCell_ScramblingCode, "Scrambling Code", "UMTSSet: Failed to retrieve Scrambling Code\n"},
-    {kVoxCell_RSCP,           "RSCP",            "UMTSSet: Failed to retrieve RSCP\n",            monitoredRscp},
-    {kVoxCell_EcNo,           "Energy Per Chip", "UMTSSet: Failed to retrieve Energy Per Chip\n", monitoredEcNo},
+    {kVoxCell_RSCP,           "RSCP",            "UMTSSet: Failed to retrieve RSCP\n",            kWhereMeasured<inWholeDbm<signed16>>},
+    {kVoxCell_EcNo,           "Energy Per Chip", "UMTSSet: Failed to retrieve Energy Per Chip\n", kWhereMeasured<inWholeDb<signed16>>},
 };
 // clang-format on
 
+constexpr Layout kLayouts[] = {
+    {.code = ranking::kCode,
+     .minimumLength = ranking::kMinimumLength,
+     .rows = kRankedCell,
+     .list = {{kCount, kRanked}}},
+    {.code = kCellMonitorRecord},
+};
+static_assert(fits(kLayouts));
+
+constexpr SectionTraits kTraits{
+    .name = "UMTS Set",
+    .layouts = kLayouts,
+    .entryLine = "UMTSSet",
+};
+
 } // namespace
 
-std::string_view UMTSSet::getSectionName() const
-{
-    return "UMTS Set";
-}
+UMTSSet::UMTSSet(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 
-std::vector<LogCode> UMTSSet::getLogCodeArray() const
+void UMTSSet::decode(Record data, const Layout& layout)
 {
-    return {ranking::kCode, kCellMonitor};
-}
-
-void UMTSSet::updateWithData(Record data, LogCode logCode)
-{
-    if (logCode == kCellMonitor) {
-        logEntry();
-        replaceArray(sectionRef,
-                     [&](Array& list) { appendNeighbors(list, data, kVoxCellTechnology_UMTS, kMonitoredCell, roles); });
-    } else if (accepts(data, logCode, ranking::kCode, ranking::kMinimumLength)) {
-        replaceArray(sectionRef, listed(data, kRanked, data.read(kCount).value_or(0), kRankedCell));
-    }
+    if (layout.code != kCellMonitorRecord)
+        return Base::decode(data, layout);
+    replaceArray(sectionRef,
+                 [&](Array& list) { appendNeighbors(list, data, kVoxCellTechnology_UMTS, kMonitoredCell, roles); });
 }
 
 } // namespace kestrum

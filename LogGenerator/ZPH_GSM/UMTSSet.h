@@ -8,14 +8,10 @@ namespace kestrum {
 /// monitor: whichever came last. One row each.
 class UMTSSet final : public Base {
 public:
-    using Base::Base;
+    explicit UMTSSet(DecodingRoles& decodingRoles);
 
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "UMTSSet"; }
+private:
+    void decode(Record data, const Layout& layout) override;
 };
 
 } // namespace kestrum

@@ -3,22 +3,21 @@
 #include "LogGenerator/ZPH_GSM/SearcherCells.h"
 
 namespace kestrum {
+namespace {
 
-std::string_view VirtualActiveSet::getSectionName() const
-{
-    return "Virtual Active Set";
-}
+constexpr Layout kLayouts[] = {
+    {.code = searcher::kCode, .minimumLength = searcher::kMinimumLength},
+};
+static_assert(fits(kLayouts));
 
-std::vector<LogCode> VirtualActiveSet::getLogCodeArray() const
-{
-    return {searcher::kCode};
-}
+constexpr SectionTraits kTraits{
+    .name = "Virtual Active Set",
+    .layouts = kLayouts,
+    .entryLine = "VirtualActiveSet",
+};
 
-void VirtualActiveSet::updateWithData(Record data, LogCode logCode)
-{
-    // Which cells belong to it is not known: it stays empty.
-    if (accepts(data, logCode, searcher::kCode, searcher::kMinimumLength))
-        clearElementsInArray(sectionRef);
-}
+} // namespace
+
+VirtualActiveSet::VirtualActiveSet(DecodingRoles& decodingRoles) : PlaceholderList(decodingRoles, kTraits) {}
 
 } // namespace kestrum

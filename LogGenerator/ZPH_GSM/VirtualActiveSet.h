@@ -1,20 +1,13 @@
 #pragma once
 
-#include "LogGenerator/Base.h"
+#include "LogGenerator/PlaceholderList.h"
 
 namespace kestrum {
 
 /// The UMTS virtual active set. Log code 0x417A empties it; nothing fills it.
-class VirtualActiveSet final : public Base {
+class VirtualActiveSet final : public PlaceholderList {
 public:
-    using Base::Base;
-
-    std::string_view getSectionName() const override;
-    std::vector<LogCode> getLogCodeArray() const override;
-    void updateWithData(Record data, LogCode logCode) override;
-
-protected:
-    std::string_view entryLine() const override { return "VirtualActiveSet"; }
+    explicit VirtualActiveSet(DecodingRoles& decodingRoles);
 };
 
 } // namespace kestrum

@@ -40,8 +40,8 @@ private:
                 references.push_back(object(element));
             begin(0xA0, array->size());
         } else {
-            begin(0x50, value.string()->size());
-            text(*value.string());
+            begin(0x50, value.text()->size());
+            text(*value.text());
         }
         for (const std::size_t reference : references)
             number(reference, 1);

@@ -90,7 +90,7 @@ void fill(const Value& node)
     constexpr int kRows = 32, kCells = 12;
     if (const auto dictionary = node.dictionary()) {
         for (auto& entry : *dictionary)
-            if (entry.value.string() != nullptr && entry.key != "_sorted")
+            if (entry.value.isText() && entry.key != kSortedKey)
                 entry.value = Value("a value of usual length");
             else
                 fill(entry.value);

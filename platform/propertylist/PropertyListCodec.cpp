@@ -60,12 +60,12 @@ PropertyListCodec::Parsed PropertyListCodec::parseWithError(Bytes bytes, Value s
     }
 }
 
-Value PropertyListCodec::parse(Bytes bytes) const
+Value PropertyListCodec::parse(Bytes bytes)
 {
     return parseWithError(bytes).value;
 }
 
-Value PropertyListCodec::parseOver(Bytes bytes, Value spent) const
+Value PropertyListCodec::parseOver(Bytes bytes, Value spent)
 {
     return parseWithError(bytes, std::move(spent)).value;
 }
@@ -79,7 +79,7 @@ std::optional<Data> PropertyListCodec::toXml(const Value& value) const
 Value PropertyListCodec::load(const std::string& path) const
 {
     const auto bytes = contents(path, _maxBytes);
-    return bytes ? parse(*bytes) : Value();
+    return bytes ? parseWithError(*bytes).value : Value();
 }
 
 PropertyLists::Stored PropertyListCodec::write(const Dictionary& dictionary, const std::string& path) const

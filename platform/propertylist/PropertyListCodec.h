@@ -26,8 +26,8 @@ public:
     explicit PropertyListCodec(std::size_t maxBytes = kMaxBytes) : _maxBytes(maxBytes) {}
 
     /// Null for what is no property list, as `parseWithError`.
-    Value parse(Bytes bytes) const override;
-    Value parseOver(Bytes bytes, Value spent) const override;
+    Value parse(Bytes bytes) override;
+    Value parseOver(Bytes bytes, Value spent) override;
 
     /// Also nothing for a date outside the years 0 to 9999, and beyond the limits above, which a list that contains
     /// itself exceeds. Fractions of a second are cut off.

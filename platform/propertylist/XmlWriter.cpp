@@ -92,7 +92,7 @@ private:
         case Value::Kind::Dictionary:
             return container("dict", value.dictionary()->empty(), {nullptr, value.dictionary().get()});
         case Value::Kind::String:
-            return element("string", *value.string());
+            return element("string", *value.text());
         case Value::Kind::Integer:
             return element("integer", value.integer() ? formatted("%ld", *value.integer())
                                                       : formatted("%lu", *value.unsignedInteger()));

@@ -75,7 +75,7 @@ TEST(C2KTemplate, ThatIsMissingIsReportedAndTriedAgain)
 
 TEST(C2KTemplate, OfTheApplicationNamesEveryIdentifierAndNoOther)
 {
-    const PropertyListCodec codec;
+    PropertyListCodec codec;
     const Value shipped = codec.load(inCheckout("resources/C2KTemplate.plist"));
     ASSERT_TRUE(shipped.dictionary());
     std::set<std::string> named;
@@ -84,7 +84,7 @@ TEST(C2KTemplate, OfTheApplicationNamesEveryIdentifierAndNoOther)
             if (const auto below = value.dictionary())
                 self(self, *below);
             else if (key != "_sorted")
-                named.insert(*value.string());
+                named.insert(*value.text());
         }
     };
     collect(collect, *shipped.dictionary());

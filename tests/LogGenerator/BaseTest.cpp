@@ -60,16 +60,22 @@ RC_GTEST_PROP(LookUpECNO, RisesWithTheRatioInsideTheScale, ())
 }
 
 // A section with two codes, one of them twice.
+constexpr Row kRows[] = {{u8(13), "Channel", decimalSigned32}};
+constexpr Layout kLayouts[] = {
+    {.code = 0x4005, .minimumLength = 20, .rows = kRows},
+    {.code = 0xFF0002},
+    {.code = 0x4005, .minimumLength = 30},
+};
+constexpr SectionTraits kTraits{.name = "Serving Cell", .layouts = kLayouts};
+
+constexpr Row kCell[] = {{u8(0), "Cell", decimalSigned32}};
 
 class Section : public Base {
 public:
-    using Base::accepts;
-    using Base::Base;
+    explicit Section(DecodingRoles& decodingRoles, const SectionTraits& traits = kTraits) : Base(decodingRoles, traits)
+    {}
     using Base::publish;
     using Base::sectionRef;
-    std::string_view getSectionName() const override { return "Serving Cell"; }
-    std::vector<LogCode> getLogCodeArray() const override { return {0x4005, 0xFF0002, 0x4005}; }
-    void updateWithData(Record, LogCode) override {}
 };
 
 class BaseOf : public testing::Test {
@@ -78,7 +84,7 @@ protected:
     Section section{doubles.roles};
 };
 
-TEST_F(BaseOf, SectionRegistersUnderItsNameAndItsCodesInDecimal)
+TEST_F(BaseOf, SectionRegistersUnderItsNameAndItsCodes)
 {
     ClassDictionary classes;
     CodeDictionary codes;
@@ -86,8 +92,8 @@ TEST_F(BaseOf, SectionRegistersUnderItsNameAndItsCodesInDecimal)
     EXPECT_EQ(classes.size(), 1u);
     EXPECT_EQ(classes.at("Serving Cell"), &section);
     EXPECT_EQ(codes.size(), 2u);
-    EXPECT_THAT(codes.at("16389"), ElementsAre(&section, &section));
-    EXPECT_THAT(codes.at("16711682"), ElementsAre(&section));
+    EXPECT_THAT(codes.at(0x4005), ElementsAre(&section, &section));
+    EXPECT_THAT(codes.at(0xFF0002), ElementsAre(&section));
     EXPECT_EQ(doubles.log.count("Array Count: 3"), 1u);
 }
 
@@ -176,26 +182,86 @@ TEST_F(BaseOf, NodeOfTheOtherShapeIsLeftAlone)
     EXPECT_EQ(array->size(), 1u);
 }
 
-TEST_F(BaseOf, RecordOfItsCodeAndLengthIsAccepted)
+/// A record whose payload begins with 7.
+std::vector<std::byte> recordOf(std::size_t length)
 {
-    const std::vector<std::byte> bytes(20);
-    EXPECT_TRUE(section.accepts(Record(bytes), 0x4005, 0x4005, 20));
+    std::vector<std::byte> bytes(length);
+    bytes[13] = std::byte{7};
+    return bytes;
+}
+
+TEST_F(BaseOf, RecordOfItsCodeAndLengthIsShown)
+{
+    auto node = makeDictionary();
+    section.updateSectionRef(node);
+    doubles.log.lines.clear();
+    section.updateWithData(Record(recordOf(20)), 0x4005);
     EXPECT_THAT(doubles.log.lines, ElementsAre(RecordingLog::Line(Priority::Warning, "Serving Cell")));
+    EXPECT_EQ(Value(node), Value(makeDictionary({{"Channel", "7"}})));
 }
 
 TEST_F(BaseOf, ShortRecordIsDroppedSilently)
 {
-    const std::vector<std::byte> bytes(19);
-    EXPECT_FALSE(section.accepts(Record(bytes), 0x4005, 0x4005, 20));
+    auto node = makeDictionary();
+    section.updateSectionRef(node);
+    section.updateWithData(Record(recordOf(19)), 0x4005);
     EXPECT_THAT(doubles.log.errors(), IsEmpty());
+    EXPECT_TRUE(node->empty());
 }
 
 TEST_F(BaseOf, ForeignCodeIsReported)
 {
-    const std::vector<std::byte> bytes(20);
-    EXPECT_FALSE(section.accepts(Record(bytes), 0xFF0003, 0x4005, 20));
+    auto node = makeDictionary();
+    section.updateSectionRef(node);
+    section.updateWithData(Record(recordOf(20)), 0xFF0003);
     EXPECT_THAT(doubles.log.errors(), ElementsAre("Received an unknown log message: 16711683"));
+    EXPECT_TRUE(node->empty());
 }
+
+TEST_F(BaseOf, SectionMayIgnoreForeignCodes)
+{
+    static constexpr SectionTraits kDeaf{
+        .name = "Serving Cell", .layouts = kLayouts, .foreignCode = ForeignCode::Ignored};
+    Section deaf(doubles.roles, kDeaf);
+    deaf.updateWithData(Record(recordOf(20)), 0xFF0003);
+    EXPECT_THAT(doubles.log.lines, ElementsAre(RecordingLog::Line(Priority::Warning, "Serving Cell")));
+}
+
+TEST_F(BaseOf, EntryLineAndItsPriorityAreTheSections)
+{
+    static constexpr SectionTraits kWordy{
+        .name = "Serving Cell", .layouts = kLayouts, .entryLine = "ServingCell", .entryPriority = Priority::Notice};
+    Section(doubles.roles, kWordy).updateWithData(Record(recordOf(20)), 0xFF0003);
+    EXPECT_EQ(doubles.log.lines.front(), RecordingLog::Line(Priority::Notice, "ServingCell"));
+}
+
+TEST_F(BaseOf, ListIsRewrittenByItsCount)
+{
+    static constexpr Layout kCells[] = {
+        {.code = 0x4005, .minimumLength = 14, .rows = kCell, .list = {{u8(13), {14, 1}}}}};
+    static constexpr SectionTraits kList{.name = "Cells", .layouts = kCells};
+    static_assert(fits(kCells));
+    auto node = makeArray({"left over"});
+    Section list(doubles.roles, kList);
+    list.updateSectionRef(node);
+    std::vector<std::byte> bytes(17);
+    bytes[13] = std::byte{2};
+    bytes[14] = std::byte{7};
+    bytes[15] = std::byte{8};
+    list.updateWithData(Record(bytes), 0x4005);
+    EXPECT_EQ(Value(node), Value(makeArray({makeDictionary({{"Cell", "7"}}), makeDictionary({{"Cell", "8"}})})));
+}
+
+// Layouts whose shortest record does not hold all fields are found by the compiler.
+constexpr Layout kFieldBeyondTheRecord[] = {{.code = 1, .minimumLength = 13, .rows = kRows}};
+static_assert(!fits(kFieldBeyondTheRecord));
+constexpr Layout kCountBeyondTheRecord[] = {
+    {.code = 1, .minimumLength = 13, .rows = kCell, .list = {{u8(13), {14, 1}}}}};
+static_assert(!fits(kCountBeyondTheRecord));
+constexpr Row kWideCell[] = {{u16(0), "Cell", decimalSigned32}};
+constexpr Layout kFieldBeyondTheElement[] = {
+    {.code = 1, .minimumLength = 14, .rows = kWideCell, .list = {{u8(13), {14, 1}}}}};
+static_assert(!fits(kFieldBeyondTheElement));
 
 } // namespace
 } // namespace kestrum

@@ -10,12 +10,12 @@ namespace {
 /// Takes any bytes for the list of their text, but for "none".
 class CountingLists final : public PropertyLists {
 public:
-    Value parse(Bytes bytes) const override
+    Value parse(Bytes bytes) override
     {
         ++parsed;
         return textOf(bytes) == "none" ? Value() : Value(makeArray({Value(textOf(bytes))}));
     }
-    Value parseOver(Bytes bytes, Value spentList) const override
+    Value parseOver(Bytes bytes, Value spentList) override
     {
         spent = std::move(spentList);
         return parse(bytes);
@@ -27,14 +27,14 @@ public:
         return path == "writable" ? Stored::Written : Stored::Failed;
     }
 
-    mutable int parsed = 0;
-    mutable Value spent;
+    int parsed = 0;
+    Value spent;
 };
 
 TEST(ParsedOnce, ReadsEqualBytesOnce)
 {
-    const CountingLists lists;
-    const ParsedOnce once(lists);
+    CountingLists lists;
+    ParsedOnce once(lists);
     const std::string first = "cells", again = "cells"; // equal bytes at different addresses
     const Value list = once.parse(bytesOf(first));
     EXPECT_EQ(list, Value(makeArray({"cells"})));
@@ -44,8 +44,8 @@ TEST(ParsedOnce, ReadsEqualBytesOnce)
 
 TEST(ParsedOnce, ReadsOtherBytesAtTheSameAddressAnew)
 {
-    const CountingLists lists;
-    const ParsedOnce once(lists);
+    CountingLists lists;
+    ParsedOnce once(lists);
     std::string buffer = "cells";
     once.parse(bytesOf(buffer));
     buffer = "files";
@@ -54,8 +54,8 @@ TEST(ParsedOnce, ReadsOtherBytesAtTheSameAddressAnew)
 
 TEST(ParsedOnce, OffersTheListThatItForgetsToTheNext)
 {
-    const CountingLists lists;
-    const ParsedOnce once(lists);
+    CountingLists lists;
+    ParsedOnce once(lists);
     const Value first = once.parse(bytesOf("cells"));
     EXPECT_TRUE(lists.spent.isNull());
     once.parse(bytesOf("files"));
@@ -64,8 +64,8 @@ TEST(ParsedOnce, OffersTheListThatItForgetsToTheNext)
 
 TEST(ParsedOnce, RemembersThatBytesAreNone)
 {
-    const CountingLists lists;
-    const ParsedOnce once(lists);
+    CountingLists lists;
+    ParsedOnce once(lists);
     EXPECT_TRUE(once.parse(bytesOf("none")).isNull());
     EXPECT_TRUE(once.parse(bytesOf("none")).isNull());
     EXPECT_EQ(lists.parsed, 1);
@@ -74,8 +74,8 @@ TEST(ParsedOnce, RemembersThatBytesAreNone)
 
 TEST(ParsedOnce, LeavesTheRestToTheListsBehindIt)
 {
-    const CountingLists lists;
-    const ParsedOnce once(lists);
+    CountingLists lists;
+    ParsedOnce once(lists);
     EXPECT_EQ(textOf(once.toXml(Value("any"))->bytes()), "xml");
     EXPECT_EQ(once.load("path"), Value("path"));
     EXPECT_EQ(once.write({}, "writable"), PropertyLists::Stored::Written);

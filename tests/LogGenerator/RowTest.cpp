@@ -14,9 +14,9 @@ std::string_view colour(std::uint32_t raw)
 }
 
 constexpr Row kRows[] = {
-    {u8(0), "Byte", decimal},
+    {u8(0), "Byte", decimalSigned32},
     {u16(1), "Word", decimalSigned16},
-    {u8(3), "Colour", colour},
+    {u8(3), "Colour", named<colour>},
 };
 static_assert(reach(kRows) == 4);
 
@@ -44,20 +44,11 @@ TEST(Rows, ValueBeyondTheNamesIsUnknown)
 
 TEST(Rows, WordsArePrintedAsTheirSignSays)
 {
-    EXPECT_EQ(decimal(0xFFFFFFFF), "-1");
-    EXPECT_EQ(decimalUnsigned(0xFFFFFFFF), "4294967295");
-    EXPECT_EQ(decimalSigned8(0x80), "-128");
-    EXPECT_EQ(decimalSigned16(0x8000), "-32768");
-}
-
-std::string word(Record element)
-{
-    return decimal(element.read(u16(0)).value_or(0));
-}
-
-std::string byte(Record element)
-{
-    return decimal(element.read(u8(0)).value_or(0));
+    EXPECT_EQ(decimalSigned32.text(0xFFFFFFFF), "-1");
+    EXPECT_EQ(decimalUnsigned.text(0xFFFFFFFF), "4294967295");
+    EXPECT_EQ(decimalSigned16.text(0x8000), "-32768");
+    EXPECT_EQ(decimalSigned16.number(0x8000), -32768.0);
+    EXPECT_EQ(decimalUnsigned.number(0xFFFFFFFF), 4294967295.0);
 }
 
 /// What the list holds after that.
@@ -72,24 +63,26 @@ Value listOf(Append append)
 TEST(Lists, EndWhereTheRecordDoes)
 {
     const auto bytes = bytesFrom({9, 1, 2, 3, 4, 5});
-    EXPECT_EQ(listOf(listed(Record(bytes), Elements(1, 2), 200, word)), Value(makeArray({"513", "1027"})));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(1, 2), 200, u16(0), decimalSigned32)),
+              Value(makeArray({"513", "1027"})));
 }
 
 TEST(Lists, EndAtTheirCount)
 {
     const auto bytes = bytesFrom({1, 2, 3, 4});
-    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, byte)), Value(makeArray({"1", "2"})));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, u8(0), decimalSigned32)), Value(makeArray({"1", "2"})));
 }
 
 TEST(Lists, MayOverlap)
 {
     const auto bytes = bytesFrom({1, 2, 3});
-    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1, 2), 9, word)), Value(makeArray({"513", "770"})));
+    EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1, 2), 9, u16(0), decimalSigned32)),
+              Value(makeArray({"513", "770"})));
 }
 
 TEST(Lists, ElementsCanBeRows)
 {
-    constexpr Row kElement[] = {{u8(0), "Byte", decimal}};
+    constexpr Row kElement[] = {{u8(0), "Byte", decimalSigned32}};
     const auto bytes = bytesFrom({1, 2});
     EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, kElement)),
               Value(makeArray({makeDictionary({{"Byte", "1"}}), makeDictionary({{"Byte", "2"}})})));
@@ -99,7 +92,7 @@ TEST(Lists, ElementsCanBeShownByAFunction)
 {
     const auto bytes = bytesFrom({1, 2});
     const auto twice = [](Record element, Dictionary& row) {
-        row.setText("Twice", decimal(2 * element.read(u8(0)).value_or(0)));
+        row.set("Twice", Reading(decimalSigned32, 2 * element.read(u8(0)).value_or(0)));
     };
     EXPECT_EQ(listOf(listed(Record(bytes), Elements(0, 1), 2, twice)),
               Value(makeArray({makeDictionary({{"Twice", "2"}}), makeDictionary({{"Twice", "4"}})})));

@@ -20,39 +20,42 @@ inline std::vector<std::string>& calls()
     return all;
 }
 
+inline constexpr Row kCell[] = {{u8(13), "Channel", decimalSigned32}};
+inline constexpr Layout kCellLayouts[] = {{.code = 0x4001, .minimumLength = 0, .rows = kCell},
+                                          {.code = 0xFF0002, .minimumLength = 0, .rows = kCell},
+                                          {.code = 0x4003}};
+inline constexpr SectionTraits kCellTraits{.name = "Cell", .layouts = kCellLayouts};
+
 class Cell final : public Base {
 public:
-    using Base::Base;
-    std::string_view getSectionName() const override { return "Cell"; }
-    std::vector<LogCode> getLogCodeArray() const override { return {0x4001, 0xFF0002, 0x4003}; }
+    explicit Cell(DecodingRoles& decodingRoles) : Base(decodingRoles, kCellTraits) {}
     void updateWithData(Record data, LogCode logCode) override
     {
         calls().push_back(formatted("Cell %u %u", logCode, static_cast<std::uint32_t>(data.size())));
         if (logCode == 0x4003)
             throw std::runtime_error("broken record");
-        static constexpr Row kRows[] = {{u8(13), "Channel", decimal}};
-        publish(data, kRows);
+        publish(data, kCell);
     }
 };
+
+inline constexpr Layout kNeighborLayouts[] = {{.code = 0x4002}, {.code = 0x4001}};
+inline constexpr SectionTraits kNeighborTraits{.name = "Neighbors", .layouts = kNeighborLayouts};
 
 class Neighbors final : public Base {
 public:
-    using Base::Base;
-    std::string_view getSectionName() const override { return "Neighbors"; }
-    std::vector<LogCode> getLogCodeArray() const override { return {0x4002, 0x4001}; }
+    explicit Neighbors(DecodingRoles& decodingRoles) : Base(decodingRoles, kNeighborTraits) {}
     void updateWithData(Record data, LogCode logCode) override
     {
         calls().push_back(formatted("Neighbors %u %u", logCode, static_cast<std::uint32_t>(data.size())));
-        replaceArray(sectionRef,
-                     listed(data, Elements(13, 1), 255, [](Record each) { return decimal(each.read(u8(0)).value()); }));
+        replaceArray(sectionRef, listed(data, Elements(13, 1), 255, u8(0), decimalSigned32));
     }
 };
 
+inline constexpr SectionTraits kLegendTraits{.name = "Legend"};
+
 class Legend final : public Base {
 public:
-    using Base::Base;
-    std::string_view getSectionName() const override { return "Legend"; }
-    std::vector<LogCode> getLogCodeArray() const override { return {}; }
+    explicit Legend(DecodingRoles& decodingRoles) : Base(decodingRoles, kLegendTraits) {}
     void updateWithData(Record, LogCode) override { calls().push_back("Legend"); }
 };
 

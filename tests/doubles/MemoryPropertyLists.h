@@ -11,8 +11,8 @@ namespace kestrum {
 /// property list. What is serialised is laid down.
 class MemoryPropertyLists final : public PropertyLists {
 public:
-    Value parse(Bytes bytes) const override { return deepCopy(find(parsed, std::string(textOf(bytes)))); }
-    Value parseOver(Bytes bytes, Value /*spent*/) const override { return parse(bytes); }
+    Value parse(Bytes bytes) override { return deepCopy(find(parsed, std::string(textOf(bytes)))); }
+    Value parseOver(Bytes bytes, Value /*spent*/) override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override
     {
         if (value.isNull() || !writable)

@@ -139,7 +139,7 @@ inline RecordBuilder arbitraryRecord(LogCode code, std::size_t length)
 }
 
 /// A cell-monitor record of cells with any of the service's numbers, of any type.
-inline std::vector<std::byte> arbitraryCellMonitor(const PropertyListCodec& codec)
+inline std::vector<std::byte> arbitraryCellMonitor(PropertyListCodec& codec)
 {
     auto cells = makeArray();
     const auto count = *rc::gen::inRange(0, 6);

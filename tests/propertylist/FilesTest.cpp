@@ -112,7 +112,7 @@ TEST_F(Files, OnlyTheirOwnerReadsThem)
 
 TEST_F(Files, TwoWritersOfOneNameGetNoTwoFilesUnderIt)
 {
-    const PropertyListCodec other;
+    PropertyListCodec other;
     ASSERT_EQ(other.write({{"theirs", 1}}, scratch.file("a")), Stored::Written);
     EXPECT_EQ(codec.write(snapshot, scratch.file("a")), Stored::NameTaken);
     EXPECT_EQ(codec.load(scratch.file("a")), Value(makeDictionary({{"theirs", 1}})));
@@ -161,7 +161,7 @@ TEST_F(Files, TheLongestThatIsWrittenIsLoadedAndNothingLongerIsEither)
     ASSERT_EQ(codec.write(snapshot, scratch.file("a")), Stored::Written);
     const auto size = std::filesystem::file_size(scratch.file("a"));
     for (const bool fits : {true, false}) {
-        const PropertyListCodec small(fits ? size : size - 1);
+        PropertyListCodec small(fits ? size : size - 1);
         EXPECT_EQ(small.write(snapshot, scratch.file(fits ? "b" : "c")), fits ? Stored::Written : Stored::Failed);
         EXPECT_EQ(!small.load(scratch.file("a")).isNull(), fits);
         EXPECT_EQ(small.parseWithError(bytesOf(contentsOf(scratch.file("a")))).reason, fits ? "" : "too many bytes");

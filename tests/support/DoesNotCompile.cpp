@@ -1,5 +1,6 @@
 // Compiled once for each case, which has to fail, and once without any.
 #include "support/Format.h"
+#include "support/Reading.h"
 #include "support/Record.h"
 #include "support/Value.h"
 
@@ -47,6 +48,29 @@ constexpr Field fields[] = {
     u16(19).bits(8, 0),
 #elif defined BIT_BEYOND_THE_WORD
     u8(13).bit(8),
+#endif
+};
+
+constexpr Quantity level{[](Quantity::Raw raw) { return formatted("%lu dBm", raw); }};
+
+// A line of a layout.
+struct Line {
+    Field field;
+    QuantityRef quantity;
+};
+
+#if defined LOCAL_FOR_A_QUANTITY
+Reading local()
+{
+    constexpr Quantity mine{[](Quantity::Raw) { return std::string(); }};
+    return Reading(mine, 7);
+}
+#endif
+
+constexpr Line lines[] = {
+    {u8(0), level},
+#if defined TEMPORARY_FOR_A_QUANTITY
+    {u8(1), Quantity{[](Quantity::Raw) { return std::string(); }}},
 #endif
 };
 

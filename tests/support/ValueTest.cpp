@@ -1,4 +1,5 @@
 #include "support/Value.h"
+#include "support/Format.h"
 
 #include <gtest/gtest.h>
 
@@ -11,6 +12,17 @@
 
 namespace kestrum {
 namespace {
+
+constexpr Quantity kLevel{[](Quantity::Raw raw) { return raw == 0 ? "Not Present" : formatted("-%lu dBm", raw); },
+                          [](Quantity::Raw raw) { return raw == 0 ? NAN : -static_cast<double>(raw); }, "dBm"};
+constexpr Quantity kRatio{[](Quantity::Raw raw) { return formatted("-%lu dBm", raw); }}; // worded alike
+constexpr Quantity kOnOff{[](Quantity::Raw raw) { return std::string(raw != 0 ? "on" : "off"); }};
+
+std::string percent(double share)
+{
+    return formatted("%.1f%%", share);
+}
+constexpr Quantity kShare = computedQuantity<percent>("%");
 
 using namespace std::chrono_literals;
 
@@ -42,7 +54,7 @@ TEST(Value, GivesNothingOfAnotherKind)
     const Value text = "1";
     EXPECT_FALSE(text.integer() || text.unsignedInteger() || text.real() || text.boolean() || text.date());
     EXPECT_FALSE(text.array() || text.dictionary() || text.data() != nullptr || text.int32());
-    EXPECT_EQ(Value(1).string(), nullptr);
+    EXPECT_EQ(Value(1).text(), std::nullopt);
     EXPECT_FALSE(Value(1).real() || Value(1.0).integer() || Value(true).integer());
 }
 
@@ -261,7 +273,7 @@ TEST(Array, DropsItsSparesAndNothingElse)
     const auto kept = makeDictionary(), spare = makeDictionary();
     Array list{kept, spare};
     list.startOver();
-    EXPECT_EQ(list.slot(), Value(kept));
+    list.append(kept);
     list.dropSpares();
     EXPECT_EQ(list.size(), 1u);
     EXPECT_EQ(kept.use_count(), 2);
@@ -273,7 +285,7 @@ TEST(Dictionary, DropsItsSparesAndNothingElse)
     const auto kept = makeDictionary(), spare = makeDictionary();
     Dictionary dictionary{{"kept", kept}, {"spare", spare}};
     dictionary.startOver();
-    EXPECT_EQ(dictionary.slot("kept"), Value(kept));
+    dictionary.set("kept", kept);
     dictionary.dropSpares();
     EXPECT_EQ(dictionary.size(), 1u);
     EXPECT_EQ(kept.use_count(), 2);
@@ -305,62 +317,122 @@ TEST(Value, LeavesAContainerThatSomebodyElseHolds)
     EXPECT_EQ(heldDictionary, Value(makeDictionary({{"RSSI", "-71 dBm"}})));
 }
 
-TEST(Dictionary, WordsOnlyWhatHasChanged)
+TEST(Reading, HasTextNumberAndUnit)
 {
-    Dictionary dictionary;
-    int worded = 0;
-    constexpr int kLine = 0, kOther = 0;
-    const auto set = [&](const Wording& wording, std::string_view text) {
-        dictionary.setWorded("RSSI", wording, [&](Value& value) {
-            value.assignText(text, wording);
-            ++worded;
-        });
-    };
-    set({&kLine, 71}, "-71 dBm");
-    set({&kLine, 71}, "not asked for");
-    EXPECT_EQ(worded, 1);
-    EXPECT_EQ(dictionary.at("RSSI"), Value("-71 dBm"));
-    set({&kLine, 72}, "-72 dBm");
-    set({&kOther, 72}, "72");
-    EXPECT_EQ(worded, 3);
-    EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
-    dictionary.setText("RSSI", "by hand");
-    set({&kOther, 72}, "72");
-    EXPECT_EQ(worded, 4);
-    dictionary.set("RSSI", 5);
-    set({&kOther, 72}, "72");
-    EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
-    dictionary.startOver();
-    set({&kOther, 72}, "not asked for");
-    EXPECT_EQ(dictionary.at("RSSI"), Value("72"));
-    EXPECT_EQ(worded, 5);
+    const Reading level(kLevel, 71);
+    EXPECT_EQ(level.text(), "-71 dBm");
+    EXPECT_EQ(level.number(), -71.0);
+    EXPECT_EQ(level.unit(), "dBm");
 }
 
-TEST(Dictionary, PassesOnlyWhatIsNextAndWordedSo)
+TEST(Reading, OfANameHasATextAlone)
 {
-    constexpr int kRssi = 0, kMode = 0; // lines
-    const Wording rssi{&kRssi, 71}, mode{&kMode, 1};
-    Dictionary dictionary;
-    EXPECT_FALSE(dictionary.passWorded(rssi));
-    dictionary.slot("RSSI").assignText("-71 dBm", rssi);
-    dictionary.slot("Mode").assignText("idle", mode);
-    EXPECT_FALSE(dictionary.passWorded(rssi)) << "behind the last one";
+    const Reading name(kOnOff, 1);
+    EXPECT_EQ(name.text(), "on");
+    EXPECT_EQ(name.number(), std::nullopt);
+    EXPECT_EQ(name.unit(), "");
+}
 
-    dictionary.startOver();
-    EXPECT_FALSE(dictionary.passWorded(mode)) << "not the next one";
-    EXPECT_FALSE(dictionary.passWorded({&kRssi, 72}));
-    EXPECT_TRUE(dictionary.passWorded(rssi));
-    EXPECT_EQ(describe(std::make_shared<Dictionary>(dictionary)), R"({"RSSI": "-71 dBm"})");
-    EXPECT_TRUE(dictionary.passWorded(mode));
-    EXPECT_EQ(describe(std::make_shared<Dictionary>(dictionary)), R"({"RSSI": "-71 dBm", "Mode": "idle"})");
-    EXPECT_FALSE(dictionary.passWorded(rssi));
+TEST(Reading, OfWhatMeasuresNothingHasATextAlone)
+{
+    const Reading absent(kLevel, 0);
+    EXPECT_EQ(absent.text(), "Not Present");
+    EXPECT_EQ(absent.number(), std::nullopt);
+    EXPECT_EQ(absent.unit(), "");
+}
 
-    EXPECT_NE(dictionary.find("RSSI"), nullptr);
-    EXPECT_TRUE(dictionary.passWorded(mode)) << "the next one without starting over";
-    EXPECT_EQ(dictionary.size(), 2u);
-    dictionary.slot("RSSI").becomeArray();
+TEST(Reading, OfAComputedNumberKeepsAllOfIt)
+{
+    const auto share = Reading::computed(kShare, 1.0 / 3.0);
+    EXPECT_EQ(share.text(), "0.3%");
+    EXPECT_EQ(share.number(), 1.0 / 3.0);
+    EXPECT_EQ(share.unit(), "%");
+}
+
+TEST(Reading, OfANumberThatIsNoneHasATextAlone)
+{
+    for (const double none : {0.0 / 0.0, HUGE_VAL, -HUGE_VAL})
+        EXPECT_EQ(Reading::computed(kShare, none).number(), std::nullopt);
+    EXPECT_EQ(Reading::computed(kShare, -HUGE_VAL).text(), "-inf%");
+}
+
+TEST(Value, ReadingIsAString)
+{
+    const Value value = Reading(kLevel, 71);
+    EXPECT_EQ(value.kind(), Value::Kind::String);
+    EXPECT_TRUE(value.isText());
+    EXPECT_EQ(value.text(), "-71 dBm");
+    EXPECT_EQ(value.reading(), Reading(kLevel, 71));
+    EXPECT_EQ(describe(value), "\"-71 dBm\"");
+    EXPECT_EQ(Value("-71 dBm").reading(), std::nullopt);
+}
+
+TEST(Value, ComparesStringsAndReadingsByTheirTexts)
+{
+    EXPECT_EQ(Value(Reading(kLevel, 71)), Value(Reading(kLevel, 71)));
+    EXPECT_EQ(Value(Reading(kLevel, 71)), Value(Reading(kRatio, 71)));
+    EXPECT_EQ(Value(Reading(kLevel, 71)), Value("-71 dBm"));
+    EXPECT_EQ(Value("-71 dBm"), Value(Reading(kLevel, 71)));
+    EXPECT_NE(Value(Reading(kLevel, 71)), Value(Reading(kLevel, 72)));
+    EXPECT_NE(Value(Reading(kLevel, 71)), Value("-72 dBm"));
+    EXPECT_NE(Value("-72 dBm"), Value(Reading(kLevel, 71)));
+    EXPECT_NE(Value(Reading(kLevel, 71)), Value(71));
+}
+
+TEST(Value, TakesAReadingInPlaceOfAnything)
+{
+    for (Value value : {Value(), Value("text"), Value(Reading(kOnOff, 0)), Value(makeArray({"4"}))}) {
+        value.assign(Reading(kLevel, 71));
+        EXPECT_EQ(value.reading(), Reading(kLevel, 71));
+    }
+}
+
+TEST(Dictionary, FindsWithoutAnEffectOnWhatComesNext)
+{
+    // Keys that come in their order reuse the entries that stood there, whatever is looked for in between.
+    Dictionary dictionary{{"a", makeArray({"1"})}, {"b", makeArray({"2"})}};
+    const Array* second = dictionary.at("b").array().get();
     dictionary.startOver();
-    EXPECT_FALSE(dictionary.passWorded(rssi)) << "no text any more";
+    dictionary.slot("a");
+    EXPECT_NE(std::as_const(dictionary).find("a"), nullptr);
+    EXPECT_EQ(std::as_const(dictionary).find("b"), nullptr);
+    EXPECT_EQ(dictionary.slot("b").array().get(), second);
+}
+
+TEST(Dictionary, SlotOfASpareEntryIsEmpty)
+{
+    const auto shared = makeDictionary({{"key", "shared"}});
+    Dictionary dictionary{{"text", "old"},
+                          {"reading", Reading(kLevel, 71)},
+                          {"number", 5},
+                          {"list", makeArray({"old"})},
+                          {"row", makeDictionary({{"key", "old"}})},
+                          {"shared", shared}};
+    dictionary.startOver();
+    EXPECT_EQ(dictionary.slot("text"), "");
+    EXPECT_TRUE(dictionary.slot("reading").isNull());
+    EXPECT_TRUE(dictionary.slot("number").isNull());
+    EXPECT_EQ(dictionary.slot("list"), Value(makeArray()));
+    EXPECT_EQ(dictionary.slot("row"), Value(makeDictionary()));
+    EXPECT_TRUE(dictionary.slot("shared").isNull());
+    EXPECT_TRUE(dictionary.slot("new").isNull());
+    EXPECT_EQ(shared->at("key"), "shared");
+}
+
+TEST(Dictionary, SlotOfAKeyThatIsThereHoldsItsValue)
+{
+    Dictionary dictionary{{"text", "old"}};
+    EXPECT_EQ(dictionary.slot("text"), "old");
+}
+
+TEST(Array, SlotOfASpareElementIsEmpty)
+{
+    Array list{"old", Reading(kLevel, 71), makeArray({"old"})};
+    list.startOver();
+    EXPECT_EQ(list.slot(), "");
+    EXPECT_TRUE(list.slot().isNull());
+    EXPECT_EQ(list.slot(), Value(makeArray()));
+    EXPECT_TRUE(list.slot().isNull());
 }
 
 TEST(Dictionary, HoldsWhatCameSinceItStartedOver)
@@ -389,7 +461,7 @@ TEST(Dictionary, HoldsWhatCameSinceItStartedOver)
         }
         std::vector<std::pair<std::string, std::string>> found;
         for (const auto& [key, value] : dictionary)
-            found.emplace_back(key, *value.string());
+            found.emplace_back(key, *value.text());
         ASSERT_EQ(found, expected) << "round " << round;
         for (const auto& [key, text] : expected)
             ASSERT_EQ(dictionary.at(key), Value(text)) << "round " << round;

@@ -15,7 +15,7 @@ public:
     static constexpr const char* kCommands = "vox.commands";
 
     /// `lists` are those of the application's roles.
-    ServedModem(MonitorDoubles& doubles, const PropertyLists& lists) : _doubles(doubles), _lists(lists) {}
+    ServedModem(MonitorDoubles& doubles, PropertyLists& lists) : _doubles(doubles), _lists(lists) {}
 
     void serve(std::string_view technology = kVoxLogChannelTechnology_IFX)
     {
@@ -55,7 +55,7 @@ private:
     }
 
     MonitorDoubles& _doubles;
-    const PropertyLists& _lists;
+    PropertyLists& _lists;
 };
 
 /// What Save needs: the marker of an internal installation.

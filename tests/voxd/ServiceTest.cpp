@@ -154,7 +154,7 @@ protected:
             if (!sent.reply)
                 return "no reply";
             const auto answer = test.lists.parse(sent.reply->bytes()).dictionary();
-            return answer && answer->at("GetTechnology").string() ? *answer->at("GetTechnology").string() : "no answer";
+            return answer ? answer->at("GetTechnology").text().value_or("no answer") : "no answer";
         }
         void startStreaming() { EXPECT_EQ(send(makeDictionary({{"SetState", Value("Streaming")}})).status, 0); }
         bool hasReceived(std::size_t count)

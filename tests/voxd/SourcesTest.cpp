@@ -155,7 +155,7 @@ TEST_F(ReplaySourceTest, RefusesWhatCannotBeReplayed)
     EXPECT_THAT(whatIsWrong(file("\x10\0\0\0short"s)), HasSubstr("at offset 0: the last message ends 11 bytes short"));
 }
 
-const PropertyListCodec kLists;
+PropertyListCodec kLists;
 constexpr Date kStart = std::chrono::sys_days(std::chrono::year{2026} / 11 / 16) + std::chrono::hours{6};
 
 class AnyScenario : public testing::TestWithParam<Scenario> {};
@@ -221,7 +221,7 @@ protected:
                 visit((*array)[i], path + "[]");
         } else {
             ASSERT_EQ(value.kind(), Value::Kind::String) << path;
-            seen[path].insert(*value.string());
+            seen[path].insert(*value.text());
         }
     }
     static void SetUpTestSuite()

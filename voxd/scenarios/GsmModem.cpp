@@ -73,7 +73,7 @@ public:
         if (isDue(number, kPlmnAgain))
             logPlmn(log);
         if (isDue(number, kCellMonitor))
-            log.add(kCellReport, cells());
+            log.add(kCellMonitorRecord, cells());
         if (isDue(number, kPdpAgain))
             logPdp(log);
         if (isDue(number, kSimAgain))
@@ -129,7 +129,7 @@ private:
         logPlmn(log);
         // Its system information has still to be read.
         _identified = false;
-        log.add(kCellReport, cells());
+        log.add(kCellMonitorRecord, cells());
     }
 
     void logStates(ModemLog& log)
@@ -208,11 +208,11 @@ private:
 
     void logSim(ModemLog& log)
     {
-        log.add(kSimReport, simReport(_world.plmn(site()), area().locationArea, area().routingArea));
+        log.add(kSimFilesRecord, simReport(_world.plmn(site()), area().locationArea, area().routingArea));
     }
     void logPdp(ModemLog& log)
     {
-        log.add(kPdpReport, pdpReport(_onUmts ? "UMTS" : "GSM", !_traffic.isIdle() && _traffic.isData()));
+        log.add(kPdpContextsRecord, pdpReport(_onUmts ? "UMTS" : "GSM", !_traffic.isIdle() && _traffic.isData()));
     }
 
     Value cells()

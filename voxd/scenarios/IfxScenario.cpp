@@ -232,7 +232,7 @@ private:
         left.reserve(_left.size());
         for (const int identity : _left)
             left.push_back(Value(formatted("0x%04x", static_cast<unsigned>(identity))));
-        return makeDictionary({{"_sorted", Value("_sorted")},
+        return makeDictionary({{kSortedKey, kSortedKey},
                                {"0;Reselections", Value(formatted("%d", _reselections))},
                                {"1;Handovers", Value(formatted("%d", _handovers))},
                                {"2;Location Updates", Value(formatted("%d", _areaUpdates))},
@@ -240,7 +240,7 @@ private:
                                {"4;Cells Left", counted(std::move(left))}});
     }
 
-    const PropertyLists& _lists;
+    PropertyLists& _lists;
     Date _start;
     Random _random;
     std::array<Cell, kCells> _cells;

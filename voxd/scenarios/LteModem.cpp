@@ -89,7 +89,7 @@ public:
             log.add(antennas());
         }
         if (isDue(number, kCellMonitor))
-            log.add(kCellReport, cells());
+            log.add(kCellMonitorRecord, cells());
         if (isDue(number, kPdpAgain))
             logPdp(log);
         if (isDue(number, kSimAgain))
@@ -147,14 +147,17 @@ private:
         log.add(servingCell());
         log.add(antennas());
         log.add(servingMeasurement());
-        log.add(kCellReport, cells());
+        log.add(kCellMonitorRecord, cells());
     }
     void logSim(ModemLog& log)
     {
         const auto at = gsmCell(_world, _serving.site());
-        log.add(kSimReport, simReport(_world.plmn(_serving.site()), at.locationArea, at.routingArea));
+        log.add(kSimFilesRecord, simReport(_world.plmn(_serving.site()), at.locationArea, at.routingArea));
     }
-    void logPdp(ModemLog& log) { log.add(kPdpReport, pdpReport("LTE", !_traffic.isIdle() && _traffic.isData())); }
+    void logPdp(ModemLog& log)
+    {
+        log.add(kPdpContextsRecord, pdpReport("LTE", !_traffic.isIdle() && _traffic.isData()));
+    }
 
     RecordWriter antennas() const { return RecordWriter(0xB0C1, 22).set(u8(13), 2).set(u8(20), _layer == 0 ? 4 : 2); }
 

@@ -20,7 +20,7 @@ constexpr bool isDue(unsigned tick, unsigned period)
 class ModemLog {
 public:
     /// The lists outlive the log.
-    explicit ModemLog(const PropertyLists& lists) : _lists(lists) {}
+    explicit ModemLog(PropertyLists& lists) : _lists(lists) {}
 
     void add(RecordWriter record) { _records.push_back(std::move(record)); }
     void add(LogCode code, const Value& propertyList);
@@ -28,7 +28,7 @@ public:
     std::vector<RecordWriter> take() { return std::exchange(_records, {}); }
 
 private:
-    const PropertyLists& _lists;
+    PropertyLists& _lists;
     std::vector<RecordWriter> _records;
 };
 

@@ -1,12 +1,13 @@
 #include "voxd/scenarios/RecordWriter.h"
 
+#include "platform/ChannelMessage.h"
+
 #include <algorithm>
 #include <cmath>
 
 namespace kestrum {
 namespace {
 
-constexpr LogCode kExtraCodes = 0xFF0000;
 constexpr Field kType = u8(0), kLength = u16(1), kCode = u16(3);
 constexpr std::size_t kTimeStamp = 5;
 constexpr std::byte kPrefix[] = {std::byte{0x81}, std::byte{0}};
@@ -15,7 +16,7 @@ constexpr std::byte kPrefix[] = {std::byte{0x81}, std::byte{0}};
 
 RecordWriter::RecordWriter(LogCode code, std::size_t length) : _bytes(length)
 {
-    set(kType, code >= kExtraCodes ? 0xFF : 1);
+    set(kType, code >= ChannelMessage::kExtraCodes ? 0xFF : 1);
     // Counted as in a log file, where the record has no type byte.
     set(kLength, static_cast<std::int64_t>(length) - 1);
     set(kCode, code & 0xFFFF);

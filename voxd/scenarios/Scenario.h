@@ -15,8 +15,8 @@ class PropertyLists;
 /// What a scenario is made from. Equal seeds and starts give equal messages.
 struct ScenarioSetting {
     std::uint64_t seed;
-    Date start;                 ///< the moment of offset 0: records are stamped with it
-    const PropertyLists& lists; ///< outlives the source
+    Date start;           ///< the moment of offset 0: records are stamped with it
+    PropertyLists& lists; ///< outlives the source
 };
 
 /// A simulated drive through a small network.

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/ChannelMessage.h"
 #include "support/Record.h"
 #include "support/Value.h"
 #include "voxd/scenarios/World.h"
@@ -12,8 +13,6 @@
 namespace kestrum {
 
 // What the telephony service itself adds to the modem's log: property lists.
-
-constexpr LogCode kSimReport = 0xFF0000, kCellReport = 0xFF0001, kPdpReport = 0xFF0002;
 
 /// The number of what could not be measured.
 constexpr int kNotMeasured = 32767;

@@ -75,7 +75,7 @@ public:
         if (isDue(number, kCellAgain))
             log.add(servingCell());
         if (isDue(number, kCellMonitor))
-            log.add(kCellReport, cells());
+            log.add(kCellMonitorRecord, cells());
         if (isDue(number, kPdpAgain))
             logPdp(log);
         if (isDue(number, kSimAgain))
@@ -96,14 +96,17 @@ private:
         log.add(servingCell());
         // Its system information has still to be read.
         _identified = false;
-        log.add(kCellReport, cells());
+        log.add(kCellMonitorRecord, cells());
     }
     void logSim(ModemLog& log)
     {
         const int routingArea = gsmCell(_world, _serving.site()).routingArea;
-        log.add(kSimReport, simReport(_world.plmn(_serving.site()), cell().locationArea, routingArea));
+        log.add(kSimFilesRecord, simReport(_world.plmn(_serving.site()), cell().locationArea, routingArea));
     }
-    void logPdp(ModemLog& log) { log.add(kPdpReport, pdpReport("TD-SCDMA", !_traffic.isIdle() && _traffic.isData())); }
+    void logPdp(ModemLog& log)
+    {
+        log.add(kPdpContextsRecord, pdpReport("TD-SCDMA", !_traffic.isIdle() && _traffic.isData()));
+    }
 
     RecordWriter state() const
     {

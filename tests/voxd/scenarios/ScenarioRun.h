@@ -46,7 +46,7 @@ public:
 /// A scenario on its way through the real generators, on the templates that ship with the program.
 class ScenarioRun {
 public:
-    static inline const PropertyListCodec kLists;
+    static inline PropertyListCodec kLists = PropertyListCodec();
     static constexpr Date kStart{std::chrono::sys_days(std::chrono::year(2026) / 11 / 16)};
 
     explicit ScenarioRun(std::string_view scenario, std::uint64_t seed = 1)
@@ -117,7 +117,7 @@ inline void eachText(const Value& node, const std::string& path,
         for (const auto& each : *array)
             eachText(each, path + "[]", seen);
     } else {
-        seen(path, node.string() != nullptr ? *node.string() : describe(node));
+        seen(path, node.text().value_or(describe(node)));
     }
 }
 
@@ -139,7 +139,7 @@ inline std::string textAt(const Value& tree, std::string_view section, std::stri
 {
     const auto node = nodeNamed(section, tree).dictionary();
     const Value found = node ? node->at(key) : Value();
-    return found.string() != nullptr ? *found.string() : std::string();
+    return found.text().value_or("");
 }
 
 } // namespace kestrum

@@ -1,0 +1,14 @@
+#pragma once
+
+#include "LogGenerator/Quantities.h"
+
+namespace kestrum {
+
+inline std::string signedDecibels(double ratio)
+{
+    return formatted("%+.2f dB", ratio);
+}
+/// A pilot's energy over all that is received (Ec/Io): "-5.25 dB".
+inline constexpr Quantity kPilotStrength = computedQuantity<signedDecibels>("dB");
+
+} // namespace kestrum

@@ -1,0 +1,37 @@
+#pragma once
+
+#include "LogGenerator/Quantities.h"
+
+#include <cstdint>
+
+namespace kestrum {
+
+// What a raw value measures, in dB, dBm. The ranges begin where the reporting ranges of 3GPP TS 36.133 and TS 36.331 do, or below.
+constexpr double rsrpQuarterDb(std::uint32_t raw)
+{
+    return raw * 0.25 - 140.0;
+}
+constexpr double rsrqEighthDb(std::uint32_t raw)
+{
+    return raw * 0.125 - 20.0;
+}
+constexpr double rsrqQuarterDb(std::uint32_t raw)
+{
+    return raw * 0.25 - 30.0;
+}
+/// RSSI; and RSRP where a record has room for half-dB steps only.
+constexpr double powerHalfDb(std::uint32_t raw)
+{
+    return raw * 0.5 - 140.0;
+}
+constexpr int srxlev(std::uint32_t raw)
+{
+    return static_cast<int>(raw) - 30;
+}
+/// The least level that cell selection accepts, sent in steps of 2 dB.
+constexpr int qrxlevmin(std::uint32_t raw)
+{
+    return 2 * static_cast<int>(raw) - 140;
+}
+
+} // namespace kestrum
