@@ -26,8 +26,12 @@ public:
     /// The display as it stands: at the end, and, of a file that is followed, whenever its end was met.
     virtual void display(const Decoding&) {}
 
-    /// `withLog`: lines of the system log are kept or shown.
-    static std::unique_ptr<Output> make(OutputFormat format, bool withLog, OutputFile& data, OutputFile& remarks);
+    /// What is written beside the values.
+    struct Contents {
+        bool log = false;     ///< lines of the system log
+        bool numbers = false; ///< jsonl: {"text", "number", "unit"} for a value that measures something
+    };
+    static std::unique_ptr<Output> make(OutputFormat format, Contents contents, OutputFile& data, OutputFile& remarks);
 };
 
 } // namespace kestrum

@@ -65,7 +65,7 @@ class Program {
 public:
     Program(const DecodeOptions& options, Bundle& bundle)
         : _options(options),
-          _output(Output::make(options.format, options.log, _data, _remarks)),
+          _output(Output::make(options.format, {.log = options.log, .numbers = options.numbers}, _data, _remarks)),
           _decoding(options.technology, bundle, _lists,
                     options.log ? [this](Priority priority, std::string_view text) { _output->logLine(priority, text); }
                                 : Decoding::LogLine(),

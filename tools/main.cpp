@@ -30,8 +30,10 @@ const std::map<std::string, OutputFormat> kFormats = {{"tree", OutputFormat::Tre
 constexpr const char* kFooter = R"(Formats:
   tree   what the panes show after the last message
   json   one object: technology, messages, dropped, display, and (with --log) log
-  jsonl  one object for each message that changed the display: time, code, changes by path
-  csv    the same changes as rows: time, code, path, value; a value that a spreadsheet would take for a formula (it
+  jsonl  one object for each message that changed the display: time, code, changes by path; with --numbers, a value
+         that measures something is an object: text, number, unit
+  csv    the same changes as rows: time, code, path, value, number, unit (the last two are empty where a value measures
+         nothing); a value that a spreadsheet would take for a formula (it
          begins with = + - @, a tab or a return, and is no number) stands behind an apostrophe
 
 Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum); other names are told by their content.
@@ -59,6 +61,8 @@ int main(int argc, char** argv)
         ->check(CLI::IsMember(&kFormats))
         ->capture_default_str();
     commands.add_flag("--log", options.log, "The system log too: in the object of json, else on standard error");
+    commands.add_flag("--numbers", options.numbers,
+                      "With jsonl: the number and the unit too of each value that measures something");
     commands.add_flag("--stats", options.stats, "Count the messages of each log code, on standard error");
     commands.add_flag("--follow", options.follow, "Go on as the last file grows, until interrupted");
     commands.add_option("--extract", options.extract,
@@ -70,6 +74,8 @@ int main(int argc, char** argv)
             for (const auto& file : options.files)
                 if (file.ends_with(".kcap") || file.ends_with(".dlf"))
                     throw CLI::ValidationError("--extract", file + " is no snapshot");
+        if (options.numbers && format != "jsonl")
+            throw CLI::ValidationError("--numbers", "goes with --format jsonl alone");
         if (options.follow && options.files.back().ends_with(".kestrum"))
             throw CLI::ValidationError("--follow", options.files.back() + " is a snapshot: it does not grow");
     } catch (const CLI::ParseError& error) {

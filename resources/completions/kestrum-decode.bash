@@ -12,8 +12,8 @@ _kestrum_decode() {
             mapfile -t COMPREPLY < <(compgen -d -- "$current") ;;
         *)
             if [[ $current == -* ]]; then
-                mapfile -t COMPREPLY < <(compgen -W '-h --help --version --technology --format --log --stats --follow
-                    --extract --force' -- "$current")
+                mapfile -t COMPREPLY < <(compgen -W '-h --help --version --technology --format --log --numbers --stats
+                    --follow --extract --force' -- "$current")
             else
                 compopt -o filenames 2>/dev/null
                 mapfile -t COMPREPLY < <(compgen -f -- "$current")

@@ -223,14 +223,46 @@ TEST_F(ProgramTest, JsonlHasNoTimeWhereAMessageHasNone)
 TEST_F(ProgramTest, CsvQuotesAsRfc4180)
 {
     EXPECT_EQ(run({"--format", "csv", capture(kcap(ifx("a,\"b\"&#10;c")))}).output,
-              "time,code,path,value\r\n,,/Cell,\"a,\"\"b\"\"\nc\"\r\n,,/Other,o\r\n");
+              "time,code,path,value,number,unit\r\n,,/Cell,\"a,\"\"b\"\"\nc\",,\r\n,,/Other,o,,\r\n");
 }
 
 TEST_F(ProgramTest, CsvHasTimeAndCode)
 {
     EXPECT_THAT(
         run({"--format", "csv", capture(kcap(antennas(4)))}).output,
-        HasSubstr("\n2026-11-16T06:05:42.000000Z,0xB0C1,/0;Serving Cell/Serving Cell Info/Num Tx Antennas,4\r\n"));
+        HasSubstr("\n2026-11-16T06:05:42.000000Z,0xB0C1,/0;Serving Cell/Serving Cell Info/Num Tx Antennas,4,4,\r\n"));
+}
+
+/// A serving cell measurement of LTE: RSRP -98.25 dBm, P_Max absent.
+std::string servingCell()
+{
+    std::string record("\x01\x21\x00\x7F\xB1\x00\x00\x00\x00\x00\x00\x00\x00", 13);
+    record.resize(33);
+    record[21] = static_cast<char>(167); // (140 - 98.25) * 4
+    record[27] = static_cast<char>(64 >> 1);
+    return record;
+}
+
+TEST_F(ProgramTest, CsvHasNumberAndUnitWhereAValueMeasuresSomething)
+{
+    EXPECT_THAT(run({"--format", "csv", capture(kcap(servingCell()))}).output,
+                AllOf(HasSubstr("/Measured RSRP,-98.25 dBm,-98.25,dBm\r\n"), HasSubstr("/P_Max,Not Present,,\r\n"),
+                      HasSubstr("/Version,0,0,\r\n"), HasSubstr("/Measurement Rules Updated,False,,\r\n")));
+}
+
+TEST_F(ProgramTest, JsonlHasNumbersAndUnitsWhenAsked)
+{
+    EXPECT_THAT(run({"--format", "jsonl", "--numbers", capture(kcap(servingCell()))}).output,
+                AllOf(HasSubstr(R"(/Measured RSRP":{"text":"-98.25 dBm","number":-98.25,"unit":"dBm"})"),
+                      HasSubstr(R"(/P_Max":"Not Present")"),
+                      HasSubstr(R"(/Version":{"text":"0","number":0,"unit":""})")));
+}
+
+TEST_F(ProgramTest, NumbersGoWithJsonlAlone)
+{
+    const auto ran = run({"--format", "csv", "--numbers", capture(kcap(servingCell()))});
+    EXPECT_EQ(ran.status, 2);
+    EXPECT_THAT(ran.remarks, HasSubstr("--numbers: goes with --format jsonl alone"));
 }
 
 TEST_F(ProgramTest, StandardInputIsReadAsWhatItHolds)
@@ -341,10 +373,10 @@ TEST_F(ProgramTest, CsvGuardsFormulasAndLeavesNumbersAlone)
 {
     for (const auto* formula : {"=1+2", "+cmd", "-2+3", "-2 dBm+3", "@SUM(1)", "-"})
         EXPECT_THAT(run({"--format", "csv", capture(kcap(ifx(formula)))}).output,
-                    HasSubstr(",/Cell,'"s + formula + "\r\n"));
+                    HasSubstr(",/Cell,'"s + formula + ",,\r\n"));
     for (const auto* number : {"-98.25 dBm", "+2.50 dB", "-3", "-0.5 %", "4"})
         EXPECT_THAT(run({"--format", "csv", capture(kcap(ifx(number)))}).output,
-                    HasSubstr(",/Cell,"s + number + "\r\n"));
+                    HasSubstr(",/Cell,"s + number + ",,\r\n"));
 }
 
 TEST_F(ProgramTest, NamesOfFilesDoNothingToATerminal)

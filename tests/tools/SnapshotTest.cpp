@@ -208,7 +208,8 @@ TEST_F(SnapshotFile, IsListedBeforeItsDisplay)
                                                "  Entry 1: DLF binary (21 bytes); date (none); DLF, 21 bytes\n"
                                                "\nServing Cell\n"));
     EXPECT_THAT(run({"--format", "json", file}).output, HasSubstr("\"timestamp\": \"2026-11-16 06:05:42 +0000\""));
-    EXPECT_THAT(run({"--format", "csv", file}).output, StartsWith("time,code,path,value\r\n2026-11-16T06:05:42"));
+    EXPECT_THAT(run({"--format", "csv", file}).output,
+                StartsWith("time,code,path,value,number,unit\r\n2026-11-16T06:05:42"));
 }
 
 TEST_F(SnapshotFile, IsExtracted)
