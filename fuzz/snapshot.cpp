@@ -14,6 +14,8 @@
 namespace kestrum::fuzz {
 namespace {
 
+using namespace tools;
+
 PropertyListCodec kCodec;
 
 /// What a person is shown of it, and its messages; nothing where it is refused.

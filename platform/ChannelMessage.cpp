@@ -1,16 +1,11 @@
 #include "platform/ChannelMessage.h"
 
-#include "platform/TelephonyService.h"
-
 namespace kestrum {
 namespace {
 
 constexpr Field kType = u8(0);
 constexpr Field kCode = u16(3);
 constexpr std::size_t kTimeStamp = 5;
-
-/// The record that opens a DLF stream tells who wrote it, whatever the modem.
-constexpr LogCode kDlfVersionReport = 0x1FFD;
 
 } // namespace
 
@@ -43,30 +38,6 @@ bool isPropertyList(Bytes message)
         text.remove_prefix(3);
     const auto begin = text.find_first_not_of(" \t\r\n");
     return begin != text.npos && (text[begin] == '<' || text.starts_with("bplist"));
-}
-
-std::optional<std::string_view> technologyOf(Bytes message)
-{
-    const auto record = channelRecord(message);
-    if (!record)
-        return isPropertyList(message) ? std::optional(kVoxLogChannelTechnology_IFX) : std::nullopt;
-    if (record->code == kDlfVersionReport)
-        return std::nullopt;
-    // The first hexadecimal digit is the part of the modem that logs.
-    switch (record->code >> 12) {
-    case 0x1:
-        return kVoxLogChannelTechnology_Zephra_CDMA;
-    case 0x4:
-    case 0x5:
-    case 0x7:
-        return kVoxLogChannelTechnology_Zephra_GSM;
-    case 0xB:
-        return kVoxLogChannelTechnology_Zephra_LTE;
-    case 0xD:
-        return kVoxLogChannelTechnology_Zephra_UTRAN2;
-    default:
-        return std::nullopt;
-    }
 }
 
 } // namespace kestrum

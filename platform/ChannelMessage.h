@@ -4,7 +4,6 @@
 
 #include <cstdint>
 #include <optional>
-#include <string_view>
 
 namespace kestrum {
 
@@ -47,8 +46,5 @@ std::optional<ChannelRecord> channelRecord(Bytes message);
 
 /// Whether the message looks like a property list (XML or binary), as an IFX modem sends them.
 bool isPropertyList(Bytes message);
-
-/// The technology (kVoxLogChannelTechnology_...) that alone has such messages; nothing for what several may send.
-std::optional<std::string_view> technologyOf(Bytes message);
 
 } // namespace kestrum

@@ -1,6 +1,6 @@
 #include "tools/Changes.h"
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 void appendStep(std::string& pointer, std::string_view step)
@@ -116,4 +116,4 @@ void Changes::report(const Value& value)
     _onChange(_pointer, value);
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

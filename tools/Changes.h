@@ -7,7 +7,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 /// Reports which values of a display changed since the last look. It walks the display side by side with a copy of the
 /// last one and builds paths only of changes, so that it is fast enough to look after every message.
@@ -40,4 +40,4 @@ private:
     std::string _pointer;
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

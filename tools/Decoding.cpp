@@ -1,5 +1,6 @@
 #include "tools/Decoding.h"
 
+#include "capture/Technology.h"
 #include "platform/ChannelMessage.h"
 #include "platform/Clock.h"
 #include "platform/PropertyLists.h"
@@ -10,7 +11,7 @@
 #include <stdexcept>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 // Messages before the first that shows the technology cannot be decoded yet.
@@ -222,4 +223,4 @@ void Decoding::endInterval()
     _inInterval = 0;
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

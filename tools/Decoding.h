@@ -17,7 +17,7 @@
 #include <string_view>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 /// What has become of the messages of one log code. Each is counted once: decoded, or under one of the others.
 struct Tally {
@@ -98,4 +98,4 @@ private:
     Statistics _statistics;
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -5,7 +5,7 @@
 #include <filesystem>
 #include <stdexcept>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 constexpr const char *kKcap = ".kcap", *kDlf = ".dlf", *kWritten = "-written.dlf";
@@ -65,4 +65,4 @@ void Extraction::finish()
             throw std::runtime_error("not extracted, for there is already " + path);
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

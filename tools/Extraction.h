@@ -10,7 +10,7 @@
 #include <utility>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 /// Files made of a snapshot, named after it: the DLF stream as it was written ("-written.dlf"), and what was recovered
 /// of it as a clean ".dlf" and ".kcap". All of them, or none.
@@ -38,4 +38,4 @@ private:
     std::uint64_t _inKcapAlone = 0;
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

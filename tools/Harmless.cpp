@@ -3,7 +3,7 @@
 #include "support/Format.h"
 #include "support/Utf8.h"
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 // Unicode's bidirectional controls let a text stand in another order than it is read in.
@@ -52,4 +52,4 @@ std::string onLines(std::string_view raw)
     }
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

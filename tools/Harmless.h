@@ -3,7 +3,7 @@
 #include <string>
 #include <string_view>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 /// A text that is safe to show on a terminal, on one line: control characters, characters that change the writing
 /// direction, and bytes that are no UTF-8 become \xnn.
@@ -12,4 +12,4 @@ std::string onOneLine(std::string_view raw);
 /// The same, but line ends stay.
 std::string onLines(std::string_view raw);
 
-} // namespace kestrum
+} // namespace kestrum::tools

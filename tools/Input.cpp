@@ -11,7 +11,7 @@
 #include <unistd.h>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 [[noreturn]] void fail(const std::string& what)
@@ -126,4 +126,4 @@ Input::Woken Input::whatChanged()
     return Woken::Restarted;
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -7,7 +7,7 @@
 #include <span>
 #include <string>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 /// A file that is read from beginning to end and, where it is followed, further as it grows.
 class Input {
@@ -41,4 +41,4 @@ private:
     std::uint64_t _read = 0;
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

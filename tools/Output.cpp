@@ -13,7 +13,7 @@
 #include <cstdio>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 using Json = nlohmann::ordered_json;
@@ -383,4 +383,4 @@ std::unique_ptr<Output> Output::make(OutputFormat format, Contents contents, Out
     return std::make_unique<TreeOutput>(contents, data, remarks);
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

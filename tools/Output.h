@@ -10,7 +10,7 @@
 #include <string>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 enum class OutputFormat { Tree, Json, Jsonl, Csv };
 
@@ -34,4 +34,4 @@ public:
     static std::unique_ptr<Output> make(OutputFormat format, Contents contents, OutputFile& data, OutputFile& remarks);
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

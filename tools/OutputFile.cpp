@@ -6,7 +6,7 @@
 #include <system_error>
 #include <unistd.h>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 constexpr std::size_t kPiece = 64 << 10;
@@ -49,4 +49,4 @@ void OutputFile::flush()
     _held.clear();
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -4,7 +4,7 @@
 #include <string>
 #include <string_view>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 /// The reader of our output has closed it: the rest is not wanted.
 struct ClosedPipe {};
@@ -34,4 +34,4 @@ private:
     std::string _held;
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

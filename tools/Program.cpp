@@ -16,7 +16,7 @@
 #include <stdexcept>
 #include <unistd.h>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 using Existing = WholeFile::Existing;
@@ -302,4 +302,4 @@ int decodeFiles(const DecodeOptions& options, Bundle& bundle)
     return Program(options, bundle).run();
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

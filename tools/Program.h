@@ -6,8 +6,10 @@
 #include <vector>
 
 namespace kestrum {
-
 class Bundle;
+}
+
+namespace kestrum::tools {
 
 /// What the command line asks for.
 struct DecodeOptions {
@@ -23,4 +25,4 @@ struct DecodeOptions {
 /// status: 0, or 1 when there was bad input, whose good parts are shown all the same.
 int decodeFiles(const DecodeOptions& options, Bundle& bundle);
 
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -10,7 +10,7 @@
 #include <stdexcept>
 #include <utility>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 constexpr LogCode kVersionReport = 0x1FFD;
@@ -168,4 +168,4 @@ void Snapshot::read(Bytes bytes, std::uint64_t from, RecordReader::Origin origin
         take(*message);
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools

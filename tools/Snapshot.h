@@ -12,8 +12,10 @@
 #include <vector>
 
 namespace kestrum {
-
 class PropertyLists;
+}
+
+namespace kestrum::tools {
 
 /// What a snapshot file holds, as it says itself.
 struct SnapshotListing {
@@ -59,4 +61,4 @@ private:
     CaptureReader::OnFault _onFault;
 };
 
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -12,6 +12,7 @@
 namespace {
 
 using namespace kestrum;
+using namespace kestrum::tools;
 
 constexpr int kFailed = 1, kUsageError = 2;
 

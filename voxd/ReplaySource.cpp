@@ -1,5 +1,6 @@
 #include "voxd/ReplaySource.h"
 
+#include "capture/Technology.h"
 #include "platform/ChannelMessage.h"
 #include "support/Date.h"
 #include "support/Format.h"

@@ -1,3 +1,4 @@
+#include "capture/Technology.h"
 #include "platform/ChannelMessage.h"
 #include "platform/TelephonyService.h"
 

@@ -5,7 +5,7 @@
 #include <algorithm>
 #include <filesystem>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 std::vector<std::string> captures()
@@ -49,4 +49,4 @@ TEST(Captures, AreThereForEveryTechnology)
 }
 
 } // namespace
-} // namespace kestrum
+} // namespace kestrum::tools

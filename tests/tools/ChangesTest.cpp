@@ -3,7 +3,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 using testing::ElementsAre;
@@ -67,4 +67,4 @@ TEST_F(ChangesTest, TakesADisplayThatIsOneText)
 }
 
 } // namespace
-} // namespace kestrum
+} // namespace kestrum::tools

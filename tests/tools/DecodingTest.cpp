@@ -10,7 +10,7 @@
 
 #include <stdexcept>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 class DecodingTest : public testing::Test {
@@ -108,4 +108,4 @@ TEST_F(DecodingTest, CountsEachMessageOnce)
 }
 
 } // namespace
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -10,7 +10,7 @@
 #include <filesystem>
 #include <sys/resource.h>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 using namespace std::string_literals;
@@ -441,4 +441,4 @@ TEST_F(ProgramTest, MemoryDoesNotGrowWithTheCapture)
 }
 
 } // namespace
-} // namespace kestrum
+} // namespace kestrum::tools

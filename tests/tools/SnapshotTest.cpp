@@ -13,7 +13,7 @@
 
 #include <filesystem>
 
-namespace kestrum {
+namespace kestrum::tools {
 namespace {
 
 using namespace std::string_literals;
@@ -293,4 +293,4 @@ TEST_F(SnapshotFile, WithoutDataIsListedAlone)
 }
 
 } // namespace
-} // namespace kestrum
+} // namespace kestrum::tools

@@ -16,7 +16,7 @@
 #include <utility>
 #include <vector>
 
-namespace kestrum {
+namespace kestrum::tools {
 
 inline std::string contentsOf(const std::string& path)
 {
@@ -147,4 +147,4 @@ inline Ran run(std::vector<std::string> arguments, std::string_view input = {})
     return {tool.status(), std::move(output), std::move(remarks)};
 }
 
-} // namespace kestrum
+} // namespace kestrum::tools
