@@ -1,17 +1,10 @@
 #pragma once
 
-#include <exception>
 #include <stdexcept>
 #include <string>
 #include <utility>
 
 namespace kestrum {
-
-/// An element was asked for that its record does not count.
-class ArrayOutOfBoundsException : public std::exception {
-public:
-    const char* what() const noexcept override { return "ArrayOutOfBoundsException"; }
-};
 
 /// An internal inconsistency: where it was found, and what it is. `what()` tells it all.
 class AssertionFailure : public std::runtime_error {

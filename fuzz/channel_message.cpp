@@ -88,8 +88,6 @@ public:
             _generator->updateState(state, message);
         } catch (const LogCode_0xFF0000::UnknownDataException& failure) {
             log.lines.emplace_back(Priority::Error, failure.what());
-        } catch (const ArrayOutOfBoundsException& failure) {
-            log.lines.emplace_back(Priority::Error, failure.what());
         } catch (const AssertionFailure& failure) {
             log.lines.emplace_back(Priority::Error, failure.description());
         }

@@ -24,7 +24,7 @@ std::vector<std::string> recovered(const Value& list)
     std::vector<std::string> all;
     std::uint64_t faults = 0;
     try {
-        const Snapshot snapshot("file", list, [&](const Fault& fault) {
+        const Snapshot snapshot("file", list, [&](const CaptureFault& fault) {
             require(!fault.reason.empty(), "a fault without a reason");
             ++faults;
         });
