@@ -20,7 +20,7 @@ void require(bool condition, const char* what)
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {
-    const kestrum::PropertyListCodec codec;
+    kestrum::PropertyListCodec codec;
     const auto bytes = std::as_bytes(std::span(data, size));
     const auto read = codec.parseWithError(bytes);
     require(read.value.isNull() == !read.reason.empty(), "neither a value nor a reason");
