@@ -6,20 +6,18 @@
 namespace kestrum::bench {
 namespace {
 
+constexpr Row kCell[] = {
+    {u16(13), "ARFCN", decimalSigned32}, {u8(15), "BSIC", decimalSigned32},
+    {u8(16), "RxLev", decimal<signed8>}, {u16(17), "Cell ID", decimalUnsigned},
+    {u16(19), "LAC", decimalSigned32},   {u32(21).bits(3, 12), "Offset", decimalSigned32},
+};
+constexpr Layout kLayouts[] = {{.code = 0x5071, .minimumLength = 25, .rows = kCell}};
+static_assert(fits(kLayouts));
+constexpr SectionTraits kTraits{.name = "Cell", .layouts = kLayouts};
+
 class Cell final : public Base {
 public:
-    using Base::Base;
-    std::string_view getSectionName() const override { return "Cell"; }
-    std::vector<LogCode> getLogCodeArray() const override { return {0x5071}; }
-    void updateWithData(Record data, LogCode logCode) override
-    {
-        static constexpr Row kRows[] = {
-            {u16(13), "ARFCN", decimal},           {u8(15), "BSIC", decimal}, {u8(16), "RxLev", decimalSigned8},
-            {u16(17), "Cell ID", decimalUnsigned}, {u16(19), "LAC", decimal}, {u32(21).bits(3, 12), "Offset", decimal},
-        };
-        if (accepts(data, logCode, 0x5071, 25))
-            publish(data, kRows);
-    }
+    explicit Cell(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits) {}
 };
 
 class Index final : public ClassIndex {
