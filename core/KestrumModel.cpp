@@ -35,9 +35,9 @@ void KestrumModel::startMonitor()
         return;
     const auto self = shared_from_this();
     const auto failure = failureOfAttempt();
-    _problem = failure ? problemOfAttempt() : "";
+    _problem = failure ? problemOfAttempt() : std::nullopt;
     if (failure) {
-        logError(*failure);
+        logError(failure->text);
         destroyPorts();
         scheduleRetry();
     } else {
@@ -47,28 +47,30 @@ void KestrumModel::startMonitor()
     notify(&KestrumModelObserver::updateStatus);
 }
 
-std::optional<std::string> KestrumModel::failureOfAttempt()
+std::optional<Problem> KestrumModel::failureOfAttempt()
 {
     const ScopedFlag starting(_starting);
     if (!createPorts())
-        return "Could not create the ports necessary";
+        return Problem{"Could not create the ports necessary"};
     configureGenerator();
     if (!_logGenerator)
-        return "No log generator technology works";
+        return Problem{"No log generator technology works"};
     const auto command = _roles.propertyLists.toXml(_logGenerator->getStartCommand());
     if (!command)
-        return " Could not generate PLIST";
+        return Problem{" Could not generate PLIST"};
     const auto sent = send(command->bytes(), RemotePort::Reply::None);
     if (sent.status != 0)
-        return formatted(" ***** Could not send the START command (got error=%d)", sent.status);
+        return Problem{formatted(" ***** Could not send the START command (got error=%d)", sent.status)};
     return std::nullopt;
 }
 
-std::string KestrumModel::problemOfAttempt() const
+std::optional<Problem> KestrumModel::problemOfAttempt() const
 {
-    if (auto problem = _roles.telephony.problem(); !problem.empty())
+    if (auto problem = _roles.telephony.problem())
         return problem;
-    return _sendPort ? "The telephony service does not say which technology the modem runs." : "";
+    if (!_sendPort)
+        return std::nullopt;
+    return Problem{"The telephony service does not say which technology the modem runs."};
 }
 
 void KestrumModel::scheduleRetry()

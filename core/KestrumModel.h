@@ -5,6 +5,7 @@
 #include "platform/MessagePorts.h"
 #include "platform/Roles.h"
 #include "support/Bytes.h"
+#include "support/Problem.h"
 #include "support/Value.h"
 
 #include <cstdint>
@@ -55,8 +56,8 @@ public:
 
     /// The log channel is open in both directions.
     bool isConnected() const;
-    /// Why the last attempt to connect failed, in words for a person; empty when it did not.
-    const std::string& connectionProblem() const { return _problem; }
+    /// Why the last attempt to connect failed; nothing when it did not, or when there is nothing to say.
+    const std::optional<Problem>& connectionProblem() const { return _problem; }
     /// Log messages that the service has dropped because this display did not take them in time, since the start.
     std::uint64_t lostMessages() const { return _lostMessages; }
     /// The same in words for a person.
@@ -89,8 +90,8 @@ public:
 
 private:
     /// Why an attempt to start failed; nothing when it did not.
-    std::optional<std::string> failureOfAttempt();
-    std::string problemOfAttempt() const;
+    std::optional<Problem> failureOfAttempt();
+    std::optional<Problem> problemOfAttempt() const;
     void scheduleRetry();
 
     void handleMessage(std::int32_t messageId, Bytes payload);
@@ -116,7 +117,7 @@ private:
     KestrumModelNodeRef _nodes;
     std::optional<PathDictionary> _nodesByPath; ///< there when `_nodes` is
 
-    std::string _problem;
+    std::optional<Problem> _problem;
     std::uint64_t _lostMessages = 0;
     bool _lossPending = false; ///< the observer has not been told yet
     bool _starting = false;    ///< an attempt is on the stack

@@ -1,5 +1,7 @@
 #pragma once
 
+#include "support/Problem.h"
+
 #include <cstdint>
 #include <functional>
 #include <memory>
@@ -37,8 +39,8 @@ public:
     /// connection is destroyed; equal ones that wait there together arrive once.
     virtual std::unique_ptr<VoxServerConnection> connect(NotificationHandler handler) = 0;
 
-    /// Why the last connection or log channel could not be had, in words for a person; empty when it could.
-    virtual std::string problem() const { return {}; }
+    /// Why the last attempt to connect, or to create a log channel, failed; nothing when it did not.
+    virtual std::optional<Problem> problem() const { return {}; }
 };
 
 /// The service's baseband-state-report log channel; the local port that receives the log bears the same name.

@@ -8,6 +8,8 @@ namespace kestrum {
 /// nothing on success.
 struct Problem {
     std::string text;
+
+    friend bool operator==(const Problem&, const Problem&) = default;
 };
 
 } // namespace kestrum

@@ -2,11 +2,11 @@
 
 namespace kestrum {
 
-std::string connectionHint(std::string_view reason)
+std::string connectionHint(const std::optional<Problem>& problem)
 {
     std::string text = "Waiting for the telephony service.\n";
-    if (!reason.empty())
-        text.append(reason).append("\n");
+    if (problem)
+        text.append(problem->text).append("\n");
     return text + "To start a simulated one:\nvoxd --scenario lte";
 }
 

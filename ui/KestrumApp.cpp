@@ -153,7 +153,7 @@ void KestrumApp::followConnection()
         root.setHint("");
     } else if (!_unconnected) {
         _unconnected = _roles.queue.repeat(kConnectionPatience, [this, &root] {
-            root.setHint(connectionHint(_model ? _model->connectionProblem() : ""));
+            root.setHint(connectionHint(_model ? _model->connectionProblem() : std::nullopt));
         });
     }
 }

@@ -65,8 +65,8 @@ void TextDisplay::awaitData()
 {
     _patience = _roles.queue.repeat(kPatience, [this] {
         const auto& problem = _model->connectionProblem();
-        end(1, formatted("the telephony service sent nothing for %d s%s%s", kPatience.count(),
-                         problem.empty() ? "" : ": ", problem));
+        end(1, formatted("the telephony service sent nothing for %d s%s", kPatience.count(),
+                         problem ? ": " + problem->text : ""));
     });
 }
 

@@ -82,9 +82,9 @@ private:
     bool _held = false;
 };
 
-std::string ofPorts(const LinuxMessagePorts& ports)
+Problem ofPorts(const LinuxMessagePorts& ports)
 {
-    return formatted("This display cannot be reached: %s.", ports.problem().value_or(Problem()).text);
+    return {formatted("This display cannot be reached: %s.", ports.problem().value_or(Problem()).text)};
 }
 
 std::string inWords(const LogChannelAnswer& answer)
@@ -193,7 +193,7 @@ struct Link {
 
 class SocketServerConnection final : public VoxServerConnection {
 public:
-    SocketServerConnection(std::shared_ptr<Link> link, const LinuxMessagePorts& ports, std::string& problem)
+    SocketServerConnection(std::shared_ptr<Link> link, const LinuxMessagePorts& ports, std::optional<Problem>& problem)
         : _link(std::move(link)), _ports(ports), _problem(problem)
     {}
     ~SocketServerConnection() override { _link->close(); }
@@ -209,14 +209,14 @@ public:
         const auto link = _link;
         auto& problem = _problem;
         auto answer = link->request(vox::addressOfPort(serviceName, ::getpid()));
-        problem = answer.errorCode == 0 ? "" : inWords(answer);
+        problem = answer.errorCode == 0 ? std::nullopt : std::optional(Problem{inWords(answer)});
         return answer;
     }
 
 private:
     std::shared_ptr<Link> _link;
     const LinuxMessagePorts& _ports;
-    std::string& _problem;
+    std::optional<Problem>& _problem;
 };
 
 } // namespace
@@ -230,11 +230,11 @@ std::unique_ptr<VoxServerConnection> LinuxTelephonyService::connect(Notification
 {
     auto connection = FrameConnection::connectTo(_directory + "/" + std::string(vox::kServerPort), kTimeout, _log);
     if (!connection) {
-        _problem =
-            _ports.problem() ? ofPorts(_ports) : formatted("No telephony service can be reached in %s.", _directory);
+        _problem = _ports.problem() ? ofPorts(_ports)
+                                    : Problem{formatted("No telephony service can be reached in %s.", _directory)};
         return nullptr;
     }
-    _problem.clear();
+    _problem.reset();
     return std::make_unique<SocketServerConnection>(
         std::make_shared<Link>(std::move(connection), std::move(handler), _queue), _ports, _problem);
 }

@@ -18,14 +18,14 @@ public:
     LinuxTelephonyService(std::string directory, const LinuxMessagePorts& ports, MainQueue& queue, SystemLog& log);
 
     std::unique_ptr<VoxServerConnection> connect(NotificationHandler handler) override;
-    std::string problem() const override { return _problem; }
+    std::optional<Problem> problem() const override { return _problem; }
 
 private:
     std::string _directory;
     const LinuxMessagePorts& _ports;
     MainQueue& _queue;
     SystemLog& _log;
-    std::string _problem;
+    std::optional<Problem> _problem;
 };
 
 } // namespace kestrum

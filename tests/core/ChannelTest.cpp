@@ -362,22 +362,23 @@ TEST_F(Channel, IgnoresALossThatSaysNothingAndMessagesOfOtherIds)
 
 TEST_F(Channel, SaysWhyThereIsNoConnection)
 {
-    EXPECT_EQ(model->connectionProblem(), "");
+    EXPECT_EQ(model->connectionProblem(), std::nullopt);
     ports.kill(kCommandPort);
     telephony.why = "No telephony service can be reached.";
     model->startMonitor();
-    EXPECT_EQ(model->connectionProblem(), "No telephony service can be reached.");
+    EXPECT_EQ(model->connectionProblem(), Problem{"No telephony service can be reached."});
 
     telephony.why.clear();
     serve();
     replyIs({});
     seconds(5);
-    EXPECT_EQ(model->connectionProblem(), "The telephony service does not say which technology the modem runs.");
+    EXPECT_EQ(model->connectionProblem(),
+              Problem{"The telephony service does not say which technology the modem runs."});
 
     modemRuns("kVoxLogChannelTechnology_IFX");
     seconds(5);
     EXPECT_TRUE(model->isConnected());
-    EXPECT_EQ(model->connectionProblem(), "");
+    EXPECT_EQ(model->connectionProblem(), std::nullopt);
 }
 
 } // namespace

@@ -227,7 +227,7 @@ public:
         return std::make_unique<Connection>(*this, std::move(end));
     }
 
-    std::string problem() const override { return why; }
+    std::optional<Problem> problem() const override { return why.empty() ? std::nullopt : std::optional(Problem{why}); }
 
     /// Tells all that are connected.
     void notify(const std::string& name)

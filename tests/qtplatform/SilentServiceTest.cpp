@@ -42,7 +42,7 @@ TEST_F(SilentService, LeavesTheMainLoopTurning)
     model->startMonitor();
     EXPECT_GT(turns, 10);
     EXPECT_EQ(keys, 1);
-    EXPECT_EQ(model->connectionProblem(), "The telephony service does not answer.");
+    EXPECT_EQ(model->connectionProblem(), Problem{"The telephony service does not answer."});
     EXPECT_FALSE(ports.isListening(kLogPort));
 }
 

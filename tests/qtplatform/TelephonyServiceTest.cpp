@@ -294,7 +294,7 @@ TEST_F(TelephonyServiceTest, AsksForNoLogToAPortThatDoesNotListen)
 
 TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
 {
-    EXPECT_EQ(telephony.problem(), "");
+    EXPECT_EQ(telephony.problem(), std::nullopt);
     const auto refusedWith = [&](std::uint32_t code) {
         play([&](RawSocket& client) {
             client.receive(kRequestSize);
@@ -302,7 +302,7 @@ TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
         });
         telephony.connect({})->networkMonitorCreateLogChannel("log");
         played.join();
-        return telephony.problem();
+        return telephony.problem().value_or(Problem()).text;
     };
     EXPECT_EQ(refusedWith(2), "The telephony service has no channel left for this display.");
     EXPECT_EQ(refusedWith(3), "The telephony service cannot reach this display.");
@@ -310,7 +310,7 @@ TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
     EXPECT_EQ(refusedWith(0), "");
     listening.close();
     telephony.connect({});
-    EXPECT_EQ(telephony.problem(), "No telephony service can be reached in " + directory.path() + ".");
+    EXPECT_EQ(telephony.problem(), Problem{"No telephony service can be reached in " + directory.path() + "."});
 }
 
 TEST_F(TelephonyServiceTest, SaysThatTheReceivePortCouldNotBeMade)
@@ -318,7 +318,8 @@ TEST_F(TelephonyServiceTest, SaysThatTheReceivePortCouldNotBeMade)
     EXPECT_FALSE(ports.createLocal("log", [](auto, auto) {}));
     local.reset();
     telephony.connect({})->networkMonitorCreateLogChannel("log");
-    EXPECT_THAT(telephony.problem(), testing::StartsWith("This display cannot be reached: another process listens at"));
+    EXPECT_THAT(telephony.problem().value_or(Problem()).text,
+                testing::StartsWith("This display cannot be reached: another process listens at"));
 }
 
 TEST_F(TelephonyServiceTest, MayBeDestroyedWithinItsNotification)

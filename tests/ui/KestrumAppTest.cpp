@@ -222,10 +222,10 @@ TEST_F(KestrumAppTest, HintFollowsTheReasonThatIsKnown)
     doubles.telephony.why = "No telephony service can be reached in /run.";
     launch();
     doubles.queue.advance(10s);
-    EXPECT_EQ(top().hint, connectionHint("No telephony service can be reached in /run."));
+    EXPECT_EQ(top().hint, connectionHint(Problem{"No telephony service can be reached in /run."}));
     doubles.telephony.why = "The telephony service has no channel left for this display.";
     doubles.queue.advance(10s);
-    EXPECT_EQ(top().hint, connectionHint("The telephony service has no channel left for this display."));
+    EXPECT_EQ(top().hint, connectionHint(Problem{"The telephony service has no channel left for this display."}));
 }
 
 TEST_F(KestrumAppTest, LostMessagesAreToldInALineThatGoesAway)
@@ -244,7 +244,7 @@ TEST_F(KestrumAppTest, LostMessagesAreToldInALineThatGoesAway)
 TEST(ConnectionHintTest, SaysWhatIsMissingAndHowToStartIt)
 {
     EXPECT_EQ(connectionHint(), "Waiting for the telephony service.\nTo start a simulated one:\nvoxd --scenario lte");
-    EXPECT_EQ(connectionHint("It belongs to another user."),
+    EXPECT_EQ(connectionHint(Problem{"It belongs to another user."}),
               "Waiting for the telephony service.\nIt belongs to another user.\n"
               "To start a simulated one:\nvoxd --scenario lte");
 }
