@@ -4,8 +4,8 @@
 
 namespace kestrum::terminal {
 
-/// An empty card in the middle of the screen, at most as large as the screen, with a thin frame around it. Returns what is
-/// inside of it.
+/// Draws an empty card with a thin frame in the middle of the screen, at most as large as the screen. Returns the
+/// area inside the frame.
 Area drawBox(Screen& screen, int rows, int columns);
 
 } // namespace kestrum::terminal

@@ -8,7 +8,7 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kInset = 1; // columns, on either side of a row
+constexpr int kInset = 1; // columns, on both sides of a row
 
 int column(double points)
 {
@@ -97,7 +97,7 @@ void Subviews::setSideways(int columns)
 
 int TerminalScrollView::furthest() const
 {
-    // The content's width may reach further than its texts do: nobody wants to scroll into nothing.
+    // The content may be wider than its texts. Scrolling stops at the end of the text.
     if (_contentSize.width <= _frame.width)
         return 0;
     return std::max(0, std::min(_content.end(), column(_contentSize.width)) - column(_frame.width));

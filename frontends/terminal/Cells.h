@@ -9,20 +9,20 @@
 #include <string>
 #include <vector>
 
-/// What the rows of a table are made of. A row takes one line whatever its height in points, so only the x of a frame
-/// matters. A column is 10 points wide: the cells' inset is one column then, their gap between key and value five.
+/// The views of a table's row. A row takes one line whatever its height in points, so only the x of a frame matters.
+/// A column is 10 points wide: the inset of a cell is one column, the gap between key and value five.
 namespace kestrum::terminal {
 
 inline constexpr double kPointsPerColumn = 10, kPointsPerLine = 20;
 
-/// What can show itself on a line.
+/// A view that can draw itself on a line.
 class Drawn {
 public:
     virtual ~Drawn() = default;
     virtual void draw(const Line& line) const = 0;
     virtual int end() const = 0;                 ///< the column after its content
     virtual const std::string* name() const = 0; ///< the first text in it
-    virtual int sideways() const = 0;            ///< the columns by which it is moved to the left
+    virtual int sideways() const = 0;            ///< the columns by which it is scrolled to the left
     virtual void setSideways(int columns) = 0;
 };
 
@@ -43,7 +43,7 @@ public:
 
 private:
     Rect _frame;
-    std::optional<std::string> _text; // its beginning, where it is longer than anybody scrolls
+    std::optional<std::string> _text; // its beginning, where it is longer than users scroll
     int _columns = 0;                 // of the text
     Font _font = systemFont(15);
 };
@@ -60,7 +60,7 @@ public:
 
 private:
     std::vector<std::shared_ptr<View>> _views;
-    std::vector<Drawn*> _drawn; // the same
+    std::vector<Drawn*> _drawn; // the same views, as Drawn
 };
 
 class TerminalScrollView final : public ScrollView, public Drawn {
@@ -82,7 +82,7 @@ private:
     Rect _frame;
     Size _contentSize;
     Subviews _content;
-    int _scrolled = 0; // columns; held to what there is when it is used
+    int _scrolled = 0; // columns; limited to the content's width when it is used
 };
 
 class TerminalCell final : public TableCell {

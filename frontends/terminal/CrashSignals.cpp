@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <unistd.h>
 
-// The second header names macros like `columns`.
+// curses.h defines macros like `columns`, so it comes second.
 #include <curses.h>
 #include <term.h>
 
@@ -16,12 +16,13 @@ namespace {
 
 constexpr std::array kSignals = {SIGSEGV, SIGABRT, SIGBUS, SIGFPE, SIGILL};
 
-// All that the handler needs is ready before it runs: in a crash neither memory nor the terminal library can be trusted.
+// The handler uses only what was prepared before: in a crash neither memory nor the terminal library can be trusted.
 termios modes;
 std::array<char, 512> farewell;
 std::size_t farewellBytes = 0;
 std::array<struct sigaction, kSignals.size()> before;
-alignas(std::max_align_t) std::array<std::byte, 64 << 10> stack; // of the handler: the program's may have run over
+// for the handler: the program's stack may have overflowed
+alignas(std::max_align_t) std::array<std::byte, 64 << 10> stack;
 
 void giveBack(int signal)
 {
@@ -29,10 +30,10 @@ void giveBack(int signal)
     [[maybe_unused]] const auto written = write(STDOUT_FILENO, farewell.data(), farewellBytes);
     for (std::size_t i = 0; i < kSignals.size(); ++i)
         sigaction(kSignals[i], &before[i], nullptr);
-    raise(signal); // it waits until this handler returns, and then does what it did before
+    raise(signal); // pending until this handler returns; then the signal has its default effect
 }
 
-// The library's own mark of a capability that is no string is -1.
+// The library marks a capability that is not a string by -1.
 bool isText(const char* capability)
 {
     return capability != nullptr && reinterpret_cast<std::intptr_t>(capability) != -1;
@@ -49,7 +50,7 @@ void add(const char* capability)
     });
 }
 
-// As the terminal library does when it closes the screen.
+// The same steps as the terminal library's when it closes the screen.
 void composeFarewell()
 {
     farewellBytes = 0;

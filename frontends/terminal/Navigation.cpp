@@ -73,7 +73,7 @@ const SaveItem* TerminalTableScreen::saveItem() const
 
 void TerminalNavigationView::show(TableScreen& pane, std::vector<std::string> titles, Transition, bool)
 {
-    // All panes come from the same toolkit. A terminal has no transitions: the pane is there at once.
+    // All panes come from the same toolkit, so the cast is safe. A terminal shows no transitions.
     _pane = static_cast<TerminalTableScreen*>(&pane);
     _jump.reset();
     setTitles(std::move(titles));
@@ -177,7 +177,7 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
 {
     if (!_pane)
         return;
-    // What matters most comes first, and what finds no room beside the status is left out from the end.
+    // The most important hints come first. Hints without room beside the status are omitted, from the end.
     _hints.clear();
     if (_pane->saveItem())
         _hints.push_back({L's', "s save"});
@@ -188,7 +188,7 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
     std::size_t kept = 0;
     for (; kept < _hints.size() && columns(_hints[kept].text) + kGap <= room; ++kept)
         room -= columns(_hints[kept].text) + kGap;
-    // Save is never left out: the status gives way.
+    // Save is always shown; the status is shortened for it.
     if (_pane->saveItem())
         kept = std::max<std::size_t>(kept, 1);
     _hints.resize(kept);
@@ -226,7 +226,7 @@ void TerminalNavigationView::handle(const Input& input)
     if (_save)
         _save->handle(input);
     else if (_helpShown)
-        _helpShown = input.key == Key::Release || input.key == Key::Other; // anything typed or pressed closes it
+        _helpShown = input.key == Key::Release || input.key == Key::Other; // any key or mouse press closes it
     else if (_jump)
         handleJump(input);
     else if (_pane)
@@ -277,7 +277,7 @@ void TerminalNavigationView::handlePane(const Input& input)
         return;
     case Key::Press:
         if (input.row == 0)
-            _delegate.backRequested(); // the title line is the back button
+            _delegate.backRequested(); // the title line works as the back button
         else if (input.row == _bottom && !_toolbarHidden)
             for (const auto& each : std::vector(_hints)) {
                 if (input.column >= each.column && input.column < each.column + columns(each.text))
@@ -328,7 +328,7 @@ void TerminalNavigationView::handleCommand(wchar_t key)
             table.choose(_lastJump, table.chosen() + 1);
         return;
     case L's':
-        // A copy: the action may replace the toolbar that holds it.
+        // A copy, because the action may replace the toolbar that holds it.
         if (const auto* save = _pane->saveItem()) {
             const auto action = save->action;
             action();

@@ -18,7 +18,7 @@
 
 namespace kestrum::terminal {
 
-/// A pane: rows, and what stands in the bottom line.
+/// A pane: rows, and the contents of the bottom line.
 class TerminalTableScreen final : public TableScreen {
 public:
     TerminalTableScreen(TableDataSource& source, Repaint& repaint) : _table(source, repaint), _repaint(repaint) {}
@@ -27,7 +27,7 @@ public:
     void setTitle(std::string_view title) override { _title = title; }
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool animated) override;
-    void resignFirstResponder() override {} // nothing in a pane is typed into
+    void resignFirstResponder() override {} // a pane has no text field
     void setHint(std::string_view text) override;
 
     bool isSpinning() const;
@@ -42,8 +42,8 @@ private:
     std::vector<ToolbarItem> _items;
 };
 
-/// The whole screen: the path in the title line, the pane's rows, the toolbar in the bottom line; over them the save
-/// screen, the help, or the name to jump to.
+/// The whole screen: the path in the title line, the pane's rows, the toolbar in the bottom line. The save screen,
+/// the help or the search field is drawn over them.
 class TerminalNavigationView final : public NavigationView {
 public:
     TerminalNavigationView(NavigationViewDelegate& delegate, Repaint& repaint, std::function<void()> quit)
@@ -57,13 +57,13 @@ public:
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 
-    /// `spinner` is the indicator's present picture. `inBackground`: something else takes the input.
+    /// `spinner` is the current picture of the activity indicator. `inBackground`: another part takes the input.
     void draw(Screen& screen, std::string_view spinner, bool inBackground);
     void handle(const Input& input);
     bool isSpinning() const { return _pane && _pane->isSpinning(); }
 
 private:
-    /// A key that the bottom line names, and where, so that it can be clicked as well.
+    /// A key that the bottom line names, and its position for the mouse.
     struct Hint {
         wchar_t key;
         std::string text;
@@ -89,10 +89,10 @@ private:
     std::vector<Hint> _hints;
     int _bottom = 0; // the toolbar's line
 
-    /// While a name is typed to jump to.
+    /// The search for a row while the user types its name.
     struct Jump {
         EditedLine name;
-        TerminalTable::Place from; // the row chosen before
+        TerminalTable::Place from; // the row that was chosen before
         bool found = true;
     };
     std::optional<Jump> _jump;

@@ -2,11 +2,11 @@
 
 namespace kestrum::terminal {
 
-/// Whoever shows something else than before asks for the screen to be drawn anew.
+/// Requests a redraw of the screen. Call it after a change to what is shown.
 class Repaint {
 public:
     virtual ~Repaint() = default;
-    /// Draws everything once, when the main loop comes round to it, however often it was asked.
+    /// Draws everything in the next round of the main loop, once however many requests were made.
     virtual void repaintLater() = 0;
 };
 

@@ -19,7 +19,7 @@ int TerminalTextField::draw(const Line& line, bool focused) const
         line.put(0, kDescriptionPlaceholder, {.dim = true, .underlined = true});
         return 0;
     }
-    // Before the cursor everything is shown that fits.
+    // Shows as much text before the cursor as fits.
     const int cursor = columns(_line.beforeCursor());
     const int scrolled = std::max(0, cursor - line.width() + 1);
     const auto text = line.part(0, line.width(), scrolled);
@@ -30,7 +30,7 @@ int TerminalTextField::draw(const Line& line, bool focused) const
 
 TerminalSaveInterface::TerminalSaveInterface(SaveInterfaceOwner& owner, Repaint& repaint)
     : _owner(owner), _repaint(repaint), _table(owner, repaint), _description([this] {
-          // As on a touch screen the keyboard closes; here it goes on to what is pressed next.
+          // A touch screen closes its keyboard here. On a terminal the focus moves to the next control.
           if (_focus == Focus::Description)
               focus(Focus::Save);
       })

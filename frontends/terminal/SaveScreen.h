@@ -21,7 +21,7 @@ public:
     void resignFirstResponder() override { _resigned(); }
 
     bool handle(const Input& input) { return _line.handle(input); }
-    /// Returns the column of the cursor within the line.
+    /// Draws the field and returns the cursor's column within the line.
     int draw(const Line& line, bool focused) const;
 
 private:
@@ -29,14 +29,15 @@ private:
     std::function<void()> _resigned;
 };
 
-/// The save screen: the description, the list of what is saved, Save and Cancel. Tab and the arrows go round them.
+/// The save screen: the description, the list of what is saved, Save and Cancel. Tab and the arrow keys move between
+/// them.
 class TerminalSaveInterface final : public SaveInterface {
 public:
     TerminalSaveInterface(SaveInterfaceOwner& owner, Repaint& repaint);
 
     TableView& saveContentTable() override { return _table; }
     TextField& saveDescription() override { return _description; }
-    void setFrame(Rect) override {} // it has the whole screen, whatever its size becomes
+    void setFrame(Rect) override {} // it always has the whole screen
 
     void draw(Screen& screen);
     void handle(const Input& input);
@@ -56,7 +57,7 @@ private:
     TerminalTable _table;
     TerminalTextField _description;
     Focus _focus = Focus::Description;
-    Area _descriptionArea, _saveArea, _cancelArea, _tableArea; // as last drawn, for the mouse
+    Area _descriptionArea, _saveArea, _cancelArea, _tableArea; // as drawn last, for the mouse
 };
 
 } // namespace kestrum::terminal

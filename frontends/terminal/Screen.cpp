@@ -1,6 +1,6 @@
 #include "frontends/terminal/Screen.h"
 
-#define NCURSES_NOMACROS // `clear`, `move` and `timeout` would be macros otherwise
+#define NCURSES_NOMACROS // without it `clear`, `move` and `timeout` would be macros
 #include <curses.h>
 
 #include <algorithm>
@@ -14,9 +14,9 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kEscapeDelay = 25; // ms in which the rest of a key's sequence must follow its ESC
+constexpr int kEscapeDelay = 25; // ms; the rest of a key's sequence must follow its ESC within this time
 
-// What a terminal without Unicode shows for the program's own marks; '?' for everything else.
+// The replacement of the program's marks on a terminal without Unicode; '?' for all other characters.
 wchar_t asciiFor(wchar_t c)
 {
     constexpr std::wstring_view kMarks = L"›…✓─│╭╮╰╯⠋⠙⠹⠸⠼⠴⠦⠧⠇⠏", kAscii = L">~*-|++++|/-\\|/-\\|/";
@@ -107,7 +107,7 @@ void Screen::open()
 {
     if (_open)
         return;
-    // A library that complains would write across the rows.
+    // Messages of libraries on standard error would overwrite the rows.
     if (isatty(STDERR_FILENO)) {
         _standardError = fcntl(STDERR_FILENO, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
         const int nowhere = ::open("/dev/null", O_WRONLY | O_CLOEXEC);
@@ -130,7 +130,7 @@ void Screen::open()
         init_pair(static_cast<short>(Colour::Accent), COLOR_CYAN, -1);
         init_pair(static_cast<short>(Colour::Danger), COLOR_RED, -1);
     }
-    // A press counts at once: waiting for a double click would delay it.
+    // A press counts at once: a wait for a double click would delay it.
     mouseinterval(0);
     mousemask(BUTTON1_PRESSED | BUTTON1_RELEASED | BUTTON4_PRESSED | BUTTON5_PRESSED, nullptr);
     _crashSignals.emplace(before);
@@ -164,7 +164,7 @@ void Screen::resume()
     _suspended = false;
     if (!_open)
         return;
-    // After a stop that left no time to hand the terminal over, the shell has changed its modes all the same.
+    // If the stop left no time to hand over the terminal, the shell has changed its modes nevertheless.
     if (!isendwin())
         endwin();
     resize();
@@ -229,7 +229,7 @@ void Screen::put(int row, int column, const Glyph& glyph, Style style)
 
 void Screen::placeCursor(int row, int column, bool visible)
 {
-    // Readers and braille lines follow the cursor, the hidden one too.
+    // Screen readers and braille lines follow the cursor, even the hidden one.
     _cursor = {row, column, visible};
 }
 
@@ -255,12 +255,12 @@ std::optional<Input> Screen::read()
     switch (wget_wch(stdscr, &code)) {
     case OK:
         if (code == ('L' & 0x1F))
-            clearok(curscr, TRUE); // Ctrl-L: whatever another program wrote onto the screen goes
+            clearok(curscr, TRUE); // Ctrl-L: removes what another program wrote to the screen
         return Input{keyOfCharacter(code), static_cast<wchar_t>(code)};
     case KEY_CODE_YES:
         if (code != KEY_MOUSE)
             return Input{keyOf(code)};
-        // Several movements can come with one key, the last one first.
+        // One key can carry several mouse events, the last one first.
         for (MEVENT event; getmouse(&event) == OK;)
             _mouse.push_back(inputOf(event));
         return _mouse.empty() ? Input{Key::Other} : read();
@@ -297,7 +297,7 @@ void Line::put(int column, const Glyph& glyph, Style style) const
         style = {.bold = style.bold, .reverse = true};
     if (column >= _first && column + glyph.columns <= _end)
         _screen.put(_row, column, glyph, style);
-    else // half of a wide character
+    else // the second half of a wide character
         for (int each = std::max(column, _first); each < std::min(column + glyph.columns, _end); ++each)
             _screen.put(_row, each, {L" ", 1}, style);
 }

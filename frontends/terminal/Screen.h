@@ -11,7 +11,7 @@
 
 namespace kestrum::terminal {
 
-/// Of the terminal's own palette.
+/// Colours of the terminal's palette.
 enum class Colour { Plain, Accent, Danger };
 
 struct Style {
@@ -19,7 +19,7 @@ struct Style {
     Colour colour = Colour::Plain;
 };
 
-/// Rows and bars keep to a column of at most this width: a value far from its key is hard to read.
+/// The maximum width of rows and bars: on a wider row the value is too far from its key to read them together.
 inline constexpr int kColumn = 80;
 
 /// A rectangle of the screen, in cells.
@@ -65,8 +65,8 @@ struct Input {
     bool is(wchar_t c) const { return key == Key::Character && character == c; }
 };
 
-/// The terminal as a screen of cells. What is put on it becomes visible with `show`, which sends the difference to what
-/// the terminal shows already, and nothing else.
+/// The terminal as a screen of cells. `show` makes the contents visible: it sends only the difference to what the
+/// terminal already shows.
 class Screen {
 public:
     explicit Screen(Charset charset) : _charset(charset) {}
@@ -74,29 +74,29 @@ public:
     Screen(const Screen&) = delete;
     Screen& operator=(const Screen&) = delete;
 
-    /// Why standard input and output cannot serve as a screen; nothing when they can.
+    /// The reason why standard input and output cannot serve as a screen; empty when they can.
     static std::optional<Problem> problem();
 
     void open();
-    void close(); ///< The terminal is as it was before `open`.
+    void close(); ///< Restores the terminal to its state before `open`.
     bool isOpen() const { return _open; }
 
     void suspend(); ///< gives the terminal to the shell
-    void resume();  ///< takes it back, in whatever state it is
+    void resume();  ///< takes the terminal back, in whatever state it is
     void resize();  ///< follows the terminal's size
 
     int rows() const;
     int columns() const;
 
     void clear();
-    void setDimmed(bool dimmed) { _dimmed = dimmed; } ///< What is put from now on is in the background.
+    void setDimmed(bool dimmed) { _dimmed = dimmed; } ///< Everything drawn from now on is dimmed.
     void put(int row, int column, const Glyph& glyph, Style style);
     void placeCursor(int row, int column, bool visible);
     void show();
 
-    /// What was typed; nothing when all has been read.
+    /// The next input; empty when all input was read.
     std::optional<Input> read();
-    bool hungUp() const; ///< The terminal is gone.
+    bool hungUp() const; ///< Whether the terminal is gone.
 
 private:
     Charset _charset;
@@ -105,29 +105,29 @@ private:
         int row = 0, column = 0;
         bool visible = false;
     } _cursor;
-    std::vector<Input> _mouse; // the last first
-    int _standardError = -1;   // where it went before the screen was opened
+    std::vector<Input> _mouse; // in reverse order
+    int _standardError = -1;   // the descriptor's target before the screen was opened
     std::optional<CrashSignals> _crashSignals;
 };
 
-/// A stretch of one line of the screen. What does not lie in it is not shown.
+/// A part of one line of the screen. Contents outside of it are not shown.
 class Line {
 public:
     Line(Screen& screen, int row, int column, int columns)
         : _screen(screen), _row(row), _first(column), _end(column + columns), _origin(column)
     {}
 
-    /// The stretch of `columns` from `column`, its content moved left by `scrolled`.
+    /// The part of `columns` columns from `column`, its content scrolled left by `scrolled`.
     Line part(int column, int columns, int scrolled = 0) const;
-    /// The same with everything in reverse video, as the chosen row is shown.
+    /// The same part in reverse video, for the chosen row.
     Line chosen() const;
 
     int width() const { return _end - _first; }
     int put(int column, std::string_view text,
-            Style style = {}) const; ///< the column after the text, as far as it can be seen
-    void putRight(std::string_view text, Style style = {}) const; ///< against the right edge
+            Style style = {}) const; ///< the column after the text, at most the end of the part
+    void putRight(std::string_view text, Style style = {}) const; ///< aligned to the right edge
     void fill(Style style = {}) const;
-    /// Marks the ends at which the content goes on.
+    /// Marks the ends where content is hidden.
     void markCut(bool left, bool right) const;
 
 private:

@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <unistd.h>
 
-// Apart from the rest of Screen: the second header names macros like `columns`.
+// Separate from Screen.cpp, because the second header defines macros like `columns`.
 #include <curses.h>
 #include <term.h>
 

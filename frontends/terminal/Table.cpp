@@ -11,7 +11,7 @@ constexpr std::ptrdiff_t kWheelRows = 3;
 constexpr int kSidewaysColumns = 8;
 constexpr auto kNowhere = static_cast<std::size_t>(-1);
 
-// Cells come from makeCell alone.
+// makeCell creates every cell, so the cast is safe.
 TerminalCell& terminalCell(ReusableCell& reusable)
 {
     return static_cast<TerminalCell&>(reusable.cell());
@@ -43,7 +43,7 @@ std::shared_ptr<ReusableCell> TerminalTable::cellFor(std::size_t row)
     if (_offered)
         terminalCell(*_offered).setColumns(_area.columns);
     auto cell = _source.cellForRowAtIndexPath(*this, {0, row});
-    // Its row now is of the other kind, which this cell cannot show: a new one can.
+    // The row now is of the other kind, which this cell cannot show. It needs a new cell.
     if (cell == _offered && terminalCell(*cell).accessory() != before) {
         _offered = nullptr;
         cell = _source.cellForRowAtIndexPath(*this, {0, row});
@@ -89,7 +89,8 @@ void TerminalTable::followChosen()
         return;
     for (const auto& each : _heirs)
         if (const auto row = find(each)) {
-            // Rows that come or go above it leave it on its line, unless the table shows its first row.
+            // When rows are added or removed above it, the chosen row keeps its line, unless the table shows its
+            // first row.
             if (top() > 0 && _chosen < top() + height())
                 _top = std::max(*row + _top, _chosen) - _chosen;
             _chosen = *row;
@@ -117,7 +118,8 @@ TerminalTable::Place TerminalTable::placeOf(std::size_t row)
 std::optional<std::size_t> TerminalTable::find(const Place& place)
 {
     for (std::size_t distance = 0; distance <= std::max(place.row, _rows); ++distance)
-        for (const auto row : {place.row + distance, place.row - distance}) // one below 0 is far beyond the last
+        // a row below 0 wraps to a number far beyond the last
+        for (const auto row : {place.row + distance, place.row - distance})
             if (row < _rows && nameOf(row) == place.name)
                 return row;
     return std::nullopt;
@@ -187,7 +189,7 @@ bool TerminalTable::handle(const Input& input)
         }
         return _pressed.has_value();
     case Key::Release: {
-        // A refresh may have put another row there.
+        // A refresh may have moved another row there.
         const auto pressed = std::exchange(_pressed, std::nullopt);
         const auto row = rowAt(input);
         return pressed && row < _rows && find(*pressed) == row && open(row);
@@ -199,7 +201,7 @@ bool TerminalTable::handle(const Input& input)
 
 bool TerminalTable::open(std::size_t row)
 {
-    load(); // a row that is gone since it was shown opens nothing
+    load(); // a row that was removed since it was shown opens nothing
     if (row >= _rows)
         return false;
     _source.didSelectRowAtIndexPath(*this, IndexPath{0, row});
@@ -262,7 +264,7 @@ void TerminalTable::move(std::ptrdiff_t rows)
 
 void TerminalTable::scroll(std::ptrdiff_t rows)
 {
-    _chosenInSight = false; // until a key asks for it
+    _chosenInSight = false; // until the next key
     const auto furthest = static_cast<std::ptrdiff_t>(_rows) - static_cast<std::ptrdiff_t>(height());
     const auto to = static_cast<std::ptrdiff_t>(top()) + rows;
     _top = static_cast<std::size_t>(std::clamp(to, std::ptrdiff_t{0}, std::max(furthest, std::ptrdiff_t{0})));

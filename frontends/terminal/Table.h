@@ -15,7 +15,7 @@
 
 namespace kestrum::terminal {
 
-/// Rows, one to a line, one of them chosen.
+/// A table with one row per line, one of them chosen.
 class TerminalTable final : public TableView {
 public:
     TerminalTable(TableDataSource& source, Repaint& repaint) : _source(source), _repaint(repaint) {}
@@ -23,31 +23,32 @@ public:
     void reloadData() override;
     std::shared_ptr<ReusableCell> dequeueReusableCell(std::string_view reuseIdentifier) override;
     std::unique_ptr<TableCell> makeCell(CellStyle style) override;
-    /// The chosen row stays: without it the keyboard would have no place in the table.
+    /// Kept chosen: without a chosen row the keyboard would have no position in the table.
     void deselectRow(IndexPath, bool) override {}
     void sizeToFit() override {} // it always has the screen's width
 
-    /// Brings rows and cells up to date for this area, and shows them.
+    /// Updates rows and cells for this area, and draws them.
     void draw(Screen& screen, Area area, bool focused);
 
-    /// The keys and the mouse of a list. False when the input is not for it.
+    /// Handles a list's keys and mouse actions. False when the input is another one.
     bool handle(const Input& input);
 
-    /// A row as the user knows it: by its name, and among rows of one name by its number.
+    /// A row as users know it: its name, and its number among rows of the same name.
     struct Place {
         std::size_t row;
         std::string name;
     };
 
-    /// Chooses the next row after `from`, round the end, in whose name `part` occurs. False when there is none.
+    /// Chooses the next row after `from` whose name contains `part`; continues at the top after the last row. False
+    /// when there is none.
     bool choose(std::string_view part, std::size_t from);
     void choose(std::size_t row);
     std::size_t chosen() const;
     Place placeOf(std::size_t row);
     std::optional<std::size_t> find(const Place& place); ///< the nearest row of that name
-    int chosenLine() const;                              ///< on the screen, as last drawn
+    int chosenLine() const;                              ///< line of the screen, as drawn last
     std::size_t rows() const { return _rows; }
-    std::string position() const; ///< "12/40" when not all rows are in sight
+    std::string position() const; ///< "12/40" when some rows are out of sight
 
 private:
     void load();
@@ -58,7 +59,7 @@ private:
     void move(std::ptrdiff_t rows);
     void scroll(std::ptrdiff_t rows);
     bool open(std::size_t row);
-    std::size_t rowAt(const Input& mouse) const; ///< behind the last row where there is none
+    std::size_t rowAt(const Input& mouse) const; ///< one past the last row when the mouse is on no row
     std::size_t top() const;
     std::size_t height() const { return static_cast<std::size_t>(_area.rows); }
 
@@ -66,18 +67,17 @@ private:
     Repaint& _repaint;
     Area _area;
     std::size_t _rows = 0;
-    // Where the user put them. They are held to the rows that there are only when they are used, so that rows which come
-    // back find them again.
+    // Set by the user. They are limited to the existing rows only at use, so that rows which come back restore them.
     std::size_t _chosen = 0, _top = 0;
-    std::vector<Place> _heirs; // the chosen row, and its neighbours: the first that a reload leaves is chosen then
+    std::vector<Place> _heirs; // the chosen row, then its neighbours; after a reload the first remaining one is chosen
     std::optional<Place> _pressed;
-    std::map<std::string, int> _sideways; // how far rows are moved, by name; not those at rest
+    std::map<std::string, int> _sideways; // columns by which rows are scrolled, by name; without zeros
     bool _loaded = false, _chosenInSight = true;
-    /// The rows in sight. A row keeps its cell, and no other row gets it: a leaf's value would be lost in the cell of a
-    /// row that opens.
+    /// The rows in sight. A row keeps its cell, and no other row gets it: the cell of a row that opens cannot show a
+    /// leaf's value.
     std::map<std::size_t, std::shared_ptr<ReusableCell>> _cells;
-    std::shared_ptr<ReusableCell> _offered; // to the data source, for the row it is asked for
-    std::shared_ptr<ReusableCell> _reader;  // in no row: names are read with it
+    std::shared_ptr<ReusableCell> _offered; // offered to the data source for the row that it is asked for
+    std::shared_ptr<ReusableCell> _reader;  // a cell outside the table, used to read names
 };
 
 } // namespace kestrum::terminal

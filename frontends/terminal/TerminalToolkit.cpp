@@ -90,7 +90,7 @@ struct TerminalToolkit::Parts final : Repaint {
         while (const auto input = screen.read()) {
             if (!root)
                 continue;
-            // Keys can come in one go: each one meets what the one before it has brought up.
+            // Several keys can arrive together: each one acts on the screen that the previous one has shown.
             if (repaint.isActive())
                 compose();
             if (!alerts.empty())
@@ -111,7 +111,7 @@ struct TerminalToolkit::Parts final : Repaint {
 
     void takeSignals()
     {
-        // Those that end the program come first: a stopped job is killed by SIGTERM and SIGCONT together.
+        // Ending signals come first: a stopped job is killed by SIGTERM and SIGCONT together.
         for (const int each : signals->taken())
             switch (each) {
             case SIGTSTP:
@@ -137,7 +137,7 @@ struct TerminalToolkit::Parts final : Repaint {
 
     void goOn()
     {
-        // Continued in the background, where the terminal is the shell's: wait to be brought back.
+        // Continued in the background, while the shell owns the terminal: wait for the foreground.
         if (tcgetpgrp(STDIN_FILENO) != getpgrp())
             return stop();
         screen.resume();
@@ -146,7 +146,7 @@ struct TerminalToolkit::Parts final : Repaint {
 
     void end()
     {
-        input.reset(); // a terminal that is gone would be readable for ever
+        input.reset(); // a closed terminal would stay readable
         ended = true;
         QCoreApplication::quit();
     }
@@ -163,7 +163,7 @@ struct TerminalToolkit::Parts final : Repaint {
 
 namespace {
 
-/// The screen while it shows the application.
+/// The screen as the application's window.
 class TerminalWindow final : public Window {
 public:
     TerminalWindow(Screen& screen, TerminalNavigationView*& root, Repaint& repaint)
@@ -207,7 +207,7 @@ Rect TerminalToolkit::mainScreenBounds() const
 
 Rect TerminalToolkit::mainScreenApplicationFrame() const
 {
-    return mainScreenBounds(); // no status bar here
+    return mainScreenBounds(); // a terminal has no status bar
 }
 
 Size TerminalToolkit::measure(std::string_view text, Font) const
@@ -254,9 +254,9 @@ void TerminalToolkit::showAlert(std::string_view title, std::string_view message
 int TerminalToolkit::run(ApplicationDelegate& application)
 {
     auto& parts = *_parts;
-    // Before the terminal library looks which ones are taken care of.
+    // Before the terminal library, which checks which signals already have a handler.
     parts.signals.emplace(std::vector{SIGTERM, SIGHUP, SIGINT, SIGQUIT, SIGTSTP, SIGCONT, SIGWINCH});
-    // Giving the terminal back must not stop a process that is in the background by then.
+    // A process in the background must not be stopped when it restores the terminal.
     std::signal(SIGTTOU, SIG_IGN);
     parts.signalled = std::make_unique<QSocketNotifier>(parts.signals->descriptor(), QSocketNotifier::Read);
     QObject::connect(parts.signalled.get(), &QSocketNotifier::activated, [&parts] { parts.takeSignals(); });

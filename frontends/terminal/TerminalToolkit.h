@@ -16,14 +16,14 @@
 
 namespace kestrum::terminal {
 
-/// The UI toolkit on a terminal: standard input and output. Its main loop is the QCoreApplication's, which must exist.
-/// One at a time.
+/// The UI toolkit on a terminal: standard input and output. Its main loop is the QCoreApplication's, which must
+/// exist. One at a time.
 class TerminalToolkit final : public Toolkit {
 public:
     explicit TerminalToolkit(Charset charset);
     ~TerminalToolkit() override;
 
-    /// Why there can be no screen here; nothing when there can.
+    /// The reason why the terminal cannot be used; empty when it can.
     static std::optional<Problem> problem();
 
     Rect mainScreenBounds() const override;
@@ -39,7 +39,7 @@ public:
 
     void showAlert(std::string_view title, std::string_view message, std::string_view button) override;
 
-    /// Ends with `q`, Ctrl-C, SIGTERM, SIGHUP, or when the terminal is gone; the terminal is then as it was before.
+    /// Ends with `q`, Ctrl-C, SIGTERM, SIGHUP, or when the terminal is gone. The terminal is then restored.
     int run(ApplicationDelegate& application) override;
 
 private:

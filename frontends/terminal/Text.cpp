@@ -18,11 +18,11 @@ namespace {
 
 constexpr const char* kLocaleVariables[] = {"LC_ALL", "LC_CTYPE", "LANG"};
 constexpr char32_t kReplacement = 0xFFFD;
-constexpr std::size_t kLongestGlyph = 5;     // characters; a cell of the terminal library holds no more
+constexpr std::size_t kLongestGlyph = 5;     // characters; the most that a cell of the terminal library holds
 constexpr std::size_t kLongestCharacter = 4; // bytes
 constexpr std::size_t kMostKept = 16 << 10;  // bytes
 
-// Embeddings, overrides and isolates (Unicode Standard Annex 9) would turn the rest of the line around.
+// Embeddings, overrides and isolates (Unicode Standard Annex 9) would reverse the rest of the line.
 bool turnsDirection(wchar_t c)
 {
     return c == 0x061C || c == 0x200E || c == 0x200F || (c >= 0x202A && c <= 0x202E) || (c >= 0x2066 && c <= 0x2069);
@@ -53,17 +53,17 @@ std::wstring folded(std::string_view text)
     return folded;
 }
 
-// Where the character begins in which `at` lies.
+// The start of the character that contains byte `at`.
 std::size_t characterAt(std::string_view text, std::size_t at)
 {
     const auto isInside = [&](std::size_t i) { return (static_cast<unsigned char>(text[i]) & 0xC0) == 0x80; };
     for (std::size_t back = 0; back < kLongestCharacter && back < at; ++back)
         if (!isInside(at - back))
             return at - back;
-    return at; // no UTF-8 anyway
+    return at; // not UTF-8
 }
 
-// The bytes of the text's beginning that stand in at most so many columns.
+// The number of bytes at the beginning of `text` that fit into `width` columns.
 std::size_t bytesIn(std::string_view text, int width)
 {
     Glyphs glyphs(text);
@@ -75,7 +75,7 @@ std::size_t bytesIn(std::string_view text, int width)
     return bytes;
 }
 
-// What stands in at most so many columns, a wide character less than they could hold.
+// A part of a text and its columns: the requested width, or one less if a wide character does not fit.
 struct Piece {
     std::wstring text;
     int columns = 0;
@@ -86,7 +86,7 @@ Piece last(std::string_view text, int width)
     Piece piece;
     if (width <= 0)
         return piece;
-    // All glyphs that may fit, and one more that the cut may have gone through.
+    // All glyphs that may fit, and one more because the cut may split the last one.
     const auto bytes = kLongestGlyph * kLongestCharacter * static_cast<std::size_t>(width + 1);
     Glyphs glyphs(bytes < text.size() ? text.substr(characterAt(text, text.size() - bytes)) : text);
     std::vector<Glyph> all;
@@ -110,7 +110,7 @@ bool fits(std::string_view text, int width)
     return false;
 }
 
-// `back` columns at most are kept of the end.
+// Keeps at most `back` columns of the end.
 std::string cut(std::string_view text, int width, int back)
 {
     if (fits(text, width))
@@ -156,9 +156,10 @@ std::optional<Glyph> Glyphs::next()
         return std::nullopt;
     const wchar_t c = shownAt(_read);
     const int width = wcwidth(c);
-    // A mark with nothing before it stands on a dotted circle.
+    // A mark without a base character stands on a dotted circle.
     Glyph glyph = width > 0 ? Glyph{{c}, width} : Glyph{{L'\u25CC', c}, 1};
-    const auto isAscii = [&](std::size_t at) { return static_cast<unsigned char>(_text[at]) < 0x80; }; // no mark
+    // ASCII, so not a combining mark
+    const auto isAscii = [&](std::size_t at) { return static_cast<unsigned char>(_text[at]) < 0x80; };
     for (std::size_t at = _read; at < _text.size() && !isAscii(at); _read = at) {
         const wchar_t mark = shownAt(at);
         if (wcwidth(mark) > 0)
@@ -211,7 +212,7 @@ std::vector<std::string> wrapped(std::string_view text, int width)
         const bool fits = terminal::fits(line, width);
         auto end = fits ? line.size() : bytesIn(line, width);
         if (!fits) {
-            // At a blank, unless that leaves a word which finds no line to itself anyway.
+            // Breaks at a blank, unless the next word is longer than a line and is split anyway.
             const auto blank = line.rfind(' ', end);
             const auto next = blank == line.npos ? line : line.substr(blank + 1);
             if (blank != line.npos && terminal::fits(next.substr(0, next.find(' ')), width))

@@ -6,32 +6,32 @@
 #include <string_view>
 #include <vector>
 
-/// Text as a terminal shows it. Widths come from wcwidth(3), so the process runs in a UTF-8 locale.
+/// Text for a terminal. Widths come from wcwidth(3), so the process needs a UTF-8 locale.
 namespace kestrum::terminal {
 
-/// What the terminal can show.
+/// The characters that the terminal can show.
 enum class Charset { Unicode, Ascii };
 
-/// Sets a UTF-8 locale for the process, before Qt and the terminal library look at it. Ascii where the environment
-/// names a locale with another character set; where it names none, as in most containers, Unicode is taken for granted.
+/// Sets a UTF-8 locale for the process. Call it before Qt and the terminal library read the locale. Ascii where the
+/// environment names a locale with another character set; Unicode where it names none, as in most containers.
 Charset chooseLocale();
 
 std::string utf8(std::wstring_view text);
 
-/// What stands in one or two columns: a character with the marks combined with it.
+/// One glyph of one or two columns: a character with its combining marks.
 struct Glyph {
     std::wstring text;
     int columns;
 };
 
-/// `text` as it may be sent to a terminal. Control characters are shown as their pictures (U+2400...), what is no UTF-8,
-/// has no width or turns the direction of writing as U+FFFD: nothing from outside ever steers the terminal. Only what is
-/// asked for is looked at: a value can have megabytes, of which a screen shows a line.
+/// Makes `text` safe for a terminal: nothing from outside can control it. Control characters become their pictures
+/// (U+2400...). Invalid UTF-8, and characters without width or that change the writing direction, become U+FFFD. It
+/// reads only as far as requested: a value can have megabytes, of which a screen shows a line.
 class Glyphs {
 public:
     explicit Glyphs(std::string_view text) : _text(text) {}
 
-    std::optional<Glyph> next();               ///< nothing at the end
+    std::optional<Glyph> next();               ///< empty at the end
     std::size_t read() const { return _read; } ///< bytes
 
 private:
@@ -41,23 +41,23 @@ private:
     std::size_t _read = 0;
 };
 
-/// The whole of it as one string.
+/// The whole of `text` as one string.
 std::string harmless(std::string_view text);
 
-/// The columns that `text` takes.
+/// The number of columns that `text` takes.
 int columns(std::string_view text);
 
-/// What rows keep of `text`: all of it, or so much (16 KiB) that the rest ("…") lies beyond what anybody scrolls to.
+/// The part of `text` that rows keep: all of it, or 16 KiB followed by "…", which is further than users scroll.
 std::string beginning(std::string_view text);
 
-/// `text` in at most `width` columns, its middle or its end left out ("…") when it is longer.
+/// `text` in at most `width` columns. A longer text loses its middle or its end ("…").
 std::string cutInTheMiddle(std::string_view text, int width);
 std::string cutAtTheEnd(std::string_view text, int width);
 
-/// The lines of `text`, broken so that each has at most `width` columns: at blanks, and within words that are longer.
+/// `text` in lines of at most `width` columns, broken at blanks, and inside words that are longer than a line.
 std::vector<std::string> wrapped(std::string_view text, int width);
 
-/// Whether `part` occurs in `whole`, upper and lower case alike.
+/// Whether `whole` contains `part`, ignoring case.
 bool contains(std::string_view whole, std::string_view part);
 
 } // namespace kestrum::terminal
