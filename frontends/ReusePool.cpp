@@ -11,7 +11,7 @@ void ReusePool::put(std::size_t row, std::shared_ptr<ReusableCell> cell)
 
 std::shared_ptr<ReusableCell> ReusePool::take(std::size_t row, std::string_view reuseIdentifier)
 {
-    // Rows are asked for from the top, so the cell of the topmost row is the least likely to be wanted back.
+    // Rows are requested from the top, so the cell of the topmost row is the least likely to be requested again.
     auto found = _cells.end();
     for (auto each = _cells.begin(); each != _cells.end(); ++each) {
         if (each->second->reuseIdentifier() != reuseIdentifier)

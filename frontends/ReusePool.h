@@ -13,13 +13,13 @@ namespace kestrum {
 /// unchanged table keeps every row as it was.
 class ReusePool {
 public:
-    /// A row without a cell of its own gets another row's only when more than `kept` of them wait: until then it is
-    /// better served by a new cell of the right kind.
+    /// A row that has no cell in the pool gets another row's cell only when more than `kept` cells wait. Until then
+    /// take() returns null, and the caller makes a new cell of the right kind.
     explicit ReusePool(std::size_t kept = 256) : _kept(kept) {}
 
-    /// A cell that no longer shows its row.
+    /// Adds a cell that no longer shows its row.
     void put(std::size_t row, std::shared_ptr<ReusableCell> cell);
-    /// Null when there is none with that identifier.
+    /// Null when no cell has that identifier.
     std::shared_ptr<ReusableCell> take(std::size_t row, std::string_view reuseIdentifier);
     void clear() { _cells.clear(); }
 

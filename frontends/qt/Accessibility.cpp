@@ -50,7 +50,7 @@ public:
     void doAction(const QString& name) override
     {
         const auto [table, row] = place();
-        // Assistive technology may hold on to rows that are covered, or of a pane that has left.
+        // Assistive technology may keep references to covered rows, or to rows of a pane that was removed.
         if (!table || !table->isVisible() || !table->isEnabled())
             return;
         FocusRing::instance().setShown(true);
@@ -78,7 +78,7 @@ private:
     }
 };
 
-/// Its children are the rows in view, top down.
+/// Its children are the rows in view, from the top down.
 class AccessibleTable final : public QAccessibleWidget {
 public:
     explicit AccessibleTable(Table& table) : QAccessibleWidget(&table, QAccessible::List) {}
@@ -118,7 +118,7 @@ private:
     Table& table() const { return *static_cast<Table*>(widget()); }
 };
 
-/// A widget that holds others. What is hidden is no part of it.
+/// A widget that holds others. Hidden widgets are not its children.
 class AccessibleGroup final : public QAccessibleWidget {
 public:
     using QAccessibleWidget::QAccessibleWidget;
@@ -138,13 +138,13 @@ public:
     QAccessibleInterface* childAt(int x, int y) const override
     {
         const auto children = shown();
-        for (auto each = children.rbegin(); each != children.rend(); ++each) // what covers comes last
+        for (auto each = children.rbegin(); each != children.rend(); ++each) // the topmost child is the last one
             if ((*each)->rect().contains((*each)->mapFromGlobal(QPoint(x, y))))
                 return QAccessible::queryAccessibleInterface(*each);
         return nullptr;
     }
 
-    // It would take the focus from what is inside.
+    // A focus action would take the focus from the widgets inside.
     QStringList actionNames() const override { return {}; }
     void doAction(const QString&) override {}
 
@@ -179,7 +179,8 @@ QAccessibleInterface* makeInterface(const QString& type, QObject* object)
         return new AccessibleCell(*cell);
     if (auto* table = dynamic_cast<Table*>(object))
         return new AccessibleTable(*table);
-    // A table scrolls to the row that is asked for; its scroll bars are never shown, and not to be moved from outside.
+    // The table scrolls to the row that is requested. Its scroll bars are never shown and must not be moved from
+    // outside.
     if (auto* bar = qobject_cast<QScrollBar*>(object))
         return new QAccessibleWidget(bar, QAccessible::ScrollBar);
     if (auto* group = qobject_cast<QWidget*>(object); group && type == QStringLiteral("QWidget"))

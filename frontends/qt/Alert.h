@@ -21,7 +21,7 @@ protected:
     void paintEvent(QPaintEvent*) override;
     void resizeEvent(QResizeEvent*) override;
     void keyPressEvent(QKeyEvent* event) override;
-    void mousePressEvent(QMouseEvent*) override {} // nothing reaches what it covers
+    void mousePressEvent(QMouseEvent*) override {} // widgets below get no input
     void changeEvent(QEvent* event) override;
     bool focusNextPrevChild(bool) override { return true; }
 

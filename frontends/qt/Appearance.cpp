@@ -27,7 +27,7 @@ const QString kMotionGroup = QStringLiteral("org.gnome.desktop.interface"),
 
 QDBusConnection desktopBus()
 {
-    // Where no session bus runs, Qt would try to start one.
+    // Without a session bus, Qt would try to start one.
     if (!qEnvironmentVariableIsSet("DBUS_SESSION_BUS_ADDRESS") &&
         !QFile::exists(qEnvironmentVariable("XDG_RUNTIME_DIR") + QStringLiteral("/bus")))
         return QDBusConnection(QString());
@@ -40,13 +40,13 @@ Appearance::Appearance(const QDBusConnection& bus) : _bus(bus)
     applyScheme();
     if (!_bus.isConnected())
         return;
-    // Qt finds the slot by the names of its types, and knows this one only once it is registered.
+    // Qt finds the slot by its type names. It knows this type only after it is registered.
     qRegisterMetaType<QDBusVariant>();
     if (!_bus.connect(kPortal, kPath, kSettings, QStringLiteral("SettingChanged"), this,
                       SLOT(settingChanged(QString, QString, QDBusVariant))))
         qWarning("kestrum: changes of the desktop's settings are not followed: %s",
                  qPrintable(_bus.lastError().message()));
-    // A portal that starts later, or again, may say something else than what is known.
+    // A portal that starts later, or restarts, may give another value.
     auto* portal = new QDBusServiceWatcher(kPortal, _bus, QDBusServiceWatcher::WatchForRegistration, this);
     connect(portal, &QDBusServiceWatcher::serviceRegistered, this, &Appearance::askAll);
     askAll();
@@ -65,7 +65,7 @@ void Appearance::ask(const QString& group, const QString& key)
     auto* watcher = new QDBusPendingCallWatcher(_bus.asyncCall(read), this);
     connect(watcher, &QDBusPendingCallWatcher::finished, this, [this, group, key, watcher] {
         const QDBusPendingReply<QDBusVariant> reply = *watcher;
-        if (!reply.isError()) // no portal, or none that knows this setting
+        if (!reply.isError()) // there is no portal, or the portal does not know this setting
             settingChanged(group, key, reply.value());
         watcher->deleteLater();
     });
@@ -74,7 +74,7 @@ void Appearance::ask(const QString& group, const QString& key)
 void Appearance::settingChanged(const QString& group, const QString& key, const QDBusVariant& value)
 {
     QVariant plain = value.variant();
-    while (plain.canConvert<QDBusVariant>()) // "Read" wraps its answer once more than the signal does
+    while (plain.canConvert<QDBusVariant>()) // "Read" wraps its reply once more than the signal does
         plain = plain.value<QDBusVariant>().variant();
     if (group == kSchemeGroup && key == kScheme) {
         constexpr uint kPreferDark = 1, kPreferLight = 2;
@@ -98,7 +98,7 @@ bool Appearance::eventFilter(QObject* watched, QEvent* event)
 void Appearance::applyScheme()
 {
     _applying = true;
-    QApplication::setPalette(QPalette()); // brings the theme's own palette back
+    QApplication::setPalette(QPalette()); // restores the theme's palette
     const bool dark = _dark.value_or(isDark(QApplication::palette()));
     const QPalette palette = paletteOf(dark ? darkColours() : lightColours());
     QApplication::setPalette(palette);

@@ -7,12 +7,11 @@
 
 namespace kestrum::qt {
 
-/// The bus on which the desktop's settings are, not connected where there is none.
+/// The bus that gives access to the desktop's settings. Not connected where there is no such bus.
 QDBusConnection desktopBus();
 
-/// What the desktop asks of how things look: follows its light or dark scheme, and its wish for reduced motion, for as
-/// long as this lives. It listens to Qt's platform theme and to the settings portal (org.freedesktop.portal.Settings)
-/// where there is one.
+/// Follows the desktop's light or dark scheme, and its setting for reduced motion, as long as this object exists. It
+/// listens to Qt's platform theme and, where one runs, to the settings portal (org.freedesktop.portal.Settings).
 class Appearance final : public QObject {
     Q_OBJECT
 
@@ -30,7 +29,7 @@ private:
     void applyScheme();
 
     QDBusConnection _bus;
-    std::optional<bool> _dark; ///< as the portal says; nothing when it leaves it to the theme
+    std::optional<bool> _dark; ///< the portal's value; empty when the portal leaves the scheme to the theme
     bool _applying = false;
 };
 

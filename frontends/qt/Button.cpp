@@ -15,8 +15,8 @@ namespace kestrum::qt {
 
 namespace {
 
-constexpr int kPad = 18;         // beside a filled button's text
-constexpr int kChevronRoom = 14; // before a back button's
+constexpr int kPad = 18;         // on both sides of a filled button's text
+constexpr int kChevronRoom = 14; // to the left of a back button's text
 
 } // namespace
 
@@ -65,7 +65,7 @@ void Button::paintEvent(QPaintEvent*)
     }
     painter.setPen(_kind == Kind::Filled ? colours.onAccent() : colours.accent);
     const Qt::Alignment side = _kind == Kind::Back ? Qt::AlignLeft : Qt::AlignHCenter;
-    // A back button that had to give way has room for its chevron alone.
+    // A back button without room for its text shows its chevron alone.
     const QFontMetricsF metrics(font());
     if (width() > kRowHeight || metrics.horizontalAdvance(text()) <= place.width())
         painter.drawText(place, metrics.elidedText(text(), Qt::ElideRight, place.width()),
@@ -76,7 +76,7 @@ void Button::paintEvent(QPaintEvent*)
 
 void Button::keyPressEvent(QKeyEvent* event)
 {
-    // A held key must not press what just got the focus.
+    // The widget may just have received the focus; a key held since before must not press it.
     if (event->isAutoRepeat())
         return;
     if (event->key() == Qt::Key_Return || event->key() == Qt::Key_Enter)

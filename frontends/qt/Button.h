@@ -4,7 +4,7 @@
 
 namespace kestrum::qt {
 
-/// A button of text: on nothing, on accent, or the one that goes back.
+/// A text button: plain, filled with the accent colour, or the back button.
 class Button final : public QAbstractButton {
 public:
     enum class Kind { Plain, Filled, Back };

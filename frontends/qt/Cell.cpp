@@ -12,7 +12,7 @@ namespace kestrum::qt {
 
 namespace {
 
-constexpr double kMark = 12; // width of a chevron or check mark's place
+constexpr double kMark = 12; // width reserved for a chevron or check mark
 
 } // namespace
 
@@ -132,7 +132,8 @@ void Cell::paintEvent(QPaintEvent*)
         if (const auto* drawn = dynamic_cast<const Drawn*>(view.get()))
             drawn->paint(painter, {colours, background, content.width});
     painter.restore();
-    fillHairline(painter, *this, height(), kInset, width() - kInset, colours.line); // no fade reaches it
+    // drawn last, so that no fade covers it
+    fillHairline(painter, *this, height(), kInset, width() - kInset, colours.line);
 
     const QPointF middle(width() - kInset - kMark / 2, height() / 2.0);
     if (_accessory == Accessory::DisclosureIndicator)

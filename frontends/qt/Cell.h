@@ -8,7 +8,7 @@
 
 namespace kestrum::qt {
 
-/// One row. Its table places it and gives it its look; it takes no input itself.
+/// One row. Its table sets its position and its look. It handles no input.
 class Cell final : public QWidget, public TableCell {
 public:
     explicit Cell(CellStyle style);
@@ -19,7 +19,7 @@ public:
     void addSubview(std::shared_ptr<View> view) override;
     Label& textLabel() override { return *_textLabel; }
 
-    /// The row that it shows, or showed last. What still rolls stays with the row that the cell leaves.
+    /// The row that it shows, or showed last. A strip that still scrolls stays with the row that the cell leaves.
     std::size_t row() const { return _row; }
     void setRow(std::size_t row);
 
@@ -31,16 +31,16 @@ public:
     Look look() const { return _look; }
 
     Accessory accessory() const { return _accessory; }
-    /// The strip that can be scrolled sideways; null when everything is in view.
+    /// The strip that can be scrolled sideways; null when all of its content is in view.
     Strip* strip() const;
-    double sideways() const; ///< its offset, 0 without one
+    double sideways() const; ///< the strip's offset; 0 without a strip
     void setSideways(double offset);
-    /// Whether some of its text is out of sight.
+    /// Whether part of its text is out of sight.
     bool isCut() const;
-    /// Its labels', from the first to the last: the key, then the value.
+    /// The texts of its labels in order: the key, then the value.
     QStringList texts() const;
     QString name() const { return texts().value(0); }
-    /// What a screen reader says: "key, value".
+    /// The text for screen readers: "key, value".
     QString spoken() const;
 
 protected:
@@ -50,7 +50,7 @@ private:
     Accessory _accessory = Accessory::None;
     Look _look;
     std::size_t _row = 0;
-    std::shared_ptr<TextLabel> _textLabel; ///< the default style's own
+    std::shared_ptr<TextLabel> _textLabel; ///< the label of the default style
     std::vector<std::shared_ptr<View>> _views;
 };
 

@@ -6,7 +6,7 @@ namespace kestrum::qt {
 
 namespace {
 
-/// `over` laid on `under` with `share` of 1.
+/// `over` laid on `under` with an opacity of `share`, 0 to 1.
 QColor mixed(const QColor& under, const QColor& over, float share)
 {
     const auto channel = [&](float a, float b) { return a + (b - a) * share; };

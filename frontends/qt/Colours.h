@@ -5,33 +5,33 @@
 
 class QWidget;
 
-/// Every colour of the window, by what it is for.
+/// All colours of the window, named by their use.
 namespace kestrum::qt {
 
 struct Colours {
     QColor ground;  ///< behind the bars
     QColor surface; ///< behind rows, sheets and cards
     QColor ink;     ///< text
-    QColor muted;   ///< marks, placeholders, what is secondary
+    QColor muted;   ///< marks, placeholders and secondary text
     QColor line;    ///< hairlines
-    QColor accent;  ///< what can be pressed, check marks, focus
+    QColor accent;  ///< pressable text, check marks, focus
     QColor danger;  ///< an error's title
 
-    QColor pressed() const;  ///< a row or button that is held
-    QColor selected() const; ///< a row that was chosen
+    QColor pressed() const;  ///< a row or button while it is held
+    QColor selected() const; ///< the chosen row
     QColor onAccent() const { return surface; }
-    static QColor dim() { return QColor(0, 0, 0, 115); } ///< over what a modal screen covers
+    static QColor dim() { return QColor(0, 0, 0, 115); } ///< laid over the widgets that a modal screen covers
 };
 
 const Colours& lightColours();
 const Colours& darkColours();
 
-/// The application's palette carries the scheme, so that a change reaches every widget as Qt's own event does.
+/// The scheme is stored in the application's palette, so Qt's own palette event tells every widget about a change.
 QPalette paletteOf(const Colours& colours);
-/// The scheme of the palette that `widget` draws with.
+/// The colours of the scheme in `widget`'s palette.
 const Colours& coloursOf(const QWidget& widget);
 
-/// Whether a palette that is not ours, the desktop's, is a dark one.
+/// Whether a palette from the desktop, not one of ours, is a dark one.
 bool isDark(const QPalette& palette);
 
 } // namespace kestrum::qt

@@ -18,7 +18,7 @@ ContextMenu::ContextMenu(Table& table, std::optional<std::size_t> row, QPoint at
                       .arg(kRowHeight)
                       .arg(2 * kInset));
     if (row) {
-        // As they are now: the row may have moved when one of these is chosen.
+        // Read now: the row may have moved when the user chooses an action.
         const QString value = table.textsOf(*row).value(1), whole = rowAsText(table, *row);
         if (!value.isEmpty())
             addAction(QStringLiteral("Copy value"), &table, [value] { copy(value); });

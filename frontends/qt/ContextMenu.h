@@ -6,10 +6,10 @@
 
 namespace kestrum::qt {
 
-/// What can be done with a row besides opening it. It closes when its table is covered or leaves.
+/// The actions for a row besides opening it. It closes when its table is covered or removed.
 class ContextMenu final : public QMenu {
 public:
-    /// At a point of the screen. Without a row: what can be done with the pane.
+    /// `at` is in screen coordinates. Without a row it offers the actions for the whole pane.
     ContextMenu(Table& table, std::optional<std::size_t> row, QPoint at);
 
     bool eventFilter(QObject* watched, QEvent* event) override;

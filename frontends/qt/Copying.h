@@ -7,7 +7,7 @@ namespace kestrum::qt {
 
 class Table;
 
-/// What a table shows as text: a row is "key<TAB>value", a pane its rows, a line each.
+/// The texts of a table for the clipboard: "key<TAB>value" for a row, one such line per row for a pane.
 QString rowAsText(Table& table, std::size_t row);
 QString paneAsText(Table& table);
 

@@ -50,7 +50,7 @@ void TextLabel::paint(QPainter& painter, const Paper& paper) const
 
 double TextLabel::room(double width) const
 {
-    return std::min(_frame.width + 1, width - _frame.x); // + 1: measures are rounded somewhere
+    return std::min(_frame.width + 1, width - _frame.x); // + 1: Qt rounds some text widths down
 }
 
 bool TextLabel::isCut(double width) const
@@ -115,7 +115,7 @@ bool Strip::isCutRight() const
 
 void Strip::paint(QPainter& painter, const Paper& paper) const
 {
-    constexpr double kFade = 32; // points at an edge that what lies beyond fades in
+    constexpr double kFade = 32; // points at an edge over which cut content fades out
     painter.save();
     const QRectF frame = rectOf(_frame);
     painter.setClipRect(frame, Qt::IntersectClip);
@@ -140,7 +140,7 @@ void Strip::paint(QPainter& painter, const Paper& paper) const
         fade(frame.left(), frame.left() + kFade);
     if (isCutRight()) {
         fade(frame.right(), frame.right() - kFade);
-        // What lies beyond may begin there, with nothing to fade: three dots tell of it.
+        // The hidden content may begin exactly there, so that nothing fades. Three dots show that there is more.
         painter.setPen(Qt::NoPen);
         painter.setBrush(paper.colours.muted);
         for (int i = 0; i < 3; ++i)

@@ -16,23 +16,23 @@
 
 class QPainter;
 
-/// The views inside a cell. They are drawn by the cell and no widgets of their own: a frame may lie between pixels,
-/// and a row costs one widget however much it holds.
+/// The views inside a cell. The cell draws them; they are not widgets. So a frame may lie between pixels, and a row
+/// costs one widget whatever it holds.
 namespace kestrum::qt {
 
-/// What a view is drawn on.
+/// The drawing target of a view.
 struct Paper {
     const Colours& colours;
     QColor background;
-    double width; ///< of the view that holds it; a text that would pass its end is cut short there
+    double width; ///< of the holding view; a longer text is cut short there
 };
 
 class Drawn {
 public:
     virtual ~Drawn() = default;
     virtual void paint(QPainter& painter, const Paper& paper) const = 0;
-    virtual QStringList texts() const = 0; ///< one for each label, empty ones too
-    /// Whether some of it is out of sight in a holder of that width.
+    virtual QStringList texts() const = 0; ///< one per label, empty ones included
+    /// Whether part of it is out of sight in a holder of that width.
     virtual bool isCut(double width) const = 0;
     virtual void setHolder(QWidget* holder) { _holder = holder; }
 
@@ -44,7 +44,7 @@ protected:
     }
 
 private:
-    QPointer<QWidget> _holder; ///< repainted when this changes
+    QPointer<QWidget> _holder; ///< repainted when this view changes
 };
 
 class TextLabel final : public Label, public Drawn {
@@ -66,14 +66,14 @@ private:
 
     Rect _frame;
     std::optional<std::string> _text;
-    QString _line; ///< `_text` as drawn
+    QString _line; ///< `_text` in the form that is drawn
     std::string _family;
     double _size = 17;
     bool _bold = false;
     QFont _font;
 };
 
-/// The sideways scrolling strip. Its QScroller events move it.
+/// The strip that scrolls sideways. QScroller events move it.
 class Strip final : public QObject, public ScrollView, public Drawn {
 public:
     void setFrame(Rect frame) override;
@@ -86,7 +86,7 @@ public:
     bool isCut(double) const override { return isCutLeft() || isCutRight(); }
     void setHolder(QWidget* holder) override;
 
-    // Its content is wider than the texts in it: only what is out of sight counts.
+    // The content is wider than its texts. Only hidden text counts as cut.
     bool isCutLeft() const;
     bool isCutRight() const;
 

@@ -7,7 +7,7 @@ namespace kestrum::qt {
 
 namespace {
 
-/// Keys that a handset has beside its screen are not among them.
+/// Whether the key moves the focus. Keys that a handset has beside its screen are not included.
 bool moves(const QKeyEvent& event)
 {
     switch (event.key()) {

@@ -4,13 +4,13 @@
 
 namespace kestrum::qt {
 
-/// Whether the ring around what has the keyboard is drawn. It belongs to the keyboard: a key that moves brings it, a
-/// mouse button or a finger takes it away.
+/// Whether the ring around the focused widget is drawn. A key that moves the focus shows the ring; a mouse button or
+/// a touch hides it.
 class FocusRing final : public QObject {
     Q_OBJECT
 
 public:
-    /// Made with the toolkit.
+    /// Created together with the toolkit.
     static FocusRing& instance();
 
     bool isShown() const { return _shown; }

@@ -8,10 +8,10 @@
 
 namespace kestrum::qt {
 
-/// A row of a table that is followed by its name while rows come and go around it. When the row itself goes, the one
-/// below takes its place, or the one above. Names that occur twice are told apart by where they stand.
+/// Follows a row of a table by its name while rows are added and removed around it. When the row itself is removed,
+/// the row below replaces it, or else the row above. Equal names are distinguished by their order.
 ///
-/// `nameOf(i)` gives the name of row i as a std::string, for each i below `rows`.
+/// `nameOf(i)` returns the name of row i as a std::string, for each i below `rows`.
 class FollowedRow {
 public:
     std::optional<std::size_t> row() const { return _row; }
@@ -28,7 +28,7 @@ public:
             _names.push_back(nameOf(row - 1));
     }
 
-    /// The rows are others now.
+    /// Call it when the rows have changed.
     template <class NameOf>
     void follow(std::size_t rows, const NameOf& nameOf)
     {
@@ -58,7 +58,7 @@ private:
     }
 
     std::optional<std::size_t> _row;
-    std::vector<std::string> _names; ///< its own, then its neighbours'
+    std::vector<std::string> _names; ///< the row's name, then its neighbours' names
 };
 
 } // namespace kestrum::qt

@@ -2,7 +2,7 @@
 
 #include <QPixmap>
 
-// At file scope, as Qt asks: the linker drops a static library's resources that nothing names.
+// At file scope, as Qt requires. Without this call the linker drops the resources of a static library.
 static void registerPictures()
 {
     Q_INIT_RESOURCE(kestrum);

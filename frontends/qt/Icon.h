@@ -4,12 +4,12 @@
 
 namespace kestrum::qt {
 
-/// The window's icon: the desktop theme's own where it has one, else ours.
+/// The window's icon: the desktop theme's icon where it has one, else our own.
 QIcon windowIcon();
 
-/// Ours as it was drawn, sharp in any size. Without Qt's SVG plug-in, a package that may be missing, it is null.
+/// Our own icon as SVG, sharp in any size. Null without Qt's SVG plug-in, whose package may be missing.
 QIcon drawnIcon();
-/// The same in the usual sizes, for a Qt without that plug-in.
+/// Our own icon as pictures in the usual sizes, for a Qt without that plug-in.
 QIcon paintedIcon();
 
 } // namespace kestrum::qt

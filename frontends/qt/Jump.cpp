@@ -12,7 +12,7 @@ namespace kestrum::qt {
 
 namespace {
 
-/// Not for a menu of the field's, or another window.
+/// Whether the focus leaves the field. A menu of the field, or another window, does not count.
 bool leaves(const QFocusEvent& event)
 {
     return event.reason() != Qt::PopupFocusReason && event.reason() != Qt::ActiveWindowFocusReason;
@@ -27,7 +27,7 @@ Jump::Jump(QWidget* parent) : QWidget(parent), _field(this), _missing(this)
     _field.setFrame(false);
     _field.setPlaceholderText(QStringLiteral("Jump to a name"));
     _field.setAccessibleName(QStringLiteral("Jump to a name"));
-    QPalette ground; // the rest follows the scheme
+    QPalette ground; // the other colours follow the scheme
     ground.setColor(QPalette::Base, Qt::transparent);
     _field.setPalette(ground);
     _missing.setFont(fontOf(systemFont(kStatusSize)));

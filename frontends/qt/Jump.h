@@ -7,7 +7,7 @@
 
 namespace kestrum::qt {
 
-/// Jumps to a row by a part of its name while it is typed: a bar in the toolbar's place.
+/// A bar in the toolbar's place: jumps to a row while the user types a part of its name.
 class Jump final : public QWidget {
     Q_OBJECT
 
@@ -15,9 +15,9 @@ public:
     explicit Jump(QWidget* parent);
 
     void start(Table& table);
-    /// To the next row that the last name fits.
+    /// Jumps to the next row that matches the last search.
     void again(Table& table);
-    /// The table stays where the jump has brought it.
+    /// Closes the bar. The table stays at the row that was found.
     void end();
 
     QLineEdit& field() { return _field; }

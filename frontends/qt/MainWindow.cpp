@@ -18,7 +18,8 @@ double shortSide(const QSizeF& size)
     return std::min(size.width(), size.height());
 }
 
-/// Some screens give their aspect ratio in place of their size, in centimetres or in millimetres; others nothing.
+/// Whether a screen's physical size is plausible. Some screens report their aspect ratio instead, in centimetres or
+/// millimetres; others report nothing.
 bool isSize(const QSizeF& millimetres)
 {
     const QSize whole = millimetres.toSize();
@@ -28,7 +29,7 @@ bool isSize(const QSizeF& millimetres)
 
 Display primaryDisplay()
 {
-    // These draw on the bare screen, without a desktop.
+    // These platforms draw directly on the screen, without a desktop.
     static const QStringList bare{QStringLiteral("eglfs"), QStringLiteral("linuxfb"), QStringLiteral("vkkhrdisplay")};
     const QScreen& screen = *QGuiApplication::primaryScreen();
     const auto devices = QInputDevice::devices();
@@ -59,7 +60,7 @@ QRect screenArea()
     const QScreen& screen = *QGuiApplication::primaryScreen();
     if (isHandset())
         return screen.geometry();
-    constexpr int kWindowFrame = 40; // what a desktop adds around a window, at most
+    constexpr int kWindowFrame = 40; // the most that a desktop's frame adds to a window
     const QRect room = screen.availableGeometry();
     const QSize size = QSize(kPhoneWidth, kPhoneHeight).boundedTo(room.size() - QSize(0, kWindowFrame));
     return {room.center() - QPoint(size.width() / 2, size.height() / 2), size};
@@ -75,14 +76,14 @@ MainWindow::MainWindow()
 
 MainWindow::~MainWindow()
 {
-    // The navigation view belongs to the controllers.
+    // The controllers own the navigation view.
     if (_root)
         _root->setParent(nullptr);
 }
 
 void MainWindow::setRoot(NavigationView& root)
 {
-    // This front end makes every navigation view, so it is one of ours.
+    // This front end creates every navigation view, so the cast is safe.
     _root = static_cast<Navigation*>(&root);
     _root->setParent(this);
     _root->setGeometry(rect());
@@ -93,7 +94,7 @@ void MainWindow::setRoot(NavigationView& root)
 void MainWindow::makeKeyAndVisible()
 {
     if (isHandset()) {
-        // Without a window manager a full screen has the size that the window had before.
+        // Without a window manager a full-screen window would keep its previous size.
         setGeometry(screenArea());
         showFullScreen();
         connect(QGuiApplication::primaryScreen(), &QScreen::geometryChanged, this,

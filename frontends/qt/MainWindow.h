@@ -6,7 +6,7 @@
 
 namespace kestrum::qt {
 
-/// The one window: full screen on a handset, a handset's shape on a desktop.
+/// The only window: full screen on a handset, in a handset's proportions on a desktop.
 class MainWindow final : public QWidget, public Window {
 public:
     MainWindow();
@@ -19,7 +19,7 @@ public:
         if (!_abandoned)
             hide();
     }
-    /// The display is gone: the window is left as it is.
+    /// Stops all changes to the window, because the display connection is gone.
     void abandon() { _abandoned = true; }
 
     void showAlert(std::string_view title, std::string_view message, std::string_view button);
@@ -38,23 +38,23 @@ private:
     bool _abandoned = false;
     QPointer<Navigation> _root;
     QPointer<Alert> _alert;
-    std::vector<Message> _messages; ///< waiting behind `_alert`
+    std::vector<Message> _messages; ///< not shown yet; they follow `_alert`
 };
 
-/// What is known of a screen.
+/// The known facts about a screen.
 struct Display {
     QSize points;
-    QSizeF millimetres; ///< empty or wrong where the screen does not tell
+    QSizeF millimetres; ///< empty or wrong when the screen does not report it
     bool touch;
-    bool bare; ///< no desktop runs on it
+    bool bare; ///< without a desktop
 };
 
-/// Whether the screen is a handset's by its real size, whatever its scale makes of its points; where that is not known,
-/// a small one that is touched.
+/// Whether the screen is a handset's, judged by its physical size and not by its scaled points. Where the size is not
+/// known, a small touch screen counts as a handset's.
 bool isHandset(const Display& display);
-/// Whether the whole screen is ours: a handset's, or one without a desktop.
+/// Whether the window takes the whole screen: on a handset, or without a desktop.
 bool isHandset();
-/// The screen as the application knows it: a handset's own, on a desktop the piece of it that the window takes.
+/// The screen that the application sees: a handset's whole screen, or the window's area on a desktop.
 QRect screenArea();
 
 } // namespace kestrum::qt

@@ -1,17 +1,17 @@
 #pragma once
 
-/// What the window's parts measure, in points, and how long they move, in milliseconds. A point is one of Qt's
-/// device-independent pixels: the screen's own scale is applied below us.
+/// Sizes of the window's parts in points, and durations of its animations in milliseconds. A point is one of Qt's
+/// device-independent pixels; Qt applies the screen's scale.
 namespace kestrum::qt {
 
-inline constexpr int kRowHeight = 44; ///< nothing to touch is smaller
-inline constexpr int kBarHeight = 48; ///< title bar and toolbar, hairline included
+inline constexpr int kRowHeight = 44; ///< the minimum height of everything that can be touched
+inline constexpr int kBarHeight = 48; ///< title bar and toolbar, including the hairline
 inline constexpr int kInset = 10;
 inline constexpr int kGap = 8; ///< between neighbours on a bar
 inline constexpr int kSpinner = 20;
 inline constexpr int kRing = 2; ///< keyboard focus
 
-/// Rows and bars keep to a column of at most this width: a value far from its key is hard to read across a wide screen.
+/// The maximum width of rows and bars: on a wider row the value is too far from its key to read them together.
 inline constexpr int kColumn = 720;
 
 inline constexpr double kTextSize = 15, kTitleSize = 17, kStatusSize = 14;
@@ -19,9 +19,10 @@ inline constexpr double kTextSize = 15, kTitleSize = 17, kStatusSize = 14;
 inline constexpr int kSlide = 220; ///< push and pop
 inline constexpr int kSheet = 260; ///< the save screen, from below
 
-/// The handset's shape, which the window takes on a desktop.
+/// A handset's proportions, for the window on a desktop.
 inline constexpr int kPhoneWidth = 390, kPhoneHeight = 844;
-/// The shorter side below which a screen is a handset's, in millimetres, and in points where that is not known.
+/// A screen whose shorter side is below this is a handset's: in millimetres, or in points where the size is not
+/// known.
 inline constexpr double kHandsetMillimetres = 110, kHandset = 600;
 
 } // namespace kestrum::qt

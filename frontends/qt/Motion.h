@@ -7,11 +7,11 @@
 
 namespace kestrum::qt {
 
-/// False where the desktop asks for reduced motion: panes then change at once.
+/// False where the desktop is set to reduced motion: panes then change at once.
 bool motionWanted();
 void setMotionWanted(bool wanted);
 
-/// A picture of what leaves: it moves out of sight in place of the real thing, and takes no input.
+/// A picture of a removed widget. It moves out of sight in the widget's place, and handles no input.
 class Still final : public QWidget {
 public:
     Still(QWidget& of, QWidget* parent);
@@ -23,8 +23,8 @@ private:
     QPixmap _picture;
 };
 
-/// One movement at a time, eased out. `step` gets 0 to 1, the 1 for sure; a movement that another one replaces is
-/// brought to its end first.
+/// At most one animation at a time, eased out. `step` gets values from 0 to 1, and always the final 1. An animation
+/// that is replaced is finished first.
 class Movement final {
 public:
     Movement();

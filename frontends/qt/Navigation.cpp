@@ -14,7 +14,7 @@ namespace kestrum::qt {
 namespace {
 
 constexpr double kLeastTitleSize = 13;
-constexpr int kLeastBackWidth = 72; // points that show a few letters of where it goes
+constexpr int kLeastBackWidth = 72; // points; enough for a few letters of the previous title
 
 void bring(QWidget& widget, QWidget& onto)
 {
@@ -22,7 +22,7 @@ void bring(QWidget& widget, QWidget& onto)
     widget.setEnabled(true);
 }
 
-/// Out of reach of all input: assistive technology may hold on to what is no longer on the screen.
+/// Disables all input to a widget that has left the screen: assistive technology may still refer to it.
 void takeAway(QWidget& widget)
 {
     widget.setParent(nullptr);
@@ -59,8 +59,8 @@ void TitleBar::arrange()
     const int whole = std::min(_back.sizeHint().width(), column * 2 / 5);
     const int least = std::min(whole, kLeastBackWidth);
 
-    // Before the title is cut the button keeps a few letters only, the title shrinks a little, the button keeps its
-    // chevron alone, the title shrinks further. What is still too long stands in two lines.
+    // The order in which space is saved: the back button keeps a few letters only, the title shrinks a little, the
+    // button keeps only its chevron, the title shrinks further. A title that is still too long is set in two lines.
     int back = 0, from = kInset;
     const auto fits = [&](int backWidth) {
         back = hasBack ? backWidth : 0;
@@ -78,7 +78,7 @@ void TitleBar::arrange()
         fits(std::clamp(to - kGap - static_cast<int>(_title.wanted()), back, whole));
     _title.setLines(fitted ? 1 : 2);
     _back.setGeometry(left, 2, back, kRowHeight);
-    // In the middle of the bar if it fits there, beside the button if not.
+    // Centred in the bar if it fits there, else beside the button.
     const int wanted = fitted ? static_cast<int>(_title.wanted()) : to - from;
     const int x = std::clamp((column - wanted) / 2, from, to - wanted);
     _title.setGeometry(left + x, 2, wanted, kRowHeight);
@@ -136,7 +136,7 @@ Navigation::~Navigation()
 {
     _slide.finish();
     _rise.finish();
-    // Panes and the sheet belong to their controllers.
+    // The controllers own the panes and the sheet.
     for (QWidget* each : std::initializer_list<QWidget*>{_table, _toolbar, _sheet})
         if (each)
             each->setParent(nullptr);
@@ -150,7 +150,7 @@ void Navigation::goBack()
 
 void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated)
 {
-    // This front end makes every screen, so it is one of ours.
+    // This front end creates every screen, so the cast is safe.
     auto& screen = static_cast<Screen&>(pane);
     _slide.finish();
     Table* const old = _table;
@@ -172,7 +172,7 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     arrange();
     fresh->show();
     takeFocus();
-    // What leaves goes out of reach at once; only its picture stays until it has moved away.
+    // The old pane refuses input at once. Only its picture stays until it has moved out of sight.
     if (old) {
         takeAway(*old);
         old->onSwipeBack(nullptr);
@@ -184,7 +184,7 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     still->show();
     fresh->raise();
     _notice.raise();
-    // The old pane goes a little slower than the new one, which covers it.
+    // The old pane moves a little slower than the new one, which covers it.
     const int way = transition == Transition::Push ? _stage.width() : -_stage.width();
     _slide.start(
         kSlide,
@@ -201,7 +201,7 @@ void Navigation::setTitles(std::vector<std::string> titles)
 {
     _depth = titles.size();
     _bar.setTitles(titles);
-    window()->setWindowTitle(_bar.title()); // a desktop adds the program's name
+    window()->setWindowTitle(_bar.title()); // the desktop appends the program's name
 }
 
 void Navigation::setToolbarHidden(bool hidden)
@@ -226,7 +226,7 @@ void Navigation::setNotice(std::string_view text)
 void Navigation::present(SaveInterface& screen, bool animated)
 {
     _jump.end();
-    // This front end makes every save interface, so it is one of ours.
+    // This front end creates every save interface, so the cast is safe.
     _sheet = static_cast<SaveSheet*>(&screen);
     bring(*_sheet, *this);
     _sheet->setGeometry(rect());
@@ -264,7 +264,7 @@ void Navigation::dismiss(bool animated)
 
 void Navigation::takeFocus()
 {
-    // What lies under a modal screen is out of reach, of Tab and of a screen reader too.
+    // Widgets under a modal screen are disabled for Tab and for screen readers too.
     _panes.setEnabled(!_sheet);
     if (_sheet)
         _sheet->takeFocus();

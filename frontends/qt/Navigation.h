@@ -11,7 +11,7 @@
 
 namespace kestrum::qt {
 
-/// Where one is, and the way back.
+/// The title of the current pane and the back button.
 class TitleBar final : public QWidget {
 public:
     explicit TitleBar(QWidget* parent);
@@ -31,7 +31,7 @@ private:
     LineLabel _title;
 };
 
-/// What was done, over the lower end of the panes; it takes no input.
+/// A short report of a finished action, over the lower end of the panes. It handles no input.
 class Notice final : public QLabel {
 public:
     explicit Notice(QWidget* parent);
@@ -41,7 +41,7 @@ protected:
     void paintEvent(QPaintEvent* event) override;
 };
 
-/// Title bar, the top pane's table, its toolbar; over them the save sheet while it is presented.
+/// Title bar, the top pane's table, and its toolbar. The save sheet covers them while it is presented.
 class Navigation final : public QWidget, public NavigationView {
 public:
     explicit Navigation(NavigationViewDelegate& delegate);
@@ -62,7 +62,7 @@ public:
     SaveSheet* sheet() const { return _sheet; }
     Jump& jump() { return _jump; }
     bool isMoving() const { return _slide.isRunning() || _rise.isRunning(); }
-    /// Gives the keyboard to what is on top: the sheet, or the pane.
+    /// Gives the keyboard focus to the topmost part: the sheet, or the pane.
     void takeFocus();
 
 protected:
@@ -76,9 +76,9 @@ private:
     void pressSave();
 
     NavigationViewDelegate& _delegate;
-    QWidget _panes; ///< the bars and the stage: all that a modal screen covers
+    QWidget _panes; ///< the bars and the stage: everything that a modal screen covers
     TitleBar _bar;
-    QWidget _stage; ///< what slides, slides in here
+    QWidget _stage; ///< contains everything that slides
     Notice _notice; ///< over the stage's lower end
     Jump _jump;
     QPointer<Table> _table;

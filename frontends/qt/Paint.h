@@ -5,10 +5,10 @@
 #include <QPainterPath>
 #include <QWidget>
 
-/// The few marks that the window draws by itself.
+/// The marks that the window draws without Qt's style.
 namespace kestrum::qt {
 
-/// One line of the screen's own pixels, the last above `bottom`.
+/// A line one device pixel high, directly above `bottom`.
 inline void fillHairline(QPainter& painter, const QWidget& on, double bottom, double from, double to,
                          const QColor& colour)
 {
@@ -34,7 +34,7 @@ inline void strokeCheckMark(QPainter& painter, QPointF middle, const QColor& col
     strokeMark(painter, {middle + QPointF(-6, 0), middle + QPointF(-2, 4.5), middle + QPointF(6, -5)}, colour, 2);
 }
 
-/// Where the keyboard is.
+/// The ring around the widget that has the keyboard focus.
 inline void strokeRing(QPainter& painter, const QRectF& around, const QColor& colour)
 {
     painter.setBrush(Qt::NoBrush);

@@ -19,12 +19,12 @@ namespace {
 
 using namespace kestrum::qt;
 
-/// Qt ends the program by abort() when it reaches no display. It says so in a fatal message first: the one place to
-/// answer every reason alike, be it no display at all, one that is dead or refuses us, or one that Qt lacks a plug-in for.
+/// Qt calls abort() when it cannot reach a display: there is none, it is dead, it refuses us, or Qt has no plug-in
+/// for it. Before that Qt always writes a fatal message, so all these cases are handled here.
 void onMessageAtStart(QtMsgType type, const QMessageLogContext&, const QString& message)
 {
     if (type != QtFatalMsg)
-        return; // Qt's own account of it, in many lines
+        return; // Qt's own explanation, which has many lines
     Q_UNUSED(message);
     std::fputs("kestrum: no display server can be reached.\n"
                "Start it from a desktop session or on a handset's screen, or set DISPLAY or WAYLAND_DISPLAY to a "
@@ -43,7 +43,7 @@ public:
     QApplication* operator->() { return &_application; }
 
 private:
-    // There is no command line: Qt is not given one either.
+    // The program has no command line, so Qt does not get one either.
     char _name[8] = "kestrum";
     char* _arguments[2] = {_name, nullptr};
     int _argumentCount = 1;
@@ -52,7 +52,7 @@ private:
 };
 
 class QtToolkit;
-/// Whose application has not been told of its end yet; null when there is none.
+/// The toolkit whose application does not know of its end yet; null when there is none.
 QtToolkit* running = nullptr;
 
 class QtToolkit final : public Toolkit {
@@ -73,7 +73,7 @@ public:
         const QSize size = _window ? _window->size() : screenArea().size();
         return {0, 0, static_cast<double>(size.width()), static_cast<double>(size.height())};
     }
-    // No status bar stands on the screen that is ours.
+    // The window's screen has no status bar.
     Rect mainScreenApplicationFrame() const override { return mainScreenBounds(); }
     Size measure(std::string_view text, Font font) const override { return measured(lineOf(text), fontOf(font)); }
 
@@ -111,9 +111,9 @@ public:
 
     int run(ApplicationDelegate& application) override
     {
-        // Every end comes back here, from waits inside the loop too: the window's, a signal's.
+        // All exits come back here, also from waits inside the loop: the window's, a signal's.
         const TerminationSignals signals([] { QCoreApplication::exit(EXIT_SUCCESS); });
-        // All but one: when the display server goes away, Qt calls exit() by itself.
+        // The only exception: Qt calls exit() by itself when the display server goes away.
         [[maybe_unused]] static const int registered = std::atexit([] {
             if (running)
                 running->endByExit();
@@ -134,7 +134,7 @@ private:
     }
     void endByExit()
     {
-        // There is nothing left to hide the window from, and too little of Qt to do it with.
+        // Qt is no longer complete enough to hide the window.
         if (_window)
             _window->abandon();
         tellTheEnd();
@@ -147,8 +147,8 @@ private:
     Application _application;
     Appearance _appearance;
     QPointer<MainWindow> _window;
-    ApplicationDelegate* _delegate = nullptr; ///< while its end has not been told
-    std::vector<Message> _early;              ///< alerts from before there was a window
+    ApplicationDelegate* _delegate = nullptr; ///< until the delegate was told of the end
+    std::vector<Message> _early;              ///< alerts that came before the window existed
 };
 
 } // namespace

@@ -14,8 +14,8 @@ namespace kestrum::qt {
 namespace {
 
 constexpr int kHeader = 56;
-constexpr int kTop = 28;   // of the screen below, that stays in view
-constexpr int kWide = 560; // the widest that a sheet gets
+constexpr int kTop = 28;   // points of the screen below that stay in view
+constexpr int kWide = 560; // the maximum width of the sheet
 constexpr int kField = 48;
 
 } // namespace
@@ -31,7 +31,7 @@ void Card::paintEvent(QPaintEvent*)
 
 DescriptionField::DescriptionField(QWidget* parent) : QLineEdit(parent)
 {
-    // Assistive technology sets the text of a field without asking whether it is covered.
+    // Assistive technology sets a field's text without checking whether the field is covered.
     connect(this, &QLineEdit::textChanged, this, [this](const QString& text) {
         if (isEnabled())
             _kept = text;
@@ -42,7 +42,7 @@ DescriptionField::DescriptionField(QWidget* parent) : QLineEdit(parent)
 
 void DescriptionField::resignFirstResponder()
 {
-    // The sheet keeps the keyboard: without a place in the window Escape and Tab would go nowhere.
+    // The sheet keeps the keyboard focus: without a focused widget, Escape and Tab would have no effect.
     if (hasFocus())
         parentWidget()->setFocus(Qt::OtherFocusReason);
     QGuiApplication::inputMethod()->hide();
@@ -51,7 +51,8 @@ void DescriptionField::resignFirstResponder()
 void DescriptionField::paintEvent(QPaintEvent* event)
 {
     QLineEdit::paintEvent(event);
-    // Its lower edge is all the frame it has; in accent while it listens, and then twice as thick.
+    // The field's frame is its lower edge. It has the accent colour and double thickness while the field has the
+    // focus.
     const Colours& colours = coloursOf(*this);
     QPainter painter(this);
     const int thick = hasFocus() ? kRing : 1;
@@ -73,7 +74,7 @@ SaveSheet::SaveSheet(SaveInterfaceOwner& owner)
     _title.setLine(QStringLiteral("Save Snapshot"));
     _description.setFont(fontOf(systemFont(kTextSize)));
     _description.setFrame(false);
-    _description.setTextMargins(-2, 0, -2, 0); // in line with the rows
+    _description.setTextMargins(-2, 0, -2, 0); // aligned with the rows
     _description.setPlaceholderText(QLatin1String(kDescriptionPlaceholder.data()));
     _description.setAccessibleName(QStringLiteral("Description"));
     _table.setParent(&_card);
@@ -81,7 +82,7 @@ SaveSheet::SaveSheet(SaveInterfaceOwner& owner)
     setTabOrder(&_description, &_table);
     setTabOrder(&_table, &_save);
     setTabOrder(&_save, &_cancel);
-    // Nothing may be done with the sheet after the owner was told: it can be gone.
+    // The owner may destroy the sheet, so nothing may use the sheet after this call.
     connect(&_save, &QAbstractButton::clicked, this, [this] { _owner.savePressed(); });
     connect(&_cancel, &QAbstractButton::clicked, this, [this] { _owner.cancelPressed(); });
     connect(&_description, &QLineEdit::returnPressed, this, [this] { _owner.textFieldShouldReturn(); });
@@ -143,14 +144,14 @@ void SaveSheet::paintEvent(QPaintEvent*)
 
 void SaveSheet::keyPressEvent(QKeyEvent* event)
 {
-    // A key that is still held from what opened the sheet means nothing here.
+    // A key that is still held since the sheet was opened has no effect.
     if (event->isAutoRepeat())
         return;
     if (event->key() == Qt::Key_Escape)
         _owner.cancelPressed();
     else if (event->key() == Qt::Key_S && event->modifiers() == Qt::ControlModifier)
         _save.click();
-    // Nothing goes on to the panes below.
+    // Keys are not passed on to the panes below.
 }
 
 void SaveSheet::mousePressEvent(QMouseEvent*)
@@ -160,7 +161,7 @@ void SaveSheet::mousePressEvent(QMouseEvent*)
 
 bool SaveSheet::focusNextPrevChild(bool next)
 {
-    // Tab stays inside.
+    // Tab stays inside the sheet.
     QWidget* const order[] = {&_description, &_table, &_save, &_cancel};
     const auto count = std::size(order);
     const auto at = static_cast<std::size_t>(std::find(order, order + count, focusWidget()) - order);

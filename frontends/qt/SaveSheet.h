@@ -9,7 +9,7 @@
 
 namespace kestrum::qt {
 
-/// A rounded piece of surface that stands on what it covers.
+/// A rounded surface that covers part of the window.
 class Card final : public QWidget {
 public:
     using QWidget::QWidget;
@@ -21,7 +21,7 @@ protected:
     void paintEvent(QPaintEvent*) override;
 
 private:
-    bool _bottomSquare = false; ///< it stands on the screen's lower edge
+    bool _bottomSquare = false; ///< for a card at the screen's lower edge
 };
 
 class DescriptionField final : public QLineEdit, public TextField {
@@ -51,7 +51,7 @@ public:
     Button& save() { return _save; }
     Button& cancel() { return _cancel; }
     Card& card() { return _card; }
-    /// How far it has come up, 0 to 1.
+    /// How far the sheet has moved up, 0 to 1.
     void setRisen(double risen);
     void takeFocus();
 

@@ -7,7 +7,7 @@
 
 namespace kestrum::qt {
 
-/// A pane: a table and the bar under it. The navigation view shows both while the pane is on top.
+/// A pane: a table and the toolbar under it. The navigation view shows both while the pane is on top.
 class Screen final : public TableScreen {
 public:
     explicit Screen(TableDataSource& source) : _table(source) { _table.hide(); }

@@ -4,8 +4,7 @@ class QWidget;
 
 namespace kestrum::qt {
 
-/// What a desktop's user expects of every window, whatever it shows: Ctrl+Q and Ctrl+W close it, F11 gives it the
-/// whole screen and takes it back.
+/// The usual shortcuts of a desktop window: Ctrl+Q and Ctrl+W close it, F11 turns full screen on and off.
 void installShortcuts(QWidget& window);
 
 } // namespace kestrum::qt

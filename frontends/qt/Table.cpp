@@ -24,17 +24,17 @@ namespace kestrum::qt {
 
 namespace {
 
-constexpr int kSidewaysStep = 60; // points that an arrow key moves a strip by
-constexpr double kEdge = 24;      // points from the left edge within which a swipe back begins
-constexpr double kSwipe = 60;     // points that it takes
+constexpr int kSidewaysStep = 60; // points by which an arrow key moves a strip
+constexpr double kEdge = 24;      // points; a swipe back begins within this distance from the left edge
+constexpr double kSwipe = 60;     // points; the minimum length of a swipe back
 
-/// Every cell comes from a table's `makeCell`, so it is one of ours.
+/// The table's `makeCell` creates every cell, so the cast is safe.
 Cell& cellOf(ReusableCell& reusable)
 {
     return static_cast<Cell&>(reusable.cell());
 }
 
-/// A slim line at the right edge, as long as the share of the rows that is in view.
+/// A thin line at the right edge. Its length is the share of the rows in view.
 class ScrollMark final : public QWidget {
 public:
     explicit ScrollMark(const QScrollBar& bar, QWidget* parent) : QWidget(parent), _bar(bar)
@@ -83,7 +83,8 @@ Table::Table(TableDataSource& source) : _source(source), _hint(viewport())
     QScrollerProperties properties;
     properties.setScrollMetric(QScrollerProperties::VerticalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
     properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
-    properties.setScrollMetric(QScrollerProperties::DragStartDistance, 0.0); // the table itself tells drags from taps
+    // the table itself distinguishes drags from taps
+    properties.setScrollMetric(QScrollerProperties::DragStartDistance, 0.0);
     QScroller::scroller(this)->setScrollerProperties(properties);
     _hold.setSingleShot(true);
     connect(&_hold, &QTimer::timeout, this, [this] { held(); });
@@ -92,7 +93,7 @@ Table::Table(TableDataSource& source) : _source(source), _hint(viewport())
 
 Table::~Table()
 {
-    // Cells belong to those who share them, not to the viewport.
+    // The viewport does not own the cells; the holders of their shared pointers do.
     for (QWidget* child : viewport()->findChildren<QWidget*>(Qt::FindDirectChildrenOnly))
         if (dynamic_cast<Cell*>(child))
             child->setParent(nullptr);
@@ -100,7 +101,7 @@ Table::~Table()
 
 void Table::reloadData()
 {
-    // A table that nobody sees asks when it is shown.
+    // A hidden table reloads when it is shown.
     _stale = true;
     if (isVisible())
         fill(true);
@@ -146,7 +147,7 @@ void Table::arrangeHint()
 {
     const bool shown = _rows == 0 && !_hint.text().isEmpty();
     const int x = (viewport()->width() - columnWidth()) / 2;
-    // A little above the middle, where an empty page is looked at.
+    // A little above the middle: the eye looks there on an empty page.
     _hint.setGeometry(x + 2 * kInset, 0, columnWidth() - 4 * kInset, viewport()->height() * 4 / 5);
     _hint.setVisible(shown);
     setAccessibleDescription(shown ? _hint.text() : QString());
@@ -203,7 +204,7 @@ void Table::fill(bool anew)
         _current.follow(_rows, names());
         _selected.follow(_rows, names());
     }
-    // Only now: what shows a row again is never hidden in between.
+    // Hidden last: a cell that shows a row again must not be hidden in between.
     for (const auto& cell : left)
         if (cell && !rowOf(*cell))
             cell->hide();
@@ -280,7 +281,7 @@ QString Table::nameOf(std::size_t row)
 
 QStringList Table::textsOf(std::size_t row)
 {
-    // Outside of `showRow` nothing is offered for reuse: the cell is a new one, of the row's kind.
+    // Outside `showRow` no cell is offered for reuse. So this is a new cell, of the row's kind.
     const auto reusable = _source.cellForRowAtIndexPath(*this, {0, row});
     return cellOf(*reusable).texts();
 }
@@ -360,14 +361,14 @@ void Table::mouseMoveEvent(QMouseEvent* event)
         return;
     const QPointF moved = event->position() - _press->at;
     if (_press->drag == Drag::Undecided) {
-        constexpr double kStart = 8; // points; a finger on a tap moves less
+        constexpr double kStart = 8; // points; a finger moves less than this during a tap
         if (moved.manhattanLength() < kStart)
             return;
         const bool sideways = std::abs(moved.x()) > std::abs(moved.y());
         if (!sideways)
             _press->drag = Drag::Upright;
         else if (moved.x() > 0 && _press->at.x() < kEdge)
-            _press->drag = Drag::Ignored; // a swipe back, if it goes far enough
+            _press->drag = Drag::Ignored; // becomes a swipe back if it is long enough
         else
             _press->drag = _press->strip ? Drag::Sideways : Drag::Ignored;
         _hold.stop();
@@ -425,7 +426,7 @@ void Table::showTip(const QHelpEvent& event)
 
 bool Table::isOnItsRow(const Press& press, QPointF point)
 {
-    // Rows may have come or gone under the finger: what it lies on now was not meant.
+    // Rows may have been added or removed during the press. Another row under the finger is not pressed.
     return press.row && press.row == rowAt(point) && names()(*press.row) == press.name;
 }
 
@@ -505,7 +506,7 @@ void Table::openMenuOfCurrentRow()
 
 void Table::openMenu(std::optional<std::size_t> row, QPoint at)
 {
-    // A platform may report one key both as a key and as the wish for a menu.
+    // Some platforms report one key both as a key and as a menu request.
     if (!_rows || QApplication::activePopupWidget())
         return;
     if (row)
@@ -518,7 +519,7 @@ void Table::openMenu(std::optional<std::size_t> row, QPoint at)
 
 bool Table::event(QEvent* event)
 {
-    // A row's width does not change with the scheme or the font, but what stands in it does.
+    // A new scheme or font does not change a row's width, but its contents.
     if (event->type() == QEvent::ApplicationFontChange && isVisible())
         fill(true);
     return QAbstractScrollArea::event(event);

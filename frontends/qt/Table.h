@@ -19,7 +19,7 @@ class QScroller;
 
 namespace kestrum::qt {
 
-/// The table: cells for the rows in view, and a few spare ones.
+/// The table. It keeps cells for the rows in view, and a few spare ones.
 class Table final : public QAbstractScrollArea, public TableView {
 public:
     explicit Table(TableDataSource& source);
@@ -36,29 +36,29 @@ public:
     }
 
     std::size_t rows() const { return _rows; }
-    std::optional<std::size_t> current() const { return _current.row(); } ///< where the keyboard is
+    std::optional<std::size_t> current() const { return _current.row(); } ///< the row with the keyboard focus
     std::optional<std::size_t> selected() const { return _selected.row(); }
     void clearSelection();
     void makeCurrent(std::size_t row);
-    /// As a tap or Enter does.
+    /// Selects a row as a tap or Enter does.
     void select(std::size_t row);
 
     Cell* cellAt(std::size_t row) const;                      ///< null when it is not in view
-    std::vector<Cell*> cellsInView() const;                   ///< top down
+    std::vector<Cell*> cellsInView() const;                   ///< from the top down
     std::optional<std::size_t> rowOf(const Cell& cell) const; ///< nothing when it is not in view
     QString nameOf(std::size_t row);
-    /// Its key, and its value where it has one, as the data source gives them now.
+    /// The row's key, and its value if it has one, read from the data source now.
     QStringList textsOf(std::size_t row);
-    std::size_t cells() const; ///< those that wait to be used again among them
+    std::size_t cells() const; ///< including those that wait for reuse
 
-    /// The current row shows its ring although the keyboard is elsewhere: in the field that looks for a row.
+    /// Shows the current row's ring while the search field has the keyboard focus.
     void keepRing(bool kept);
 
-    /// What stands where the rows would be while there are none.
+    /// The text that is shown while there are no rows.
     void setHint(std::string_view text);
     const QLabel& hint() const { return _hint; }
 
-    /// Told of a swipe from the left edge.
+    /// Called after a swipe from the left edge.
     void onSwipeBack(std::function<void()> action) { _swipedBack = std::move(action); }
 
     QSize sizeHint() const override;
@@ -83,7 +83,7 @@ private:
     enum class Drag { Undecided, Sideways, Upright, Ignored };
     struct Press {
         QPointF at;
-        std::optional<std::size_t> row; ///< nothing when the press stopped a scroll
+        std::optional<std::size_t> row; ///< empty when the press stopped a scroll
         Drag drag = Drag::Undecided;
         QPointer<Strip> strip;
         std::string name; ///< of the row
@@ -105,7 +105,7 @@ private:
     void scrollTo(std::size_t row);
     void feed(QScroller& scroller, int input, const QMouseEvent& event);
     void scrollSideways(std::size_t row, double by);
-    /// False when the row is where it belongs.
+    /// False when the row already is at its place.
     bool bringBack(std::size_t row);
     void showTip(const QHelpEvent& event);
     void arrangeHint();
@@ -118,16 +118,16 @@ private:
     std::size_t _rows = 0;
     std::map<std::size_t, std::shared_ptr<ReusableCell>> _shown; ///< by row
     ReusePool _spare;
-    std::map<std::size_t, double> _sideways; ///< offsets of rows out of view that are not 0
-    std::optional<std::size_t> _asked;       ///< the row whose cell the data source is making
+    std::map<std::size_t, double> _sideways; ///< offsets other than 0 of rows out of view
+    std::optional<std::size_t> _asked;       ///< the row whose cell the data source creates now
     FollowedRow _current, _selected;
     std::optional<Press> _press;
     std::function<void()> _swipedBack;
     int _laidOutWidth = -1;
     bool _filling = false, _stale = true, _fitsRows = false, _ringKept = false;
-    QTimer _hold; ///< runs while a finger rests on a row
+    QTimer _hold; ///< runs while a finger stays on a row
     QLabel _hint;
-    QWidget* _mark; ///< how far the table is scrolled
+    QWidget* _mark; ///< shows the scroll position
 };
 
 } // namespace kestrum::qt

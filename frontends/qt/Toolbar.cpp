@@ -63,7 +63,7 @@ void Spinner::paintEvent(QPaintEvent*)
     painter.setPen(QPen(colours.line, 2));
     painter.drawEllipse(circle);
     painter.setPen(QPen(colours.muted, 2, Qt::SolidLine, Qt::RoundCap));
-    // Sixteenths of a degree, anticlockwise from three o'clock.
+    // In sixteenths of a degree, counterclockwise from three o'clock.
     painter.drawArc(circle, qRound((90 - _turning.currentValue().toDouble()) * 16), -100 * 16);
 }
 
@@ -198,7 +198,7 @@ void Toolbar::arrange()
         taken += width + kGap;
     }
     const double column = std::min(width(), kColumn);
-    // A button brings its own inset at the end.
+    // A button includes its inset at the end.
     const double room = column - kInset - (taken - kGap);
     double x = (width() - column) / 2 + kInset;
     for (const Place& place : places) {

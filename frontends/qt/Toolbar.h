@@ -11,7 +11,7 @@ namespace kestrum::qt {
 
 class Button;
 
-/// Small and grey, turning while something is awaited.
+/// A small grey circle that turns during a wait.
 class Spinner final : public QWidget {
 public:
     explicit Spinner(QWidget* parent = nullptr);
@@ -25,20 +25,20 @@ protected:
     void hideEvent(QHideEvent*) override;
 
 private:
-    /// Turns while it is seen, unless the desktop asks for reduced motion.
+    /// Turns while it is visible, unless the desktop is set to reduced motion.
     void turn();
 
     bool _running = false;
     QVariantAnimation _turning;
 };
 
-/// One line, or a few, cut short to one where there is no room for it; a screen reader hears it whole.
+/// A text of one or more lines, cut short where it does not fit. A screen reader gets the whole text.
 class LineLabel final : public QLabel {
 public:
     using QLabel::QLabel;
     void setLine(const QString& line);
-    double wanted() const; ///< the width of the whole line
-    /// May be broken into that many.
+    double wanted() const; ///< the width of the whole text in one line
+    /// Sets the maximum number of lines.
     void setLines(int lines);
     bool isCut() const;
 
@@ -50,7 +50,7 @@ private:
     int _lines = 1;
 };
 
-/// The bar under a pane. An item that stays at its place keeps its widget, whatever it says.
+/// The bar under a pane. An item that keeps its position keeps its widget, even when its text changes.
 class Toolbar final : public QWidget {
 public:
     Toolbar();
@@ -58,7 +58,7 @@ public:
     /// The widget of an item; null for a space.
     QWidget* widgetAt(std::size_t item) const { return item < _items.size() ? _items[item].widget : nullptr; }
 
-    /// Null where Save is not offered.
+    /// Null where Save is not available.
     Button* save() const;
 
     QSize sizeHint() const override;
