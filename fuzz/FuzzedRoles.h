@@ -9,7 +9,7 @@
 
 namespace kestrum::fuzz {
 
-/// What a generator needs: doubles, but for the property lists.
+/// The roles that a generator needs: doubles, except for the property lists.
 struct FuzzedRoles {
     RecordingLog log;
     RecordingConsole console;

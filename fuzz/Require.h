@@ -5,7 +5,7 @@
 
 namespace kestrum::fuzz {
 
-/// Ends the run, so that the fuzzer keeps the input.
+/// Ends the run if the condition is false, so that the fuzzer keeps the input.
 inline void require(bool condition, const char* what)
 {
     if (condition)

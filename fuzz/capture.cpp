@@ -1,9 +1,9 @@
 // A capture file, damaged or not. The first byte chooses the format: .kcap, .dlf, or the raw records of a snapshot's
 // interval, which are only searched.
 //
-// By the lengths alone: messages are the file's own bytes, in their order and without a gap, up to its end or to a fault
-// with its place. Searching behind damage: messages and skipped bytes are all of the file, in its order. Where the
-// lengths lead to the end, both give the same messages and nothing is skipped.
+// Read by lengths: the messages are the file's bytes, in order and without a gap, up to the end or to a fault with
+// its offset. Searched after damage: messages and skipped bytes together are the whole file, in order. Where the
+// lengths lead to the end, both ways give the same messages and nothing is skipped.
 #include "Require.h"
 #include "capture/CaptureWriter.h"
 #include "capture/RecordReader.h"
@@ -19,18 +19,18 @@ namespace {
 
 using Messages = std::vector<std::string>;
 
-/// The message as the file holds it.
+/// The message in the form that the file holds.
 std::string inFile(CaptureFormat format, Bytes message)
 {
     std::ostringstream written;
     if (format == CaptureFormat::Kcap)
         writeKcap(sinkTo(written), message);
     else
-        written << textOf(message.subspan(1)); // less the type byte that was put before it
+        written << textOf(message.subspan(1)); // without the type byte that the reader added
     return written.str();
 }
 
-/// The messages, when the lengths lead to the end.
+/// The messages; empty unless the lengths lead to the end.
 std::optional<Messages> byLengths(Bytes file, CaptureFormat format)
 {
     std::istringstream stream{std::string(textOf(file))};
@@ -45,7 +45,7 @@ std::optional<Messages> byLengths(Bytes file, CaptureFormat format)
     std::size_t behind = 0, notes = 0;
     while (const auto message = reader->next()) {
         require(window.offset() >= behind, "messages overlap");
-        // Between messages stand nothing but whole notes.
+        // Only whole notes stand between messages.
         require((window.offset() - behind) % kKcapGapSize == 0, "a gap between two messages");
         notes += (window.offset() - behind) / kKcapGapSize;
         behind = window.offset();

@@ -1,8 +1,9 @@
-// Channel messages of every technology, through its real generator, template and property lists. The first byte chooses
-// the technology; then messages, each behind its length (16 bits, little-endian), where a length of 0 is a refresh.
+// Channel messages of every technology, through its real generator, template and property lists. The first byte
+// chooses the technology. Messages follow, each after its length (16 bits, little-endian); a length of 0 is a
+// refresh.
 //
-// Equal bytes give equal displays and logs; a display has no keys but those of its template and its sections' rows; the
-// interval's raw messages are kept as they came; the history keeps five entries at most.
+// Equal bytes give equal displays and logs. A display has only keys of its template and of its sections' rows. The
+// interval's raw messages are kept unchanged. The history keeps at most five entries.
 #include "FuzzedRoles.h"
 #include "LogGenerator/Failures.h"
 #include "LogGenerator/LogGenerator.h"
@@ -27,10 +28,10 @@ namespace {
 
 struct Technology {
     std::string_view identifier;
-    std::string_view templateName;                       ///< none: its messages bring the whole display
-    bool keepsAll = false;                               ///< every message goes into the interval's raw bytes
+    std::string_view templateName;                       ///< empty: its messages carry the whole display
+    bool keepsAll = false;                               ///< every message is added to the interval's raw bytes
     std::set<std::string, std::less<>> rowKeys = {};     ///< of the rows of list sections
-    bool (*isListedKey)(std::string_view key) = nullptr; ///< of what a decoder lists at a place of its own
+    bool (*isListedKey)(std::string_view key) = nullptr; ///< for keys that a decoder lists at a fixed place
 };
 
 /// "_sorted", or an index and an offset as in "0;PN".
@@ -69,21 +70,21 @@ std::string pathOf(std::string_view templateName)
 
 PropertyListCodec kCodec;
 
-/// One generator, from its start on.
+/// One generator from its start.
 class Run : public FuzzedRoles {
 public:
     Run(const Technology& technology, const Value& loadedTemplate) : _technology(technology)
     {
         bundle.paths = {pathOf(technology.templateName)};
         if (loadedTemplate)
-            state.set("Template", loadedTemplate); // as read before: reading it is not what is tried here
+            state.set("Template", loadedTemplate); // loaded before: this target does not test the loading of templates
         _generator = LogGenerator::generatorFromTechnology(Value(technology.identifier), roles);
         require(_generator != nullptr, "no generator for the technology");
     }
 
     void receive(Bytes message)
     {
-        // What a decoder may throw, and nothing else.
+        // The only exceptions that a decoder may throw.
         try {
             _generator->updateState(state, message);
         } catch (const LogCode_0xFF0000::UnknownDataException& failure) {
@@ -128,7 +129,7 @@ private:
     std::vector<std::byte> _interval;
 };
 
-/// Whether the rows of a list have known keys, and texts alone or lists of such rows below them.
+/// Whether the rows of a list have known keys, and hold only texts or lists of such rows.
 bool isListing(const Technology& technology, const Value& value)
 {
     if (const auto dictionary = value.dictionary())
@@ -142,21 +143,21 @@ bool isListing(const Technology& technology, const Value& value)
     return value.isText();
 }
 
-/// Whether the display has no keys but those of the template beside it and of the rows listed inside it.
+/// Whether the display has only keys of the template beside it and of the rows listed inside it.
 bool hasShapeOf(const Technology& technology, const Value& templateNode, const Value& display)
 {
     const auto expected = templateNode.dictionary(), shown = display.dictionary();
     if (!expected || !shown)
         return isListing(technology, display);
     return std::ranges::all_of(*shown, [&](const Dictionary::Entry& entry) {
-        // These rows are the telephony service's own.
+        // The telephony service defines the keys of these rows.
         const bool isService = entry.key == "PDP Context Info" && entry.value.array();
         return expected->contains(entry.key) &&
                (isService || hasShapeOf(technology, expected->at(entry.key), entry.value));
     });
 }
 
-/// The template of each technology, read once.
+/// The template of each technology, loaded once.
 Value loadedTemplate(std::size_t technology)
 {
     static const auto templates = [] {
@@ -179,7 +180,7 @@ void decode(Bytes input)
     const std::string templateBefore = describe(templateNode);
 
     Run once(technology, templateNode), again(technology, templateNode);
-    constexpr int kMostRefreshes = 12; // twice what the history holds; zeros are many in what a fuzzer makes
+    constexpr int kMostRefreshes = 12; // twice the length of the history; inputs from a fuzzer contain many zeros
     int refreshes = 0;
     for (std::size_t at = 1; at < input.size();) {
         const auto length = record.from(at)->read(u16(0));

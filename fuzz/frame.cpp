@@ -1,5 +1,5 @@
-// The byte stream of a message port. However it is cut into pieces, the same frames come out, up to the same fault; and
-// what came out, written again, is what went in.
+// The byte stream of a message port. Any division into pieces gives the same frames, up to the same fault. The
+// frames, written again, are the input.
 #include "platform/posix/Frame.h"
 #include "Require.h"
 
@@ -19,7 +19,7 @@ struct Outcome {
     bool operator==(const Outcome&) const = default;
 };
 
-/// `piece`: how many bytes come at once.
+/// `piece`: the number of bytes that arrive at once.
 Outcome readInPieces(Bytes stream, std::size_t piece)
 {
     FrameReader reader;

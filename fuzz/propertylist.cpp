@@ -1,5 +1,5 @@
-// Any bytes are a property list or are refused with a reason; what is read can be written, and then reads the same,
-// whatever it is read over.
+// Any bytes are a property list or are refused with a reason. A list that was read can be written, and then reads the
+// same, whatever value its memory is reused from.
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <cstdint>
@@ -27,10 +27,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     require(read.offset <= size, "an offset beyond the end");
     if (!read)
         return 0;
-    // Replaced characters can make two keys equal, so it is the second list that has to stay as it is.
+    // Replaced characters can make two keys equal, so only the second list has to stay the same.
     const auto first = codec.toXml(read.value);
     if (!first)
-        return 0; // indented, a large one can exceed the limit
+        return 0; // indented, a large list can exceed the limit
     for (const auto& spent : {codec.parse(bytes), kestrum::Value(kestrum::makeArray({"", codec.parse(bytes)}))}) {
         const auto over = codec.toXml(codec.parseOver(bytes, kestrum::deepCopy(spent)));
         require(over && kestrum::textOf(over->bytes()) == kestrum::textOf(first->bytes()), "it reads differently over");

@@ -1,7 +1,7 @@
 // A snapshot file, whole or damaged.
 //
-// It is listed and recovered, or refused with a reason; twice the same; what a damaged one yields can be listed and
-// recovered too.
+// It is listed and recovered, or refused with a reason, and a second run gives the same result. The messages
+// recovered from a damaged file can be listed and recovered too.
 #include "tools/Snapshot.h"
 #include "Require.h"
 #include "platform/propertylist/PropertyListCodec.h"
@@ -18,7 +18,7 @@ using namespace tools;
 
 PropertyListCodec kCodec;
 
-/// What a person is shown of it, and its messages; nothing where it is refused.
+/// The listing for users and the messages; empty where the snapshot is refused.
 std::vector<std::string> recovered(const Value& list)
 {
     std::vector<std::string> all;

@@ -1,8 +1,8 @@
-// A template file. The first byte chooses the technology; the rest is the property list, XML or binary. Records of all
-// codes of the technology are shown in it.
+// A template file. The first byte chooses the technology; the rest is the property list, XML or binary. The display
+// shows records of all codes of the technology.
 //
-// Equal templates give equal displays; the template is not changed; every path of the tree leads to its node; a
-// generator that takes a display over goes on in that very display.
+// Equal templates give equal displays. The template is not changed. Every path of the tree leads to its node. A
+// generator that takes over a display continues in the same display.
 #include "FuzzedRoles.h"
 #include "LogGenerator/LogGenerator.h"
 #include "Require.h"
@@ -23,7 +23,7 @@ constexpr std::string_view kTechnologies[] = {kVoxLogChannelTechnology_Zephra_GS
                                               kVoxLogChannelTechnology_Zephra_LTE,
                                               kVoxLogChannelTechnology_Zephra_UTRAN2};
 
-/// A record whose counts are small and whose fields differ.
+/// A record with small counts and different fields.
 std::vector<std::byte> patterned(LogCode code)
 {
     constexpr std::size_t kLength = 160;
@@ -48,7 +48,7 @@ public:
             _codes.push_back(static_cast<LogCode>(each.int32().value_or(0)));
     }
 
-    /// A new generator on the old state, as after a reconnection.
+    /// Creates a new generator on the old state, as after a reconnection.
     void restart() { _generator = LogGenerator::generatorFromTechnology(Value(_technology), roles); }
 
     void receiveAll()
@@ -83,7 +83,7 @@ void show(Bytes input)
         return;
     const auto technology = kTechnologies[std::to_integer<std::size_t>(input.front()) % std::size(kTechnologies)];
     const Value templateNode = PropertyListCodec().parse(input.subspan(1));
-    // Anything else is refused where the template is loaded.
+    // Everything else is refused when the template is loaded.
     if (!templateNode.dictionary())
         return;
     const std::string before = describe(templateNode);

@@ -9,12 +9,12 @@
 
 namespace kestrum::tools {
 
-/// Reports which values of a display changed since the last look. It walks the display side by side with a copy of the
-/// last one and builds paths only of changes, so that it is fast enough to look after every message.
+/// Reports which values of a display have changed since the previous call. It compares the display with a copy of the
+/// previous one, and builds paths only for changes. So it is fast enough to run after every message.
 class Changes {
 public:
-    /// `path`: the value's place in the display, as a JSON Pointer (RFC 6901): display names may be equal, keys are
-    /// not. `value`: a leaf; null when it was removed.
+    /// `path`: the value's place in the display, as a JSON Pointer (RFC 6901). Keys are unique; display names may be
+    /// equal. `value`: a leaf; null when it was removed.
     using OnChange = std::function<void(std::string_view path, const Value& value)>;
 
     explicit Changes(OnChange onChange) : _onChange(std::move(onChange)) {}
@@ -22,7 +22,7 @@ public:
     void look(const Value& display) { compare(display, _seen); }
 
 private:
-    /// A step of the path: a key, or (without one) an index.
+    /// A step of the path: a key, or an index if there is no key.
     struct Step {
         const std::string* key;
         std::size_t index;

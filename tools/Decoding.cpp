@@ -14,13 +14,13 @@
 namespace kestrum::tools {
 namespace {
 
-// Messages before the first that shows the technology cannot be decoded yet.
+// Messages before the first one that shows the technology cannot be decoded yet.
 constexpr std::size_t kMostEarlyBytes = 16 << 20;
 
 // After this many bytes the generator drops the raw records that it keeps for a snapshot.
 constexpr std::size_t kInterval = 256 << 10;
 
-/// The codes that a start command asks for.
+/// The codes that the generator requests in a start command.
 std::set<LogCode> codesIn(const LogGenerator& generator)
 {
     std::set<LogCode> codes;
@@ -75,7 +75,7 @@ private:
     LogLine _line;
 };
 
-// Standard output holds only the display; and a capture is shown without today's date.
+// Standard output holds only the display, and a capture is decoded without today's date.
 class Decoding::Quiet final : public Console, public Clock {
 public:
     void printLine(std::string_view) override {}
@@ -136,8 +136,8 @@ Tally Decoding::total() const
     return sum;
 }
 
-// True when a generator was made. A log that continues in another technology gets another generator, as on the live
-// channel. A record whose code no display of its technology takes does not count.
+// True when a generator was created. A log that continues in another technology gets another generator, as on the
+// live channel. A record counts only if a display of its technology takes its code.
 bool Decoding::adoptTechnologyOf(Bytes message)
 {
     const auto technology = technologyOf(message);
@@ -204,7 +204,7 @@ Tally& Decoding::classified(Bytes message, Decoded& decoded, bool& reaches)
         return tally;
     }
     decoded.code = read->logCode;
-    // A stamp of 0 is none.
+    // A stamp of 0 means no time.
     if (const auto stamp = read->timeStamp().value_or(0); stamp != 0)
         _quiet->moment = *(decoded.time = dateFromTimeStamp(stamp));
     Tally& tally = _statistics[read->logCode];

@@ -19,48 +19,50 @@
 
 namespace kestrum::tools {
 
-/// What has become of the messages of one log code. Each is counted once: decoded, or under one of the others.
+/// What happened to the messages of one log code. Each message is counted once: as decoded, or under one of the
+/// others.
 struct Tally {
     std::uint64_t messages = 0;
     std::uint64_t decoded = 0;
-    std::uint64_t tooShort = 0;          ///< for one of its decoders at least
+    std::uint64_t tooShort = 0;          ///< for at least one of its decoders
     std::uint64_t withoutSubscriber = 0; ///< no section takes the code
-    std::uint64_t refused = 0;           ///< of an invalid type, no property list where one is due, or contradictory
+    std::uint64_t refused = 0;           ///< invalid type, missing property list, or contradictory contents
 
     std::uint64_t dropped() const { return tooShort + refused; }
     Tally& operator+=(const Tally& other);
 };
 
-/// "0xB0C2": as the standards and their tools write log codes.
+/// "0xB0C2": the notation of log codes in the standards and their tools.
 std::string codeText(LogCode code);
 
-/// By effective log code; nothing: messages that have none (the trees of an IFX modem, fragments).
+/// By effective log code. Empty: messages without a code (the trees of an IFX modem, fragments).
 using Statistics = std::map<std::optional<LogCode>, Tally>;
 
-/// Decodes a capture as the display does, with the memory of one display, however long the capture is.
+/// Decodes a capture as the display does. It needs only the memory of one display, however long the capture is.
 class Decoding {
 public:
-    /// A line of the system log: addresses are shown as null, so that two runs log the same.
+    /// Gets a line of the system log. Addresses are shown as null, so that two runs log the same.
     using LogLine = std::function<void(Priority, std::string_view)>;
 
-    /// What is known of a message once it is decoded.
+    /// The facts about a decoded message.
     struct Decoded {
         std::optional<Date> time; ///< from the record's time stamp
         std::optional<LogCode> code;
     };
     using Then = std::function<void(const Decoded&)>;
 
-    /// `technology`: an identifier, or empty when the messages decide. Bundle and lists outlive the decoding;
-    /// `then`, if there is one, is called behind each message.
+    /// `technology`: an identifier, or empty to find it in the messages. Bundle and lists must outlive this object.
+    /// `then`, if set, is called after each message.
     Decoding(std::string_view technology, Bundle& bundle, PropertyLists& lists, LogLine log, Then then);
     ~Decoding();
 
-    /// Messages are kept until one shows the technology. Throws std::runtime_error when too many come before it.
+    /// Stores messages until one shows the technology. Throws std::runtime_error when too many come before it.
     void take(Bytes message);
-    /// No further message comes. Throws std::runtime_error when there were messages, and none showed the technology.
+    /// Call it after the last message. Throws std::runtime_error when there were messages, but none showed the
+    /// technology.
     void finish();
 
-    /// Empty while it is not known.
+    /// Empty while the technology is not known.
     const std::string& technology() const { return _technology; }
     /// The display dictionary; null when there is none.
     Value display() const { return _state.at(StateKey::kDisplay); }
@@ -90,7 +92,7 @@ private:
     DecodingRoles _roles;
     State _state;
     std::unique_ptr<LogGenerator> _generator;
-    std::set<LogCode> _codes; ///< that the generator takes
+    std::set<LogCode> _codes; ///< the codes that the generator takes
     std::size_t _inInterval = 0;
 
     std::vector<std::vector<std::byte>> _early;

@@ -12,19 +12,19 @@
 
 namespace kestrum::tools {
 
-/// Files made of a snapshot, named after it: the DLF stream as it was written ("-written.dlf"), and what was recovered
-/// of it as a clean ".dlf" and ".kcap". All of them, or none.
+/// Files extracted from a snapshot, named after it: the DLF stream as it was written ("-written.dlf"), and the
+/// recovered messages as a clean ".dlf" and ".kcap". Writes all of them or none.
 class Extraction {
 public:
-    /// Makes the directory where it is missing. Throws std::runtime_error, naming the files that exist unless they are
-    /// to be replaced, and when a file cannot be written. Links are replaced, never followed.
+    /// Creates the directory if it is missing. Throws std::runtime_error when a file cannot be written, or, unless
+    /// files may be replaced, with the names of those that exist. Links are replaced, never followed.
     Extraction(const std::string& directory, const Snapshot& snapshot, WholeFile::Existing existing);
 
-    /// One recovered message.
+    /// Adds one recovered message.
     void take(Bytes message);
     void finish();
 
-    /// Messages that a DLF stream cannot hold: they stand in the ".kcap" alone.
+    /// The number of messages that a DLF stream cannot hold; only the ".kcap" has them.
     std::uint64_t inKcapAlone() const { return _inKcapAlone; }
 
 private:

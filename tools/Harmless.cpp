@@ -6,7 +6,7 @@
 namespace kestrum::tools {
 namespace {
 
-// Unicode's bidirectional controls let a text stand in another order than it is read in.
+// Unicode's bidirectional controls make a text appear in another order than it is stored.
 bool turnsDirection(char32_t character)
 {
     return character == 0x061C || character == 0x200E || character == 0x200F ||

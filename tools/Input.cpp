@@ -26,15 +26,15 @@ Input::Input(const std::string& path, bool follow)
 {
     if (_file < 0)
         fail("cannot be opened");
-    // A pipe ends when its writer does.
+    // A pipe is not watched: it ends when its writer closes it.
     if (!follow || !size() || path == "-")
         return;
-    // Watched before the first byte is read, so that no change falls between.
+    // The watch starts before the first read, so that no change is missed.
     _changes = ::inotify_init1(IN_CLOEXEC | IN_NONBLOCK);
     if (_changes < 0)
         fail("cannot be followed");
     watch();
-    // Another file may get its name.
+    // The folder is watched too, because another file may get the name.
     const auto slash = path.rfind('/');
     const auto directory = slash == path.npos ? "." : path.substr(0, slash + 1);
     if (::inotify_add_watch(_changes, directory.c_str(), IN_CREATE | IN_MOVED_TO | IN_DELETE | IN_MOVED_FROM) < 0)

@@ -9,7 +9,7 @@
 
 namespace kestrum::tools {
 
-/// A file that is read from beginning to end and, where it is followed, further as it grows.
+/// A file that is read from beginning to end and, if it is followed, further while it grows.
 class Input {
 public:
     /// "-" is standard input. Throws std::system_error when it cannot be opened.
@@ -20,13 +20,13 @@ public:
 
     /// 0 at the end. Throws std::system_error.
     std::size_t read(std::span<std::byte> into);
-    /// Nothing for anything but a regular file.
+    /// Empty unless the input is a regular file.
     std::optional<std::uint64_t> size() const;
 
     /// Whether it may grow: a regular file that is followed.
     bool mayGrow() const { return _changes >= 0; }
-    /// Restarted: another file has its name now, or it was emptied; it is read from its start. Gone: it was deleted and
-    /// not replaced yet.
+    /// Restarted: another file has the name now, or the file was emptied; reading starts again at its beginning.
+    /// Gone: the file was deleted and not replaced yet.
     enum class Woken { Changed, Restarted, Gone, TimedOut, Ended };
     /// Waits until the file has changed, or the program is asked to end (SIGINT, SIGTERM, SIGHUP).
     Woken wait(std::optional<std::chrono::milliseconds> atMost);

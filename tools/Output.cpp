@@ -18,7 +18,7 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
-/// Digits of a second's fraction: time stamps count 1.25 ms.
+/// Digits of the fraction of a second: time stamps count 1.25 ms.
 constexpr int kFraction = 6;
 
 std::string text(const Json& json, int indent = -1)
@@ -51,7 +51,7 @@ Json jsonOf(const Value& value)
     }
     case Value::Kind::Dictionary: {
         Json object = Json::object();
-        // No two keys are equal: none has to be looked for.
+        // Keys are unique, so the entries need no search.
         auto& entries = object.get_ref<Json::object_t&>();
         for (const auto& [key, held] : *value.dictionary())
             entries.push_back({key, jsonOf(held)});
@@ -63,7 +63,7 @@ Json jsonOf(const Value& value)
     return nullptr;
 }
 
-/// Appends a text as JSON. Nearly all are plain, and need no more than quotes.
+/// Appends a text as JSON. Nearly all texts are plain and need only quotes.
 void appendJson(std::string& to, std::string_view raw)
 {
     const auto isPlain = [](char c) { return c >= 0x20 && c < 0x7F && c != '"' && c != '\\'; };
@@ -83,7 +83,7 @@ std::string numberText(double number)
     return {digits, std::to_chars(std::begin(digits), std::end(digits), number).ptr};
 }
 
-/// A value in a cell of a table or a line of a tree: a text as it is.
+/// A value as plain text, for a table's cell or a line of a tree.
 std::string plainText(const Value& value)
 {
     if (auto words = value.text())
@@ -120,7 +120,7 @@ void list(const SnapshotListing& listing, OutputFile& to)
     }
 }
 
-/// Remarks that do not belong among the data.
+/// Remarks that are not part of the data.
 class RemarkingOutput : public Output {
 public:
     RemarkingOutput(Contents contents, OutputFile& data, OutputFile& remarks)
@@ -185,8 +185,8 @@ private:
     bool _again = false;
 };
 
-/// The log of a long capture does not fit into memory: until the display, which comes before it, is known, it stands
-/// in a file without a name.
+/// The log of a long capture does not fit into memory. It waits in an unnamed file until the display, which comes
+/// before it, is complete.
 class JsonOutput final : public Output {
 public:
     JsonOutput(Contents contents, OutputFile& data)
@@ -221,7 +221,7 @@ public:
             _data.write(written + '\n');
             return _data.flush();
         }
-        written.resize(written.size() - 2); // the closing brace on its line
+        written.resize(written.size() - 2); // the closing brace and its line
         _data.write(written + ",\n  \"log\": [");
         copyLog();
         _data.write(_lines == 0 ? "]\n}\n" : "\n  ]\n}\n");
@@ -289,8 +289,8 @@ private:
     }};
 };
 
-/// RFC 4180: a cell with a quote, a comma or a line end stands in quotes, and quotes inside it twice. Lines end with
-/// CR LF.
+/// A CSV cell (RFC 4180). A cell with a quote, a comma or a line end is put in quotes, and quotes inside it are
+/// doubled. Lines end with CR LF.
 std::string cell(std::string_view raw)
 {
     if (raw.find_first_of("\",\r\n") == raw.npos)
@@ -301,7 +301,7 @@ std::string cell(std::string_view raw)
     return quoted + '"';
 }
 
-/// "-98.25 dBm": a sign, a number, and perhaps a unit behind a blank.
+/// "-98.25 dBm": a sign, a number, and optionally a blank and a unit.
 bool isNumber(std::string_view raw)
 {
     const auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
@@ -316,7 +316,7 @@ bool isNumber(std::string_view raw)
                             }));
 }
 
-/// What a spreadsheet would take for a formula stands behind an apostrophe: there it is text.
+/// An apostrophe makes a spreadsheet treat a formula as text.
 std::string guarded(std::string text)
 {
     const bool isFormula =
@@ -352,7 +352,7 @@ private:
     }
 
     const Decoding::Decoded* _decoded = nullptr;
-    std::string _begin; ///< of the message's rows, once there is one
+    std::string _begin; ///< the first cells of the message's rows; empty until the first row
     Changes _changes{[this](std::string_view path, const Value& value) {
         _data.write(begin());
         _data.write(cell(path));

@@ -14,22 +14,22 @@ namespace kestrum::tools {
 
 enum class OutputFormat { Tree, Json, Jsonl, Csv };
 
-/// Puts what is decoded on standard output.
+/// Writes the decoded messages and the display to standard output.
 class Output {
 public:
     virtual ~Output() = default;
 
-    /// One more message is decoded.
+    /// Called after each decoded message.
     virtual void message(const Decoding&, const Decoding::Decoded&) {}
     virtual void logLine(Priority priority, std::string_view text) = 0;
     virtual void snapshot(const SnapshotListing& listing) = 0;
-    /// The display as it stands: at the end, and, of a file that is followed, whenever its end was met.
+    /// Called with the current display at the end, and whenever the end of a followed file is reached.
     virtual void display(const Decoding&) {}
 
-    /// What is written beside the values.
+    /// What is written besides the values.
     struct Contents {
         bool log = false;     ///< lines of the system log
-        bool numbers = false; ///< jsonl: {"text", "number", "unit"} for a value that measures something
+        bool numbers = false; ///< jsonl: {"text", "number", "unit"} for a value with a number
     };
     static std::unique_ptr<Output> make(OutputFormat format, Contents contents, OutputFile& data, OutputFile& remarks);
 };

@@ -6,7 +6,7 @@
 
 namespace kestrum::tools {
 
-/// The reader of our output has closed it: the rest is not wanted.
+/// The reader has closed the pipe of our output and wants no more.
 struct ClosedPipe {};
 
 /// Standard output cannot be written.
@@ -15,15 +15,15 @@ public:
     using std::runtime_error::runtime_error;
 };
 
-/// Text for a file descriptor, written in large pieces. Throws ClosedPipe or OutputFailure, unless losses are ignored.
+/// Buffered text for a file descriptor. Throws ClosedPipe or OutputFailure, unless losses are ignored.
 class OutputFile {
 public:
     enum class Loss { Throws, Ignored };
     explicit OutputFile(int descriptor, Loss loss = Loss::Throws);
 
-    /// Text from files and modems: made harmless on a terminal, unchanged elsewhere.
+    /// Writes text from files and modems: made harmless on a terminal, unchanged elsewhere.
     void write(std::string_view text);
-    /// Our own text, which may move the cursor.
+    /// Writes our own text, which may contain control sequences.
     void control(std::string_view text);
     void flush();
 

@@ -24,10 +24,10 @@ using SteadyClock = std::chrono::steady_clock;
 
 constexpr int kBadInput = 1, kUsageError = 2;
 
-/// A snapshot cannot be followed.
+/// Thrown for a followed snapshot, which is not possible.
 struct WrongUsage {};
 constexpr std::uint64_t kMostFaultLines = 100;
-/// The display of a followed file is shown again after this time at the earliest, as the panes are.
+/// The shortest interval between two displays of a followed file, as in the panes.
 constexpr std::chrono::milliseconds kRefresh{2000};
 
 /// Shows the progress of a long run on a terminal.
@@ -47,7 +47,7 @@ public:
         _to.flush();
         _isShown = true;
     }
-    /// Makes room for a line.
+    /// Removes the progress, so that a line can be written.
     void clear()
     {
         if (std::exchange(_isShown, false))
@@ -79,7 +79,7 @@ public:
                 decode(file, &file == &_options.files.back());
             finish();
         } catch (const ClosedPipe&) {
-            return 0; // The rest is not wanted.
+            return 0; // The reader wants no more.
         } catch (const WrongUsage&) {
             complain(_file + ": a snapshot does not grow, and cannot be followed");
             return kUsageError;
@@ -95,7 +95,7 @@ private:
         try {
             Input input(file, _options.follow && isLast);
             do {
-                // Shows what is decoded before it waits for more.
+                // Shows the decoded messages before it waits for more.
                 ByteWindow window([&](std::span<std::byte> into) {
                     _data.flush();
                     _remarks.flush();
@@ -189,7 +189,7 @@ private:
         if (!_options.extract.empty())
             try {
                 const auto stem = std::filesystem::path(file).stem().string();
-                // The next snapshot of this run does not replace what this one wrote.
+                // A snapshot of this run must not replace the files of an earlier snapshot of this run.
                 const bool mayReplace = _options.force && _extracted.insert(stem).second;
                 extraction.emplace(_options.extract, snapshot, mayReplace ? Existing::Replaced : Existing::Kept);
             } catch (const std::exception& error) {
@@ -273,7 +273,7 @@ private:
 
     const DecodeOptions& _options;
     OutputFile _data{STDOUT_FILENO}, _remarks{STDERR_FILENO, OutputFile::Loss::Ignored};
-    // Not between rows that the same terminal shows at once.
+    // Not shown on a terminal that shows the rows.
     Progress _progress{_remarks,
                        !_options.follow && (_options.format == OutputFormat::Tree ||
                                             _options.format == OutputFormat::Json || ::isatty(STDOUT_FILENO) == 0)};
@@ -281,13 +281,13 @@ private:
     std::unique_ptr<Output> _output;
     Decoding _decoding;
 
-    std::string _file; ///< as it is called in remarks
+    std::string _file; ///< its name in remarks
     ByteWindow* _window = nullptr;
     struct {
-        std::uint64_t lines = 0, unreported = 0; ///< faults; bytes skipped in those without a line
+        std::uint64_t lines = 0, unreported = 0; ///< faults; bytes skipped by faults that were not reported in a line
     } _faults;
     std::uint64_t _skipped = 0, _missing = 0;
-    std::set<std::string> _extracted; ///< stems of snapshots
+    std::set<std::string> _extracted; ///< the snapshots' names without extension
     bool _isBad = false, _isRestarted = false;
     std::uint64_t _shownMessages = 0;
     SteadyClock::time_point _nextDisplay{};
@@ -297,7 +297,7 @@ private:
 
 int decodeFiles(const DecodeOptions& options, Bundle& bundle)
 {
-    // The write reports a reader that has closed the pipe.
+    // With SIGPIPE ignored, write() reports that the reader has closed the pipe.
     std::signal(SIGPIPE, SIG_IGN);
     return Program(options, bundle).run();
 }

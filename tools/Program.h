@@ -11,7 +11,7 @@ class Bundle;
 
 namespace kestrum::tools {
 
-/// What the command line asks for.
+/// The options of the command line.
 struct DecodeOptions {
     std::vector<std::string> files; ///< "-": standard input
     std::string technology;         ///< an identifier; empty: found in the messages
@@ -21,8 +21,8 @@ struct DecodeOptions {
     bool force = false;  ///< extracted files replace existing ones
 };
 
-/// Decodes the files, as parts of one log, onto standard output; all else goes to standard error. Gives the exit
-/// status: 0, or 1 when there was bad input, whose good parts are shown all the same.
+/// Decodes the files, as parts of one log, to standard output. Everything else goes to standard error. Returns the
+/// exit status: 0, or 1 for bad input, whose good parts are shown nevertheless.
 int decodeFiles(const DecodeOptions& options, Bundle& bundle);
 
 } // namespace kestrum::tools

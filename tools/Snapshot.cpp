@@ -34,7 +34,7 @@ std::optional<std::string> textAt(const Dictionary& dictionary, std::string_view
     return dictionary.at(key).text();
 }
 
-/// The bytes of base64 up to where it is cut off or damaged.
+/// The decoded bytes of base64, up to the point where it is cut off or damaged.
 Data dataBefore(std::string_view damaged)
 {
     constexpr std::string_view kAlphabet = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/=";
@@ -139,7 +139,7 @@ void Snapshot::recover(PropertyLists& lists, const std::function<void(Bytes)>& t
         else
             _onFault({0, leavesOf(tree), "a tree cannot be serialised"});
     }
-    // The stream lacks the first byte of each interval.
+    // The stream does not contain the first byte of each interval.
     std::size_t accounted = versionReport().size();
     for (const auto& [entry, interval] : _intervals)
         accounted += interval.size() >= 2 ? interval.size() - 1 : 0;

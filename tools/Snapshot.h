@@ -17,12 +17,12 @@ class PropertyLists;
 
 namespace kestrum::tools {
 
-/// What a snapshot file holds, as it says itself.
+/// The facts about a snapshot file that it states itself.
 struct SnapshotListing {
     struct Entry {
-        std::string description;  ///< empty where it has none
-        std::string date;         ///< empty where it has none
-        std::uint64_t size = 0;   ///< of the raw records or the DLF stream, bytes; of a tree, values
+        std::string description;  ///< empty: none
+        std::string date;         ///< empty: none
+        std::uint64_t size = 0;   ///< of the raw records or the DLF stream: bytes; of a tree: values
         std::string_view content; ///< "records", "DLF", "tree", or "nothing"
     };
     std::string file;
@@ -30,23 +30,23 @@ struct SnapshotListing {
     std::vector<Entry> entries;
 };
 
-/// A snapshot that the save screen wrote.
+/// A snapshot from the save screen.
 class Snapshot {
 public:
-    /// What can be read of a snapshot whose property list is damaged: its raw records. Null when there are none.
+    /// The raw records of a snapshot whose property list is damaged. Null when there are none.
     static Value salvaged(Bytes xml);
 
-    /// Throws std::runtime_error when the property list is no snapshot. Whatever else is wrong with it is reported.
+    /// Throws std::runtime_error when the property list is no snapshot. Other faults are reported.
     Snapshot(std::string file, const Value& propertyList, CaptureReader::OnFault onFault);
 
     const SnapshotListing& listing() const { return _listing; }
-    /// The DLF stream as it was written; nothing when there is none.
+    /// The DLF stream as it was written; empty when there is none.
     const std::optional<Data>& dlf() const { return _dlf; }
-    /// The version report that opens it; empty when none does.
+    /// The version report at the stream's start; empty when it has none.
     Bytes versionReport() const;
 
-    /// Gives every channel message that can be recovered, in order: from the intervals' raw records, which are whole,
-    /// or, where those are missing, from the DLF stream; the trees of an IFX modem serialised anew.
+    /// Gives every channel message that can be recovered, in order: from the intervals' raw records, which are
+    /// complete, or, where those are missing, from the DLF stream. The trees of an IFX modem are serialised again.
     void recover(PropertyLists& lists, const std::function<void(Bytes)>& take) const;
 
 private:
@@ -54,7 +54,7 @@ private:
               const std::function<void(Bytes)>& take) const;
 
     SnapshotListing _listing;
-    std::vector<std::pair<std::size_t, Data>> _intervals; ///< with the index of the entry
+    std::vector<std::pair<std::size_t, Data>> _intervals; ///< with the entry's index
     std::vector<Value> _trees;
     std::optional<Data> _dlf;
     std::size_t _dlfEntry = 0;

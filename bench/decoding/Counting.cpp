@@ -4,7 +4,7 @@
 #include <new>
 
 namespace {
-std::size_t count = 0; // one thread measures
+std::size_t count = 0; // only one thread measures
 }
 
 void* operator new(std::size_t size)

@@ -4,7 +4,7 @@
 
 namespace kestrum::bench {
 
-/// How often the heap was asked for memory since the program began.
+/// The number of heap allocations since the program's start.
 std::size_t allocations();
 
 } // namespace kestrum::bench

@@ -1,4 +1,5 @@
-// GSM and UMTS by the real generator: a mix of records as a drive gives them, and each dictionary section's record alone.
+// GSM and UMTS through the real generator: a mix of records as in a drive, and each dictionary section's record
+// alone.
 #include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
 #include "decoding/Messages.h"
 #include "doubles/Places.h"
@@ -14,7 +15,7 @@ Message messageOf(const RecordBuilder& record)
     return copied(record.bytes());
 }
 
-/// The generator on its shipped template.
+/// The generator with its shipped template.
 class Gsm {
 public:
     Gsm()
@@ -26,7 +27,7 @@ public:
     void receive(const Message& message)
     {
         _generator->updateState(_state, message);
-        // The refresh hands the raw messages over, so that their buffer does not grow for ever.
+        // A refresh takes the raw messages, so that their buffer stays bounded.
         if (++_received % 100'000 == 0)
             _generator->generateLogUsingState(_state);
     }
@@ -52,7 +53,7 @@ const RecordBuilder kIdentity = record(0x5134, 26).u16(13, 871).u16(15, 63).u16(
 
 void gsmStream(benchmark::State& run)
 {
-    // Measurements come often, states seldom.
+    // Measurements are frequent, states rare.
     std::vector<Message> mix;
     for (const auto& [record, times] : {std::pair{&kMeasurements, 8},
                                         {&kSearcher, 8},

@@ -5,7 +5,7 @@
 namespace kestrum::bench {
 namespace {
 
-/// Writes the form "bplist00" with offsets of two bytes and references of one.
+/// Writes the format "bplist00" with offsets of two bytes and references of one byte.
 class Writer {
 public:
     std::vector<std::byte> write(const Value& root)
@@ -25,7 +25,7 @@ public:
     }
 
 private:
-    /// Children stand before their parent.
+    /// Children are written before their parent.
     std::size_t object(const Value& value)
     {
         std::vector<std::size_t> references;

@@ -15,7 +15,7 @@
 
 namespace kestrum::bench {
 
-/// What decoding needs, doing nothing: only the decoding is measured.
+/// The roles that decoding needs, all without effect: the benchmark measures only the decoding.
 struct Surroundings {
     class Log final : public SystemLog {
         void write(Priority, std::string_view) override {}
@@ -37,11 +37,11 @@ inline std::vector<std::byte> copied(Bytes bytes)
     return {bytes.begin(), bytes.end()};
 }
 
-/// The binary form of a list of dictionaries, arrays and strings of ASCII, up to 250 different objects.
+/// The binary form of a list of dictionaries, arrays and ASCII strings, with up to 250 different objects.
 std::vector<std::byte> binaryPropertyList(const Value& root);
 
-/// Measures `work` on one message: messages and bytes a second, heap allocations a message. `plainCopy` of as many
-/// bytes is what to compare it with.
+/// Measures `work` on one message: messages and bytes per second, heap allocations per message. Compare it with
+/// `plainCopy` of as many bytes.
 template <typename Work>
 void measure(benchmark::State& run, const std::vector<std::byte>& message, Work work)
 {

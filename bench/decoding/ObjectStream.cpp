@@ -1,4 +1,4 @@
-// The IFX path: a message's bytes to the state, and on to the display tree.
+// The IFX path: from a message's bytes to the state, and from there to the display tree.
 #include "LogGenerator/GSM/GSMLogGenerator.h"
 #include "core/KestrumModelNode.h"
 #include "decoding/Messages.h"
@@ -7,7 +7,7 @@
 namespace kestrum::bench {
 namespace {
 
-/// A display as a modem sends it: a serving cell, eight neighbours behind their header, wrappers around values.
+/// A display as a modem sends it: a serving cell, eight neighbours after their header, wrappers around values.
 Value display()
 {
     const auto wrapped = [](const char* text) { return Value(makeDictionary({{"value", text}})); };

@@ -1,4 +1,4 @@
-// What the other figures are compared with: the same bytes, merely copied.
+// The reference for the other figures: the same bytes, only copied.
 #include "decoding/Messages.h"
 
 namespace kestrum::bench {

@@ -1,4 +1,4 @@
-// The binary path without any technology's own conversions: routing, one dictionary section of six rows, the raw copy.
+// The binary path without the conversions of a technology: routing, one dictionary section of six rows, the raw copy.
 #include "LogGenerator/ClassIndex.h"
 #include "LogGenerator/ZPHLogGenerator2.h"
 #include "decoding/Messages.h"
@@ -47,7 +47,7 @@ void templateStream(benchmark::State& run)
     int interval = 0;
     measure(run, message, [&] {
         generator.updateState(state, message);
-        // The refresh hands the raw messages over, so that their buffer does not grow for ever.
+        // A refresh takes the raw messages, so that their buffer stays bounded.
         if (++interval % 100'000 == 0)
             generator.generateLogUsingState(state);
     });

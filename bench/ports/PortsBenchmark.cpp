@@ -1,4 +1,4 @@
-// Messages from one process to another through the message ports: this program sends to itself, started once more.
+// Messages between two processes through the message ports. The sender is a second process of this program.
 #include "platform/SystemLog.h"
 #include "platform/qt/FrameSocket.h"
 #include "platform/qt/LinuxMessagePorts.h"
@@ -27,14 +27,15 @@ using namespace std::chrono;
 
 using Payloads = std::vector<std::vector<std::byte>>;
 
-constexpr std::size_t kMessages = 200'000; // in one measurement
-constexpr std::size_t kKept = 256 << 10;   // as the service lets a socket keep
+constexpr std::size_t kMessages = 200'000; // per measurement
+constexpr std::size_t kKept = 256 << 10;   // the buffer that the service gives a socket
 
 struct NoLog final : SystemLog {
     void write(Priority, std::string_view) override {}
 };
 
-/// What both processes make of the same words: a number is a size, all else is a scenario's name.
+/// Gives both processes the same payloads for the same argument: a number is a size, everything else a scenario's
+/// name.
 Payloads payloadsOf(const std::string& what)
 {
     if (std::ranges::all_of(what, [](char c) { return c >= '0' && c <= '9'; }))
@@ -75,7 +76,7 @@ duration<double> timeOfCopies(const Payloads& payloads)
     return steady_clock::now() - begin;
 }
 
-/// From the first message's arrival to the last one's end; `receive` is called with each.
+/// Measures from the first message's arrival to the last one's end. Calls `receive` with each message.
 void throughPorts(benchmark::State& state, const std::string& what, const std::function<void(Bytes)>& receive)
 {
     NoLog log;
@@ -124,10 +125,10 @@ void transport(benchmark::State& state)
                  [](Bytes payload) { benchmark::DoNotOptimize(payload.data()); });
 }
 
-/// The whole way that the application's messages go, up to the display.
+/// The whole path of the application's messages, up to the display.
 void endToEnd(benchmark::State& state, const Scenario& scenario)
 {
-    constexpr std::size_t kMessagesOfARefresh = 300; // two seconds of a drive
+    constexpr std::size_t kMessagesOfARefresh = 300; // as in two seconds of a drive
     Decoding decoding(scenario.technology);
     std::size_t received = 0;
     throughPorts(state, std::string(scenario.name), [&](Bytes payload) {
@@ -147,7 +148,7 @@ void registerAll()
         ->Iterations(5)
         ->Unit(benchmark::kMillisecond);
     for (const Scenario& scenario : scenarios())
-        if (scenario.name != "drive") // which changes its technology on the way
+        if (scenario.name != "drive") // the scenario "drive" changes its technology on the way
             benchmark::RegisterBenchmark(("to the display: " + std::string(scenario.name)).c_str(), endToEnd, scenario)
                 ->UseManualTime()
                 ->Iterations(5)

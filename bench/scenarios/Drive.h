@@ -13,15 +13,15 @@ namespace kestrum::bench {
 
 using std::chrono::microseconds;
 
-/// Whenever so much of a drive has passed, the application refreshes the display.
+/// The application refreshes the display each time this much of a drive has passed.
 inline constexpr microseconds kRefresh = std::chrono::seconds(2);
 
-/// The messages of a scenario's first technology, made while they are asked for.
+/// The messages of a scenario's first technology, generated on request.
 class Drive {
 public:
     explicit Drive(const Scenario& scenario);
 
-    /// Nothing at the end, and where the technology changes.
+    /// Empty at the end, and where the technology changes.
     std::optional<Source::Message> next();
 
 private:
@@ -30,16 +30,16 @@ private:
     std::string_view _technology;
 };
 
-/// So much of it, in memory: what is measured is then the decoding alone.
+/// The first `time` of a scenario, in memory, so that only the decoding is measured.
 std::vector<Source::Message> driven(const Scenario& scenario, std::chrono::minutes time);
 
-/// The real generator on its shipped template.
+/// The real generator with its shipped template.
 class Decoding {
 public:
     explicit Decoding(std::string_view technology);
 
     void receive(Bytes message) { _generator->updateState(state, message); }
-    /// The display, and its tree.
+    /// Updates the display and its tree.
     void refresh();
 
     State state;

@@ -1,4 +1,4 @@
-// Each scenario's own mix of messages: decoded as fast as possible, refreshed with every list full, and for a day.
+// Each scenario's mix of messages: decoded as fast as possible, refreshed with all lists full, and run for a day.
 #include "scenarios/Drive.h"
 
 #include <algorithm>
@@ -16,7 +16,7 @@ namespace {
 
 using namespace std::chrono;
 
-/// Of this process's own time: what else the machine does is left out.
+/// The time of this process alone, without the machine's other work.
 duration<double> processorTime()
 {
     return duration<double>(static_cast<double>(std::clock()) / CLOCKS_PER_SEC);
@@ -31,8 +31,9 @@ void decode(benchmark::State& run, const Scenario& scenario)
     for (const auto& message : messages)
         bytes += message.bytes.size();
 
-    // Taken as the application takes them: fresh from a port's buffer, not from far away in memory; and whenever two
-    // seconds of the drive have passed it refreshes, unmeasured here, and takes the raw messages over.
+    // As in the application: a message comes from a port's recent buffer, not from cold memory. After every two
+    // seconds of the drive the display is refreshed, which also takes the raw messages. The refresh is not measured
+    // here.
     std::vector<std::span<const Source::Message>> spells;
     for (auto from = messages.begin(); from != messages.end();) {
         const auto to = std::ranges::find_if(
@@ -58,7 +59,7 @@ void decode(benchmark::State& run, const Scenario& scenario)
             decoding.refresh();
         }
     };
-    drive(); // the display takes its form
+    drive(); // creates the display's values
     decodingTime = {};
     allocated = 0;
 
@@ -84,7 +85,7 @@ void decode(benchmark::State& run, const Scenario& scenario)
     run.counters["plain copies"] = decodingTime / copyingTime;
 }
 
-/// Every list of the display made as long as lists get, every row as wide.
+/// Makes every list of the display as long, and every row as wide, as they can get.
 void fill(const Value& node)
 {
     constexpr int kRows = 32, kCells = 12;
@@ -115,7 +116,7 @@ void refresh(benchmark::State& run, const Scenario& scenario)
         decoding.refresh();
 }
 
-/// Of this process, in MiB.
+/// The memory of this process, in MiB.
 double resident()
 {
     std::ifstream file("/proc/self/statm");
@@ -156,7 +157,7 @@ void registerAll()
             ->Unit(benchmark::kMillisecond);
         benchmark::RegisterBenchmark(named("refresh").c_str(), refresh, scenario)->Unit(benchmark::kMicrosecond);
     }
-    // Last, since what the others leave behind counts as resident too.
+    // Registered last, because memory that the other benchmarks keep counts as resident too.
     for (const Scenario& scenario : scenarios())
         benchmark::RegisterBenchmark((std::string("day/") + std::string(scenario.name)).c_str(), day, scenario)
             ->Iterations(1)
