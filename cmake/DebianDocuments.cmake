@@ -1,4 +1,4 @@
-# Run by CPack over what it is about to pack: the documents as Debian wants them, in its places and compressed.
+# CPack runs this on the files to be packed: it compresses the documents and moves them to Debian's places for them.
 set(usr ${CPACK_TEMPORARY_INSTALL_DIRECTORY}/usr)
 set(documents ${usr}/share/doc/${CPACK_PACKAGE_NAME})
 set(source ${CMAKE_CURRENT_LIST_DIR}/..)

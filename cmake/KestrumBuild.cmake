@@ -1,4 +1,4 @@
-# How every target is compiled.
+# Compiler settings of all targets.
 set(CMAKE_CXX_STANDARD 20)
 set(CMAKE_CXX_STANDARD_REQUIRED ON)
 set(CMAKE_CXX_EXTENSIONS OFF)
@@ -21,7 +21,8 @@ if(CMAKE_CXX_COMPILER_ID STREQUAL GNU)
 endif()
 if(KESTRUM_WERROR)
     add_compile_options(-Werror)
-    # GCC 12 sees overlaps in "literal" + std::string where there are none, and what a variant does not hold.
+    # GCC 12 reports false overlaps in "literal" + std::string, and reads of a variant's alternative that it does not
+    # hold.
     if(CMAKE_CXX_COMPILER_ID STREQUAL GNU)
         add_compile_options(-Wno-error=restrict -Wno-error=maybe-uninitialized)
     endif()

@@ -1,13 +1,13 @@
-# One folder of the house: a static library that sees its own headers and those of the folders it
-# names, nothing else.
+# A folder of the source tree as a static library. It sees its own headers and those of the folders that it names, and
+# no others.
 #
 #   kestrum_folder(core USES LogGenerator platform SOURCES KestrumModel.cpp)
 #
-# FOLDER gives the include prefix where it differs from the target's name (target
-# platform_propertylist, headers <platform/propertylist/...>).
+# FOLDER gives the include prefix where it differs from the target's name (target platform_propertylist, headers
+# <platform/propertylist/...>).
 find_package(Threads REQUIRED)
 
-# Off where people work: a header that a file forgot to include would not be noticed.
+# Off for developers: a precompiled header hides a missing #include.
 option(KESTRUM_PRECOMPILED "Compile the standard library's headers once" OFF)
 set(standard_headers <algorithm> <array> <chrono> <cmath> <cstdint> <filesystem> <functional> <map> <memory> <optional>
     <span> <string> <string_view> <variant> <vector>)
@@ -18,8 +18,8 @@ function(kestrum_folder name)
         set(arg_FOLDER ${name})
     endif()
     add_library(${name} STATIC ${arg_SOURCES})
-    # An include root with this folder's own headers alone in it: <core/...> is found only by those
-    # who use core, and <platform/posix/...> not by those who use platform.
+    # An include root with only this folder's headers: <core/...> is found only by users of core, and
+    # <platform/posix/...> not by users of platform.
     set(root ${CMAKE_BINARY_DIR}/roots/${name})
     file(REMOVE_RECURSE ${root})
     file(MAKE_DIRECTORY ${root}/${arg_FOLDER})
@@ -28,16 +28,16 @@ function(kestrum_folder name)
         file(CREATE_LINK ${CMAKE_CURRENT_SOURCE_DIR}/${header} ${root}/${arg_FOLDER}/${header} SYMBOLIC)
     endforeach()
     target_include_directories(${name} PUBLIC ${root})
-    # Libraries of the adapters stay private: who uses the folder does not see their headers.
+    # Libraries of the adapters are private: users of the folder do not see their headers.
     set(libraries PRIVATE ${arg_LIBRARIES})
     if(KESTRUM_VERIFY_HEADERS)
         list(TRANSFORM headers PREPEND ${root}/${arg_FOLDER}/)
-        set_source_files_properties(${headers} PROPERTIES SKIP_AUTOMOC ON) # their originals have theirs
+        set_source_files_properties(${headers} PROPERTIES SKIP_AUTOMOC ON) # the originals have their own moc files
         target_sources(${name} PUBLIC FILE_SET HEADERS BASE_DIRS ${root} FILES ${headers})
         set_target_properties(${name} PROPERTIES VERIFY_INTERFACE_HEADER_SETS ON)
-        set(libraries PUBLIC ${arg_LIBRARIES}) # a header is compiled with what its folder's users see
+        set(libraries PUBLIC ${arg_LIBRARIES}) # headers are compiled with the libraries that the folder's users see
     endif()
-    # The fuzzer follows the paths through the product's code, not those through a target or a test.
+    # The fuzzer follows paths through the product's code, not through a fuzz target or a test.
     if(KESTRUM_FUZZ)
         target_compile_options(${name} PRIVATE -fsanitize=fuzzer-no-link)
     endif()
@@ -47,7 +47,7 @@ function(kestrum_folder name)
         endif()
         target_link_libraries(${name} PUBLIC ${lower})
     endforeach()
-    # Adapters are compiled with their libraries' own options, which a precompiled header would have to share.
+    # A precompiled header needs equal options everywhere, and adapters are compiled with their libraries' options.
     if(KESTRUM_PRECOMPILED AND name STREQUAL support)
         target_precompile_headers(support PRIVATE ${standard_headers})
     elseif(KESTRUM_PRECOMPILED AND NOT arg_LIBRARIES)

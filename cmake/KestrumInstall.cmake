@@ -1,4 +1,4 @@
-# What `cmake --install` puts where. DESTDIR and the prefix are honoured.
+# The files of `cmake --install` and their places. DESTDIR and the prefix apply.
 include(GNUInstallDirs)
 
 install(TARGETS kestrum kestrum-terminal voxd kestrum-decode)
@@ -13,7 +13,7 @@ foreach(size 16 22 24 32 48 64 128 256)
     install(FILES resources/icons/${size}.png DESTINATION ${icons}/${size}x${size}/apps RENAME kestrum.png)
 endforeach()
 
-# The unit names the program by its path, which the prefix of this very installation decides.
+# The unit contains the program's path, which depends on the prefix of this installation.
 install(CODE "
     set(bindir \"\${CMAKE_INSTALL_PREFIX}/${CMAKE_INSTALL_BINDIR}\")
     configure_file(\"${CMAKE_SOURCE_DIR}/resources/voxd.service.in\" \"${CMAKE_BINARY_DIR}/voxd.service\" @ONLY)")

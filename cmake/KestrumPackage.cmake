@@ -1,4 +1,4 @@
-# The Debian package, as scripts/package makes it.
+# The Debian package that scripts/package makes.
 set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME kestrum)
 set(CPACK_PACKAGE_CONTACT "Kestrum developers <developers@kestrum.invalid>")
@@ -21,8 +21,8 @@ voxd, which replays captures and simulates drives, and the decoder
 kestrum-decode, which turns captures into trees, JSON and CSV.")
 
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
-# What no program is linked to: Qt's plug-in for the drawn icon and the window's typeface. Debian 12 has them under the
-# second names.
+# Dependencies that no program is linked to: Qt's plug-in for the SVG icon, and the window's typeface. The second
+# names are those in Debian 12.
 set(CPACK_DEBIAN_PACKAGE_DEPENDS
     "qt6-svg-plugins | libqt6svg6 (<< 6.8), fonts-liberation (>= 1:2) | fonts-liberation2")
 set(CPACK_DEBIAN_PACKAGE_RECOMMENDS qt6-wayland)

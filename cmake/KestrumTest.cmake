@@ -1,15 +1,15 @@
-# One test program for each folder of tests/.
+# One test program per folder of tests/.
 #
 #   kestrum_test(tests_lte USES loggenerator_lte test_doubles
 #       SOURCES ServingCellMeasurementTest.cpp
 #       WITH_PROPERTY_LISTS LTELogGeneratorTest.cpp)
 #
-# The sources behind WITH_PROPERTY_LISTS are left out of a build that has no platform_propertylist.
+# The sources after WITH_PROPERTY_LISTS are omitted from a build without platform_propertylist.
 find_package(GTest)
 find_package(rapidcheck REQUIRED)
 
-# The headers of the test libraries take most of a test's compile time, so they are compiled once for all of them.
-# What is tested is optimised as its preset says; the tests themselves never are: it would double their compile time.
+# The test libraries' headers take most of a test's compile time, so they are compiled once for all tests. The preset
+# sets the optimisation of the product's code. Tests are never optimised: it would double their compile time.
 add_library(test_headers OBJECT EXCLUDE_FROM_ALL ${CMAKE_SOURCE_DIR}/tests/doubles/Headers.cpp)
 target_precompile_headers(test_headers PRIVATE <gmock/gmock.h> <gtest/gtest.h> <rapidcheck.h> <rapidcheck/gtest.h>
     <algorithm> <chrono> <filesystem> <fstream> <functional> <map> <memory> <set> <sstream> <string> <vector>)
@@ -19,8 +19,8 @@ function(kestrum_test_options name)
 endfunction()
 kestrum_test_options(test_headers)
 
-# With SHARDS n the tests of a program run as n processes side by side. A processor of ctest is a quarter of a real one
-# (./test says so): a program takes a whole one, one that WAITS for real time a quarter.
+# SHARDS n runs a program's tests as n parallel processes. ctest counts in quarters of a processor (./test sets that):
+# a program takes a whole processor, a program that WAITS for real time a quarter.
 function(kestrum_test name)
     cmake_parse_arguments(arg "WAITS;MEASURES_MEMORY" "SHARDS" "USES;SOURCES;WITH_PROPERTY_LISTS;LIBRARIES" ${ARGN})
     add_executable(${name} ${arg_SOURCES})
@@ -37,10 +37,10 @@ function(kestrum_test name)
     endif()
     set(environment)
     if(arg_MEASURES_MEMORY)
-        # Freed blocks which the address sanitizer keeps would count, by default hundreds of MB.
+        # By default the address sanitizer keeps hundreds of MB of freed blocks, which would count as memory in use.
         set(environment ASAN_OPTIONS=quarantine_size_mb=1:thread_local_quarantine_size_kb=64)
     endif()
-    # The time limit is for a test that hangs: the slowest takes minutes under the sanitizers on a slow machine.
+    # The time limit ends a test that hangs. Under the sanitizers on a slow machine the slowest test takes minutes.
     if(NOT arg_SHARDS)
         add_test(NAME ${name} COMMAND ${name})
         set_tests_properties(${name} PROPERTIES TIMEOUT 1800 PROCESSORS ${processors} ENVIRONMENT "${environment}")
@@ -49,7 +49,7 @@ function(kestrum_test name)
     foreach(shard RANGE 1 ${arg_SHARDS})
         math(EXPR index "${shard} - 1")
         add_test(NAME ${name}_${shard} COMMAND ${name})
-        # The longest ones start first.
+        # The longest tests start first.
         set_tests_properties(${name}_${shard} PROPERTIES TIMEOUT 1800 PROCESSORS ${processors} COST 100
             ENVIRONMENT "GTEST_TOTAL_SHARDS=${arg_SHARDS};GTEST_SHARD_INDEX=${index};${environment}")
     endforeach()

@@ -1,10 +1,10 @@
 # shellcheck shell=bash
-# How ./run and ./test build, and end with all that they started. Sourced by both.
+# Building for ./run and ./test, and ending every process that they started. Sourced by both.
 
 work=$(mktemp -d /tmp/kestrum.XXXXXX) || { echo "${0##*/}: /tmp cannot be written: is the disk full?" >&2; exit 1; }
 group=""
 
-# Ends a group of processes, and returns when all of them are gone.
+# Ends a group of processes, and returns after all of them have ended.
 end_group() {
     kill -TERM -- "-$1" "$1" 2>/dev/null || true
     for _ in {1..100}; do
@@ -24,7 +24,8 @@ trap 'exit 129' HUP
 trap 'exit 130' INT
 trap 'exit 143' TERM
 
-# Runs a command as a group of its own, that finish() can end whole. In the background: the shell hears signals then.
+# Runs a command in a separate process group, which finish() can end as a whole. In the background, so that the shell
+# handles signals at once.
 guarded() {
     local status=0
     env --default-signal=INT,QUIT setsid "$@" </dev/null &
@@ -34,7 +35,7 @@ guarded() {
     return "$status"
 }
 
-# Version $2 is $1 or later.
+# Whether version $2 is $1 or later.
 at_least() { [ "$(printf '%s\n' "$1" "$2" | sort -V | head -n 1)" = "$1" ]; }
 
 require_tools() {
@@ -58,13 +59,13 @@ explain_build() {
     fail "the build failed, see above"
 }
 
-# Builds a preset: with the build tool's own progress on a terminal, silently elsewhere, with the log on failure.
+# Builds a preset. Shows the build tool's progress on a terminal; elsewhere only the log of a failure.
 build() {
     local preset=$1
     require_tools
     echo "Building (the first time takes some minutes) ..." >&2
     mkdir -p build 2>/dev/null || fail "$PWD/build cannot be written"
-    # What another place or compiler left in the folder is no reason to fail.
+    # Files that another place or compiler left in the folder must not make the build fail.
     guarded cmake --preset "$preset" >"$work/log" 2>&1 || guarded cmake --fresh --preset "$preset" >"$work/log" 2>&1 ||
         explain_build
     : >"$work/log"

@@ -1,7 +1,7 @@
 # shellcheck shell=bash
-# What the project needs of the system, and how it gets there. Sourced by ./run, ./test and .ci/run.
+# The Debian packages that the project needs, and their installation. Sourced by ./run, ./test and .ci/run.
 
-# shellcheck disable=SC2034  # for those who source this
+# shellcheck disable=SC2034  # used by the scripts that source this one
 readonly run_packages=(
     g++ cmake ninja-build
     qt6-base-dev libqt6svg6 fonts-liberation2
@@ -13,7 +13,7 @@ readonly test_packages=(
     libgtest-dev libgmock-dev librapidcheck-dev
     python3 dbus libvterm-dev xvfb at-spi2-core
 )
-# To make the package, and to look it over.
+# For making and checking the package.
 # shellcheck disable=SC2034
 readonly package_packages=(dpkg-dev file lintian desktop-file-utils appstream mandoc systemd)
 # shellcheck disable=SC2034
@@ -21,17 +21,17 @@ readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev 
 
 fail() { echo "${0##*/}: $*" >&2; exit 1; }
 
-# Whether a line that is rewritten shows there.
+# Whether standard error can show a line that is rewritten.
 on_terminal() { [ -t 2 ] && [ "${TERM:-dumb}" != dumb ]; }
 
 missing_packages() {
-    # shellcheck disable=SC2016  # dpkg-query puts in the values
+    # shellcheck disable=SC2016  # dpkg-query expands the variables
     dpkg-query -W -f '${db:Status-Abbrev} ${Package}\n' "$@" 2>/dev/null | sed -n 's/^ii  *//p' |
         sort -u | comm -13 - <(printf '%s\n' "$@" | sort -u)
 }
 
-# Apt's output goes to the given log, its progress to a line that is rewritten. It reads to the end whatever signal
-# comes: apt finishes what it unpacks, and dies half-way when its output goes nowhere.
+# Writes apt's output to the given log, and its progress to a line that is rewritten. It reads to the end and ignores
+# signals: apt finishes unpacking then, but would fail half-way if its output were closed.
 follow_apt() {
     trap '' HUP INT TERM
     local line percent what
@@ -47,7 +47,7 @@ follow_apt() {
     ! on_terminal || printf '\r\e[K' >&2
 }
 
-# One line on what went wrong, and what to do.
+# One line with the reason and the remedy.
 explain_apt() {
     local log=$1
     shift
@@ -62,7 +62,7 @@ explain_apt() {
     fail "the packages could not be installed: put right what apt says above, then start again (its output: $log)"
 }
 
-# Installs those of the given packages that are missing. Where none is, it needs no network and no root.
+# Installs the given packages that are missing. When none is missing, it needs neither network nor root.
 ensure_packages() {
     [ -z "${KESTRUM_SKIP_INSTALL:-}" ] || return 0
     if ! command -v apt-get >/dev/null; then
@@ -83,8 +83,8 @@ ensure_packages() {
     echo "Installing ${#missing[@]} packages and what they need: ${missing[*]}" >&2
     log=$(mktemp) || fail "no temporary file can be written: is the disk full?"
     as_root+=(env LC_ALL=C DEBIAN_FRONTEND=noninteractive)
-    # The first mends what an earlier installation left when the machine was switched off. A source that fails to
-    # update may be one that nothing is needed from.
+    # The first command repairs an installation that was interrupted. A source that fails to update may be one that no
+    # needed package comes from.
     {
         "${as_root[@]}" dpkg --configure -a || true
         "${as_root[@]}" apt-get update -q -o APT::Status-Fd=1 || true
