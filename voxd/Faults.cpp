@@ -35,10 +35,11 @@ std::vector<std::byte> bytesOfFrame(const Frame& frame)
 void endConnection(FrameConnection& connection)
 {
     connection.push();
-    ::shutdown(connection.descriptor(), SHUT_RDWR); // the event loop finds it closed
+    ::shutdown(connection.descriptor(), SHUT_RDWR); // the event loop then sees the closed connection
 }
 
-// At once, so that what a signal interrupts is where it should be. A display that takes nothing loses its connection.
+// Sends without delay, so that the bytes before an interruption arrive as they should. A display that does not read
+// loses its connection.
 bool sendNow(FrameConnection& connection, Bytes bytes)
 {
     connection.push();
@@ -80,7 +81,7 @@ void sendByteByByte(FrameConnection& connection, const Frame& frame)
     for (const std::byte& each : bytesOfFrame(frame)) {
         if (!sendNow(connection, Bytes(&each, 1)))
             return;
-        std::this_thread::sleep_for(milliseconds(1)); // that the display has time to look at each
+        std::this_thread::sleep_for(milliseconds(1)); // gives the display time to process each one
     }
 }
 
@@ -121,7 +122,7 @@ void sendBehindFloodOf(FrameConnection& connection, const Frame& flood, const Fr
 
 void sendBehindRecords(FrameConnection& connection, const Frame& frame)
 {
-    // A record of 1000 bytes but for its type, which no modem has.
+    // A record of 1000 bytes, all zero except its length and its type, which no modem uses.
     std::array<std::byte, 1000> record{std::byte{7}, std::byte{0xE7}, std::byte{3}};
     sendBehindFloodOf(connection, {Frame::Kind::Message, kLogMessage, 0, record}, frame);
 }
@@ -132,7 +133,7 @@ void sendBehindNotifications(FrameConnection& connection, const Frame& frame)
     sendBehindFloodOf(connection, notification, frame);
 }
 
-/// Changes to another technology and back, twice.
+/// Switches to another technology and back, twice.
 class UnsteadySource final : public Source {
 public:
     UnsteadySource(Source& source, SystemLog& log)
@@ -162,14 +163,14 @@ private:
     Source& _source;
     SystemLog& _log;
     std::string_view _other;
-    std::size_t _given = 0; // messages
+    std::size_t _given = 0; // messages given so far
 };
 
 } // namespace
 
 struct Faults::Fault {
     std::string_view name, summary;
-    int answers, technologies, messages; ///< how many of each are struck
+    int answers, technologies, messages; ///< how many of each are affected
     void (*strike)(FrameConnection&, const Frame&);
 };
 

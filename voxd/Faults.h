@@ -14,21 +14,22 @@ namespace kestrum {
 class FrameConnection;
 class SystemLog;
 
-/// Faults of the service, for tests of displays against them. Each fault strikes a few times or for some seconds; the
-/// service may stand still meanwhile and works as usual afterwards.
+/// Faults of the service, for tests of displays. Each fault occurs a few times or lasts some seconds. The service may
+/// block during a fault; afterwards it works as usual.
 class Faults {
 public:
-    /// For the help text: a line for each fault.
+    /// The help text: one line per fault.
     static std::string help();
     static bool exists(std::string_view name);
 
-    /// The names must exist. Each strike, and the end of each fault, is logged.
+    /// The names must exist. Each occurrence and the end of each fault are logged.
     Faults(const std::vector<std::string>& names, SystemLog& log);
     ~Faults();
 
-    /// Sends the frame, or strikes instead. False when the connection has closed.
+    /// Sends the frame, or causes a fault instead. False when the connection is closed.
     bool send(FrameConnection& connection, const Frame& frame);
-    /// The source with the changes of technology that were asked for. Null when none were; `source` outlives it.
+    /// `source` with the requested changes of technology. Null when none were requested. `source` must outlive the
+    /// result.
     std::unique_ptr<Source> unsteady(Source& source);
 
 private:

@@ -8,7 +8,7 @@
 
 namespace kestrum {
 
-/// Messages that a client has not taken yet. Beyond the capacity the oldest are dropped, whole, and counted.
+/// Messages that a client has not read yet. Beyond the capacity the oldest whole messages are dropped and counted.
 class Outbox {
 public:
     explicit Outbox(std::size_t capacity) : _capacity(capacity) {} ///< bytes
@@ -34,13 +34,13 @@ public:
         return oldest;
     }
 
-    std::size_t held() const { return _held; }       ///< bytes, each message with what keeping it costs
-    std::size_t dropped() const { return _dropped; } ///< messages, since the beginning
+    std::size_t held() const { return _held; }       ///< bytes, including the overhead of each message
+    std::size_t dropped() const { return _dropped; } ///< messages since the start
 
 private:
     static std::size_t cost(const Data& message) { return message.size() + kOverhead; }
 
-    // Counted for each message, so that a flood of tiny ones cannot cost far more memory than their bytes.
+    // Counted for each message, so that many tiny messages cannot take far more memory than their bytes.
     static constexpr std::size_t kOverhead = 64;
 
     std::size_t _capacity;

@@ -22,7 +22,7 @@ CaptureFormat formatOf(const std::string& path)
 ReplaySource::ReplaySource(const std::string& path, bool loop)
     : _path(path), _format(formatOf(path)), _file(path, std::ios::binary), _loop(loop)
 {
-    // A directory opens, but cannot be read.
+    // A directory can be opened but not read.
     if (!_file || (_file.peek(), _file.bad()))
         throw std::runtime_error(path + ": cannot be read");
     rewind();

@@ -9,16 +9,16 @@
 
 namespace kestrum {
 
-/// A capture as a source. Messages come in the rhythm of their time stamps, those without at the nominal spacing.
+/// A capture as a source. Messages follow their time stamps; messages without one follow at the nominal spacing.
 class ReplaySource final : public Source {
 public:
-    /// Between messages without a time stamp.
+    /// The interval between messages without a time stamp.
     static constexpr std::chrono::milliseconds kNominalSpacing{500};
-    /// A longer gap between two time stamps means that the clock was set, and counts as none.
+    /// A longer gap between two time stamps means that the clock was set. It counts as no gap.
     static constexpr std::chrono::hours kLongestGap{1};
 
-    /// Opens the capture and finds its technology. Throws std::runtime_error, with the reason, when it cannot be read,
-    /// is empty, or has no message that shows its technology.
+    /// Opens the capture and detects its technology. Throws std::runtime_error with the reason when the capture
+    /// cannot be read, is empty, or has no message that shows its technology.
     ReplaySource(const std::string& path, bool loop);
     ReplaySource(const ReplaySource&) = delete;
     ReplaySource& operator=(const ReplaySource&) = delete;
@@ -26,7 +26,7 @@ public:
     std::optional<Message> next() override;
     std::string_view technology() const override { return _technology; }
 
-    /// Why the capture could not be read to its end, with file and offset; empty otherwise.
+    /// The reason, with file and offset, why the capture could not be read to its end; empty otherwise.
     const std::string& fault() const { return _fault; }
 
 private:
@@ -41,7 +41,7 @@ private:
     std::string _fault;
     bool _loop;
     std::string_view _technology;
-    std::optional<std::chrono::microseconds> _last; // offset of the message given last
+    std::optional<std::chrono::microseconds> _last; // offset of the last message given
     std::optional<std::uint64_t> _lastStamp;
 };
 

@@ -17,7 +17,7 @@ namespace {
 
 using namespace std::chrono;
 
-// How long messages go out before sockets have their turn.
+// The maximum time for sending messages before the sockets are served again.
 constexpr milliseconds kBatch{10};
 constexpr milliseconds kConnectTimeout{1000};
 constexpr hours kLongestWait{1};
@@ -78,8 +78,8 @@ void Service::acceptConnection(std::unique_ptr<FrameConnection> connection)
 
 void Service::serve(Clients::iterator client)
 {
-    // A malformed frame closes the connection within `next`; nothing of it is touched then. Requests of a client that
-    // does not read its replies wait in its own socket.
+    // A malformed frame closes the connection inside `next`, and nothing else changes then. Requests of a client that
+    // does not read its replies stay in that client's socket.
     while (!client->connecting && client->connection->unsent() < kUnsentReplies) {
         const auto frame = client->connection->next();
         if (!frame)
@@ -93,7 +93,7 @@ void Service::serve(Clients::iterator client)
     }
 }
 
-// A connection that closed meanwhile is forgotten by its own handler.
+// The connection's own handler removes a client whose connection has closed.
 void Service::reply(Clients::iterator client, std::int32_t messageId, std::uint32_t serial,
                     const LogChannelAnswer& answer)
 {
@@ -122,7 +122,7 @@ LogChannelAnswer Service::openChannel(std::string_view address, std::unique_ptr<
 {
     if (!logPort)
         return refuse(address, vox::kNoReceiver, "no process listens there");
-    if (_channels.size() >= kMaximumChannels) // others may have come first
+    if (_channels.size() >= kMaximumChannels) // other clients may have taken the last channels
         return refuse(address, vox::kTooManyChannels, "too many channels");
     const auto name = formatted("%s%d.%u", kCommandPorts, ::getpid(), ++_lastChannel);
     auto channel = std::make_unique<ServiceChannel>(_host, std::move(logPort));
@@ -133,7 +133,7 @@ LogChannelAnswer Service::openChannel(std::string_view address, std::unique_ptr<
     return {0, 0, name};
 }
 
-// Displays that are refused try again every 5 s: one line for each reason is enough until something changes.
+// A refused display tries again every 5 s. One line per reason is enough until something changes.
 LogChannelAnswer Service::refuse(std::string_view address, std::int32_t code, std::string_view why)
 {
     if (_loggedRefusals.insert(code).second)
@@ -151,11 +151,11 @@ microseconds Service::position(Moment now) const
     if (!_since)
         return _position;
     const duration<double, std::micro> run = (now - *_since) * _settings.speed;
-    // Held well inside the range, whatever the speed.
+    // Limited, so that no speed overflows the type.
     return _position + microseconds(static_cast<std::int64_t>(std::min(run.count(), 1e18)));
 }
 
-// Starts, stops and aims the source's time.
+// Starts or stops the source's time, and sets the timer for the next message.
 void Service::pace()
 {
     const Moment now = steady_clock::now();
@@ -207,19 +207,19 @@ void Service::streamDue()
     pace();
 }
 
-// Clients ask for the technology once, when they connect: so they are made to connect again.
+// Clients ask for the technology once, when they connect. They have to reconnect to learn the new one.
 void Service::changeTechnology()
 {
     _technology = _nextTechnology;
     _log.write(Priority::Notice, "the technology is now %s", _technology);
     for (const auto& client : _clients)
-        if (client.connection->unsent() < kUnsentReplies) // a client that reads nothing misses nothing
+        if (client.connection->unsent() < kUnsentReplies) // a client that does not read gets nothing more
             _settings.send(*client.connection,
                            {Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
     retire(_channels.begin(), _channels.end());
 }
 
-// Not at once: a channel is retired from within its own callbacks.
+// Later, not now: this may run inside the channel's own callbacks.
 void Service::retire(Channels::iterator first, Channels::iterator last)
 {
     _retired.splice(_retired.end(), _channels, first, last);

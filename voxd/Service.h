@@ -20,36 +20,36 @@ namespace kestrum {
 
 class SystemLog;
 
-/// The telephony service: answers server connections, makes log channels, and streams one source to all of them. The
-/// source's time runs while a client streams, and stands otherwise: nothing of it is lost between two clients.
+/// The telephony service: answers server connections, creates log channels, and streams one source to all of them.
+/// The source's time runs only while a client streams, so no message is lost between two clients.
 class Service {
 public:
     struct Settings {
         std::string directory;
         double speed = 1; ///< source time per real time, above 0
-        /// Every frame goes out through it.
+        /// Sends every frame.
         FrameSender send = [](FrameConnection& connection, const Frame& frame) { return connection.send(frame); };
     };
     static constexpr std::size_t kMaximumChannels = 16, kMaximumConnections = 64;
 
-    /// Receives everything that goes out, in order: for a recording.
+    /// Gets everything that is sent, in order, for a recording.
     struct Witness {
-        std::function<void(Bytes)> streamed = [](Bytes) {};                ///< each message, for whichever client
+        std::function<void(Bytes)> streamed = [](Bytes) {};                ///< each message, once for all clients
         std::function<void(std::uint64_t)> dropped = [](std::uint64_t) {}; ///< this many messages, for one client
     };
 
-    /// All outlive the service.
+    /// All arguments must outlive the service.
     Service(Settings settings, Source& source, PropertyLists& lists, SystemLog& log, Witness witness);
     ~Service();
 
     std::optional<Problem> start();
 
-    /// Runs once when the source has ended and its last message has gone out.
+    /// Called once, after the source has ended and its last message was sent.
     std::function<void()> sourceEnded;
 
 private:
     using Moment = std::chrono::steady_clock::time_point;
-    // A server connection. It is served one request at a time, so that one client's slow port stops only itself.
+    // A server connection. Its requests are served one at a time, so a slow port delays only its own client.
     struct Client {
         std::unique_ptr<FrameConnection> connection;
         std::unique_ptr<FrameConnectionAttempt> connecting; ///< to the port that the current request names
@@ -80,14 +80,14 @@ private:
     FrameListener _listener;
     Clients _clients;
     Channels _channels, _retired;
-    std::set<std::int32_t> _loggedRefusals; ///< since the last channel was opened or closed
+    std::set<std::int32_t> _loggedRefusals; ///< since a channel was last opened or closed
     unsigned _lastChannel = 0;
 
-    std::string _technology;              // of the message streamed last
-    std::optional<Source::Message> _next; // not due yet
+    std::string _technology;              // of the last message streamed
+    std::optional<Source::Message> _next; // waits for its time
     std::string _nextTechnology;
-    std::chrono::microseconds _position{0}; // the source's time, when it stands
-    std::optional<Moment> _since;           // when it began to run from there
+    std::chrono::microseconds _position{0}; // the source's time at `_since`, or while it stands still
+    std::optional<Moment> _since;           // when the source's time started to run; empty while it stands still
     bool _sourceEnded = false;
     QTimer _due;
 };

@@ -11,7 +11,7 @@
 namespace kestrum {
 namespace {
 
-// What the socket is given to keep; the rest waits in the outbox, where whole messages can still be dropped.
+// The socket's buffer. Further messages wait in the outbox, which can still drop whole messages.
 constexpr std::size_t kSocketBytes = 256 << 10;
 constexpr std::size_t kUnsentReplies = 256 << 10;
 constexpr std::int32_t kLogMessage = 0, kLossMessage = 1;
@@ -48,7 +48,7 @@ std::optional<Problem> ServiceChannel::listen(const std::string& path)
 
 void ServiceChannel::accept(std::unique_ptr<FrameConnection> connection)
 {
-    if (_commands) // a channel has one master
+    if (_commands) // a channel has one command connection
         return;
     _commandTimeout.stop();
     _commands = std::move(connection);
@@ -58,7 +58,7 @@ void ServiceChannel::accept(std::unique_ptr<FrameConnection> connection)
 
 void ServiceChannel::readCommands()
 {
-    // Commands of a client that does not read its replies wait in its own socket.
+    // Commands of a client that does not read its replies stay in that client's socket.
     while (!_ended && _commands->unsent() < kUnsentReplies) {
         const auto frame = _commands->next();
         if (!frame)
@@ -67,7 +67,7 @@ void ServiceChannel::readCommands()
     }
 }
 
-// The client sends nothing here. Reading detects a malformed peer and keeps the socket from filling up.
+// The client sends nothing on this port. Reading detects a malformed peer and keeps the socket's buffer empty.
 void ServiceChannel::readLogPort()
 {
     while (!_ended && _logPort->next())
@@ -115,7 +115,7 @@ void ServiceChannel::flush()
         if (_logPort->unsent() >= kSocketBytes)
             _logPort->push();
         if (_logPort->unsent() >= kSocketBytes)
-            return; // `written` goes on
+            return; // `written` continues
         const auto message = _outbox.take();
         sendLosses();
         if (!message) {
@@ -131,7 +131,7 @@ void ServiceChannel::flush()
     }
 }
 
-// At the place in the stream where the messages are missing: before the next one.
+// Sent where the messages are missing in the stream: before the next message.
 void ServiceChannel::sendLosses()
 {
     const std::uint64_t missing = _outbox.dropped() - std::exchange(_sentDrops, _outbox.dropped());

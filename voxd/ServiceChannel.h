@@ -19,27 +19,27 @@ class SystemLog;
 /// Sends a frame, as `FrameConnection::send` does.
 using FrameSender = std::function<bool(FrameConnection&, const Frame&)>;
 
-/// One client's log channel: it takes commands at a separate port and sends the log to the client's port. It ends
-/// when either side of it goes.
+/// One client's log channel. It takes commands at a separate port and sends the log to the client's port. It ends
+/// when either connection closes.
 class ServiceChannel {
 public:
-    /// What the channel asks of the service.
+    /// The services that the channel uses.
     struct Host {
         std::function<std::string_view()> technology;
         std::function<void()> streamingChanged;
         std::function<void(ServiceChannel&)> ended; ///< at most once; must not destroy the channel at once
-        std::function<void(std::uint64_t)> dropped; ///< this many messages, for a client that does not read
+        std::function<void(std::uint64_t)> dropped; ///< this many messages, when the client does not read
         FrameSender send;
         PropertyLists& lists;
         SystemLog& log;
     };
 
-    /// Bytes held back for a client that does not read.
+    /// The maximum number of bytes that wait for a client that does not read.
     static constexpr std::size_t kHeldBytes = 8 << 20;
-    /// A client that has not connected to the command port by then is gone.
+    /// A client that has not connected to the command port within this time counts as gone.
     static constexpr std::chrono::seconds kCommandTimeout{10};
 
-    /// `logPort` leads to the client's receiving port. `host` outlives the channel.
+    /// `logPort` is connected to the client's receiving port. `host` must outlive the channel.
     ServiceChannel(const Host& host, std::unique_ptr<FrameConnection> logPort);
     ~ServiceChannel();
 
@@ -47,7 +47,7 @@ public:
     std::optional<Problem> listen(const std::string& path);
 
     bool isStreaming() const { return _subscription.has_value(); }
-    /// Sends the message when the client has asked for it, or holds it back.
+    /// Sends the message if the client has subscribed to it, or stores it until the client reads.
     void stream(const Data& message);
 
 private:
@@ -64,10 +64,10 @@ private:
     std::unique_ptr<FrameConnection> _logPort, _commands;
     FrameListener _listener;
     QTimer _commandTimeout;
-    std::optional<Subscription> _subscription; // nothing: not streaming
+    std::optional<Subscription> _subscription; // empty: not streaming
     Outbox _outbox;
-    std::size_t _reportedDrops = 0; ///< in the system's log
-    std::size_t _sentDrops = 0;     ///< reported to the client
+    std::size_t _reportedDrops = 0; ///< as reported in the system's log
+    std::size_t _sentDrops = 0;     ///< as reported to the client
     bool _dropping = false;
     bool _ended = false;
 };

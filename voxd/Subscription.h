@@ -9,18 +9,18 @@
 
 namespace kestrum {
 
-/// What a client asked for in its start command.
+/// The log codes that a client asked for in its start command.
 class Subscription {
 public:
-    /// From the lists "SetZephraLogCodes" and "SetVoxExtraCodes"; what is no code in them is left out. A command
-    /// without both asks for everything.
+    /// Reads the lists "SetZephraLogCodes" and "SetVoxExtraCodes" and ignores entries that are no codes. A command
+    /// without both lists subscribes to everything.
     explicit Subscription(const Dictionary& command);
 
-    /// Messages that are no log records (an IFX modem's) are wanted by all.
+    /// True for every message that is no log record (from an IFX modem).
     bool wants(Bytes message) const;
 
 private:
-    std::optional<std::unordered_set<LogCode>> _codes; // nothing: everything
+    std::optional<std::unordered_set<LogCode>> _codes; // empty: everything
 };
 
 } // namespace kestrum

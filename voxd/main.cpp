@@ -58,13 +58,13 @@ std::ofstream openForWriting(const std::string& path)
     return file;
 }
 
-// CLI11's ranges accept not-a-number.
+// Needed because CLI11's ranges accept not-a-number.
 std::string notFinite(const std::string& text)
 {
     return std::isfinite(std::strtod(text.c_str(), nullptr)) ? std::string() : text + " is no finite number";
 }
 
-// The source's first seconds, at once and without a service.
+// Writes the source's first seconds to a file, without pacing and without a service.
 void writeCapture(Source& source, const Options& options)
 {
     auto file = openForWriting(options.write);
@@ -78,7 +78,7 @@ void writeCapture(Source& source, const Options& options)
 
 int serve(QCoreApplication& application, const Options& options)
 {
-    // A log or output that nothing reads any more must not end the service.
+    // A closed log or output must not end the service.
     std::signal(SIGPIPE, SIG_IGN);
     const TerminationSignals termination([&] { application.quit(); });
     LinuxSystemLog log(standardErrorSink("voxd"));

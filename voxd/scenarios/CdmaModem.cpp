@@ -21,11 +21,11 @@ constexpr Carrier kOneXPilot{878.5, 14}, kEvdoPilot{871.1, 14};
 constexpr double kMargin = 2.5;    // dB
 constexpr int kPatience = 5;       // moves
 constexpr double kNoise = -104;    // dBm in 1.2288 MHz
-constexpr double kSoftHandoff = 5; // dB below the best, within which a pilot is in the active set
+constexpr double kSoftHandoff = 5; // dB below the best; stronger pilots are in the active set
 constexpr std::size_t kActive = 4, kFingerCount = 6;
 constexpr int kWarmUp = 15, kNegotiation = 20; // moves
 
-// A carrier's pilots: which serve, and how strong they are.
+// The pilots of one carrier: which of them serve, and how strong they are.
 class Link {
 public:
     Link(const World& world, Carrier carrier, double load, Random random)
@@ -45,7 +45,7 @@ public:
     std::size_t site() const { return _serving.site(); }
     double power() const { return dbm(_coverage.total() * _load + milliwatts(kNoise)); } ///< dBm received
     double strength(std::size_t site) const { return _coverage.level(site) - power(); }  ///< dB Ec/Io
-    /// The serving pilot first; the others only while there is traffic.
+    /// The serving pilot first. The others serve only while there is traffic.
     std::vector<std::size_t> active(bool traffic) const
     {
         std::vector<std::size_t> sites;
@@ -57,15 +57,15 @@ public:
 
 private:
     Coverage _coverage;
-    double _load; // a cell's power as a multiple of its pilot's
+    double _load; // a cell's power as a multiple of its pilot's power
     ServingCell _serving{kMargin, kPatience};
 };
 
-// Packets of one kind so far.
+// The number of packets of one kind so far.
 struct ForwardPackets {
     std::size_t counter;
     double bits;
-    double reach; // dB Ec/Io from which the kind is used
+    double reach; // dB Ec/Io; the kind is used from here upwards
     std::uint32_t sent;
 };
 
@@ -103,7 +103,7 @@ public:
             log.add(identity());
         }
         if (_evdo.follow()) {
-            // Another colour code: the session is moved, and the phone gets another address.
+            // Another colour code: the session moves, and the phone gets another address.
             if (colour(site) != colour(_evdo.site()))
                 _negotiation = kNegotiation;
             log.add(evdoStatus());
@@ -145,7 +145,7 @@ private:
         const Site& at = _world.sites()[site];
         return 40 + 20 * at.abroad + at.area;
     }
-    /// Open loop: what is received and what is sent add up to some -73 dBm (3GPP2 C.S0002).
+    /// Open loop power control: received and transmitted power add up to about -73 dBm (3GPP2 C.S0002).
     static double transmitPower(const Link& link) { return std::clamp(-73 - link.power(), -50.0, 24.0); }
 
     RecordWriter evdoStatus()
@@ -179,7 +179,7 @@ private:
     }
     bool onOrNearData() const { return !_traffic.isIdle() && _traffic.isData(); }
 
-    /// A ratio in units of 1/512, at least one of them.
+    /// A ratio in units of 1/512; at least 1.
     static std::int64_t parts(double decibels) { return std::max(std::llround(512 * milliwatts(decibels)), 1LL); }
 
     RecordWriter pilots() const
@@ -194,7 +194,7 @@ private:
         return record;
     }
 
-    // Each active pilot has a finger on its first path, the serving one a second on an echo.
+    // Each active pilot has one finger on its first path. The serving pilot has a second finger on an echo.
     RecordWriter fingers()
     {
         constexpr int kUnused = 0xFFFF;
@@ -219,14 +219,14 @@ private:
         enum Device { Acquisition = 3, Sync = 4, Paging = 6, Sleep = 7, Traffic = 8 };
         constexpr std::size_t kState = 17, kRadio = kState + 8, kActiveSet = kRadio + 16;
         const auto active = _oneX.active(onCall());
-        // An entry for one path, rounded to words.
+        // An entry for one path, rounded up to words.
         constexpr std::size_t kPaths = 1, kEntry = (6 * kPaths + 15) / 4 * 4, kEnergy = 12 + 4 * kPaths;
         const std::size_t activeSize = 12 + kEntry * active.size(), fingers = kActiveSet + activeSize;
         constexpr std::size_t kFingerSize = 12;
         RecordWriter record(0x119C, fingers + kFingerSize);
         record.set(u8(13), 1).set(u8(14), 4);
 
-        // Woken up every 1.28 s to hear whether it is paged.
+        // The idle phone wakes up every 1.28 s to listen for a page.
         const bool awake = !_traffic.isIdle() || _random.chance(0.2);
         const Device device = _warmUp > 10  ? Acquisition
                               : _warmUp > 5 ? Sync
@@ -270,7 +270,7 @@ private:
         return record;
     }
 
-    // One frame of 20 ms; bad ones are frequent where the pilot is weak.
+    // One frame of 20 ms. Bad frames are frequent where the pilot is weak.
     RecordWriter frame()
     {
         constexpr std::size_t kDemodulation = 28;
@@ -285,7 +285,7 @@ private:
     {
         constexpr int kHome = 0, kRoaming = 1, kCdma = 2, kRevision = 6;
         const CdmaCell cell = cdmaCell(_world, _oneX.site());
-        // As long as the modem writes it since the base station stands behind all else.
+        // The modem's length, because the base station comes after all other fields.
         return RecordWriter(0x134F, 186)
             .set(u8(13), 2)
             .set(u32(42), _world.sites()[_oneX.site()].abroad ? kRoaming : kHome)
@@ -297,7 +297,7 @@ private:
             .set(u16(184), cell.baseStation);
     }
 
-    // The packets of the last second. The link carries what the pilot's strength allows.
+    // The packets of the last second. The pilot's strength limits what the link carries.
     void transfer()
     {
         if (!onData())
@@ -309,7 +309,7 @@ private:
             --best;
         best->sent += static_cast<std::uint32_t>(forward / best->bits);
 
-        // Longer packets while the phone need not shout; most are understood at the first of four attempts.
+        // Packets are longer while the phone needs little power. Most need only the first of four attempts.
         constexpr std::array<double, kRates> kBits{128, 256, 512, 768, 1024, 1536, 2048, 3072, 4096, 6144, 8192, 12288};
         const double room = std::clamp((24 - transmitPower(_evdo)) / 40, 0.1, 0.9);
         const auto rate = static_cast<std::size_t>(room * kRates);
@@ -347,7 +347,7 @@ private:
     int _warmUp = kWarmUp; // moves until the phone is in service
     int _negotiation = 0;  // moves until the session is open again
     std::uint32_t _second = 0;
-    // Packets of 5120, 4096, 3072, 2048 and 1024 bits that are sent in a single slot or few, the longest first.
+    // Packets of 5120, 4096, 3072, 2048 and 1024 bits that take one or a few slots, the longest first.
     std::array<ForwardPackets, 5> _forward{
         {{52, 5120, -1.5, 0}, {45, 4096, -3, 0}, {39, 3072, -5, 0}, {27, 2048, -7, 0}, {3, 1024, -99, 0}}};
     std::array<std::array<std::uint32_t, kAttempts>, kRates> _reverse{}; // by rate and attempt

@@ -8,7 +8,7 @@ constexpr LteLayer kLteLayers[] = {
     {{806, 7}, 20, 6300, 24300, 50, 4},
 };
 
-// Areas of one network follow each other; those of the other network are far away.
+// Area codes of one network are consecutive; those of the other network are far away.
 int areaCode(const World& world, std::size_t site, int first)
 {
     const Site& at = world.sites()[site];

@@ -8,8 +8,8 @@
 
 namespace kestrum {
 
-// How the sites' cells are called: one map for all modems, so that what one names as its neighbour is what another
-// camps on.
+// The identities of the sites' cells. All modems share them, so that one modem's neighbour is another modem's serving
+// cell.
 
 /// GERAN (3GPP TS 45.005, 23.003).
 struct GsmCell {

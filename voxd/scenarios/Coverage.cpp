@@ -9,12 +9,12 @@ namespace kestrum {
 namespace {
 
 constexpr double kShadowDeviation = 4.5; // dB
-constexpr double kShadowDistance = 110;  // metres after which shadows have become others
-constexpr double kNearest = 0.12;        // km: below the antenna's beam it gets no stronger
+constexpr double kShadowDistance = 110;  // metres over which the shadowing changes completely
+constexpr double kNearest = 0.12;        // km; closer, below the antenna's beam, the signal grows no stronger
 constexpr double kAntennaHeight = 15;    // metres above the roofs
 constexpr double kNothing = -139;        // dBm
 
-// Macro cells in a town (3GPP TR 36.942).
+// Path loss of macro cells in a town (3GPP TR 36.942).
 double pathLoss(double kilometres, double megahertz)
 {
     return 40 * (1 - 0.004 * kAntennaHeight) * std::log10(std::max(kilometres, kNearest)) -

@@ -9,13 +9,15 @@
 
 namespace kestrum {
 
-/// What the cells of one layer send.
+/// The signal that the cells of one layer send.
 struct Carrier {
     double frequency; ///< MHz
-    double power;     ///< dBm of what is measured (a resource element, the pilot, the beacon), gains and car included
+    /// dBm of the measured signal (a resource element, the pilot, the beacon), including the gains and the loss of
+    /// the car
+    double power;
 };
 
-/// Shadows of houses and hills: a normal distribution in dB that stays alike over some 100 m (Gudmundson's model).
+/// Shadowing by houses and hills: normally distributed in dB, correlated over about 100 m (Gudmundson's model).
 class ShadowFading {
 public:
     ShadowFading(double deviation, Random& random) : _deviation(deviation), _value(deviation * random.normal()) {}
@@ -27,12 +29,12 @@ private:
     double _deviation, _value;
 };
 
-/// How strongly the car receives the layer's cells, one on each site, or on each in a town.
+/// The received level of a layer's cells in the car. The layer has a cell on every site, or only on those in a town.
 class Coverage {
 public:
     Coverage(const World& world, Carrier carrier, Random random, bool townsOnly = false);
 
-    /// To be called whenever the world went on.
+    /// Call it after every move of the world.
     void move();
 
     double level(std::size_t site) const { return _levels[site]; } ///< dBm
@@ -41,7 +43,7 @@ public:
     /// The sites, the strongest first.
     std::span<const std::size_t> order() const { return _order; }
     std::size_t strongest() const { return _order.front(); }
-    /// The strongest sites but one, at most `count`, not below `least` dBm.
+    /// At most `count` of the strongest sites, without `but` and those below `least` dBm.
     std::vector<std::size_t> others(std::size_t but, std::size_t count, double least) const;
 
 private:
@@ -49,14 +51,14 @@ private:
     Carrier _carrier;
     bool _townsOnly;
     Random _random;
-    double _way; // of the world, when it last moved
+    double _way; // of the world at the last move
     std::vector<ShadowFading> _shadows;
     std::vector<double> _levels;
     std::vector<std::size_t> _order;
     double _total = 0;
 };
 
-/// The cell that serves: another takes over when it has been better by a margin for a while.
+/// The serving cell. Another cell replaces it after being stronger by a margin for some moves.
 class ServingCell {
 public:
     ServingCell(double margin, int patience) : _margin(margin), _patience(patience) {}
@@ -67,7 +69,7 @@ public:
         _site = site;
         _better = 0;
     }
-    /// To be called once for each move. Whether another cell serves now.
+    /// Call it once per move. Returns whether the serving cell has changed.
     bool follow(const Coverage& coverage);
 
 private:

@@ -4,7 +4,7 @@ namespace kestrum {
 namespace {
 
 constexpr unsigned kLegTicks = 30 * Modem::kSecond;
-constexpr double kPrefixed = 0.02; // part of the records that come with a prefix
+constexpr double kPrefixed = 0.02; // share of the records that have a prefix
 
 } // namespace
 
@@ -44,7 +44,7 @@ void Drive::tick()
     }
     modem().tick(_log, _ticks);
 
-    // The records of a tick are spread over it.
+    // The records of a tick are spread evenly over the tick.
     auto records = _log.take();
     const auto began = Modem::kTick * _ticks;
     for (std::size_t i = 0; i < records.size(); ++i) {

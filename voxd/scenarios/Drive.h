@@ -11,8 +11,8 @@
 
 namespace kestrum {
 
-/// The source of a live scenario: a car goes through the world, and its modem's log comes out. With several modems the
-/// drive has legs of half a minute: one after the other has its turn, again and again.
+/// The source of a live scenario: a car drives through the world, and the source gives its modem's log. Several
+/// modems alternate in legs of half a minute.
 class Drive final : public Source {
 public:
     using MakeModem = std::unique_ptr<Modem> (*)(const World& world, Random random);
@@ -33,7 +33,7 @@ private:
     std::vector<std::unique_ptr<Modem>> _modems;
     std::size_t _leg = 0;
     unsigned _ticks = 0;
-    std::deque<Message> _ready; // of the last tick
+    std::deque<Message> _ready; // the messages of the last tick
 };
 
 } // namespace kestrum

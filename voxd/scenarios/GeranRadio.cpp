@@ -17,7 +17,7 @@ constexpr Carrier kBeacon{945, 24};
 constexpr double kMargin = 5;           // dB: the reselection hysteresis
 constexpr int kPatience = 8;            // moves
 constexpr double kAccessMinimum = -104; // dBm RXLEV_ACCESS_MIN
-constexpr int kReselectOffset = 6;      // dB: C2 is C1 and this (3GPP TS 45.008)
+constexpr int kReselectOffset = 6;      // dB; C2 = C1 + offset (3GPP TS 45.008)
 constexpr double kDetectable = -108;    // dBm
 constexpr std::size_t kShownNeighbors = 6;
 
@@ -88,7 +88,7 @@ RecordWriter GeranRadio::state(State state, bool data) const
     return RecordWriter(0x512C, 17).set(u8(13), state).set(u8(14), state == Transfer).set(u8(15), 0).set(u8(16), data);
 }
 
-// The words of the path-loss criteria C1 and C2 hold the received quality while a channel is in use.
+// While a channel is in use, the words of the path-loss criteria C1 and C2 hold the received quality.
 RecordWriter GeranRadio::measurement(const Traffic& traffic)
 {
     const auto near = neighbors();
@@ -133,7 +133,7 @@ RecordWriter GeranRadio::dedicatedChannel() const
     return RecordWriter(0x5076, 17).set(u16(13), cell().arfcn);
 }
 
-// A cell hops over its own frequency and two more; without a channel there is nothing to hop over.
+// A cell hops over its own frequency and two more. Without a channel there is no hopping.
 RecordWriter GeranRadio::hopping(bool dedicated) const
 {
     const std::size_t count = dedicated ? 3 : 0;
@@ -149,7 +149,7 @@ RecordWriter GeranRadio::discontinuousTransmission(bool on) const
     return RecordWriter(0x5072, 20).set(u8(19), on);
 }
 
-// System information 13 and its kin (3GPP TS 44.018, 44.060).
+// System information 13 and related messages (3GPP TS 44.018, 44.060).
 void GeranRadio::logPacketParameters(ModemLog& log) const
 {
     constexpr int kSi13OnBcch = 0, kPfcSupported = 1, kAccessAllowed = 7, kT3192Of500ms = 0, kT3192Of1000ms = 1;
@@ -166,7 +166,7 @@ void GeranRadio::logPacketParameters(ModemLog& log) const
 
 RecordWriter GeranRadio::ranking()
 {
-    // Without UMTS cells: both lists begin at the same byte, so that only one of them can be sent.
+    // Without UMTS cells: both lists begin at the same byte, so the record can hold only one of them.
     const auto near = neighbors();
     RecordWriter record(0x4005, 15 + 7 * near.size());
     record.set(u8(14), static_cast<std::int64_t>(near.size()));
@@ -193,7 +193,7 @@ DictionaryRef GeranRadio::servingReport() const
 void GeranRadio::reportNeighbors(Array& into)
 {
     for (const std::size_t near : neighbors()) {
-        // Half the level, which is doubled for display.
+        // Half the level, because the display doubles it.
         const int half = static_cast<int>(std::lround(level(near) / 2));
         into.append(cellReport(kVoxCellTechnology_GSM, kVoxCellType_Neighbor,
                                {{std::string(kVoxCell_ARFCN), Value(gsmCell(_world, near).arfcn)},

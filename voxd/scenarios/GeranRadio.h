@@ -9,23 +9,23 @@
 
 namespace kestrum {
 
-/// The GSM side of a GSM/UMTS modem: which cell it camps on, and the records of its radio resource layer.
+/// The GSM side of a GSM/UMTS modem: its serving cell, and the records of its radio resource layer.
 class GeranRadio {
 public:
     GeranRadio(const World& world, Random random);
 
     void receive() { _coverage.move(); }
     void camp() { _serving.choose(_coverage.strongest()); }
-    /// Whether another cell serves now.
+    /// Returns whether the serving cell has changed.
     bool follow() { return _serving.follow(_coverage); }
     std::size_t site() const { return _serving.site(); }
     GsmCell cell() const { return gsmCell(_world, site()); }
 
-    /// What is known of a cell once its system information has been read.
+    /// Logs the facts about a cell that its system information gives.
     void logServingCell(ModemLog& log, const Traffic& traffic);
-    /// What follows the traffic.
+    /// Logs the records that depend on the traffic.
     void logState(ModemLog& log, const Traffic& traffic);
-    /// The layer's state while nothing of GSM is in use, or on the way to or from UMTS (values of 0x512C).
+    /// The layer's state while GSM is not in use, or during a change to or from UMTS (values of 0x512C).
     enum State {
         Inactive = 0,
         Idle = 5,
@@ -39,10 +39,10 @@ public:
     RecordWriter state(State state, bool data) const;
     void tick(ModemLog& log, unsigned number, const Traffic& traffic);
 
-    /// For the cell monitor.
+    /// The entry for the cell monitor.
     DictionaryRef servingReport() const;
     void reportNeighbors(Array& into);
-    /// The cells that would be reselected, on either side.
+    /// The candidates for reselection, GSM and UMTS.
     RecordWriter ranking();
 
 private:

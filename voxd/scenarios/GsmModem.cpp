@@ -14,10 +14,10 @@ constexpr unsigned kStatesAgain = 100, kPlmnAgain = 200, kCellMonitor = 100, kPd
 
 constexpr double kLeaveUmts = -101, kReturnToUmts = -95; // dBm RSCP
 constexpr int kRadioPatience = 12;                       // moves
-constexpr int kUpdate = 10;                              // moves that a location update takes
+constexpr int kUpdate = 10;                              // moves; the duration of a location update
 
-// Equivalent networks, one digit a byte: MCC and MNC digits alternate, and the second network's begin at the fourth
-// byte. At home 001-99 and 999-102, abroad 001-01.
+// Equivalent networks, one digit per byte. MCC and MNC digits alternate; the second network's digits begin at the
+// fourth byte. At home 001-99 and 999-102, abroad 001-01.
 constexpr int kEquivalentAtHome[] = {0, 0, 0, 9, 1, 9, 0, 9, 2};
 constexpr int kEquivalentAbroad[] = {0, 0, 0, 0, 1, 1};
 
@@ -82,7 +82,7 @@ public:
 
 private:
     std::size_t site() const { return _onUmts ? _umts.site() : _gsm.site(); }
-    GsmCell area() const { return gsmCell(_world, site()); } // areas are those of the site
+    GsmCell area() const { return gsmCell(_world, site()); } // the site defines the area
 
     void receive()
     {
@@ -90,7 +90,7 @@ private:
         _gsm.receive();
     }
 
-    // UMTS is better than GSM, until it is too weak for long.
+    // UMTS is preferred to GSM until it has been too weak for some moves.
     bool radioChanges()
     {
         const bool wrong = _onUmts ? _umts.best() < kLeaveUmts : _umts.best() > kReturnToUmts;
@@ -127,7 +127,7 @@ private:
         else
             _gsm.logServingCell(log, _traffic);
         logPlmn(log);
-        // Its system information has still to be read.
+        // The phone has not read its system information yet.
         _identified = false;
         log.add(kCellMonitorRecord, cells());
     }
@@ -152,7 +152,7 @@ private:
         logSim(log);
     }
 
-    // Mobility management, for calls (0x7131) and packets (0x7130), and the registration (0x7132).
+    // Mobility management for calls (0x7131) and packets (0x7130), and the registration (0x7132).
     void logMobility(ModemLog& log)
     {
         constexpr int kIdle = 19, kUpdateInitiated = 3, kWaitForConnection = 14, kConnectionActive = 6,
@@ -235,8 +235,8 @@ private:
     UtraRadio _umts;
     GeranRadio _gsm;
     bool _onUmts = true, _identified = false;
-    int _otherRadio = 0; // moves for which the other radio would have been better
-    int _update = 0;     // moves until the location update is done
+    int _otherRadio = 0; // moves for which the other radio was better
+    int _update = 0;     // moves until the location update ends
 };
 
 } // namespace

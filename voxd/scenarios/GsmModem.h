@@ -9,8 +9,8 @@ namespace kestrum {
 
 class World;
 
-/// A GSM/UMTS modem: camps on UMTS where it can, on GSM where it must; calls, data, location updates.
-/// The world outlives it.
+/// A GSM/UMTS modem: camps on UMTS where possible, else on GSM; makes calls, transfers data, updates its location.
+/// The world must outlive it.
 std::unique_ptr<Modem> makeGsmModem(const World& world, Random random);
 
 } // namespace kestrum

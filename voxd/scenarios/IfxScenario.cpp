@@ -21,16 +21,16 @@ constexpr std::size_t kShownNeighbors = 6;
 constexpr double kSpacing = 900;         // metres of road between two sites
 constexpr double kSpeed = 16;            // m/s
 constexpr double kRoadside = 120;        // metres from a site to the road
-constexpr double kHysteresis = 4;        // dB by which a neighbour must be stronger to be reselected
-constexpr double kLowestLevel = -110;    // dBm, below which GSM reports nothing (RXLEV 0, 3GPP TS 45.008)
+constexpr double kHysteresis = 4;        // dB; a neighbour stronger by this much is reselected
+constexpr double kLowestLevel = -110;    // dBm; the lowest level that GSM reports (RXLEV 0, 3GPP TS 45.008)
 constexpr double kRxLevAccessMin = -104; // dBm
 constexpr std::size_t kRememberedCells = 5;
 
 struct Cell {
     int arfcn, bsic, identity, area;
     double place; // metres along the road
-    double fade;  // dB, drifts
-    double level; // dBm, as it is received now
+    double fade;  // dB, changes slowly
+    double level; // dBm, the current received level
 
     int c1() const { return static_cast<int>(std::lround(level - kRxLevAccessMin)); }
 };
@@ -38,12 +38,12 @@ struct Cell {
 enum class Call { Idle, Setup, Active, Release };
 
 struct CallPhase {
-    const char* connection; // mobility management
-    const char* channel;    // radio resource
+    const char* connection; // of mobility management
+    const char* channel;    // of radio resource management
     int shortest, longest;  // steps
 };
 
-// In the order of Call.
+// In the order of the enumeration Call.
 constexpr CallPhase kPhases[] = {
     {"Idle", "BCCH/CCCH", 30, 90},
     {"Wait for network", "SDCCH/8", 4, 8},
@@ -108,7 +108,7 @@ private:
         }
     }
 
-    // The road is a ring. Path loss as in a suburb: 35 dB more for ten times the way.
+    // The road is a ring. Path loss as in a suburb: 35 dB per decade of distance.
     void receive()
     {
         constexpr double kRing = kSpacing * kCells;
@@ -130,8 +130,8 @@ private:
 
     static std::string dbm(double level) { return formatted("%d dBm", static_cast<int>(std::lround(level))); }
 
-    // The modem wraps what it groups into dictionaries of one entry, and begins every array with the number of
-    // what follows: a display is to drop both.
+    // The modem wraps each group into a dictionary with one entry, and puts the number of elements first in every
+    // array. A display has to remove both.
     static Value wrapped(std::string_view name, DictionaryRef group)
     {
         return makeDictionary({{std::string(name), Value(std::move(group))}});
@@ -192,7 +192,7 @@ private:
             makeDictionary({{"State", Value(dedicated ? "Dedicated" : "Idle")}, {"Channel", Value(phase().channel)}});
         if (dedicated) {
             const double apart = std::fabs(_place - cell.place);
-            // A step of the timing advance is 554 m there and back halved (3GPP TS 45.010).
+            // A step of the timing advance is 554 m: the distance there and back, halved (3GPP TS 45.010).
             status->set("Timing Advance", formatted("%d", static_cast<int>(apart / 554)));
             status->set("Tx Power", formatted("%d dBm", std::clamp(static_cast<int>(-cell.level) / 2 - 18, 5, 33)));
             status->set("RxQual", formatted("%d", std::clamp((-80 - static_cast<int>(cell.level)) / 4, 0, 7)));
@@ -249,11 +249,11 @@ private:
     int _steps = 0;
 
     Call _call = Call::Idle;
-    int _remaining = 0; // steps of the call's phase
+    int _remaining = 0; // steps left in the call's phase
     bool _packetData = true;
     long _sent = 0, _received = 0;
     int _reselections = 0, _handovers = 0, _areaUpdates = 0, _calls = 0;
-    std::deque<int> _left; // identities of the cells left last, the latest first
+    std::deque<int> _left; // identities of the previous cells, the latest first
 };
 
 } // namespace

@@ -8,7 +8,7 @@ namespace kestrum {
 
 struct ScenarioSetting;
 
-/// An IFX modem on a drive: every half second the whole tree of what it measures, as an XML property list.
+/// An IFX modem on a drive. Every half second it logs the whole tree of its measurements as an XML property list.
 std::unique_ptr<Source> makeIfxScenario(const ScenarioSetting& setting);
 
 } // namespace kestrum

@@ -12,21 +12,21 @@
 namespace kestrum {
 namespace {
 
-// Periods of what is logged again and again, in ticks.
+// Periods of repeated records, in ticks.
 constexpr unsigned kServingIdle = 2, kServingConnected = 20, kIdentityAgain = 200, kOtherCarrier = 5, kCandidates = 8,
                    kCellMonitor = 100, kPdpAgain = 1000, kSimAgain = 3000;
 
-constexpr double kMargin = 3;            // dB, to become the serving cell
+constexpr double kMargin = 3;            // dB; a stronger cell becomes the serving cell
 constexpr int kPatience = 8;             // moves
-constexpr double kLeaveLayer = -104;     // dBm: below it the lower band serves better
+constexpr double kLeaveLayer = -104;     // dBm; below it the lower band is used
 constexpr double kReturnToLayer = -98;   // dBm
 constexpr double kDetectable = -124;     // dBm
 constexpr double kLowestQuality = -19.5; // dB RSRQ
 constexpr double kQrxlevmin = -124;      // dBm (3GPP TS 36.304)
 constexpr double kNoise = -123;          // dBm in a resource element
-constexpr double kWeakServing = -112;    // dBm: other radio access becomes a candidate
+constexpr double kWeakServing = -112;    // dBm; below it other radio access becomes a candidate
 constexpr std::size_t kShownNeighbors = 6, kShownDetected = 3;
-constexpr int kAbsent6 = 32, kAbsent7 = 64; // "not present" of 6 and 7 bit fields
+constexpr int kAbsent6 = 32, kAbsent7 = 64; // "not present" in fields of 6 and 7 bits
 
 class LteModem final : public Modem {
 public:
@@ -97,13 +97,14 @@ public:
     }
 
 private:
-    // What the measured average of a cell is, and how it interferes.
+    // The average measurement of a cell.
     struct Quality {
         double power, quality, indicator; // dBm RSRP, dB RSRQ, dBm RSSI (3GPP TS 36.214)
     };
     Quality quality(std::size_t layer, std::size_t site) const
     {
-        // A resource block has 12 elements per symbol; 2 carry reference signals always, the others by load.
+        // A resource block has 12 elements per symbol. 2 always carry reference signals, the others depend on the
+        // load.
         const auto& coverage = _coverages[layer];
         const double block = coverage.total() * (2 + 10 * _load) + 12 * milliwatts(kNoise);
         const double power = coverage.level(site);
@@ -111,7 +112,7 @@ private:
     }
     // RSRQ is reported from -19.5 to -3 dB (3GPP TS 36.133).
     static double inRange(double quality) { return std::clamp(quality, kLowestQuality, -3.0); }
-    /// The cells that can be distinguished from the interference.
+    /// The cells that stand out from the interference.
     std::vector<std::size_t> neighbors(std::size_t on) const
     {
         const std::size_t none = _world.sites().size();
@@ -119,7 +120,7 @@ private:
         std::erase_if(near, [&](std::size_t site) { return quality(on, site).quality <= kLowestQuality; });
         return near;
     }
-    /// The average with what the single measurement is off.
+    /// The average plus the error of a single measurement.
     double measured(double average) { return average + 0.9 * _random.normal(); }
     double measuredQuality(double average) { return inRange(measured(average)); }
 
@@ -141,7 +142,7 @@ private:
 
     void logServingCell(ModemLog& log)
     {
-        // Its system information has still to be read.
+        // The phone has not read its system information yet.
         _identified = false;
         _rulesUpdated = true;
         log.add(servingCell());
@@ -208,7 +209,7 @@ private:
     RecordWriter connectedMeasurement()
     {
         const auto near = neighbors(_layer);
-        // The weakest were detected, but not measured yet.
+        // The weakest cells were detected, but not measured yet.
         const std::size_t detected = std::min(near.size() / 2, kShownDetected), reported = near.size() - detected;
         const Quality serving = quality(_layer, _serving.site());
         RecordWriter record(0xB179, 29 + 6 * reported + 2 * detected);
@@ -235,7 +236,7 @@ private:
 
     RecordWriter neighborMeasurement(std::size_t on)
     {
-        // There is no record of no cells: the strongest is always in it.
+        // A record holds at least one cell: the strongest is always included.
         const auto order = _coverages[on].order();
         const auto near = neighbors(on);
         const std::size_t count = std::max<std::size_t>(near.size(), 1);
@@ -247,7 +248,7 @@ private:
         for (std::size_t i = 0; i < count; ++i) {
             const std::size_t site = near.empty() ? order[on == _layer && order[0] == _serving.site()] : near[i];
             const Quality heard = quality(on, site);
-            // The cells' frames are shifted against each other, as their sites' clocks are.
+            // The cells' frames are shifted against each other, because the sites' clocks are.
             const auto shift = static_cast<std::int64_t>(site);
             record.part(21 + 20 * i, 20)
                 .set(u32(0).bits(0, 8), lteCell(_world, on, site).physicalId)
@@ -264,8 +265,8 @@ private:
         return record;
     }
 
-    // The best candidate alone: elements stand 4 bytes apart though each is longer, so that a second one's header would
-    // be read as the first one's frequency and cell.
+    // Only the best candidate. Elements stand 4 bytes apart though each is longer, so the first one's frequency and
+    // cell would be read from the second one's header.
     RecordWriter candidates()
     {
         enum RadioAccess { Lte, Utran, Geran };
@@ -327,7 +328,7 @@ private:
     std::vector<Coverage> _coverages; // by layer
     std::size_t _layer = 0;
     ServingCell _serving{kMargin, kPatience};
-    double _load = 0.5; // of the cells
+    double _load = 0.5; // of the cells, 0 to 1
     bool _identified = false, _rulesUpdated = true;
     int _cyclesBelow = 0;
 };

@@ -9,8 +9,8 @@ namespace kestrum {
 
 class World;
 
-/// An E-UTRA modem on two carriers: reselects in idle mode, measures and is handed over in connected mode.
-/// The world outlives it.
+/// An E-UTRA modem on two carriers. It reselects in idle mode, and measures and hands over in connected mode. The
+/// world must outlive it.
 std::unique_ptr<Modem> makeLteModem(const World& world, Random random);
 
 } // namespace kestrum

@@ -10,16 +10,16 @@
 
 namespace kestrum {
 
-/// Whether what is logged every `period` ticks is due in a tick; not all periods begin together.
+/// Whether a record with a period of `period` ticks is logged in this tick. The periods start in different ticks.
 constexpr bool isDue(unsigned tick, unsigned period)
 {
     return tick % period == period / 2;
 }
 
-/// The records that a modem and its telephony service write within a tick, in order.
+/// The records that a modem and its telephony service write during a tick, in order.
 class ModemLog {
 public:
-    /// The lists outlive the log.
+    /// The lists must outlive the log.
     explicit ModemLog(PropertyLists& lists) : _lists(lists) {}
 
     void add(RecordWriter record) { _records.push_back(std::move(record)); }
@@ -32,27 +32,27 @@ private:
     std::vector<RecordWriter> _records;
 };
 
-/// A modem on the drive, of one technology: it receives the world's cells and logs what it measures and does.
+/// A modem of one technology in the car. It receives the world's cells and logs its measurements and actions.
 class Modem {
 public:
     virtual ~Modem() = default;
 
-    /// A tick is as long as the shortest period of its records.
+    /// The duration of a tick, which is the shortest period of a record.
     static constexpr std::chrono::milliseconds kTick{10};
-    /// So many ticks are a second.
+    /// Ticks per second.
     static constexpr unsigned kSecond = 100;
-    /// The world moves that many ticks at once.
+    /// Ticks per move of the world.
     static constexpr unsigned kMove = 10;
     static constexpr double kMoveSeconds = 0.1;
 
     /// kVoxLogChannelTechnology_...
     virtual std::string_view technology() const = 0;
 
-    /// Its log begins: whatever it knows goes into it.
+    /// Starts the log with everything that the modem knows.
     virtual void begin(ModemLog& log) = 0;
-    /// The world has moved by `kMoveSeconds`; what changes with it is logged.
+    /// Logs what has changed after the world has moved by `kMoveSeconds`.
     virtual void move(ModemLog& log) = 0;
-    /// What is logged again and again, in the tick of that number.
+    /// Logs the periodic records of tick `number`.
     virtual void tick(ModemLog& log, unsigned number) = 0;
 };
 

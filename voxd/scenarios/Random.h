@@ -6,8 +6,8 @@
 
 namespace kestrum {
 
-/// Random numbers that are the same on every machine for the same seed (the standard library's distributions are not).
-/// splitmix64.
+/// Random numbers (splitmix64). Equal seeds give equal numbers on every machine, unlike the standard library's
+/// distributions.
 class Random {
 public:
     explicit Random(std::uint64_t seed) : _state(seed) {}
@@ -19,16 +19,16 @@ public:
         z = (z ^ (z >> 27)) * 0x94D0'49BB'1331'11EBu;
         return z ^ (z >> 31);
     }
-    /// In [0, 1).
+    /// 0 or above, below 1.
     double fraction() { return static_cast<double>(bits() >> 11) * 0x1p-53; }
     double between(double low, double high) { return low + (high - low) * fraction(); }
-    /// Both ends included.
+    /// From `low` to `high`, both included.
     int whole(int low, int high)
     {
         return low + static_cast<int>(bits() % (static_cast<std::uint64_t>(high - low) + 1));
     }
     bool chance(double probability) { return fraction() < probability; }
-    /// Mean 0, deviation 1 (Box and Muller).
+    /// Mean 0, standard deviation 1 (Box and Muller).
     double normal() { return std::sqrt(-2 * std::log(1 - fraction())) * std::cos(2 * std::numbers::pi * fraction()); }
 
 private:

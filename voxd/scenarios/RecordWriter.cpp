@@ -17,7 +17,7 @@ constexpr std::byte kPrefix[] = {std::byte{0x81}, std::byte{0}};
 RecordWriter::RecordWriter(LogCode code, std::size_t length) : _bytes(length)
 {
     set(kType, code >= ChannelMessage::kExtraCodes ? 0xFF : 1);
-    // Counted as in a log file, where the record has no type byte.
+    // The length without the type byte, which a record in a log file does not have.
     set(kLength, static_cast<std::int64_t>(length) - 1);
     set(kCode, code & 0xFFFF);
 }

@@ -5,14 +5,14 @@
 
 namespace kestrum {
 
-/// UTRA's radio resource control (3GPP TS 25.331), as both modems that know it number its states.
+/// UTRA's radio resource control (3GPP TS 25.331), numbered as in the logs of both modems that have it.
 enum class RrcState { Disconnected, Connecting, Fach, Dch, CellPch, UraPch };
 
-/// Little data goes over the common channel, much over a dedicated one; after it the phone is paged for a while, in the
-/// area where it is fast, else in the cell.
+/// Little data uses the common channel, much data a dedicated one. Afterwards the phone is reachable by paging for a
+/// while: in the registration area when the car is fast, else in the cell.
 inline RrcState rrcState(const Traffic& traffic, const World& world)
 {
-    constexpr double kLittle = 0.25, kFast = 22; // part of the link; m/s
+    constexpr double kLittle = 0.25, kFast = 22; // share of the link; m/s
     switch (traffic.phase()) {
     case Traffic::Phase::Setup:
         return RrcState::Connecting;

@@ -12,20 +12,20 @@
 
 namespace kestrum {
 
-// What the telephony service itself adds to the modem's log: property lists.
+// The property lists that the telephony service adds to the modem's log.
 
-/// The number of what could not be measured.
+/// The number for a quantity that could not be measured.
 constexpr int kNotMeasured = 32767;
 
-/// A cell of the cell monitor: its technology and type, and the numbers that the modem knows of it.
+/// A cell of the cell monitor: its technology, its type, and the numbers that the modem knows.
 DictionaryRef cellReport(std::string_view technology, std::string_view type,
                          std::initializer_list<Dictionary::Entry> numbers);
 
-/// The elementary files of the SIM (3GPP TS 31.102), as text. The location files hold where the phone was registered
-/// last; the other networks' ones are forbidden.
+/// The elementary files of the SIM (3GPP TS 31.102), as text. The location files hold the phone's last registration.
+/// The other networks are forbidden.
 DictionaryRef simReport(const Plmn& registered, int locationArea, int routingArea);
 
-/// The packet data contexts: one for the phone itself always, one for what its user does.
+/// The packet data contexts: always one for the phone itself, and one for the user's data.
 ArrayRef pdpReport(std::string_view radioAccess, bool userData);
 
 /// A network identity's digits: MCC, then MNC with 2 or 3 digits.

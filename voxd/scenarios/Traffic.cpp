@@ -10,7 +10,7 @@ struct Length {
     double shortest, longest; // seconds
 };
 
-// In the order of Phase.
+// In the order of the enumeration Phase.
 constexpr Length kLengths[] = {{5, 20}, {0.4, 1.2}, {6, 25}, {0.3, 0.8}};
 
 } // namespace
@@ -28,7 +28,7 @@ bool Traffic::pass(double seconds)
 void Traffic::begin(Phase phase)
 {
     _phase = phase;
-    // A call follows data, and data a call.
+    // Calls and data alternate.
     if (phase == Phase::Setup)
         _voice = !_voice;
     const Length& length = kLengths[static_cast<std::size_t>(phase)];

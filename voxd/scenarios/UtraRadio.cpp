@@ -17,9 +17,9 @@ constexpr Carrier kPilot{2137.4, 16};
 constexpr double kMargin = 3;         // dB
 constexpr int kPatience = 6;          // moves
 constexpr double kNoise = -99;        // dBm in 3.84 MHz
-constexpr double kCellLoad = 5.5;     // power of a cell as a multiple of its pilot's
+constexpr double kCellLoad = 5.5;     // a cell's power as a multiple of its pilot's power
 constexpr double kDetectable = -116;  // dBm RSCP
-constexpr double kSoftHandover = 4.5; // dB below the best, within which a cell is in the active set
+constexpr double kSoftHandover = 4.5; // dB below the best; stronger cells are in the active set
 constexpr std::size_t kShownNeighbors = 6, kActive = 3;
 constexpr std::size_t kProcesses = 6; // HARQ (3GPP TS 25.321)
 
@@ -84,7 +84,7 @@ double UtraRadio::energy(std::size_t site) const
     return std::clamp(_coverage.level(site) - allPower(), -24.0, 0.0);
 }
 
-// The serving cell first, then those near it, the active set before the monitored one.
+// The serving cell first, then the cells near it: the active set before the monitored set.
 RecordWriter UtraRadio::searcher(RrcState state)
 {
     constexpr int kActiveSet = 0, kMonitoredSet = 1;
@@ -110,7 +110,7 @@ RecordWriter UtraRadio::searcher(RrcState state)
 
 RecordWriter UtraRadio::ranking() const
 {
-    // Without GSM cells: both lists begin at the same byte, so that only one of them can be sent.
+    // Without GSM cells: both lists begin at the same byte, so the record can hold only one of them.
     auto cells = neighbors();
     cells.insert(cells.begin(), site());
     RecordWriter record(0x4005, 15 + 10 * cells.size());
@@ -124,7 +124,7 @@ RecordWriter UtraRadio::ranking() const
             .set(u8(4), level + 21)
             .set(u16(5), level)
             .set(u8(7), std::lround(2 * energy(cells[i])))
-            .set(u16(8), level + (i == 0 ? 4 : 0)); // the serving cell has the hysteresis on its side
+            .set(u16(8), level + (i == 0 ? 4 : 0)); // the hysteresis favours the serving cell
     }
     return record;
 }
@@ -138,7 +138,7 @@ RecordWriter UtraRadio::identity() const
         .set(u16(25), cell().registrationArea);
 }
 
-// In 0.1 dB steps from -70 dBm at -512, one entry for each slot. 0 would say that there is no value.
+// In steps of 0.1 dB from -70 dBm at -512, one entry per slot. 0 would mean "no value".
 RecordWriter UtraRadio::transmitPower()
 {
     constexpr std::size_t kSlots = 4, kEntry = 14;
@@ -146,7 +146,7 @@ RecordWriter UtraRadio::transmitPower()
     RecordWriter record(0x4031, 16 + kEntry * kSlots);
     record.set(u8(14), kSlots);
     for (std::size_t i = 0; i < kSlots; ++i) {
-        // The weaker the cell, the stronger the phone (open loop, 3GPP TS 25.331).
+        // The phone sends more power the weaker the cell is (open loop, 3GPP TS 25.331).
         const double power = std::clamp(-95 - level() + _random.normal(), kLowest, kHighest);
         const auto raw = std::lround(10 * (power + 70)) - 512;
         record.part(16 + kEntry * i, kEntry).set(u16(4), raw == 0 ? 1 : raw);
@@ -154,7 +154,7 @@ RecordWriter UtraRadio::transmitPower()
     return record;
 }
 
-// Blocks since the modem started: the counters only grow.
+// Blocks since the modem's start: the counters only increase.
 RecordWriter UtraRadio::blockErrors()
 {
     constexpr int kWindow = 50;
@@ -175,12 +175,13 @@ RecordWriter UtraRadio::blockErrors()
     return record;
 }
 
-// What the processes received in the sub-frames (2 ms) since the last record.
+// The blocks that the processes received in the sub-frames (2 ms) since the last record.
 RecordWriter UtraRadio::harq(const Traffic& traffic)
 {
     constexpr std::size_t kEntry = 9;
     constexpr int kSubFrames = 100, kBlock = 7168, kSingleCarrier = 0, kDualCarrier = 2;
-    // The network abroad has two carriers. Their entries stand 162 bytes per entry of the first carrier behind it.
+    // The network abroad has two carriers. The second carrier's entries begin 162 bytes per first-carrier entry
+    // further on.
     const bool dual = _world.sites()[site()].abroad;
     const std::size_t secondary = 18 + 162 * kProcesses;
     RecordWriter record(0x4221, dual ? secondary + kEntry * kProcesses : 18 + kEntry * kProcesses);

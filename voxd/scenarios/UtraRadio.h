@@ -12,14 +12,14 @@
 
 namespace kestrum {
 
-/// The UMTS side of a GSM/UMTS modem: which cell it camps on, and the records of its radio resource layer.
+/// The UMTS side of a GSM/UMTS modem: its serving cell, and the records of its radio resource layer.
 class UtraRadio {
 public:
     UtraRadio(const World& world, Random random);
 
     void receive() { _coverage.move(); }
     void camp() { _serving.choose(_coverage.strongest()); }
-    /// Whether another cell serves now.
+    /// Returns whether the serving cell has changed.
     bool follow() { return _serving.follow(_coverage); }
     std::size_t site() const { return _serving.site(); }
     UmtsCell cell() const { return umtsCell(_world, site()); }
@@ -27,11 +27,12 @@ public:
     double best() const { return _coverage.level(_coverage.strongest()); }
 
     void logServingCell(ModemLog& log);
-    /// What follows the traffic; without traffic of its own (on GSM) the layer is disconnected.
+    /// Logs the records that depend on the traffic. Null, while the phone is on GSM, means that the layer is
+    /// disconnected.
     void logState(ModemLog& log, const Traffic* traffic);
     void tick(ModemLog& log, unsigned number, const Traffic& traffic);
 
-    /// For the cell monitor.
+    /// The entry for the cell monitor.
     DictionaryRef servingReport() const;
     void reportNeighbors(Array& into);
 

@@ -94,7 +94,7 @@ private:
     void logServingCell(ModemLog& log)
     {
         log.add(servingCell());
-        // Its system information has still to be read.
+        // The phone has not read its system information yet.
         _identified = false;
         log.add(kCellMonitorRecord, cells());
     }
@@ -127,7 +127,7 @@ private:
             .set(u8(25).bit(0), 0);
     }
 
-    // The serving cell first. Much is left free between the header and the cells.
+    // The serving cell first. The space between the header and the cells stays 0.
     RecordWriter neighborMeasurement()
     {
         enum Set { Active, Monitored, Detected };
@@ -139,7 +139,7 @@ private:
         for (std::size_t i = 0; i < near.size(); ++i) {
             const TddCell heard = tddCell(_world, near[i]);
             const double power = _coverage.level(near[i]) + 0.8 * _random.normal();
-            // The network lists no cell beyond the sixth.
+            // The network's list ends after the sixth cell.
             const Set set = i == 0 ? Active : i < 6 ? Monitored : Detected;
             record.part(kCells + kCell * i, kCell)
                 .set(u32(0).bits(0, 13), heard.uarfcn)
@@ -161,7 +161,7 @@ private:
             record.part(17 + 8 * i, 8)
                 .set(u16(0).bits(0, 13), heard.identity % 0x4000)
                 .set(u16(0).bit(14), 0)
-                .set(u16(0).bit(15), i < 4) // the others' synchronisation bursts have not been read
+                .set(u16(0).bit(15), i < 4) // the other cells' synchronisation bursts were not read
                 .set(u8(2), heard.bsic / 8)
                 .set(u8(3), heard.bsic % 8)
                 .set(u16(4), heard.arfcn)
@@ -170,8 +170,8 @@ private:
         return record;
     }
 
-    // Transport channels, and their composites with the signal-to-interference ratio in half dB by time slot. There are
-    // none while the phone is not connected.
+    // Transport channels, and their composites with the signal-to-interference ratio in half dB per time slot. Empty
+    // while the phone is not connected.
     RecordWriter linkQuality()
     {
         constexpr std::size_t kTransport = 2, kSlots = 6;

@@ -9,7 +9,8 @@ namespace kestrum {
 
 class World;
 
-/// A UTRA TDD modem: camps, transfers data, watches its own and GSM's neighbours. The world outlives it.
+/// A UTRA TDD modem: camps, transfers data, measures neighbours of its own technology and of GSM. The world must
+/// outlive it.
 std::unique_ptr<Modem> makeUtranModem(const World& world, Random random);
 
 } // namespace kestrum

@@ -10,7 +10,7 @@ constexpr double kEast = 1700, kNorth = 1100;    // half axes of the ring road, 
 constexpr int kColumns = 8, kRows = 5;           // of the sites' grid
 constexpr double kSpacing = 620, kScatter = 130; // metres
 constexpr double kSlowest = 11, kFastest = 31;   // m/s
-constexpr double kStart = 1.9;                   // radians: at home, half a minute from the border in the north
+constexpr double kStart = 1.9;                   // radians; at home, half a minute before the border in the north
 
 Place onRing(double angle)
 {
@@ -32,7 +32,7 @@ World::World(Random random) : _random(random), _car(onRing(kStart)), _angle(kSta
 {
     for (int row = 0; row < kRows; ++row)
         for (int column = 0; column < kColumns; ++column) {
-            // Every other row stands half a cell aside, so that the cells are hexagons.
+            // Every second row is shifted by half a cell, so that the cells are hexagons.
             const double x = (column + 0.5 * (row % 2) - 0.5 * (kColumns - 0.5)) * kSpacing;
             const double y = (row - 0.5 * (kRows - 1)) * kSpacing;
             const Place place{x + kScatter * _random.between(-1, 1), y + kScatter * _random.between(-1, 1)};
@@ -41,7 +41,7 @@ World::World(Random random) : _random(random), _car(onRing(kStart)), _angle(kSta
         }
 }
 
-// Clockwise, from home in the north-west over the border to the east. The speed wanders.
+// Clockwise, from home in the north-west across the border to the east. The speed varies.
 void World::drive(double seconds)
 {
     _speed = std::clamp(_speed + 1.2 * std::sqrt(seconds) * _random.normal(), kSlowest, kFastest);

@@ -20,22 +20,22 @@ struct Plmn {
     int mncDigits; ///< 2 or 3
 };
 
-/// A mast, with a cell of each technology.
+/// A mast with one cell of each technology.
 struct Site {
     Place place;
-    bool abroad; ///< on the other side of the border: another network's
-    int area;    ///< of its network: 0 or 1; location, routing and tracking areas follow it
-    bool town;   ///< has all technologies; in the country there is no UMTS
+    bool abroad; ///< across the border, in another network
+    int area;    ///< of its network: 0 or 1; location, routing and tracking areas depend on it
+    bool town;   ///< a site in a town has all technologies, a site in the country no UMTS
 };
 
-/// A small country on both sides of a border, two networks with a few dozen sites, and a car on a ring road that
-/// crosses the border twice a round. All technologies are received in the same world.
+/// A small country on both sides of a border: two networks with a few dozen sites, and a car on a ring road that
+/// crosses the border twice per round. All technologies share this world.
 class World {
 public:
-    /// The sites stand a little elsewhere for each seed.
+    /// The sites' positions vary a little with the seed.
     explicit World(Random random);
 
-    /// The car goes on for so long.
+    /// Moves the car by `seconds`.
     void drive(double seconds);
 
     Place car() const { return _car; }
@@ -46,7 +46,7 @@ public:
     const std::vector<Site>& sites() const { return _sites; }
     const Plmn& plmn(std::size_t site) const;
 
-    /// The network of the car's owner.
+    /// The home network of the phone.
     static const Plmn kHome;
     static const Plmn kAbroad;
 
@@ -54,7 +54,7 @@ private:
     Random _random;
     std::vector<Site> _sites;
     Place _car{};
-    double _angle; // radians on the ring road
+    double _angle; // position on the ring road, radians
     double _speed = 22;
     double _way = 0;
 };
