@@ -15,7 +15,7 @@ struct Case {
 
 class BandClass : public testing::TestWithParam<Case> {};
 
-// The band class stands in the upper five bits of the EV-DO status record's byte 14.
+// The band class is in the upper five bits of the EV-DO status record's byte 14.
 TEST_P(BandClass, IsNamed)
 {
     C2KRun run;

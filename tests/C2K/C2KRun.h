@@ -10,7 +10,7 @@
 
 namespace kestrum {
 
-/// A CDMA generator with a template that shows every identifier under itself.
+/// A CDMA generator with a template that shows every identifier under its name.
 class C2KRun {
 public:
     explicit C2KRun(DictionaryRef templateNode = everyIdentifier())

@@ -13,7 +13,7 @@ RecordBuilder reverse(std::uint32_t sequence)
     return record(0x127E, 1750).u32(14, sequence);
 }
 
-// Bits of a packet by the index of its forward-link counter; 0 where the counter counts no packets.
+// Bits of a packet by the index of its forward-link counter; 0 for a counter that counts no packets.
 constexpr unsigned kForward[56] = {128,  256,  512, 1024, 0,    128,  256,  512,  1024, 0,    128,  256,  512,  1024,
                                    0,    128,  256, 512,  1024, 0,    128,  256,  512,  1024, 0,    512,  1024, 2048,
                                    0,    128,  256, 512,  1024, 0,    512,  1024, 2048, 0,    1024, 3072, 0,    512,
@@ -37,7 +37,7 @@ TEST(DataRates, PublishNothingButTheEmptyTextAtFirst)
 TEST(DataRates, AreTheBitsOverTheSequenceNumbers)
 {
     C2KRun run;
-    run.receive(forward(10)).receive(forward(12).u32(17, 16)); // 2048 bits in two: 1 kbit each
+    run.receive(forward(10)).receive(forward(12).u32(17, 16)); // 2048 bits in two slots: 1 kbit each
     EXPECT_EQ(run.at("kFLDataRate"), Value("1.00 kbps"));
     const auto extra = run.state.at("ExtraInfo").dictionary();
     EXPECT_EQ(extra->at("FLDataSeqNum2"), Value(10));

@@ -19,7 +19,7 @@ std::set<std::string> keysOf(const Value& dictionary)
     return keys;
 }
 
-/// A record of a random code, its length around those that the decoders check.
+/// A record of a random code with a length near those that the decoders check.
 RecordBuilder anyRecord(const std::vector<std::uint8_t>& payload)
 {
     const auto code = kCodes[*rc::gen::inRange<std::size_t>(0, std::size(kCodes))];

@@ -11,10 +11,10 @@ struct Pilot {
     unsigned pn, energy;
 };
 
-/// Subpackets 1, 2, 3 and 4 one after the other; the scale of the pilots is such that N = 1, G = 1, K = 1 (2^-1).
+/// Subpackets 1, 2, 3 and 4 in order. The pilots' scale gives N = 1, G = 1, K = 1 (2^-1).
 struct Status {
     unsigned deviceState = 6;
-    unsigned n = 1, gain = 1, k = 1, m = 1; // with m = 0 a pilot's energy and the next one's PN would share their bytes
+    unsigned n = 1, gain = 1, k = 1, m = 1; // with m = 0 a pilot's energy would overlap the next one's PN
     unsigned reference = 0;
     std::vector<Pilot> pilots = {};
     bool fingers = true;
@@ -194,7 +194,7 @@ TEST(ActiveSetInfo, WithTheLargestMStopsAtTheRecordsEnd)
 
 TEST(OneXStatus, PublishesNothingWhenAFieldLiesBeyondTheRecord)
 {
-    // All four subpackets on one spot, the last of a record that ends before the RF subpacket's last field.
+    // All four subpackets at one place. The last one is in a record that ends before the RF subpacket's last field.
     C2KRun run;
     auto built = record(0x119C, 61)
                      .u8(14, 4)

@@ -9,7 +9,7 @@ namespace kestrum {
 namespace {
 
 struct Search {
-    /// Where in the record the subpacket begins; nothing when it is not found.
+    /// The offset of the subpacket in the record; empty when it is not found.
     std::optional<std::size_t> operator()(const RecordBuilder& built, std::uint32_t identifier)
     {
         const Record whole(built.bytes());
@@ -64,7 +64,7 @@ TEST(Subpackets, OfSizeZeroAreComparedAgainUntilTheCountIsReached)
 
 TEST(Subpackets, MayClaimSeventeenBytesLessOneBeyondTheRecord)
 {
-    // A record of 40 bytes: an end of 56 passes, one of 57 does not.
+    // In a record of 40 bytes an end of 56 is accepted, an end of 57 is not.
     Search search;
     EXPECT_EQ(search(packets(40, 1).u8(17, 1).u16(19, 39), 1), 17u);
     EXPECT_TRUE(search.log.lines.empty());
@@ -81,7 +81,7 @@ TEST(Subpackets, OfABadSizeAreReportedWithTheirIndex)
 
 TEST(Subpackets, WhoseHeaderLiesBeyondTheRecordAreNotFound)
 {
-    // The second header would begin at 57 of 60 bytes: three of its four bytes are there.
+    // The second header would begin at 57 of 60 bytes, so three of its four bytes are present.
     Search search;
     EXPECT_EQ(search(packets(60, 2).u8(17, 1).u16(19, 40).u8(57, 2), 2), std::nullopt);
     EXPECT_TRUE(search.log.lines.empty());

@@ -25,7 +25,7 @@ protected:
     State state;
 };
 
-// Tidying.
+// Normalising the modem's tree.
 
 Value tidied(const Value& received)
 {
@@ -232,7 +232,7 @@ TEST_F(ObjectStream, DeepestListThatIsReadIsShown)
     EXPECT_EQ(paths.size(), PropertyListCodec::kMaxDepth + 1);
 }
 
-// The rest of a generator's duties.
+// The other roles of a generator.
 
 TEST_F(ObjectStream, CreationIsLogged)
 {

@@ -1,4 +1,4 @@
-// What holds for every tree that the modem can send.
+// Properties of every tree that the modem can send.
 #include "LogGenerator/GSM/GSMLogGenerator.h"
 
 #include <gtest/gtest.h>

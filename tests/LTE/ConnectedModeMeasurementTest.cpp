@@ -13,7 +13,7 @@ namespace {
 using testing::ElementsAre;
 using testing::Pair;
 
-/// Two measured cells and two detected ones behind them.
+/// Two measured cells, then two detected ones.
 RecordBuilder fourCells()
 {
     return record(0xB179, 29 + 2 * 6 + 2 * 2)
@@ -102,7 +102,7 @@ TEST(ConnectedModeCells, MoreThanTheRecordHoldsEndAtTheLastWholeOne)
     // Two measured cells and five bytes of a third.
     auto cut = record(0xB179, 29 + 2 * 6 + 5).fill(29, 0x11).u8(27, 255).u8(28, 255);
     EXPECT_EQ(decodedList<MeasuredNeighborCells>(cut).size(), 2u);
-    // The detected ones would begin far behind the end.
+    // The detected cells would begin far after the end.
     EXPECT_EQ(decodedList<DetectedCells>(fourCells(), cut).size(), 0u);
     // Two detected cells and one byte of a third.
     EXPECT_EQ(decodedList<DetectedCells>(record(0xB179, 29 + 5).u8(28, 255)).size(), 2u);

@@ -52,7 +52,7 @@ TEST(LTELogGenerator, StartsTheModemWithTheCodesOfItsSections)
               R"("SetVoxExtraCodes": [0, 1, 2]})");
 }
 
-/// The lines that the sections log when a record of the code comes.
+/// The lines that the sections log for a record of the code.
 std::vector<std::string> calledBy(LogCode code)
 {
     LTERun run;

@@ -41,7 +41,7 @@ INSTANTIATE_TEST_SUITE_P(NeighborMeasurementMisc, NeighborMeasurementField, test
 
 class NeighborCellField : public testing::TestWithParam<FieldCase> {};
 
-// Offsets count from the cell's first byte; the second cell is looked at.
+// Offsets count from the cell's first byte. The test reads the second cell.
 TEST_P(NeighborCellField, IsShownWhateverStandsBesideIt)
 {
     auto inSecondCell = GetParam();
@@ -126,7 +126,7 @@ TEST(NeighborCellsList, LogsTheCountAndTheMeasurementsOfEachCell)
 
 TEST(NeighborCellsList, ShowsUpTo32Cells)
 {
-    // The bits above the count must not matter.
+    // The bits above the count are ignored.
     EXPECT_EQ(decodedList<NeighborCellsList>(record(0xB180, 21 + 33 * 20).u16(19, 0xFFFF)).size(), 32u);
 }
 

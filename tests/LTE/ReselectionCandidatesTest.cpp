@@ -66,7 +66,7 @@ TEST(ReselectionCandidatesList, ShowsAnLteCellIdWithoutTheSevenBitsBelowIt)
 
 TEST(ReselectionCandidatesList, TakesTheSecondHeaderFrom25WhereTheFirstPayloadBegins)
 {
-    // The first candidate's payload 0x0003, 0x0001 is the second's priority 3 and RAT 1.
+    // The first candidate's payload 0x0003, 0x0001 is also the second one's priority 3 and RAT 1.
     const auto two =
         record(0xB186, 33).u16(19, 2).u16(21, 5).u16(23, 2).u16(25, 3).u16(27, 1).u16(29, 10700).u16(31, 44);
     EXPECT_EQ(
@@ -94,7 +94,7 @@ TEST(ReselectionCandidatesList, OfCount0IsEmpty)
 struct CutCase {
     const char* name;
     std::uint32_t rat;
-    std::size_t length; ///< of header and payload, as far as it is read
+    std::size_t length; ///< of header and payload together, as far as they are read
 
     friend void PrintTo(const CutCase& shown, std::ostream* out) { *out << shown.name; }
 };
@@ -118,7 +118,7 @@ INSTANTIATE_TEST_SUITE_P(ReselectionCandidatesList, CutCandidate,
 
 TEST(ReselectionCandidatesList, StopsAtTheFirstThatDoesNotFit)
 {
-    // The third, of CDMA, lacks its last byte; the fourth, of no known RAT, would fit.
+    // The third candidate, of CDMA, lacks its last byte. The fourth, of an unknown RAT, would fit.
     auto four = record(0xB186, 21 + 8 + 11).u16(19, 4).u16(23, 9).u16(27, 9).u16(31, 3).u16(35, 9);
     EXPECT_EQ(decodedList<ReselectionCandidatesList>(four).size(), 2u);
 }

@@ -106,7 +106,7 @@ INSTANTIATE_TEST_SUITE_P(ServingCellMeasurement, ServingCellField, testing::Valu
     [](const auto& each) { return std::string(each.param.name); });
 // clang-format on
 
-// The marker for absent, 64, needs seven bits; its bit belongs to no field.
+// The marker for absence, 64, needs seven bits. Its highest bit is in no field.
 TEST(ServingCellMeasurement, NeverShowsAnAbsentMaxUeTxPower)
 {
     for (std::uint32_t raw = 0; raw < 128; ++raw) {

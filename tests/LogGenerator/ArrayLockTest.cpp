@@ -49,7 +49,7 @@ TEST_F(ArrayLockCounts, UseGoesOnAfterANestedPair)
 
 TEST_F(ArrayLockCounts, DepthWrapsAtEightBits)
 {
-    // After 256 locks the depth reads 0, and the first unlock takes it to 255.
+    // After 256 locks the depth is 0, and the first unlock changes it to 255.
     for (int i = 0; i < 256; ++i)
         ArrayLock::lockArray();
     for (int i = 0; i < 255; ++i)
@@ -106,7 +106,7 @@ TEST(ArrayLockDeathTest, SecondThreadIsRefusedInADebugBuild)
 }
 #endif
 
-// The array itself changes between locking and unlocking, and not before or after.
+// The array changes between lock and unlock, not before or after.
 
 class RewriteUnderTheLock : public testing::Test {
 protected:

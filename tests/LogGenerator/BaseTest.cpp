@@ -12,7 +12,7 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-// The energy ratio's scale.
+// The scale of the energy ratio.
 
 struct Ratio {
     std::uint32_t linear;
@@ -110,7 +110,7 @@ TEST_F(BaseOf, SectionDoesNotOwnItsNode)
     EXPECT_EQ(node.use_count(), 1);
     node.reset();
     EXPECT_EQ(section.sectionRef.dictionary(), nullptr);
-    section.publish("RSSI", "-71 dBm"); // harmless
+    section.publish("RSSI", "-71 dBm"); // has no effect
 }
 
 TEST_F(BaseOf, SectionWithoutANodeDecodesWithoutHarm)
@@ -252,7 +252,7 @@ TEST_F(BaseOf, ListIsRewrittenByItsCount)
     EXPECT_EQ(Value(node), Value(makeArray({makeDictionary({{"Cell", "7"}}), makeDictionary({{"Cell", "8"}})})));
 }
 
-// Layouts whose shortest record does not hold all fields are found by the compiler.
+// The compiler rejects layouts whose shortest record does not hold all fields.
 constexpr Layout kFieldBeyondTheRecord[] = {{.code = 1, .minimumLength = 13, .rows = kRows}};
 static_assert(!fits(kFieldBeyondTheRecord));
 constexpr Layout kCountBeyondTheRecord[] = {

@@ -46,7 +46,7 @@ TEST(ChannelMessage, PrefixIsRemoved)
 
 TEST(ChannelMessage, PrefixCountsForTheLeastLength)
 {
-    // 11 bytes are left behind the prefix: less than a header, yet the type and the code are there.
+    // 11 bytes follow the prefix. That is less than a header, but includes the type and the code.
     const auto bytes = bytesFrom({0x81, 0, 0xFF, 0, 0, 0x34, 0x12, 0, 0, 0, 0, 0, 0});
     ASSERT_EQ(bytes.size(), 13u);
     const auto read = ChannelMessage::read(bytes);

@@ -31,7 +31,7 @@ TEST_F(ClassIndexOf, CodeOfTwoSectionsHasThemInTheirOrder)
 TEST_F(ClassIndexOf, CodeThatNobodyTakesHasNoSubscribers)
 {
     EXPECT_EQ(index->getSubscribers(0x4004), nullptr);
-    EXPECT_EQ(index->getSubscribers(2), nullptr); // an extra code stands under its lifted number alone
+    EXPECT_EQ(index->getSubscribers(2), nullptr); // an extra code is registered only under its number plus 0xFF0000
     EXPECT_NE(index->getSubscribers(0xFF0002), nullptr);
 }
 

@@ -25,7 +25,7 @@ std::uint64_t numberAt(Bytes bytes, std::size_t offset, std::size_t width)
     return number;
 }
 
-// The version report by itself.
+// The version report alone.
 
 TEST(VersionReport, IsByteForByte)
 {
@@ -103,7 +103,7 @@ TEST(VersionReport, TextOfExactlyItsFieldIsCutForTheNul)
     EXPECT_EQ(textAt(report, 63, 18), std::string("12345678901234567\0", 18));
 }
 
-// The stream that a generator makes of its history.
+// The stream that a generator writes from its history.
 
 class Dlf : public testing::Test {
 protected:

@@ -9,7 +9,7 @@ namespace {
 
 using testing::ElementsAre;
 
-/// A generator that decodes nothing: what is left is what all of them share.
+/// A generator that decodes nothing: it has only what all generators share.
 class Plain final : public LogGenerator {
 public:
     explicit Plain(DecodingRoles& roles) : LogGenerator(roles) {}

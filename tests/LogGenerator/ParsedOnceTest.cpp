@@ -7,7 +7,7 @@
 namespace kestrum {
 namespace {
 
-/// Takes any bytes for the list of their text, but for "none".
+/// Parses any bytes as a list with their text, except "none".
 class CountingLists final : public PropertyLists {
 public:
     Value parse(Bytes bytes) override

@@ -51,7 +51,7 @@ TEST(Rows, WordsArePrintedAsTheirSignSays)
     EXPECT_EQ(decimalUnsigned.number(0xFFFFFFFF), 4294967295.0);
 }
 
-/// What the list holds after that.
+/// The list after that.
 template <typename Append>
 Value listOf(Append append)
 {

@@ -10,8 +10,8 @@
 
 namespace kestrum {
 
-/// A technology of the tests' own: "Cell" shows a byte of records 0x4001 and 0xFF0002, "Neighbors" lists the payload
-/// of records 0x4001 and 0x4002, "Legend" takes no records. Record 0x4003 breaks "Cell".
+/// A technology for these tests: "Cell" shows a byte of records 0x4001 and 0xFF0002, "Neighbors" lists the payload of
+/// records 0x4001 and 0x4002, "Legend" takes no records. "Cell" throws on record 0x4003.
 namespace sample {
 
 inline std::vector<std::string>& calls()
@@ -95,7 +95,7 @@ private:
     std::string_view _technology;
 };
 
-/// Lays the template down: sections inside a dictionary, inside an array and at the top.
+/// Adds the template to the doubles: sections inside a dictionary, inside an array and at the top.
 inline Value templateTree()
 {
     return makeDictionary({{"Radio", makeDictionary({{"Cell", makeDictionary({{"Channel", ""}})}})},
@@ -105,7 +105,7 @@ inline Value templateTree()
 
 } // namespace sample
 
-/// The sample technology, its template in the bundle.
+/// The sample technology, with its template in the bundle.
 struct SampleDoubles : DecodingDoubles {
     SampleDoubles()
     {

@@ -1,4 +1,4 @@
-// A new generator meets the state of an earlier one.
+// A new generator continues with the state of an earlier one.
 #include "LogGenerator/Messages.h"
 #include "LogGenerator/Sections.h"
 
@@ -65,7 +65,7 @@ TEST_F(TakeOver, WorksGenerationAfterGeneration)
 
 TEST_F(TakeOver, RowOfAListIsNoSectionThoughItBearsASectionsName)
 {
-    // A record can put any name into the display; only the template says where sections are.
+    // A record can put any name into the display. Only the template decides where sections are.
     built->set("Cell", makeDictionary({{"Channel", "not a section"}}));
     sample::Generator next(doubles.roles);
     next.updateState(doubles.state, message(1, 0x4001, {8}));

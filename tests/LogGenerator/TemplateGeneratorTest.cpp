@@ -27,7 +27,7 @@ protected:
     std::unique_ptr<sample::Generator> generator = std::make_unique<sample::Generator>(doubles.roles);
 };
 
-// Its life.
+// Creation and end.
 
 TEST_F(TemplateGenerator, CreationIsLogged)
 {
@@ -158,7 +158,7 @@ TEST_F(TemplateGenerator, MissingTemplateIsLoggedAndTriedAgain)
     EXPECT_TRUE(generator->generateLogUsingState(doubles.state).isNull());
     EXPECT_EQ(doubles.log.count("Cannot load template for display"), 2u);
     EXPECT_FALSE(doubles.state.contains("Display"));
-    EXPECT_THAT(sample::calls(), ElementsAre("Cell 16385 14", "Neighbors 16385 14")); // without harm
+    EXPECT_THAT(sample::calls(), ElementsAre("Cell 16385 14", "Neighbors 16385 14")); // no error
 
     doubles.bundle.paths = {"Sample.plist"};
     generator->updateState(doubles.state, message(1, 0x4001, {8}));

@@ -12,7 +12,7 @@ namespace {
 using testing::ElementsAre;
 using testing::Pair;
 
-/// A record with those counts; the bits below them are set, for they must not matter.
+/// A record with those counts. The bits below the counts are set, because decoders must ignore them.
 RecordBuilder channels(unsigned transport, unsigned composite, std::size_t length)
 {
     return record(0xD00C, length).u16(14, 0x3Fu | transport << 6 | composite << 12);

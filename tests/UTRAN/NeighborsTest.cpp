@@ -13,7 +13,7 @@ namespace {
 using testing::ElementsAre;
 using testing::Pair;
 
-/// So many cells, all of zeros.
+/// A record of `cells` cells whose fields are all 0.
 RecordBuilder neighbors(unsigned count)
 {
     return record(0xD00A, 168 + 16 * count).u8(16, count << 1);
@@ -21,7 +21,7 @@ RecordBuilder neighbors(unsigned count)
 
 class UTRANNeighborField : public testing::TestWithParam<FieldCase> {};
 
-// Offsets count from the cell's first byte; the second cell is looked at.
+// Offsets count from the cell's first byte. The test reads the second cell.
 TEST_P(UTRANNeighborField, IsShownWhateverStandsBesideIt)
 {
     auto inSecondCell = GetParam();

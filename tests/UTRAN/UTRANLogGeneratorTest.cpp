@@ -71,7 +71,7 @@ TEST(UTRANLogGenerator, FillsTheDisplayOfItsTemplate)
     EXPECT_EQ(nodeNamed("Downlink UARFCN", run.section("Serving Cell Info")), "10700");
 }
 
-/// The template that a generator takes when these are the bundle's resources: the display comes from it.
+/// The template that a generator loads when the bundle has these resources. The display is made from it.
 Value displayFrom(std::vector<std::string> paths, const std::string& expected)
 {
     DecodingDoubles doubles;

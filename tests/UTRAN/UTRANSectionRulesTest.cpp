@@ -23,7 +23,7 @@ const SectionShape kShapes[] = {
     {"CCTRCH SIR", Kind::Array, {"CCTRCH ID", "TSNUM", "SIR"}},
 };
 
-// Without 0xD0E0, which is shown however short it is.
+// Without 0xD0E0, whose records are shown at any length.
 const SectionRule kRules[] = {
     {"ServingCell", "Serving Cell Info", 0xD0E2, 26},       {"Neighbors", "Neighbor Cell List", 0xD00A, 21},
     {"GsmNeighbors", "GSM Neighbor Cell List", 0xD00E, 17}, {"TransportChannels", "TRCH BLER", 0xD00C, 17},

@@ -12,13 +12,13 @@
 
 namespace kestrum {
 
-/// A code of a section and the least length of its record; 0 where a property list follows the header.
+/// A code of a section and the minimum length of its record; 0 where a property list follows the header.
 struct CodeContract {
     LogCode code;
     std::size_t minimumLength;
 };
 
-/// What a section promises to the outside.
+/// The external behaviour of a section.
 struct SectionContract {
     const char* className; ///< for the test's name
     const char* name;
@@ -48,7 +48,7 @@ inline const std::vector<std::string> kSimKeys = {
     "EF-OPLMNAcT",
 };
 
-// In the order in which the sections are made.
+// In the order in which the sections are created.
 // clang-format off
 inline const std::vector<SectionContract> kContracts = {
     {"ActiveSet", "Active Set", true, "ActiveSet", {{0x417A, 16}}, {"Scrambling Code", "RSCP", "Energy Per Chip"}},
@@ -103,7 +103,7 @@ inline const std::vector<SectionContract> kContracts = {
 };
 // clang-format on
 
-/// A section of the index, with a node of its own in which something stands already.
+/// A section of the index at its node, which already holds a value.
 class SectionAtWork {
 public:
     static constexpr const char* kLeftOver = "left over";
@@ -143,7 +143,7 @@ private:
     ZPH_GSMClassIndex _index;
 };
 
-/// Whether a node, and all rows inside it, have no keys but these and the one that was left over.
+/// Whether a node and all rows inside it have only these keys and the key that was there before.
 inline bool hasOnlyKeys(const Value& value, const std::vector<std::string>& keys)
 {
     if (const auto list = value.array())

@@ -47,7 +47,7 @@ TEST(ProcessCO, ShowsOfMobilityManagementTheStateAlone)
 {
     const auto section = decoded<ProcessCO>(record(0x7131, 16).bytes(13, {19, 8, 0}));
     EXPECT_EQ(section.text(), R"({"MM State": "MM_IDLE"})");
-    EXPECT_EQ(section.log().count("ProcessCS"), 1u); // its word, on purpose
+    EXPECT_EQ(section.log().count("ProcessCS"), 1u); // Kept: field logs show this word
 }
 
 TEST(ProcessPS, ShowsTheMisspeltSubstate)

@@ -20,7 +20,7 @@ TEST_P(EverySection, HasItsNameAndItsCodesInOrder)
 
 TEST_P(EverySection, LogsItsWordFirstWhateverTheRecord)
 {
-    // Its own codes short and long, and a foreign one.
+    // The section's codes, short and long, and a foreign code.
     std::vector<RecordBuilder> records = {record(0x1234, 64)};
     for (const auto& each : GetParam().codes) {
         if (each.minimumLength == 0)
@@ -78,7 +78,7 @@ TEST_P(DecodingSection, IsNotChangedByARecordOneByteShort)
 TEST_P(DecodingSection, DecodesARecordOfTheLeastLength)
 {
     for (const auto& each : GetParam().codes) {
-        // The list of colour codes is only kept for the next measurements.
+        // The list of colour codes is only stored for the next measurements.
         if (each.minimumLength == 0 || each.code == 0x51FF)
             continue;
         SectionAtWork run(GetParam());
@@ -102,7 +102,7 @@ TEST_P(DecodingSection, DoesNotLookAtWhatFollows)
 
 TEST_P(DecodingSection, ShowsNoMoreThanTheRecordHolds)
 {
-    // All counts are 255, whatever the length.
+    // All counts are 255, whatever the record's length.
     for (const auto& each : GetParam().codes) {
         if (each.minimumLength == 0)
             continue;

@@ -19,13 +19,14 @@ Value shownFor(const char* key, unsigned raw)
     return decoded<Section>(record(code, length).u8(offset, raw)).at(key);
 }
 
-/// What a raw value is called on the display.
+/// The name of a raw value on the display.
 struct Name {
     unsigned value;
     const char* text;
 };
 
-/// A byte of a record, the key that shows it, and all its names. Values that are not listed have the name `others`.
+/// A byte of a record, the key that shows it, and all of its names. Values that are not listed have the name
+/// `others`.
 struct Names {
     const char* of;
     Value (*shown)(const char* key, unsigned raw);

@@ -13,7 +13,7 @@ namespace {
 
 using Lines = std::vector<std::string>;
 
-/// A cell of the searcher: scrambling code, the set it is in (0: active), its three energies.
+/// A cell of the searcher: scrambling code, its set (0: active), its three energies.
 struct Searched {
     unsigned scramblingCode, set;
     std::uint32_t energies[3];
@@ -22,7 +22,7 @@ struct Searched {
 RecordBuilder searcher(int agc, const std::vector<Searched>& cells)
 {
     const std::size_t measurements = 16 + 15 * cells.size();
-    auto built = record(0x417A, measurements + 44 * cells.size()).fill(16, 0xA5); // what is not read is no zero
+    auto built = record(0x417A, measurements + 44 * cells.size()).fill(16, 0xA5); // unread bytes are not 0
     built.u16(13, agc).u8(15, static_cast<unsigned>(cells.size()));
     for (std::size_t i = 0; i < cells.size(); ++i) {
         built.u16(16 + 15 * i + 7, cells[i].scramblingCode | cells[i].set << 13);
@@ -46,7 +46,7 @@ TEST(ActiveSet, HasNoCellOfAnyOtherMembership)
 
 TEST(ActiveSet, AddsLevelAndEnergyTruncatingTowardZero)
 {
-    // 60000 of full scale 2^19 is -10 dB; (-600 + 512) / 10 is -8.
+    // 60000 of the full scale 2^19 is -10 dB; (-600 + 512) / 10 is -8.
     EXPECT_EQ(decodedList<ActiveSet>(searcher(-600, {{12, 0, {60000, 0, 0}}})).text(),
               R"([{"Scrambling Code": "12", "RSCP": "-124 dB", "Energy Per Chip": "-10 dB"}])");
 }
@@ -79,7 +79,7 @@ class ReceivedLevel : public testing::TestWithParam<Level> {};
 
 TEST_P(ReceivedLevel, IsShownInWholeDb)
 {
-    // All energy: 0 dB.
+    // Full energy: 0 dB.
     EXPECT_EQ(decodedList<ActiveSet>(searcher(GetParam().agc, {{1, 0, {524288, 0, 0}}})).row(0)->at("RSCP"),
               GetParam().rscp);
 }
@@ -183,7 +183,7 @@ TEST(Ranking, StopsAtTheFirstCellThatTheRecordDoesNotHold)
 {
     const auto twenty = record(0x4005, 35).u8(13, 255).u8(14, 255);
     EXPECT_EQ(decodedList<UMTSSet>(twenty).size(), 2u);
-    EXPECT_EQ(decodedList<GSMSet>(twenty).size(), 2u); // 6 of the third one's 7 bytes are there
+    EXPECT_EQ(decodedList<GSMSet>(twenty).size(), 2u); // 6 of the third cell's 7 bytes are present
     auto longer = twenty;
     EXPECT_EQ(decodedList<GSMSet>(longer.length(36)).size(), 3u);
 }

@@ -71,7 +71,7 @@ TEST(ZPH_GSMLogGenerator, StartsTheModemWithTheCodesOfItsSectionsAndNoOthers)
     EXPECT_THAT(sorted("SetVoxExtraCodes"), ElementsAre(0, 1, 2));
 }
 
-/// The words of the sections that are called when a record of the code comes.
+/// The log lines of the sections that get a record of the code.
 std::vector<std::string> calledBy(LogCode code)
 {
     GsmRun run;
@@ -198,7 +198,7 @@ TEST_P(Template, HasEveryKeyThatARecordSets)
             run.receive(record(each.code, each.minimumLength + 4000).fill(13, 1).bytes());
     auto after = keysOf(run.section(GetParam().name));
     if (std::string_view(GetParam().name) == "UMTS RR Info")
-        after.insert("UARFCN"); // which the modem's own record removes
+        after.insert("UARFCN"); // the modem's own record removes it
     EXPECT_EQ(after, before);
 }
 

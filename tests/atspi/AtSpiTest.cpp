@@ -14,7 +14,7 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// The accessibility bus, as a screen reader's process would be on it.
+/// The accessibility bus as a screen reader sees it.
 QDBusConnection& bus()
 {
     static QDBusConnection connection = [] {
@@ -25,7 +25,7 @@ QDBusConnection& bus()
     return connection;
 }
 
-/// One accessible object, on the other side of the bus.
+/// An accessible object of the application, accessed over the bus.
 class Part {
 public:
     enum State { Checked = 4, Enabled = 8 };
@@ -65,7 +65,7 @@ public:
         list.endArray();
         return children;
     }
-    /// Itself and all inside it.
+    /// The object and all objects inside it.
     std::vector<Part> all() const
     {
         std::vector<Part> all{*this};
@@ -81,7 +81,7 @@ public:
                 return each;
         return {};
     }
-    /// Everything that can be done to it.
+    /// The names of all of its actions.
     void tryEverything() const
     {
         for (int action = 0; action < 3; ++action)
@@ -141,7 +141,7 @@ protected:
     {
         makeVisible();
         ASSERT_TRUE(bus().isConnected());
-        // The application registers itself once the services are up.
+        // The application registers itself after the services have started.
         ASSERT_TRUE(QTest::qWaitFor([&] { return frame().isThere(); }, 20'000));
     }
     static Part frame()

@@ -12,7 +12,7 @@ namespace {
 
 kestrum::Toolkit* made = nullptr;
 
-/// A server that says on its first line where it can be reached; empty when it does not start.
+/// A server that writes its address in its first line; empty when it does not start.
 class Server {
 public:
     explicit Server(const QString& program, const QStringList& arguments) { _process.start(program, arguments); }

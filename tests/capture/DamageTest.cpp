@@ -25,7 +25,7 @@ struct Scanned {
     std::vector<std::string> messages;
     std::vector<CaptureFault> faults;
     std::uint64_t lost = 0;
-    std::uint64_t missing = 0; ///< by the recording's notes
+    std::uint64_t missing = 0; ///< as the recording's notes say
 };
 
 template <typename Reader, typename... Origin>
@@ -235,7 +235,7 @@ TEST(IntervalSearch, AccountsForEveryByteThatIsNoMessage)
     EXPECT_EQ(taken + got.lost, (kFirst + "fragment" + kSecond).size());
 }
 
-// Whatever is done to a capture: its scan ends, and what is given and what is told of account for every byte.
+// However a capture is damaged, its scan ends, and messages and reported gaps together account for every byte.
 class DamagedCapture : public testing::Test {
 protected:
     const std::string capture = kcap(kFirst) + kcap("\x81\x07"s + kSecond) + kcap(message(1, kXml, kStamp, 0xFF)) +
@@ -299,7 +299,7 @@ RC_GTEST_PROP(AnyBytes, AreScannedToTheirEnd, (const std::vector<std::uint8_t>& 
     RC_ASSERT(taken + asInterval.lost == stream.size());
 }
 
-/// What a fresh modem stamps its records with: 1.25 ms since it was switched on, as if that were 1980.
+/// The time stamps of a modem without network time: 1.25 ms since it was switched on, counted from 1980.
 constexpr std::uint64_t kSwitchedOn = 12'345ull << 16;
 
 std::string records(int count, std::uint64_t first, bool withTypes)
@@ -410,14 +410,14 @@ RC_GTEST_PROP(WellFramed, DlfIsReadWholeWhateverItsTimeStamps, ())
         RC_ASSERT(got.messages[i].substr(13) == payloads[i]);
 }
 
-// No zeros: the lengths and times of records are half of them, and enough of them can pass for a record.
+// No zeros: half of a record's length and time bytes are zero, so enough of them can be taken for a record.
 rc::Gen<Text> someBytes(int least, int most)
 {
     return rc::gen::container<Text>(static_cast<std::size_t>(*rc::gen::inRange(least, most)),
                                     rc::gen::cast<std::uint8_t>(rc::gen::inRange(1, 256)));
 }
 
-/// A stream in which some bytes were written over, and the whole messages behind them.
+/// A stream in which some bytes were overwritten, and the undamaged messages after them.
 struct Damaged {
     std::string stream;
     std::vector<std::string> behind;
@@ -461,15 +461,15 @@ RC_GTEST_PROP(OverwrittenBytes, HideNoMessageOfAKcapBehindThem, ())
 {
     const auto [stream, behind] = damaged(drive(), [](const std::string& each) { return kcap(each); });
     const auto got = scanKcap(stream);
-    // Unless the new lengths lead to the end as well.
+    // Except when the new lengths lead to the end as well.
     RC_ASSERT(endsWith(got.messages, behind) || got.faults.empty());
 }
 
-// Nothing but lengths and time stamps tells where records begin, so bytes of two records can pass for a third. That is
-// rare: all whole records behind the damage are found in all but a few of a thousand cases.
+// Only lengths and time stamps show where records begin, so bytes of two records can be taken for a third. That is
+// rare: in all but a few of a thousand cases the scan finds every whole record after the damage.
 TEST(OverwrittenBytes, HideRecordsOfADlfHardlyEver)
 {
-    std::mt19937 random(7); // always the same cases
+    std::mt19937 random(7); // the same cases in every run
     const auto bytes = [&](std::size_t most) {
         std::string text(random() % most, ' ');
         for (char& each : text)
@@ -497,7 +497,7 @@ TEST(OverwrittenBytes, HideRecordsOfADlfHardlyEver)
 
 TEST(HostileStreams, OfFalseHeadsAreScannedInLinearTime)
 {
-    // Nothing but heads that promise much, none of them true.
+    // Only headers with great lengths, all of them false.
     std::string heads;
     while (heads.size() < (1u << 20))
         heads += littleEndian(0xFFFFFF, 4) + "\x01\xFE\xFF\xC1\xB0" + littleEndian(kStamp, 8);
@@ -516,7 +516,7 @@ TEST(HostileStreams, OfServiceRecordsWhoseListsNeverEndAreScannedInLinearTime)
         EXPECT_LE(scanDlf(stream).messages.size(), records);
         return static_cast<double>(std::clock() - before) / CLOCKS_PER_SEC;
     };
-    // Ten times the input may take ten times as long; what grows with its square takes a hundred times.
+    // Ten times the input may take ten times as long. A quadratic algorithm would take a hundred times as long.
     const double few = seconds(5'000);
     EXPECT_LT(seconds(50'000), 40 * few + 1);
 }

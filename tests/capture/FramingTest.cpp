@@ -16,11 +16,11 @@ using testing::IsEmpty;
 struct Read {
     std::vector<std::string> messages;
     std::string fault;
-    std::uint64_t offset = 0; ///< of the fault, else of the end
+    std::uint64_t offset = 0; ///< of the fault, or of the end if there is none
     std::uint64_t missing = 0;
 };
 
-/// By the lengths alone.
+/// Reads the messages by their lengths alone.
 Read readAll(const std::string& bytes, CaptureFormat format)
 {
     std::istringstream stream(bytes);

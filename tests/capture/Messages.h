@@ -31,13 +31,13 @@ inline std::string kcap(std::string_view message)
     return littleEndian(message.size(), 4) + std::string(message);
 }
 
-/// A note that so many messages are missing.
+/// A note that `count` messages are missing.
 inline std::string note(std::uint64_t missing)
 {
     return littleEndian(0x8000'0008, 4) + littleEndian(missing, 8);
 }
 
-/// A DLF record: the message without its type.
+/// A DLF record: the message without its type byte.
 inline std::string dlf(unsigned code, std::string_view payload, std::uint64_t stamp = kStamp)
 {
     return message(code, payload, stamp).substr(1);

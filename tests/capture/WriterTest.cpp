@@ -29,7 +29,7 @@ TEST(KcapWriter, NotesHowManyMessagesAreMissing)
     EXPECT_EQ(stream.str(), std::string("\x08\0\0\x80\x08\x07\x06\x05\x04\x03\x02\x01", 12));
 }
 
-/// What a DLF stream holds of a message; "refused" when it cannot hold it.
+/// The form of a message in a DLF stream; "refused" when the stream cannot hold it.
 std::string asDlf(const std::string& message)
 {
     std::ostringstream stream;

@@ -8,7 +8,7 @@
 #include <filesystem>
 #include <fstream>
 
-// The roles on the device's files: its file system and its preferences.
+// The roles for the device's files: its file system and its preferences.
 namespace kestrum {
 namespace {
 
@@ -64,7 +64,7 @@ TYPED_TEST(FilesContract, PreferencesSayWhetherTheyCouldBeWritten)
 {
     this->world.preferences.setApplicationValue("org.example", "Key", false);
     EXPECT_TRUE(this->world.preferences.synchronize("org.example"));
-    this->world.preferences.postChanged("org.example", "Key"); // nobody to tell
+    this->world.preferences.postChanged("org.example", "Key"); // no observer yet
 }
 
 TYPED_TEST(FilesContract, PreferencesSayThatTheyCouldNotBeWritten)

@@ -67,7 +67,7 @@ TYPED_TEST(MainQueueContract, ATimerMayEndWithinItsOwnAction)
     const auto held = std::make_shared<int>(7);
     timer = this->queue.repeat(1ms, [&timer, &ticks, held] {
         timer.reset();
-        ticks += *held; // still there
+        ticks += *held; // still alive
     });
     EXPECT_TRUE(this->loop.eventually([&] { return ticks == 7; }));
     this->loop.wait(10ms);

@@ -18,7 +18,7 @@ using std::chrono::milliseconds;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// What the other process does with a message.
+/// The other process's reaction to a message.
 struct Answer {
     std::optional<std::string> reply;
     milliseconds after{0};
@@ -194,7 +194,7 @@ TYPED_TEST(LocalPortContract, MayBeDestroyedInItsReceiveHandler)
     std::vector<std::string> seen;
     port = this->world.ports.createLocal("log", [&](std::int32_t, Bytes payload) {
         port.reset();
-        seen.emplace_back(textOf(payload)); // still there
+        seen.emplace_back(textOf(payload)); // still alive
     });
     port->setDeliveryQueue(this->world.queue);
     this->world.send(0, "first");

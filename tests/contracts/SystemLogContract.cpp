@@ -33,7 +33,7 @@ struct LinuxWorld {
 
     std::vector<std::string> texts()
     {
-        log.reset(); // its thread writes what is queued
+        log.reset(); // its thread writes the queued lines first
         return written;
     }
 };

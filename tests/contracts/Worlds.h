@@ -8,11 +8,11 @@
 
 namespace kestrum {
 
-/// The hand-cranked queue, as a main loop.
+/// The main loop on the hand-cranked queue.
 struct CrankedLoop {
     CrankedQueue queue;
 
-    /// Serves the queue for that long.
+    /// Runs the queue for that time.
     void wait(std::chrono::milliseconds time) { queue.advance(time); }
     bool eventually(const std::function<bool()>& condition) { return queue.turn(std::chrono::seconds(20), condition); }
     void drop() { queue.drop(); }
@@ -32,7 +32,7 @@ struct QtLoop {
     void drop() { queue.clear(); }
 };
 
-/// Names the sides of a contract in the tests' names.
+/// Gives the names of the two sides of a contract in the tests' names.
 struct DoubleOrAdapter {
     template <typename World>
     static std::string GetName(int index)

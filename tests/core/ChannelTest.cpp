@@ -1,4 +1,4 @@
-// How the log channel ends: by itself, on purpose, and in the middle of something.
+// The end of the log channel: by itself, by a call, and during other work.
 #include "core/Monitor.h"
 
 namespace kestrum {
@@ -24,7 +24,7 @@ TEST_F(Channel, DeathWhileIdleIsFoundByTheNextRefreshAndRestarts)
     startRunning();
     ports.kill(kCommandPort);
     queue.run();
-    EXPECT_THAT(log.lines, IsEmpty()); // the death alone says nothing
+    EXPECT_THAT(log.lines, IsEmpty()); // the invalidation alone logs nothing
     serve();
 
     seconds(2);
@@ -88,7 +88,7 @@ TEST_F(Channel, InvalidatedLocalPortRestarts)
 {
     startRunning();
     ports.invalidateLocal(kLogPort);
-    EXPECT_THAT(log.lines, IsEmpty()); // not inside the call that invalidates
+    EXPECT_THAT(log.lines, IsEmpty()); // not during the call that invalidates
     queue.run();
     EXPECT_EQ(log.lines.front(), RecordingLog::Line(Priority::Error, kInvalidated));
     EXPECT_EQ(attempts(), 1u);
@@ -218,16 +218,16 @@ TEST_F(Channel, ModelLetGoWhileTheReplyIsAwaitedEndsItsAttempt)
     };
     model->startMonitor();
     EXPECT_EQ(model, nullptr);
-    EXPECT_EQ(queue.timers(), 1u); // it runs on, held by its timer
+    EXPECT_EQ(queue.timers(), 1u); // its timer keeps it running
     queue.drop();
     EXPECT_FALSE(ports.hasLocal(kLogPort));
 }
 
-// The creation of the log channel serves the queue, as the wait for the reply does.
+// Creating the log channel runs the queue, as the wait for the reply does.
 
 class ChannelCreation : public Channel {
 protected:
-    /// Runs in the wait for the service's answer.
+    /// Runs during the wait for the service's answer.
     void inTheWait(std::function<void()> task)
     {
         telephony.answersAfter = std::chrono::milliseconds(500);
@@ -295,7 +295,7 @@ TEST_F(ChannelCreation, GoesOnWithAModelThatWasLetGo)
     });
     model->startMonitor();
     EXPECT_EQ(model, nullptr);
-    EXPECT_EQ(queue.timers(), 1u); // it runs on, held by its timer
+    EXPECT_EQ(queue.timers(), 1u); // its timer keeps it running
     queue.drop();
     EXPECT_FALSE(ports.hasLocal(kLogPort));
 }
@@ -323,7 +323,7 @@ TEST_F(Channel, RefreshOfADeadChannelInvalidatesOnce)
     EXPECT_EQ(attempts(), 1u);
 }
 
-// What the service says beside the log.
+// Messages from the service besides the log.
 
 TEST_F(Channel, CountsTheMessagesThatTheServiceDroppedAndTellsOnceForSeveral)
 {

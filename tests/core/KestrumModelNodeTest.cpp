@@ -247,7 +247,7 @@ TEST(DisplayTree, DeepestPropertyListIsBuilt)
 
 TEST(DisplayTree, LongNamesInsideEachOtherCostNoMoreThanTheirBound)
 {
-    // 16 levels of 1 MB, then a thousand rows: their paths in full would take 16 GB.
+    // 16 levels with names of 1 MB, then a thousand rows: their full paths would take 16 GB.
     auto rows = makeArray();
     for (int i = 0; i < 1000; ++i)
         rows->append("x");
@@ -263,7 +263,7 @@ TEST(DisplayTree, LongNamesInsideEachOtherCostNoMoreThanTheirBound)
     const auto* level = tree.root.get();
     while (level->childNodes()->size() == 1)
         level = level->childNodes()->front().get();
-    EXPECT_EQ(level->childNodes()->size(), 1000u); // all rows are there
+    EXPECT_EQ(level->childNodes()->size(), 1000u); // no row is missing
     EXPECT_EQ(&tree.at("/"), tree.root.get());
 }
 
@@ -294,7 +294,7 @@ TEST_F(WalkedArrays, DictionariesAreNotLocked)
     EXPECT_EQ(counts.locked, 0);
 }
 
-// Names come from outside. In an ordered container no choice of them makes a look-up slow, as it would with a hash.
+// Names come from outside. In an ordered container no choice of names makes look-ups slow, unlike in a hash table.
 static_assert(std::is_same_v<PathDictionary::key_compare, std::less<std::string>>);
 
 } // namespace

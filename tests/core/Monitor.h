@@ -10,8 +10,8 @@
 
 namespace kestrum {
 
-/// A model, and the telephony service that it talks to: one that runs IFX and does everything right, until the test
-/// says otherwise.
+/// A model and its telephony service. The service runs IFX and answers every request correctly, until the test
+/// changes it.
 class Monitor : public testing::Test, protected MonitorDoubles, protected KestrumModelObserver {
 protected:
     static constexpr const char* kCommandPort = "vox.commands";
@@ -25,7 +25,7 @@ protected:
         serve();
     }
 
-    /// Listens for commands, as a service that has come up does.
+    /// Listens for commands, as a service does after its start.
     void serve()
     {
         ports.serve(kCommandPort, [this](const MemoryPorts::Request& request) {
@@ -38,14 +38,14 @@ protected:
     }
 
     void modemRuns(std::string_view name) { replyIs(makeDictionary({{"GetTechnology", name}})); }
-    /// The reply is a property list of that value; null for bytes that are none.
+    /// The reply is a property list with that value; null for bytes that are no property list.
     void replyIs(const Value& value, std::chrono::milliseconds after = std::chrono::milliseconds(0))
     {
         propertyLists.parsed["reply"] = value;
         technology = {0, Data(bytesOf("reply")), after};
     }
 
-    /// The service streams a property list; it is delivered at once.
+    /// The service streams a property list, which is delivered at once.
     void stream(const Value& list, std::int32_t messageId = 0)
     {
         propertyLists.parsed["list"] = list;
@@ -55,7 +55,7 @@ protected:
 
     void seconds(double count) { queue.advance(std::chrono::milliseconds(static_cast<std::int64_t>(count * 1000))); }
 
-    /// Starts, and forgets what that said and logged.
+    /// Starts the model, and discards its notifications and log lines so far.
     void startRunning()
     {
         model->startMonitor();
@@ -67,7 +67,7 @@ protected:
         told.clear();
     }
 
-    /// How often GetTechnology was asked.
+    /// The number of GetTechnology requests.
     std::size_t attempts() const
     {
         return static_cast<std::size_t>(std::ranges::count_if(

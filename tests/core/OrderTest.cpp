@@ -1,4 +1,4 @@
-// What the model does to its ports and its log, in which order, and who keeps it alive meanwhile.
+// The order of the model's calls to its ports and its log, and what keeps the model alive during them.
 #include "core/Monitor.h"
 
 namespace kestrum {
@@ -7,7 +7,7 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// The ports, and what is done to them.
+/// Message ports that record the calls.
 class WatchedPorts final : public MessagePorts {
 public:
     explicit WatchedPorts(MessagePorts& ports) : _ports(ports) {}
@@ -76,7 +76,7 @@ private:
     void tell(const std::string& call)
     {
         calls.push_back(call);
-        if (const auto run = onCall) // a copy: it may set another
+        if (const auto run = onCall) // a copy, because the call may replace it
             run(call);
     }
 
@@ -90,14 +90,14 @@ protected:
         model = std::make_shared<KestrumModel>(watchedRoles);
         model->setObserver(nullptr);
     }
-    // The model goes before the ports that it was given here.
+    // The model is destroyed before the ports that it uses.
     ~Order() override
     {
         queue.drop();
         model.reset();
     }
 
-    /// Lets the model go; whatever runs on its behalf must keep it to its end.
+    /// Releases the test's reference to the model. Work in progress must keep the model alive until its end.
     void letGo()
     {
         watched = model;
@@ -173,7 +173,7 @@ TEST_F(Order, AFailureIsLoggedThenThePortsAreClosedThenTheRetryIsPosted)
     EXPECT_EQ(queue.tasks(), 1u);
 }
 
-// An entry point keeps the model to its end.
+// Each entry point keeps the model alive until it returns.
 
 TEST_F(Order, RefreshKeepsTheModel)
 {

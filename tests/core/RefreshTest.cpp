@@ -1,4 +1,4 @@
-// From a message to the tree: what is rebuilt, and when.
+// From a message to the tree: which parts are rebuilt, and when.
 #include "core/Monitor.h"
 
 namespace kestrum {
@@ -62,7 +62,7 @@ TEST_F(Refresh, TreeIsBuiltOnceAndOnlyWhenAskedFor)
 {
     stream(display("GSM"));
     seconds(2);
-    EXPECT_THAT(*model->getSaveContents(), IsEmpty()); // nobody has asked, so nothing was generated
+    EXPECT_THAT(*model->getSaveContents(), IsEmpty()); // no save contents were requested before
     const auto tree = model->topLevelNodes();
     EXPECT_EQ(model->nodeAtPath("/"), tree);
     EXPECT_EQ(model->topLevelNodes(), tree);
@@ -118,7 +118,7 @@ TEST_F(Refresh, MessageWithAnotherIdIsIgnored)
     EXPECT_THAT(log.lines, IsEmpty());
 }
 
-// A bad message ends itself, and nothing else.
+// A bad message has no effect on other messages.
 
 TEST_F(Refresh, MessageThatIsNoPropertyListIsLoggedAndTheNextIsServed)
 {
@@ -172,7 +172,7 @@ TEST_F(WithoutGenerator, DataIsDroppedAndCountsAsAnUpdate)
     EXPECT_EQ(model->topLevelNodes(), nullptr);
 }
 
-// The running model belongs to its timer too.
+// The running model is also owned by its timer.
 
 TEST_F(Refresh, RunningModelOutlivesItsOwner)
 {

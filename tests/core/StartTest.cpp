@@ -1,4 +1,4 @@
-// How monitoring starts, and each way in which that fails.
+// The start of monitoring, and each of its failures.
 #include "core/Monitor.h"
 
 namespace kestrum {
@@ -64,12 +64,12 @@ TEST_F(Start, AgainWhileMonitoringRunsDoesNothing)
 TEST_F(Start, SuccessPostsAStatusUpdate)
 {
     model->startMonitor();
-    EXPECT_THAT(told, IsEmpty()); // never from inside the call
+    EXPECT_THAT(told, IsEmpty()); // never during the call
     queue.run();
     EXPECT_THAT(told, ElementsAre("status"));
 }
 
-// Every failure closes the channel, and is tried again 5 s later.
+// Every failure closes the channel, and the model tries again 5 s later.
 
 struct Failure {
     const char* name;
@@ -81,7 +81,7 @@ struct Failure {
 
 class FailingStart : public Start, public testing::WithParamInterface<Failure> {
 public:
-    // What the faults reach for.
+    // The objects in which the cases cause their faults.
     using Monitor::kCommandPort;
     using Monitor::model;
     using Monitor::modemRuns;
@@ -141,7 +141,7 @@ TEST_P(FailingStart, IsTriedAgainForEver)
     apply();
     model->startMonitor();
     const auto linesOfOneAttempt = log.errors().size();
-    // A silent service costs its attempt 1 s of waiting, so the attempts are counted, not the time.
+    // A silent service costs each attempt 1 s of waiting, so this counts attempts, not time.
     for (int hour = 0; hour < 3; ++hour)
         seconds(3600);
     const auto attemptsMade = log.errors().size() / linesOfOneAttempt;
@@ -240,7 +240,7 @@ INSTANTIATE_TEST_SUITE_P(
 
 TEST_F(Start, StartCommandThatCannotBeSerialisedFails)
 {
-    // The request goes out, then serialising breaks.
+    // The request is sent, then serialising fails.
     whileAsked = [this] { propertyLists.writable = false; };
     model->startMonitor();
     EXPECT_THAT(log.errors(), ElementsAre(kCreated, kGot, " Could not generate PLIST"));
@@ -319,7 +319,7 @@ TEST_F(Start, ObserverThatTookItselfOutIsToldNothing)
     EXPECT_THAT(told, IsEmpty());
 }
 
-// configureGenerator is lopsided: only an answer replaces the generator.
+// configureGenerator is asymmetric: only an answer replaces the generator.
 
 class Reconfigured : public Start {
 protected:

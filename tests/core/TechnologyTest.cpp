@@ -1,4 +1,4 @@
-// The modem's technology changes, or is the same again, after a restart of the service.
+// The modem's technology changes, or stays the same, after a restart of the service.
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "LogGenerator/GSM/GSMLogGenerator.h"
 #include "LogGenerator/LTE/LTELogGenerator.h"
@@ -56,7 +56,7 @@ TEST_F(Technology, AnotherThanTheDisplaysReplacesIt)
     EXPECT_THAT(told, ElementsAre("replaced", "status"));
     EXPECT_EQ(textAt("/RAT"), "(no node)");
 
-    // The call that makes the new display shows nothing yet; the one after the first record does.
+    // The call that creates the new display shows nothing yet. The call after the first record does.
     EXPECT_EQ(textAt("/"), "(unknown)");
     model->updateWithData(bytesOf("a message"));
     seconds(2);
@@ -99,7 +99,7 @@ TEST_F(Technology, ChangeBeforeAnythingWasShownReplacesNothing)
     EXPECT_THAT(told, Not(Contains("replaced")));
 }
 
-// Which generator a technology has.
+// The generator of each technology.
 
 struct Known {
     const char* identifier;
@@ -127,7 +127,7 @@ TEST_P(TechnologyIdentifier, ChoosesItsGenerator)
 TEST_P(TechnologyIdentifier, ItsGeneratorNamesItselfInItsLines)
 {
     log.showsAddresses = true;
-    bundle.paths = {"UTRAN.plist"}; // without it that generator is not initialised
+    bundle.paths = {"UTRAN.plist"}; // without UTRAN.plist that generator is not initialised
     auto generator = LogGenerator::generatorFromTechnology(GetParam().identifier, roles);
     const auto address = formatted("%p", static_cast<const void*>(generator.get()));
     EXPECT_EQ(log.count("Creating Log object: " + address), 1u);
@@ -163,7 +163,7 @@ TEST_F(Technology, UnknownOnesHaveNoGenerator)
         EXPECT_FALSE(LogGenerator::generatorFromTechnology(each, roles)) << describe(each);
 }
 
-// What a decoder throws ends its message alone.
+// An exception in a decoder ends only its message.
 
 TEST_F(Technology, SimFilesThatCannotBeReadEndTheirMessageAlone)
 {

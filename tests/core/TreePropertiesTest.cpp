@@ -1,4 +1,4 @@
-// What holds for every display, whatever is in it.
+// Properties of every display, whatever its contents.
 #include "core/KestrumModelNode.h"
 
 #include <gtest/gtest.h>
@@ -9,7 +9,7 @@
 namespace kestrum {
 namespace {
 
-/// Few letters, so that names collide, split and join in all ways.
+/// Few letters, so that names are often equal, or prefixes of each other.
 rc::Gen<std::string> names()
 {
     return rc::gen::container<std::string>(rc::gen::element('a', 'b', '1', ';', '/'));

@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// All that the application needs, doubled.
+/// Doubles of all roles that the application needs.
 struct ApplicationDoubles : MonitorDoubles {
     RecordingPreferences preferences;
     MemoryFileSystem files;
@@ -15,7 +15,7 @@ struct ApplicationDoubles : MonitorDoubles {
 
     ApplicationRoles applicationRoles{monitorRoles, preferences, files, toolkit};
 
-    // What is queued may hold the application, and the application the toolkit's screens.
+    // Queued tasks may hold the application, and the application holds the toolkit's screens.
     ~ApplicationDoubles() { queue.drop(); }
 };
 

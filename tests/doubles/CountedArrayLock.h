@@ -8,7 +8,7 @@
 
 namespace kestrum {
 
-/// Counts how the array lock uses its mutex, for as long as this object lives.
+/// Counts the calls of the array lock's mutex, as long as this object lives.
 class CountedArrayLock {
 public:
     CountedArrayLock() { ArrayLock::initialize(std::make_unique<Mutex>(*this)); }
@@ -17,7 +17,7 @@ public:
     CountedArrayLock& operator=(const CountedArrayLock&) = delete;
 
     int locked = 0, unlocked = 0;
-    std::function<void()> onLock, onUnlock; ///< run while it is locked
+    std::function<void()> onLock, onUnlock; ///< run while the mutex is locked
 
 private:
     class Mutex final : public RecursiveMutex {

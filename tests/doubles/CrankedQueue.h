@@ -14,13 +14,13 @@
 
 namespace kestrum {
 
-/// A main queue that stands until the test turns it. It outlives what it is given to.
+/// A main queue whose time advances only when the test says so. It must outlive its users.
 class CrankedQueue final : public MainQueue {
 public:
     using Duration = std::chrono::milliseconds;
 
     CrankedQueue() = default;
-    /// Moves the clock along with its own time.
+    /// Moves this clock together with the queue's time.
     explicit CrankedQueue(VirtualClock& clock) : _clock(&clock) {}
     ~CrankedQueue() override { drop(); }
     CrankedQueue(const CrankedQueue&) = delete;
@@ -37,16 +37,17 @@ public:
         return std::make_unique<Repetition>(std::move(shared));
     }
 
-    /// Runs what is due by now, tasks posted meanwhile included.
+    /// Runs the tasks whose time has come, including those posted during the run.
     void run() { advance(Duration(0)); }
 
-    /// Moves the time, running what falls due, tasks posted meanwhile included.
+    /// Moves the time forward, and runs the tasks whose time comes, including those posted during the run.
     void advance(Duration by)
     {
         turn(by, [] { return false; });
     }
 
-    /// As `advance`, but only until `done`: so a blocking wait serves the queue. Whether it is done.
+    /// As `advance`, but stops when `done` is true: a blocking wait runs the queue this way. Returns whether it is
+    /// done.
     bool turn(Duration atMost, const std::function<bool()>& done)
     {
         const Duration end = _now + atMost;
@@ -62,10 +63,10 @@ public:
         return true;
     }
 
-    /// Drops all tasks and ends all timers, as the program's end does.
+    /// Drops all tasks and ends all timers, as the end of the program does.
     void drop()
     {
-        // What a dropped task held may post again, or end timers, while it goes.
+        // Destroying a dropped task may post another task or end timers.
         while (!_due.empty())
             std::exchange(_due, {}).clear();
         for (const auto& timer : std::exchange(_timers, {}))
@@ -74,13 +75,13 @@ public:
     }
 
     Duration now() const { return _now; }
-    /// Running timers.
+    /// The number of running timers.
     std::size_t timers() const
     {
         return static_cast<std::size_t>(
             std::ranges::count_if(_timers, [](const auto& each) { return !each.expired(); }));
     }
-    /// Waiting tasks, those of timers not counted.
+    /// The number of waiting tasks, without the timers' tasks.
     std::size_t tasks() const
     {
         return static_cast<std::size_t>(
@@ -90,7 +91,7 @@ public:
 private:
     using Action = std::shared_ptr<std::function<void()>>;
 
-    /// Owns the action, and so what it holds: both go when the timer does.
+    /// Owns the action and everything it holds. Both are destroyed together with the timer.
     class Repetition final : public Timer {
     public:
         explicit Repetition(Action action) : _action(std::move(action)) {}
@@ -110,7 +111,8 @@ private:
             if (!action || !*action)
                 return;
             (*action)();
-            // Only now: a wait within the action does not run the action again. Its timer may have gone in it.
+            // Scheduled after the action, so that a wait inside it does not run it again. The action may have ended
+            // its timer.
             constexpr int kThisCall = 1;
             if (action.use_count() > kThisCall && *action)
                 queue->schedule(std::max(due + interval, queue->_now), interval, action);
@@ -122,7 +124,7 @@ private:
         _due.emplace(due, Tick{this, due, interval, action});
     }
 
-    // A wait within a task has moved the time already.
+    // A wait inside a task has already moved the time.
     void moveTo(Duration time)
     {
         if (time <= _now)

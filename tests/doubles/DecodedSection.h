@@ -10,7 +10,7 @@
 
 namespace kestrum {
 
-/// A section at work on a node of its own, and what it logs.
+/// A section with its node and its log.
 template <typename Section>
 class DecodedSection {
 public:
@@ -22,7 +22,7 @@ public:
         (receive(records), ...);
     }
 
-    /// Hands over one record, under its own code unless another is given.
+    /// Passes one record to the section, under the record's code unless another one is given.
     DecodedSection& receive(const RecordBuilder& record) { return receive(record, record.code()); }
     DecodedSection& receive(const RecordBuilder& record, LogCode code)
     {
@@ -32,16 +32,16 @@ public:
         return *this;
     }
 
-    /// The whole display of the section.
+    /// The section's whole display.
     const Value& node() const { return _node; }
-    /// Its text in one line, as `{"Cell ID": "12"}` or `[{"ARFCN": "3"}]`.
+    /// The section's text in one line: `{"Cell ID": "12"}` or `[{"ARFCN": "3"}]`.
     std::string text() const { return describe(_node); }
 
-    /// Of a dictionary section: the value under `key`, null when there is none.
+    /// For a dictionary section: the value under `key`; null when there is none.
     Value at(std::string_view key) const { return _node.dictionary()->at(key); }
     bool contains(std::string_view key) const { return _node.dictionary()->contains(key); }
 
-    /// Of a list section.
+    /// For a list section.
     std::size_t size() const { return _node.array()->size(); }
     DictionaryRef row(std::size_t index) const
     {

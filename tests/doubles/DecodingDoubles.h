@@ -9,7 +9,7 @@
 
 namespace kestrum {
 
-/// All that decoding needs, doubled.
+/// Doubles of all roles that decoding needs.
 struct DecodingDoubles {
     RecordingLog log;
     RecordingConsole console;

@@ -8,7 +8,7 @@
 
 namespace kestrum {
 
-/// A raw value in bits `first` to `last` of the word of `width` bytes at `offset`, and the text under which it is shown.
+/// A raw value in bits `first` to `last` of the word of `width` bytes at `offset`, and the text that shows it.
 struct FieldCase {
     const char* name;
     std::size_t offset;
@@ -17,7 +17,7 @@ struct FieldCase {
     const char* key;
     const char* text;
 
-    /// The word with the raw value in its bits, and all its other bits 0 or 1: they must not matter.
+    /// The word with the raw value in its bits. All other bits are 0 or 1; decoders must ignore them.
     RecordBuilder in(RecordBuilder record, bool amidOnes) const
     {
         const std::uint32_t mask = (0xFFFF'FFFFu >> (31 - (last - first))) << first;

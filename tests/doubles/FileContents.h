@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// The bytes of a file; none when it cannot be read.
+/// The bytes of a file; empty when it cannot be read.
 inline std::string contentsOf(const std::filesystem::path& path)
 {
     std::ifstream file(path, std::ios::binary);

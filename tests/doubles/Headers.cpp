@@ -1,1 +1,1 @@
-// Empty: the precompiled header of the tests is built beside it.
+// Empty: the tests' precompiled header is built with this file.

@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// Resources under names that the test chooses: paths are "name.type", or real files for those that are loaded.
+/// Resources under names that the test chooses. Paths are "name.type", or those of real files for loaded resources.
 class MemoryBundle final : public Bundle {
 public:
     std::optional<std::string> pathForResource(std::string_view name, std::string_view type) const override

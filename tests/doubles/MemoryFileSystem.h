@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// A device with the paths that the test lays down.
+/// A device with the paths that the test adds.
 class MemoryFileSystem final : public FileSystem {
 public:
     bool exists(std::string_view path) const override { return paths.contains(path); }

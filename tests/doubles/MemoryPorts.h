@@ -12,8 +12,8 @@
 
 namespace kestrum {
 
-/// Message ports within one process, over a hand-cranked queue. The test plays the other process: it serves the
-/// remote ports, and sends to the local ones.
+/// Message ports within one process, on a hand-cranked queue. The test is the other process: it answers the remote
+/// ports, and sends to the local ones.
 class MemoryPorts final : public MessagePorts {
 public:
     using Duration = std::chrono::milliseconds;
@@ -31,15 +31,15 @@ public:
     };
     struct Answer {
         std::int32_t status = 0;
-        std::optional<Data> reply = std::nullopt; ///< none: the other side stays silent
-        Duration after{0};                        ///< how long the reply is waited for
+        std::optional<Data> reply = std::nullopt; ///< empty: the other process sends no reply
+        Duration after{0};                        ///< the delay of the reply
     };
     using Server = std::function<Answer(const Request&)>;
 
-    /// From now on somebody listens under that name.
+    /// Adds a listener with that name.
     void serve(const std::string& name, Server server) { _servers[name] = std::move(server); }
 
-    /// The process that listens there goes away: the connections to it become invalid.
+    /// Removes the listener with that name. The connections to it become invalid.
     void kill(const std::string& name)
     {
         _servers.erase(name);
@@ -48,7 +48,7 @@ public:
                 end->invalidate();
     }
 
-    /// A message from another process to the local port of that name. Whether there is one that takes it.
+    /// Sends a message from another process to the local port of that name. Returns whether a port takes it.
     bool send(std::string_view name, std::int32_t messageId, std::string_view payload)
     {
         const auto port = local(name);
@@ -88,11 +88,11 @@ public:
     }
 
     bool createsLocal = true;
-    /// Every message to a remote port, those to closed ones too.
+    /// All messages to remote ports, including closed ones.
     std::vector<Request> requests;
 
 private:
-    /// What a port shares with the world: it may outlast the port while something runs in it.
+    /// The state that a port shares with its task: it may outlive the port while a handler runs.
     struct End : std::enable_shared_from_this<End> {
         explicit End(CrankedQueue& of) : queue(of) {}
 
@@ -118,14 +118,14 @@ private:
             Data payload;
         };
 
-        /// Hands over what waits for the delivery queue.
+        /// Passes on the messages that wait for the delivery queue.
         void deliver()
         {
             if (deliveryQueue == nullptr)
                 return;
             for (auto& message : std::exchange(messages, {}))
                 deliveryQueue->post([receiver = weak_from_this(), message = std::move(message)] {
-                    // What is still under way when the port closes is lost. Its handler may close it.
+                    // Messages on their way are lost when the port closes. Their handler may close the port.
                     if (const auto end = std::static_pointer_cast<LocalEnd>(receiver.lock()); end && end->valid)
                         end->handler(message.id, message.payload.bytes());
                 });
@@ -172,7 +172,7 @@ private:
         Sent sendRequest(std::int32_t messageId, Bytes payload, Duration sendTimeout, Duration receiveTimeout,
                          Reply reply) override
         {
-            const auto end = _end; // What the wait serves may destroy this port.
+            const auto end = _end; // Tasks that run during the wait may destroy this port.
             const Request request{_name, messageId, Data(payload), sendTimeout, receiveTimeout, reply};
             _ports.requests.push_back(request);
             if (!end->valid)
@@ -206,14 +206,14 @@ private:
     std::vector<std::pair<std::string, std::weak_ptr<End>>> _remotes;
 };
 
-/// A telephony service that answers as the test says.
+/// A telephony service whose answers the test sets.
 class MemoryTelephony final : public TelephonyService {
 public:
     using Duration = std::chrono::milliseconds;
     static constexpr Duration kPatience{1000};
-    static constexpr std::int32_t kSystemErrors = 2; ///< the domain of errno's
+    static constexpr std::int32_t kSystemErrors = 2; ///< the domain of errno values
 
-    /// Makes log channels to the local ports of `ports`.
+    /// Creates log channels to the local ports of `ports`.
     MemoryTelephony(CrankedQueue& queue, const MemoryPorts& ports) : _queue(queue), _ports(ports) {}
 
     std::unique_ptr<VoxServerConnection> connect(NotificationHandler handler) override
@@ -229,7 +229,7 @@ public:
 
     std::optional<Problem> problem() const override { return why.empty() ? std::nullopt : std::optional(Problem{why}); }
 
-    /// Tells all that are connected.
+    /// Notifies all connected clients.
     void notify(const std::string& name)
     {
         for (const auto& each : _ends)
@@ -245,18 +245,18 @@ public:
     }
 
     bool reachable = true;
-    std::string why; ///< there is no channel
+    std::string why; ///< the reason for refusing a channel
     LogChannelAnswer answer{0, 0, "vox.commands"};
-    Duration answersAfter{0};            ///< more than `kPatience`: too late
-    std::function<void()> whileCreating; ///< runs when a log channel is asked for
+    Duration answersAfter{0};            ///< more than `kPatience`: the answer is too late
+    std::function<void()> whileCreating; ///< runs when a log channel is requested
 
     std::vector<std::string> channelsAsked;
 
 private:
-    /// What a connection shares with the tasks for it.
+    /// The state that a connection shares with its tasks.
     struct End {
         NotificationHandler handler;
-        std::vector<std::string> names; ///< of notifications that wait for their turn
+        std::vector<std::string> names; ///< of queued notifications
         bool held = false, closed = false;
     };
 
@@ -267,7 +267,7 @@ private:
 
         LogChannelAnswer networkMonitorCreateLogChannel(std::string_view serviceName) override
         {
-            // The wait may end this connection.
+            // Tasks that run during the wait may end this connection.
             return _service.create(serviceName, _end);
         }
 
@@ -281,7 +281,7 @@ private:
         channelsAsked.emplace_back(serviceName);
         if (!_ports.hasLocal(serviceName))
             return {kSystemErrors, ENOTCONN, std::nullopt};
-        if (const auto run = whileCreating) // a copy: it may set another
+        if (const auto run = whileCreating) // a copy, because the call may replace it
             run();
         const bool inTime = answersAfter <= kPatience;
         end->held = true;

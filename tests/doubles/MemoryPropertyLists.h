@@ -7,8 +7,8 @@
 
 namespace kestrum {
 
-/// Property lists that the test lays down: files by path, parsed bytes by their text. What is not laid down is no
-/// property list. What is serialised is laid down.
+/// Property lists that the test adds: files by path, parsed bytes by their text. All other bytes are no property
+/// list. Lists that are serialised are added too.
 class MemoryPropertyLists final : public PropertyLists {
 public:
     Value parse(Bytes bytes) override { return deepCopy(find(parsed, std::string(textOf(bytes)))); }
@@ -32,9 +32,9 @@ public:
         return Stored::Written;
     }
 
-    mutable std::map<std::string, Value> parsed; ///< what was serialised too
+    mutable std::map<std::string, Value> parsed; ///< includes lists that were serialised
     mutable std::map<std::string, Value> files;
-    std::set<std::string> taken; ///< paths at which something else stands
+    std::set<std::string> taken; ///< paths where another file exists already
     bool writable = true;
 
 private:

@@ -6,7 +6,7 @@
 
 namespace kestrum {
 
-/// All that the monitor model needs, doubled. The clock moves with the queue.
+/// Doubles of all roles that the monitor model needs. The clock moves with the queue.
 struct MonitorDoubles : DecodingDoubles {
     CrankedQueue queue{clock};
     MemoryPorts ports{queue};
@@ -14,7 +14,7 @@ struct MonitorDoubles : DecodingDoubles {
 
     MonitorRoles monitorRoles{roles, queue, ports, telephony};
 
-    // Before the ports and the log go, as the program's end does it.
+    // Before the ports and the log are destroyed, in the same order as in the program.
     ~MonitorDoubles() { queue.drop(); }
 };
 

@@ -1,6 +1,6 @@
 #include "doubles/Places.h"
 
-// The one file that is compiled with paths of the machine: the others can come from a compiler's cache in any checkout.
+// The only file that is compiled with paths of the machine, so a compiler cache can serve all others in any checkout.
 std::string kestrum::inCheckout(std::string_view path)
 {
     return std::string(KESTRUM_SOURCE_DIR "/").append(path);

@@ -1,4 +1,4 @@
-// The main() of tests with real widgets, on a screen that nobody needs to have.
+// The main() of tests with real widgets. It needs no display.
 #include "doubles/QtTestToolkit.h"
 #include "frontends/qt/QtToolkit.h"
 
@@ -20,7 +20,7 @@ kestrum::Toolkit& kestrum::toolkit()
 int main(int argc, char** argv)
 {
     testing::InitGoogleMock(&argc, argv);
-    // A forked copy would wait for threads of Qt that it does not have.
+    // A forked copy would wait for Qt's threads, which it does not have.
     GTEST_FLAG_SET(death_test_style, "threadsafe");
     setenv("QT_QPA_PLATFORM", "offscreen", 1);
     const auto toolkit = kestrum::makeQtToolkit();

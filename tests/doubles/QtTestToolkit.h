@@ -4,7 +4,7 @@ namespace kestrum {
 
 class Toolkit;
 
-/// The one toolkit of a test program with real widgets; it holds the application object. QtTestMain.cpp makes it.
+/// The toolkit of a test program with real widgets. It owns the application object. QtTestMain.cpp creates it.
 Toolkit& toolkit();
 
 } // namespace kestrum

@@ -14,8 +14,8 @@
 
 namespace kestrum {
 
-/// A log record for a test: a filled-in header, zeros behind it, and what the test sets. Offsets count from the
-/// record's first byte; a field beyond the length is a mistake of the test and throws.
+/// A log record for a test: a complete header, then zeros and the fields that the test sets. Offsets count from the
+/// record's first byte. A field beyond the length is an error in the test and throws.
 class RecordBuilder {
 public:
     static constexpr std::size_t kHeaderSize = 13;
@@ -39,21 +39,21 @@ public:
             u8(offset++, value);
         return *this;
     }
-    /// Every byte from `offset` on.
+    /// Sets every byte from `offset` on.
     RecordBuilder& fill(std::size_t offset, unsigned value)
     {
         for (; offset < _bytes.size(); ++offset)
             u8(offset, value);
         return *this;
     }
-    /// Cuts the record off, or appends zeros. What its header says is left as it is.
+    /// Cuts the record off, or appends zeros. The header stays unchanged.
     RecordBuilder& length(std::size_t length)
     {
         _bytes.resize(length);
         return *this;
     }
 
-    /// Appends a property list. It is no serialised one, but what `MemoryPropertyLists` takes for one when told.
+    /// Appends a marker that `MemoryPropertyLists` reads as a property list once the test has added it there.
     RecordBuilder& propertyList(Value list)
     {
         const auto text = describe(list);
@@ -87,14 +87,14 @@ inline RecordBuilder record(LogCode code, std::size_t length)
     return {code, length};
 }
 
-/// A record of the telephony service: a property list behind the header.
+/// A record of the telephony service: a property list after the header.
 inline RecordBuilder propertyListRecord(LogCode code, Value list)
 {
     return record(code, RecordBuilder::kHeaderSize).propertyList(std::move(list));
 }
 
 /// A cell of the telephony service's cell monitor: "GSM", "UMTS", "LTE", "UTRAN2" or "CDMA"; "Serving" or "Neighbor";
-/// and its numbers, by key.
+/// and its numbers by key.
 inline Value cell(const std::string& technology, const std::string& type,
                   std::initializer_list<Dictionary::Entry> numbers = {})
 {

@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// Keeps what is printed.
+/// Stores the printed text.
 class RecordingConsole final : public Console {
 public:
     void printLine(std::string_view line) override { printed.emplace_back(line); }

@@ -10,7 +10,7 @@
 
 namespace kestrum {
 
-/// Keeps the lines, addresses shown as null unless the test wants them.
+/// Stores the lines. Addresses are shown as null unless the test wants them.
 class RecordingLog final : public SystemLog {
 public:
     using Line = std::pair<Priority, std::string>;
@@ -18,7 +18,7 @@ public:
     void write(Priority priority, std::string_view text) override
     {
         lines.emplace_back(priority, text);
-        if (const auto run = onWrite) // a copy: it may set another
+        if (const auto run = onWrite) // a copy, because the call may replace it
             run(text);
     }
     const void* shownAddress(const void* address) const override { return showsAddresses ? address : nullptr; }
@@ -39,7 +39,7 @@ public:
 
     std::vector<Line> lines;
     bool showsAddresses = false;
-    std::function<void(std::string_view text)> onWrite; ///< runs behind each line
+    std::function<void(std::string_view text)> onWrite; ///< runs after each line
 };
 
 } // namespace kestrum

@@ -10,7 +10,7 @@
 
 namespace kestrum {
 
-/// Keeps what was done, in order: "set domain key false", "synchronize domain", "changed domain key".
+/// Stores the calls in order: "set domain key false", "synchronize domain", "changed domain key".
 class RecordingPreferences final : public Preferences {
 public:
     void setApplicationValue(std::string_view domain, std::string_view key, bool value) override
@@ -26,7 +26,7 @@ public:
 
     std::vector<std::string> calls;
     bool writable = true;
-    std::function<void()> onCall; ///< runs before a call is kept
+    std::function<void()> onCall; ///< runs before a call is stored
 
 private:
     void done(std::initializer_list<std::string_view> words)

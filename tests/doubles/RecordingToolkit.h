@@ -30,12 +30,12 @@ inline void PrintTo(const Rect& rect, std::ostream* out)
     *out << "{" << rect.x << ", " << rect.y << ", " << rect.width << ", " << rect.height << "}";
 }
 
-/// What is remembered of all that a `RecordingToolkit` made.
+/// The record of everything that a `RecordingToolkit` has created.
 struct ToolkitRecord {
     double tableWidth = 320;         ///< of every table that is shown from now on
-    std::size_t visibleRows = 20;    ///< how many fit a table
-    int windows = 0;                 ///< there are now
-    std::vector<std::string> faults; ///< what the controllers must never do
+    std::size_t visibleRows = 20;    ///< the number of rows that fit into a table
+    int windows = 0;                 ///< existing now
+    std::vector<std::string> faults; ///< violations by the controllers
 };
 
 class RecordingLabel final : public Label {
@@ -67,7 +67,7 @@ private:
     Rect _frame;
 };
 
-/// Rows are 44 high; an accessory takes 30 of the width, once the cell has been laid out.
+/// Rows are 44 high. An accessory takes 30 of the width after the cell's layout.
 class RecordingCell final : public TableCell {
 public:
     RecordingCell(CellStyle cellStyle, double width) : style(cellStyle), rowWidth(width), _bounds{0, 0, width, 44} {}
@@ -78,7 +78,7 @@ public:
     void addSubview(std::shared_ptr<View> view) override { subviews.push_back(std::move(view)); }
     Label& textLabel() override { return ownLabel; }
 
-    // What a pane's cell consists of. Null where it has no such view.
+    // The views of a pane's cell. Null where the cell has no such view.
     RecordingScrollView* strip() const { return first<RecordingScrollView>(subviews); }
     RecordingLabel* key() const
     {
@@ -107,7 +107,7 @@ private:
     Rect _bounds;
 };
 
-/// Asks for the rows that fit, from `firstRow` on, once it is on the screen.
+/// Requests the rows that fit, from `firstRow` on, when it is on the screen.
 class RecordingTable final : public TableView {
 public:
     RecordingTable(ToolkitRecord& record, TableDataSource& source) : _record(record), _source(source) {}
@@ -140,7 +140,7 @@ public:
     }
     void sizeToFit() override { ++sizedToFit; }
 
-    // The user's side.
+    // The user's actions.
     void appear(bool onScreen)
     {
         _onScreen = onScreen;
@@ -166,10 +166,10 @@ public:
     }
 
     std::size_t rowCount() { return _source.numberOfRowsInSection(*this, 0); }
-    /// The row is on the screen.
+    /// Whether the row is on the screen.
     RecordingCell& row(std::size_t row) const { return dynamic_cast<RecordingCell&>(reusable(row).cell()); }
     ReusableCell& reusable(std::size_t row) const { return *_shown.at(row); }
-    /// "key" or "key: value", from the top.
+    /// "key" or "key: value", from the top down.
     std::vector<std::string> texts() const
     {
         std::vector<std::string> texts;
@@ -224,7 +224,7 @@ private:
     bool _onScreen = false, _loaded = false;
     std::optional<std::size_t> _asking;
     std::map<std::size_t, std::shared_ptr<ReusableCell>> _shown;
-    ReusePool _pool{0}; // other rows' cells are handed over at once
+    ReusePool _pool{0}; // a row gets another row's cell at once
 };
 
 class RecordingScreen final : public TableScreen {
@@ -254,7 +254,7 @@ public:
 
     std::string status() const { return std::get<LabelItem>(*toolbar.at(1)).text; }
     bool isLoading() const { return std::get<ActivityIndicatorItem>(*toolbar.at(0)).running; }
-    /// Null when Save is not offered.
+    /// Null when Save is not available.
     std::shared_ptr<const ToolbarItem> saveButton() const
     {
         const auto found =
@@ -264,7 +264,7 @@ public:
     void pressSave() const { std::get<SaveItem>(*saveButton()).action(); }
 
     RecordingTable rows;
-    std::vector<std::shared_ptr<const ToolbarItem>> toolbar; ///< the very objects: an equal item stays the same one
+    std::vector<std::shared_ptr<const ToolbarItem>> toolbar; ///< the same objects: an equal item stays the same object
     std::optional<bool> toolbarAnimated;
     int resigned = 0;
     std::string hint;
@@ -293,7 +293,7 @@ public:
     TextField& saveDescription() override { return field; }
     void setFrame(Rect to) override { frame = to; }
 
-    SaveInterfaceOwner& owner; ///< whose operations the buttons and the background are wired to
+    SaveInterfaceOwner& owner; ///< the buttons and the background call it
     RecordingTable rows;
     RecordingTextField field;
     Rect frame;
@@ -371,8 +371,8 @@ private:
     ToolkitRecord& _record;
 };
 
-/// A toolkit that draws nothing and lets the test be the user. Regular text is half as wide as its size for each
-/// character, bold text 0.6 times, and every line is 1.2 times as high.
+/// A toolkit that draws nothing; the test is the user. A character of regular text is half as wide as the font's
+/// size, a bold one 0.6 times. Every line is 1.2 times as high as the size.
 class RecordingToolkit final : public Toolkit {
 public:
     struct Alert {
@@ -415,7 +415,7 @@ public:
     {
         alerts.push_back({std::string(title), std::string(message), std::string(button)});
     }
-    /// Launches, lets `mainLoop` be the user, and terminates.
+    /// Launches the application, runs `mainLoop` as the user, and terminates the application.
     int run(ApplicationDelegate& application) override
     {
         application.applicationDidFinishLaunching();
@@ -428,7 +428,7 @@ public:
     RecordingScreen& top() const { return *navigation->shown; }
 
     ToolkitRecord record;
-    RecordingWindow* window = nullptr;             ///< the last one made; the application owns it
+    RecordingWindow* window = nullptr;             ///< the last one created; the application owns it
     RecordingNavigationView* navigation = nullptr; ///< likewise
     Rect windowFrame;
     std::vector<Alert> alerts;

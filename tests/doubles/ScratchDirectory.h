@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// An empty directory of the test's own, removed with all it holds.
+/// An empty directory for the test. It is removed with its contents.
 class ScratchDirectory {
 public:
     ScratchDirectory()

@@ -16,7 +16,7 @@
 
 namespace kestrum {
 
-/// What every decoder of records owes to its section: records of `code` count from `minimumLength` bytes on.
+/// The rules for every decoder of records: records of `code` are valid from `minimumLength` bytes on.
 struct SectionRule {
     const char* name;
     std::string_view section;
@@ -26,7 +26,7 @@ struct SectionRule {
     friend void PrintTo(const SectionRule& shown, std::ostream* out) { *out << shown.name; }
 };
 
-/// A node of that shape that a test would recognise: a dictionary without keys, or a list of one old row.
+/// A node of that shape with known contents: a dictionary without keys, or a list with one old row.
 inline Value oldNode(Value::Kind kind)
 {
     return kind == Value::Kind::Array ? Value(makeArray({makeDictionary({{"Old", "row"}})})) : Value(makeDictionary());
@@ -42,7 +42,7 @@ inline bool holdsOnlyKeysOf(const SectionShape& shape, const Value& node)
     return node.array() ? std::ranges::all_of(*node.array(), known) : known(node);
 }
 
-/// One section of a technology's index on a node of its own.
+/// One section of a technology's index, with its own node.
 template <typename Index>
 class SectionOfIndex : public testing::TestWithParam<SectionRule> {
 protected:
@@ -68,11 +68,11 @@ protected:
         receive(record(GetParam().code, GetParam().minimumLength));
         EXPECT_NE(node, before);
         EXPECT_TRUE(holdsOnlyKeysOf(shape, node)) << node;
-        // Whatever it counts, it counts more than there is.
+        // All counts are greater than the number of elements.
         receive(record(GetParam().code, GetParam().minimumLength + 37).fill(13, 0xFF));
         EXPECT_TRUE(holdsOnlyKeysOf(shape, node)) << node;
     }
-    /// `reported`: whether the section says that it does not know the code.
+    /// `reported`: whether the section logs that it does not know the code.
     void expectNoChangeByForeignCodes(bool reported)
     {
         const auto own = section().getLogCodeArray();
@@ -106,8 +106,8 @@ protected:
     const Value before = deepCopy(node);
 };
 
-/// The shipped template has each of these sections, its keys there and the lists empty; and the two of the telephony
-/// service's records, which every technology has.
+/// The shipped template has each of these sections, with its keys; the lists are empty. It also has the two sections
+/// of the telephony service's records, which every technology has.
 inline void expectTemplateToHold(std::string_view path, std::span<const SectionShape> shapes)
 {
     const Value loaded = PropertyListCodec().load(std::string(path));
@@ -127,7 +127,7 @@ inline void expectTemplateToHold(std::string_view path, std::span<const SectionS
     EXPECT_EQ(nodeNamed("PDP Context Info", loaded), Value(makeArray()));
 }
 
-/// Record bytes that RapidCheck chooses behind a good header.
+/// Record bytes that RapidCheck chooses, after a valid header.
 inline RecordBuilder arbitraryRecord(LogCode code, std::size_t length)
 {
     auto built = record(code, length);
@@ -138,7 +138,7 @@ inline RecordBuilder arbitraryRecord(LogCode code, std::size_t length)
     return built;
 }
 
-/// A cell-monitor record of cells with any of the service's numbers, of any type.
+/// A cell-monitor record with cells of any type, with any of the service's numbers.
 inline std::vector<std::byte> arbitraryCellMonitor(PropertyListCodec& codec)
 {
     auto cells = makeArray();
@@ -160,7 +160,7 @@ inline std::vector<std::byte> arbitraryCellMonitor(PropertyListCodec& codec)
     return bytes;
 }
 
-/// What a technology's generator on its shipped template owes to whatever comes over the air.
+/// The rules for a technology's generator with its shipped template, for any bytes that arrive.
 template <typename Generator>
 struct HostileRecords {
     const char* resource;
@@ -200,7 +200,7 @@ struct HostileRecords {
         try {
             run.receive(std::as_bytes(std::span(bytes)));
         } catch (const LogCode_0xFF0000::UnknownDataException&) {
-            // What a SIM record without a dictionary ends in.
+            // The log lines of a SIM record without a dictionary.
         }
         RC_ASSERT(!run.display().isNull());
     }

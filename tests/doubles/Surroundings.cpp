@@ -1,5 +1,5 @@
-// What every test program starts with, and hands on to the programs that it starts: nothing of the machine's settings,
-// the user's or the shell's. Linked into each of them, it runs ahead of main() and of other objects' constructors.
+// The environment of every test program and of the programs that it starts: free of settings of the machine, the user
+// and the shell. It is linked into each test program, and runs before main() and before other objects' constructors.
 #include "doubles/Places.h"
 
 #include <csignal>
@@ -12,7 +12,8 @@
 
 namespace {
 
-/// Where programs and scratch space are, and what steers the test libraries and the sanitizers.
+/// Variables for the paths of programs and scratch space, and for the settings of the test libraries and the
+/// sanitizers.
 bool isKept(std::string_view variable)
 {
     for (const std::string_view kept : {"PATH=", "TMPDIR=", "LD_LIBRARY_PATH=", "GTEST_", "RC_PARAMS=", "ASAN_OPTIONS=",
@@ -40,7 +41,7 @@ bool isKept(std::string_view variable)
     ::setenv("FONTCONFIG_FILE", kestrum::inCheckout("tests/doubles/fonts.conf").c_str(), 1);
     ::umask(022);
 
-    // A shell's background jobs and nohup start with some of them ignored, which would be handed on.
+    // A shell's background jobs and nohup start with some signals ignored. Child processes would inherit that.
     for (const int each : {SIGHUP, SIGINT, SIGQUIT, SIGPIPE, SIGTERM})
         std::signal(each, SIG_DFL);
     sigset_t none;

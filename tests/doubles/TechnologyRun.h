@@ -13,7 +13,7 @@
 
 namespace kestrum {
 
-/// What a section's node looks like: the keys of a dictionary, or of a list's rows.
+/// The shape of a section's node: the keys of a dictionary, or of a list's rows.
 struct SectionShape {
     std::string_view name;
     Value::Kind kind;
@@ -29,7 +29,7 @@ inline std::set<std::string, std::less<>> keysOf(const Value& dictionary)
     return keys;
 }
 
-/// The value under a key, wherever in the tree it stands; null when there is none.
+/// The value under a key, anywhere in the tree; null when there is none.
 inline Value nodeNamed(std::string_view name, const Value& tree)
 {
     if (const auto dictionary = tree.dictionary()) {
@@ -42,7 +42,7 @@ inline Value nodeNamed(std::string_view name, const Value& tree)
     return {};
 }
 
-/// A technology's generator at work on the template that ships with the program.
+/// A technology's generator on the template that ships with the program.
 template <typename Generator>
 class TechnologyRun {
 public:

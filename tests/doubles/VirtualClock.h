@@ -7,12 +7,12 @@
 
 namespace kestrum {
 
-/// A clock that stands until the test moves it.
+/// A clock that stands still until the test moves it.
 class VirtualClock final : public Clock {
 public:
     Date now() const override { return date; }
     Zone zoneAt(Date at) const override { return at < zoneChange ? zone : zoneAfterChange; }
-    /// Of a pattern's letters y, M, d, H, m and s are known, each as often as its field has digits.
+    /// Knows the pattern letters y, M, d, H, m and s, each repeated once per digit of its field.
     std::string localText(Date at, std::string_view pattern) const override
     {
         const std::string digits = dateText(at + zoneAt(at).offset);

@@ -15,7 +15,7 @@ using testing::Contains;
 using testing::Not;
 using testing::StartsWith;
 
-/// What `kestrum` is made of, and a user at its window.
+/// The parts of `kestrum`, and a user at its window.
 class TheApplication : public EndToEnd {
 protected:
     ~TheApplication() override
@@ -116,7 +116,7 @@ TEST_F(TheApplication, StartsOverWithAnotherTechnologyAndComesBack)
     QTest::keyClick(&table(), Qt::Key_Return);
     EXPECT_EQ(title(), "Serving Cell");
 
-    // Nothing that was opened in the LTE display stays open.
+    // All panes of the LTE display are closed.
     ASSERT_TRUE(eventually([&] { return title() == "Kestrum"; }));
     ASSERT_TRUE(eventually([&] { return testing::Value(rows(), Contains("UMTS")); }));
     EXPECT_THAT(rows(), Not(Contains("Idle Mode")));

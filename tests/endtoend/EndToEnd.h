@@ -13,7 +13,7 @@
 
 namespace kestrum {
 
-/// A device of the test's own, and the real telephony service on it.
+/// A device for the test, with the real telephony service on it.
 class EndToEnd : public testing::Test {
 protected:
     EndToEnd()
@@ -26,7 +26,7 @@ protected:
 
     std::string runtime() const { return directory / "run"; }
 
-    /// Until it serves.
+    /// Waits until the service accepts clients.
     bool startService(const QStringList& arguments = {"--scenario", "ifx"})
     {
         service.start(QString::fromStdString(builtProgram("voxd")), arguments);
@@ -39,7 +39,7 @@ protected:
     }
 
     ScratchDirectory directory;
-    // This process and those that it starts.
+    // For this process and those that it starts.
     ScopedVariable runtimeVariable{"KESTRUM_RUNTIME_DIR", runtime()};
     ScopedVariable deviceVariable{"KESTRUM_DEVICE_ROOT", directory / "device"};
     ScopedVariable configurationVariable{"XDG_CONFIG_HOME", directory / "config"};

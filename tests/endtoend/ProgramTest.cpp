@@ -17,7 +17,7 @@ protected:
         program.waitForFinished();
     }
 
-    /// An empty value takes a variable away.
+    /// An empty value removes a variable.
     void start(const std::vector<std::pair<QString, QString>>& variables = {})
     {
         auto environment = QProcessEnvironment::systemEnvironment();
@@ -51,7 +51,7 @@ TEST_P(AnyEnd, ResetsTheHomeScreensKeyAndExitsWithZero)
     ASSERT_TRUE(startService());
     const auto before = entriesOfRuntime();
     start();
-    // It has launched, and opens its port.
+    // The program has launched, and opens its port.
     ASSERT_TRUE(eventually([&] { return entriesOfRuntime() > before; }));
     ::kill(static_cast<pid_t>(program.processId()), GetParam());
     ASSERT_TRUE(ends());

@@ -26,13 +26,13 @@
 #include <stdexcept>
 #include <unistd.h>
 
-// Both front ends, each against a service of its own that misbehaves.
+// Both front ends, each with a separate faulty service.
 namespace kestrum {
 namespace {
 
 using testing::ElementsAre, testing::MatchesRegex;
 
-/// voxd on a device of its own.
+/// voxd on a separate device.
 class Service {
 public:
     explicit Service(const QStringList& scenario) : _scenario(scenario)
@@ -58,7 +58,7 @@ public:
                 {"KESTRUM_DEVICE_ROOT", directory / "device"},
                 {"XDG_CONFIG_HOME", directory / "config"}};
     }
-    /// Until it serves, instead of what it did before.
+    /// Waits until the restarted service accepts clients.
     void serve(const QStringList& options)
     {
         stop();
@@ -96,7 +96,7 @@ public:
     ScratchDirectory directory;
 
 private:
-    QStringList _scenario; ///< instead of the beats
+    QStringList _scenario; ///< used in place of the beats
     QProcess _process;
     std::string _log;
 };
@@ -106,7 +106,7 @@ std::string keyOf(const std::string& row)
     return row.substr(0, row.find(", "));
 }
 
-/// What a user has in front of them.
+/// A front end as a user sees it.
 class Display {
 public:
     virtual ~Display() = default;
@@ -114,14 +114,14 @@ public:
     virtual std::string status() = 0;
     virtual std::string chosen() = 0; ///< the chosen row's key
     virtual void pressDown() = 0;
-    /// Whether it has answered the key: another row is chosen. Asked at each turn of the main loop until it has.
+    /// Whether it has answered the key by choosing another row. Asked at each turn of the main loop until it has.
     virtual bool answered() = 0;
-    /// How much else it did before it answered the key, by a measure of its kind.
+    /// The amount of other work before it answered the key, in a measure that depends on the front end.
     virtual int doneBeforeAnswer() const = 0;
     virtual int mostDoneBeforeAnswer() const = 0;
     virtual pid_t process() const = 0;
 
-    /// Bytes of memory that are really there.
+    /// Bytes of resident memory.
     std::size_t memory() const
     {
         std::ifstream file("/proc/" + std::to_string(process()) + "/statm");
@@ -180,8 +180,8 @@ private:
         return std::regex_replace(std::regex_replace(row, std::regex("^ +| +›? *$"), ""), std::regex("  +"), ", ");
     }
 
-    std::string _chosen, _status; ///< when the key was pressed
-    int _refreshes = 0;           ///< shown since
+    std::string _chosen, _status; ///< at the time of the key press
+    int _refreshes = 0;           ///< shown since the key press
 };
 
 /// The application in this process.
@@ -222,7 +222,7 @@ public:
     {
         _chosen = chosen();
         _turns = 0;
-        // It waits for its turn, as a user's key does.
+        // Posted to the queue, as a user's key is.
         QApplication::postEvent(&table(), new QKeyEvent(QEvent::KeyPress, Qt::Key_Down, Qt::NoModifier));
     }
     bool answered() override
@@ -243,19 +243,19 @@ private:
     ApplicationRoles _roles = _device.applicationRoles(toolkit());
     std::shared_ptr<KestrumApp> _application = KestrumApp::make(_roles);
     qt::MainWindow* _window = nullptr;
-    std::string _chosen; ///< when the key was pressed
-    int _turns = 0;      ///< of the main loop since, nested loops included
+    std::string _chosen; ///< at the time of the key press
+    int _turns = 0;      ///< of the main loop since the key press, nested loops included
 };
 
 constexpr std::size_t kMegabyte = 1 << 20;
-// A beat comes every 10 ms then, before that every 500 ms: so no display has come as far when a fault begins.
+// A beat comes every 10 ms from then on, every 500 ms before. So no display is that far when a fault begins.
 constexpr const char* kFast = "50";
 constexpr int kBeatAfterFaults = 100;
 
 struct Fault {
     const char* names;
-    std::size_t memory = 24 * kMegabyte; ///< that a display may take because of it
-    const char* scenario = "";           ///< instead of the beats
+    std::size_t memory = 24 * kMegabyte; ///< the memory that a display may use because of the fault
+    const char* scenario = "";           ///< used in place of the beats
 
     friend void PrintTo(const Fault& shown, std::ostream* out) { *out << shown.names; }
 };
@@ -265,27 +265,27 @@ protected:
     struct Side {
         Side(Service& service, Display& display) : service(service), display(display) {}
 
-        /// From now on: presses a key when this fault strikes.
+        /// From now on, presses a key when this fault occurs.
         void awaitFault(std::string name)
         {
             fault = std::move(name);
             pressed = false;
             runningAtAnswer.reset();
         }
-        // At each turn of the main loop: what is seen later would be seen after the fault.
+        // Checked at each turn of the main loop: a later check might be after the fault.
         void look()
         {
             if (fault.empty() || runningAtAnswer)
                 return;
             if (pressed && display.answered())
                 runningAtAnswer = isRunning();
-            // What it says last before a signal may stay in it.
+            // Its last line before a signal may stay in its buffer.
             if (!pressed && (service.told("fault " + fault + ": now") || service.isStopped() || service.isGone())) {
                 pressed = true;
                 display.pressDown();
             }
         }
-        /// Whether the fault still lasts. One that strikes once is over as soon as it has struck.
+        /// Whether the fault still lasts. A fault that occurs once ends immediately.
         bool isRunning()
         {
             static const std::set<std::string> once{"half-frame", "garbage", "oversized"};
@@ -296,10 +296,10 @@ protected:
         Service& service;
         Display& display;
         std::size_t before = 0, peak = 0; ///< memory
-        std::string last;                 ///< what was seen last
+        std::string last;                 ///< the last rows seen
         std::string fault;
         bool pressed = false;
-        std::optional<bool> runningAtAnswer; ///< the fault, when the key was answered
+        std::optional<bool> runningAtAnswer; ///< whether the fault lasted when the key was answered
     };
 
     Faults()
@@ -312,16 +312,16 @@ protected:
     }
     ~Faults() override { QObject::disconnect(_turns); }
 
-    /// Serves both displays until the condition holds for both.
+    /// Runs both displays until the condition is true for both.
     bool both(const std::function<bool(Side&)>& condition)
     {
         const auto holds = [&] {
-            QCoreApplication::processEvents(QEventLoop::AllEvents, 20); // ms, as long as the terminal's turn
+            QCoreApplication::processEvents(QEventLoop::AllEvents, 20); // ms, as long as the terminal's part
             for (auto& side : sides)
                 side.peak = std::max(side.peak, side.display.memory());
             return std::ranges::all_of(sides, condition);
         };
-        for (int patience = 0; patience < 3; ++patience) // of the terminal's
+        for (int patience = 0; patience < 3; ++patience) // the terminal's waits
             if (terminal.terminal.waitUntil(holds))
                 return true;
         return false;
@@ -340,7 +340,7 @@ protected:
     {
         return isScenario() ? QStringList{"--scenario", GetParam().scenario} : QStringList();
     }
-    /// Of the rows, when they are what the service has sent and nothing else.
+    /// The beat that the rows show, if they show exactly what the service has sent.
     static std::optional<int> beat(Display& display)
     {
         static const std::string key = "Beat, ";
@@ -366,7 +366,7 @@ private:
     QMetaObject::Connection _turns;
 };
 
-// Timing decides nothing here: what a display shows in the end is waited for.
+// Independent of timing: the test waits for what a display finally shows.
 TEST_P(Faults, LeaveTheDisplayAnsweringSmallAndShowingWhatComesNext)
 {
     ASSERT_TRUE(both([](Side& side) { return showsData(side.display); })) << shown();
@@ -400,7 +400,7 @@ TEST_P(Faults, LeaveTheDisplayAnsweringSmallAndShowingWhatComesNext)
         ASSERT_TRUE(both([&](Side& side) { return side.service.told("fault " + fault + ": over"); })) << shown();
     }
     if (isScenario()) {
-        for (int update = 0; update < 2; ++update) { // the first may be of what came before
+        for (int update = 0; update < 2; ++update) { // the first update may still show earlier data
             for (auto& side : sides)
                 side.last = side.display.status();
             EXPECT_TRUE(both([](Side& side) { return showsData(side.display) && side.display.status() != side.last; }))

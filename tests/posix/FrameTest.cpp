@@ -100,7 +100,7 @@ TEST(FrameReader, TakesThePayloadOfTheLargestSize)
 TEST(FrameReader, TakesNoMemoryOnThePromiseOfALength)
 {
     FrameReader reader;
-    feed(reader, std::string("\x09\0\0\x01", 4)); // 16 MiB to come
+    feed(reader, std::string("\x09\0\0\x01", 4)); // announces 16 MiB
     EXPECT_FALSE(reader.next());
     EXPECT_LT(reader.room(1).size(), 1024u);
 }

@@ -14,7 +14,7 @@
 
 namespace kestrum {
 
-/// A peer without manners: a plain socket that sends whatever bytes the test gives it.
+/// A peer that follows no protocol: a plain socket that sends whatever bytes the test gives it.
 class RawSocket {
 public:
     explicit RawSocket(int descriptor) : _descriptor(descriptor) {}
@@ -50,12 +50,12 @@ public:
     {
         return ::send(_descriptor, bytes.data(), bytes.size(), MSG_NOSIGNAL) == static_cast<ssize_t>(bytes.size());
     }
-    /// Sends what there is room for, without waiting.
+    /// Sends as much as fits, without waiting.
     ssize_t sendSome(std::string_view bytes) const
     {
         return ::send(_descriptor, bytes.data(), bytes.size(), MSG_NOSIGNAL | MSG_DONTWAIT);
     }
-    /// What has come, without waiting.
+    /// Returns the bytes that have arrived, without waiting.
     std::string received() const
     {
         std::string all;
@@ -64,7 +64,7 @@ public:
             all.append(piece, static_cast<std::size_t>(n));
         return all;
     }
-    /// Exactly so many bytes, waiting for them; fewer when the other side has gone.
+    /// Waits for exactly `count` bytes; returns fewer when the peer has closed the connection.
     std::string receive(std::size_t count) const
     {
         std::string all(count, '\0');
@@ -72,7 +72,7 @@ public:
         all.resize(n > 0 ? static_cast<std::size_t>(n) : 0);
         return all;
     }
-    /// Whether the other side has closed the connection.
+    /// Whether the peer has closed the connection.
     bool isAbandoned() const
     {
         pollfd state{_descriptor, POLLIN | POLLRDHUP, 0};
@@ -96,7 +96,7 @@ private:
     int _descriptor;
 };
 
-/// A frame spelled out: length, kind, message id, serial, payload; numbers little-endian.
+/// A frame byte by byte: length, kind, message id, serial, payload; numbers little-endian.
 inline std::string frame(char kind, std::int32_t messageId, std::uint32_t serial, std::string_view payload)
 {
     std::string bytes;

@@ -59,7 +59,7 @@ TEST(RuntimeDirectory, LeavesRoomForTheLongestSocketOfADisplay)
     const auto ofLength = [&](std::size_t length) {
         return scratch / std::string(length - scratch.path().size() - 1, 'd');
     };
-    // "/org.kestrum.vox.baseband-state-report.log.4194304" and the zero, of 108 bytes.
+    // "/org.kestrum.vox.baseband-state-report.log.4194304" and the terminating zero, of 108 bytes.
     EXPECT_EQ(problemOf(ofLength(57)), "");
     EXPECT_THAT(problemOf(ofLength(58)), HasSubstr("too long: 58 bytes, sockets in it leave room for 57"));
     EXPECT_FALSE(std::filesystem::exists(ofLength(58)));

@@ -9,7 +9,7 @@
 
 namespace kestrum {
 
-/// A directory that goes with this object.
+/// A directory that is removed together with this object.
 class ScratchDirectory {
 public:
     ScratchDirectory()
@@ -32,14 +32,14 @@ private:
     std::string _path;
 };
 
-/// Writes a file, and makes the directories above it.
+/// Writes a file, and creates the directories above it.
 inline void writeFile(const std::string& path, std::string_view text)
 {
     std::filesystem::create_directories(std::filesystem::path(path).parent_path());
     std::ofstream(path) << text;
 }
 
-/// An environment variable of another value, or without one, as long as this object lives.
+/// Sets or removes an environment variable as long as this object lives.
 class ScopedVariable {
 public:
     ScopedVariable(const char* name, std::optional<std::string> value) : _name(name)

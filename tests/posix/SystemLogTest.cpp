@@ -12,7 +12,7 @@ using namespace std::chrono;
 using namespace std::chrono_literals;
 using testing::ElementsAre;
 
-/// A sink that hangs until the test lets it go on.
+/// A sink that blocks until the test releases it.
 struct StuckSink {
     void operator()(int level, const std::string& text)
     {
@@ -72,7 +72,7 @@ TEST(LinuxSystemLog, CutsLongLinesBetweenCharactersAndMarksThem)
         log.write(Priority::Error, longest);
         log.write(Priority::Error, longest + "y");
         log.write(Priority::Error, euros);
-        log.write(Priority::Error, std::string(10'000, '\x80')); // no text at all
+        log.write(Priority::Error, std::string(10'000, '\x80')); // not UTF-8
     }
     ASSERT_EQ(sink.state->lines.size(), 4u);
     EXPECT_EQ(sink.state->lines[0].second, longest);
@@ -88,7 +88,7 @@ TEST(LinuxSystemLog, NeverWaitsForADaemonThatHangsAndCountsWhatIsLost)
     log.write(Priority::Error, "stuck");
     ASSERT_TRUE(sink.waitForLines(1));
     for (int i = 0; i < 1000; ++i)
-        log.write(Priority::Error, "line " + std::to_string(i)); // would hang here
+        log.write(Priority::Error, "line " + std::to_string(i)); // would block here if the log waited for its sink
     sink.open();
     ASSERT_TRUE(sink.waitForLines(12));
     const std::lock_guard lock(sink.state->mutex);

@@ -80,7 +80,7 @@ TEST(BinaryList, NotANumberStaysNotANumber)
     EXPECT_TRUE(std::isnan(parsed(BinaryList{{hex("237ff8000000000000")}}.bytes()).value.real().value_or(0)));
 }
 
-/// `levels` arrays inside each other.
+/// Arrays nested `levels` deep.
 std::string nested(unsigned levels)
 {
     BinaryList list;

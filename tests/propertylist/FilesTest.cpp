@@ -53,7 +53,7 @@ TEST_F(Files, NothingIsTouchedWhenTheListHasNoXmlForm)
     EXPECT_FALSE(std::filesystem::exists(scratch.file("new")));
 }
 
-/// A disk that takes so many bytes of a file and no more.
+/// A disk on which a file can have at most this many bytes.
 class SmallDisk {
 public:
     explicit SmallDisk(::rlim_t bytes)

@@ -14,7 +14,7 @@
 
 namespace kestrum {
 
-/// What peer.py makes of `input`.
+/// The output of peer.py for `input`.
 inline std::string peer(const std::string& arguments, const std::string& input)
 {
     const ScratchDirectory scratch;
@@ -47,14 +47,14 @@ inline std::string hex(const std::string& digits)
     return bytes;
 }
 
-/// A binary property list from its objects' bytes, in which references to others take one byte. What the trailer says
-/// can be falsified.
+/// A binary property list from its objects' bytes, whose references to others take one byte. The values in the
+/// trailer can be falsified.
 struct BinaryList {
     std::vector<std::string> objects;
     std::uint64_t root = 0;
-    unsigned tableWidth = 2;                           ///< of an offset, in truth
-    unsigned offsetWidth = 2, referenceWidth = 1;      ///< as the trailer says
-    std::int64_t moreObjects = 0, moreTableOffset = 0; ///< added to what is true
+    unsigned tableWidth = 2;                           ///< the real width of an offset
+    unsigned offsetWidth = 2, referenceWidth = 1;      ///< as stated in the trailer
+    std::int64_t moreObjects = 0, moreTableOffset = 0; ///< added to the correct values
 
     std::string bytes() const
     {
@@ -89,14 +89,14 @@ inline PropertyListCodec::Parsed parsed(const std::string& text)
     return PropertyListCodec().parseWithError(bytesOf(text));
 }
 
-/// The XML form, or nothing.
+/// The XML form; empty when there is none.
 inline std::string xmlOf(const Value& value)
 {
     const auto xml = PropertyListCodec().toXml(value);
     return xml ? std::string(textOf(xml->bytes())) : std::string();
 }
 
-/// A case of a parametrised test, shown by its name.
+/// A case of a parametrised test, listed by its name.
 template <typename Expected>
 struct NamedCase {
     const char* name;

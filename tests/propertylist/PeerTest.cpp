@@ -15,7 +15,7 @@ protected:
         if (!peerIsThere())
             GTEST_SKIP() << "python3 is not installed";
     }
-    /// What we read of what plistlib writes for a Python expression.
+    /// Our reading of the list that plistlib writes for a Python expression.
     static Value fromPeer(const std::string& expression)
     {
         const auto read = parsed(peer(std::string("dump ") + GetParam(), expression));

@@ -1,4 +1,4 @@
-// What holds for any value, and for any bytes.
+// Properties of all values and all bytes.
 #include "Lists.h"
 
 #include "support/Utf8.h"
@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 #include <rapidcheck.h>
 
-#include <rapidcheck/gtest.h> // behind gtest.h, which it needs
+#include <rapidcheck/gtest.h> // needs gtest.h before it
 
 #include <bit>
 #include <cmath>
@@ -16,7 +16,7 @@ namespace {
 
 namespace gen = rc::gen;
 
-/// Texts of all the characters that XML allows.
+/// Texts with all characters that XML allows.
 rc::Gen<std::string> texts()
 {
     const auto character = gen::weightedOneOf<char32_t>({{8, gen::inRange<char32_t>(0x20, 0x80)},
@@ -76,7 +76,7 @@ RC_GTEST_PROP(AnyValue, ComesBackFromXml, ())
     const auto read = parsed(xmlOf(value));
     RC_ASSERT(read.reason == "");
     RC_ASSERT(read.value == value);
-    RC_ASSERT(describe(read.value) == describe(value)); // in the same order, too
+    RC_ASSERT(describe(read.value) == describe(value)); // in the same order
 }
 
 RC_GTEST_PROP(AnyValue, ComesBackFromXmlWhateverIsSpent, ())
@@ -86,10 +86,10 @@ RC_GTEST_PROP(AnyValue, ComesBackFromXmlWhateverIsSpent, ())
     const std::string xml = xmlOf(value);
     const auto over = [&xml](Value given) { return PropertyListCodec().parseOver(bytesOf(xml), std::move(given)); };
     RC_ASSERT(describe(over(deepCopy(spent))) == describe(value));
-    // The own one again, as it is and grown by another.
+    // Parses over the same list again, unchanged and extended by another.
     RC_ASSERT(describe(over(over({}))) == describe(value));
     RC_ASSERT(describe(over(over(makeArray({deepCopy(spent), deepCopy(value)})))) == describe(value));
-    // What somebody else holds stays.
+    // A value with another owner stays unchanged.
     RC_ASSERT(describe(over(spent)) == describe(value));
     RC_ASSERT(spent == held);
 }
@@ -102,11 +102,11 @@ TEST(AnyValue, ComesBackFromPeerInBothForms)
     ASSERT_TRUE(rc::check("collect", [&] { many.push_back(*values(3)); }));
     const Value value = makeArray(many);
     EXPECT_EQ(parsed(peer("convert BINARY", xmlOf(value))).value, value);
-    // plistlib writes no carriage return back into XML: it becomes a line feed.
+    // plistlib does not escape a carriage return in XML, so it becomes a line feed.
     EXPECT_EQ(peer("repr", xmlOf(value)), peer("repr", peer("convert BINARY", xmlOf(value))));
 }
 
-/// Whatever is read is a value or a reason, and can be written and read for good.
+/// Reading gives a value or a reason. The value can be written, and then reads the same.
 void checkReading(const std::string& bytes)
 {
     const auto read = parsed(bytes);

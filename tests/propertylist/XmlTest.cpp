@@ -414,7 +414,7 @@ TEST(XmlWritten, NothingThatContainsItself)
     EXPECT_FALSE(PropertyListCodec().toXml(array));
     array->append(array);
     EXPECT_FALSE(PropertyListCodec().toXml(array));
-    array->clear(); // or it would keep itself alive
+    array->clear(); // breaks the reference cycle
 }
 
 TEST(XmlWritten, NothingThatSharingMakesTooLarge)

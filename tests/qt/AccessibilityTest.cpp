@@ -11,7 +11,7 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// All that an assistive technology finds from there on.
+/// All objects that an assistive technology finds from this one on.
 void collect(QAccessibleInterface* from, std::vector<QAccessibleInterface*>& into)
 {
     into.push_back(from);
@@ -64,7 +64,7 @@ protected:
         collect(interfaceOf(window()), all);
         return all;
     }
-    /// What there is under its name; null when it is not there.
+    /// The object with its name; null when it is not there.
     QAccessibleInterface* find(const QString& name)
     {
         for (auto* each : everything())
@@ -72,7 +72,7 @@ protected:
                 return each;
         return nullptr;
     }
-    /// A button that is pressed this way stays down for a moment first.
+    /// A button that is pressed this way stays pressed for a moment.
     static void tryEverything(const std::vector<QAccessibleInterface*>& things)
     {
         for (auto* each : things)

@@ -21,7 +21,7 @@ const QString kScheme = QStringLiteral("org.freedesktop.appearance color-scheme"
 const QString kAnimations = QStringLiteral("org.gnome.desktop.interface enable-animations");
 constexpr uint kDark = 1, kLight = 2;
 
-/// A session bus that nobody else is on.
+/// A separate session bus.
 class PrivateBus {
 public:
     PrivateBus()
@@ -45,7 +45,7 @@ public:
         _daemon.waitForFinished();
     }
 
-    /// A connection with a name among this process's, which lasts until it is disconnected by that name.
+    /// A named connection of this process. It lasts until it is disconnected by that name.
     QDBusConnection connect(const QString& name) const { return QDBusConnection::connectToBus(_address, name); }
 
 private:
@@ -54,7 +54,7 @@ private:
     QString _address;
 };
 
-/// The desktop's portal, as far as the settings go. It goes away with its connection.
+/// The settings part of the desktop's portal. It ends with its connection.
 class Portal final : public QDBusVirtualObject {
 public:
     explicit Portal(const PrivateBus& bus) : _connection(bus.connect(kName))
@@ -71,7 +71,7 @@ public:
 
     bool isRunning() const { return _running; }
     void set(const QString& setting, const QVariant& value) { _values[setting] = value; }
-    /// As `set`, and tells everyone.
+    /// As `set`, and emits the signal.
     void change(const QString& setting, const QVariant& value)
     {
         set(setting, value);
@@ -89,7 +89,7 @@ public:
         if (found == _values.end())
             return connection.send(
                 message.createErrorReply("org.freedesktop.portal.Error.NotFound", "No such setting"));
-        // The portal wraps this answer twice.
+        // The portal wraps this reply twice.
         const auto once = QVariant::fromValue(QDBusVariant(found->second));
         return connection.send(message.createReply(QVariant::fromValue(QDBusVariant(once))));
     }
@@ -136,7 +136,7 @@ protected:
 
 TEST_F(ADesktop, IsFollowedFromLightToDarkAndBack)
 {
-    // Before anything else of this process has made the types of D-Bus known.
+    // Before any other part of this process has registered the types of D-Bus.
     const qt::Appearance appearance(bus.connect("display"));
     ASSERT_TRUE(turns(kLightRow));
     Portal portal(bus);

@@ -16,7 +16,7 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// The application in a real window, writing real files; the service and the clock are the test's.
+/// The application in a real window with real files. The service and the clock are doubles.
 class TheApplicationInItsWindow : public testing::Test {
 protected:
     TheApplicationInItsWindow()
@@ -71,7 +71,7 @@ protected:
         key(Qt::Key_S, Qt::ControlModifier);
         ASSERT_NE(navigation().sheet(), nullptr);
     }
-    /// What the only file holds that was saved.
+    /// The contents of the only saved file.
     Value saveAndRead()
     {
         key(Qt::Key_S, Qt::ControlModifier);

@@ -16,7 +16,7 @@ QImage pictureOf(const QIcon& icon, int size)
     return icon.pixmap(size).toImage().convertToFormat(QImage::Format_ARGB32);
 }
 
-/// How far two pictures are apart in a channel of a pixel, on the average, of 255.
+/// The average difference of two pictures per pixel and channel, of 255.
 double difference(const QImage& one, const QImage& other)
 {
     double sum = 0;
@@ -29,7 +29,7 @@ double difference(const QImage& one, const QImage& other)
     return sum / (4.0 * one.width() * one.height());
 }
 
-/// What a person tells the program by: its blue ground, and white strokes upon it.
+/// The features by which people recognise the icon: its blue ground, and white strokes on it.
 void expectTheKestrel(const QIcon& icon)
 {
     const QImage picture = pictureOf(icon, 16);
@@ -47,7 +47,7 @@ void expectTheKestrel(const QIcon& icon)
 
 class TheIcon : public InAWindow {
 protected:
-    /// Icons of a desktop whose themes stand here, instead of this machine's.
+    /// Icons of a desktop with its own themes, in place of this machine's.
     TheIcon() : _pathsBefore(QIcon::themeSearchPaths()), _nameBefore(QIcon::themeName())
     {
         QIcon::setThemeSearchPaths({QString::fromStdString(themes.path())});
@@ -89,7 +89,7 @@ TEST_F(TheIcon, ComesFromTheThemeThatHasIt)
     EXPECT_EQ(pictureOf(windowIcon(), 16).pixelColor(8, 8), QColor(Qt::green));
 }
 
-/// An icon that was changed in one of its forms alone is found here.
+/// Finds an icon that was changed in only one of its forms.
 class PaintedIcon : public testing::TestWithParam<int> {};
 
 TEST_P(PaintedIcon, LooksLikeTheDrawing)
@@ -97,7 +97,7 @@ TEST_P(PaintedIcon, LooksLikeTheDrawing)
     const int size = GetParam();
     const QImage painted = pictureOf(paintedIcon(), size);
     ASSERT_EQ(painted.size(), QSize(size, size));
-    // Without Qt's SVG plug-in the pictures are all there is.
+    // Without Qt's SVG plug-in only the pictures are available.
     const QImage drawn = pictureOf(drawnIcon().isNull() ? windowIcon() : drawnIcon(), size);
     ASSERT_EQ(drawn.size(), painted.size());
     EXPECT_LT(difference(drawn, painted), 4) << "resources/icons/rewrite paints them again";

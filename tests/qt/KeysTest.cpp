@@ -17,7 +17,7 @@ QString clipboard()
     return QGuiApplication::clipboard()->text();
 }
 
-/// A pane under the root, with keyboard, mouse and finger on it.
+/// A pane above the root pane, with keyboard, mouse and finger input.
 class Keys : public InAWindow {
 protected:
     Keys()
@@ -237,7 +237,7 @@ TEST_F(Keys, CloseTheMenuWhenItsPaneIsCoveredOrLeaves)
     navigation().show(*_screen, {"Kestrum"}, Transition::None, false);
 }
 
-// Jumping to a name
+// Search for a name
 
 TEST_F(Keys, JumpToANameWhileItIsTyped)
 {

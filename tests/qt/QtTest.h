@@ -25,17 +25,17 @@
 
 namespace kestrum {
 
-/// What a pane's controller does for its table, over rows that the test can change.
+/// The data source and delegate of a table, over rows that the test can change.
 class Rows final : public TableDataSource {
 public:
     struct Row {
         std::string key;
-        std::optional<std::string> value; ///< nothing: the row opens a pane
+        std::optional<std::string> value; ///< empty: the row opens a pane
     };
 
     std::vector<Row> rows;
     std::vector<std::size_t> selected;
-    std::size_t asked = 0; ///< how often for a cell
+    std::size_t asked = 0; ///< the number of requests for a cell
     std::function<void(std::size_t)> onSelect = [](std::size_t) {};
 
     static Rows leaves(std::size_t count)
@@ -75,12 +75,12 @@ public:
     }
 };
 
-/// A window with a navigation view in it, as wide and high as a handset.
+/// A window with a navigation view, of a handset's size.
 class InAWindow : public testing::Test, public NavigationViewDelegate {
 protected:
     InAWindow() : _navigation(toolkit().makeNavigationView(*this)), _window(toolkit().makeWindow({0, 0, 390, 844}))
     {
-        qt::FocusRing::instance().setShown(false); // as at the start, whatever the test before did
+        qt::FocusRing::instance().setShown(false); // reset after the previous test
         navigation().setToolbarHidden(false);
         window().setRoot(navigation());
     }
@@ -103,7 +103,7 @@ protected:
 
     static QPoint middleOf(const qt::Table& table, std::size_t row) { return table.cellAt(row)->geometry().center(); }
 
-    // A finger on the window, which finds what lies under it as a real one does.
+    // A finger on the window. It reaches the widget below it, as a real one does.
     void press(const QWidget& on, QPoint at) { finger(QTest::mousePress, on, at); }
     void release(const QWidget& on, QPoint at) { finger(QTest::mouseRelease, on, at); }
     void click(const QWidget& on, QPoint at, Qt::MouseButton button = Qt::LeftButton)
@@ -132,12 +132,12 @@ private:
     using Act = void (*)(QWindow*, Qt::MouseButton, Qt::KeyboardModifiers, QPoint, int);
     void finger(Act act, const QWidget& on, QPoint at, Qt::MouseButton button = Qt::LeftButton)
     {
-        constexpr int kPause = 10; // milliseconds of the events' own time, which nobody waits for
+        constexpr int kPause = 10; // ms in the events' time stamps, without a real wait
         act(window().windowHandle(), button, {}, on.mapTo(&window(), at), kPause);
     }
 
     std::unique_ptr<NavigationView> _navigation;
-    std::unique_ptr<Window> _window; // borrows the navigation view, and ends first
+    std::unique_ptr<Window> _window; // borrows the navigation view, so it is destroyed first
 };
 
 } // namespace kestrum

@@ -11,7 +11,7 @@
 namespace kestrum {
 namespace {
 
-/// Ends the main loop in its own way once that runs.
+/// Ends the main loop in a given way after its start.
 struct Ending {
     const char* name;
     std::function<void(Window&)> end;
@@ -72,7 +72,7 @@ INSTANTIATE_TEST_SUITE_P(Run, TheEnd,
                                                 }}),
                          [](const auto& each) { return std::string(each.param.name); });
 
-/// As Qt does when the display server goes away. A death test is run first, while the program has no threads to fork.
+/// As Qt does when the display server ends. A death test runs first, before the program has threads.
 TEST(TheEndByExitDeathTest, ReachesTheApplicationExactlyOnce)
 {
     const Ending exits{"ByExit", [](Window&) { std::exit(1); }};

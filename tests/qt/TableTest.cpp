@@ -277,7 +277,7 @@ TEST_F(ATable, LeavesTheContentAreaTheRowLessItsAccessory)
     EXPECT_EQ(cell(1).contentBounds(), (Rect{0, 0, 358, 44}));
 }
 
-/// The layout at the very width where a value just fits, with the real font's measures.
+/// The layout at the width where a value just fits, with the real font's measures.
 TEST_F(ATable, PutsAValueThatFitsExactlyBehindItsKey)
 {
     Rows rows = Rows::leaves(1);
@@ -286,7 +286,7 @@ TEST_F(ATable, PutsAValueThatFitsExactlyBehindItsKey)
     std::string key, value;
     const auto needed = [&] { return width(key) + 60 + width(value); };
     const auto isWhole = [&] { return needed() == std::floor(needed()); };
-    // A window is whole points wide, so what the texts need must be too.
+    // A window's width is a whole number of points, so the width of the texts must be one too.
     for (std::size_t more = 0; more < 64 && (key.empty() || !isWhole()); ++more)
         for (char first = '!'; first <= '~' && (key.empty() || !isWhole()); ++first) {
             key = std::string("Measured RSRP ") + first;
@@ -371,7 +371,7 @@ TEST_F(ATable, ScrollsUnderAFingerWithoutSelecting)
     Rows rows = Rows::leaves(100);
     show(rows);
     pressAndMove(*table().viewport(), {200, 500}, {200, 200});
-    EXPECT_TRUE(QTest::qWaitFor([&] { return offset() > 250; })); // the next frame follows
+    EXPECT_TRUE(QTest::qWaitFor([&] { return offset() > 250; })); // follows in the next frame
     release(*table().viewport(), {200, 200});
     EXPECT_THAT(rows.selected, IsEmpty());
 }
@@ -383,7 +383,7 @@ TEST_F(ATable, ScrollsOneRowSidewaysUnderAFinger)
     show(rows);
     const QPoint from(300, middleOf(table(), 3).y());
     pressAndMove(*table().viewport(), from, from - QPoint(200, 0));
-    EXPECT_TRUE(QTest::qWaitFor([&] { return cell(3).sideways() > 150; })); // the next frame follows
+    EXPECT_TRUE(QTest::qWaitFor([&] { return cell(3).sideways() > 150; })); // follows in the next frame
     release(*table().viewport(), from - QPoint(200, 0));
     EXPECT_EQ(cell(4).sideways(), 0);
     EXPECT_EQ(offset(), 0);
@@ -497,13 +497,13 @@ TEST_F(ATable, TellsOfAValueOnlyWhileSomeOfItIsOutOfSight)
     rows.rows[1].value = std::string(60, '7');
     show(rows);
     const auto dots = [&] {
-        // Where the last of the three stands.
+        // The place of the last of the three rows.
         return cell(1).grab().toImage().pixelColor(380 - 2, 26) != qt::lightColours().surface;
     };
     EXPECT_FALSE(cell(0).isCut());
     EXPECT_TRUE(cell(1).isCut());
     EXPECT_TRUE(dots());
-    cell(1).setSideways(100'000); // past the value's end, as far as the strip goes
+    cell(1).setSideways(100'000); // beyond the value's end, limited to the strip
     EXPECT_FALSE(dots());
     const double end = cell(1).sideways();
     cell(1).setSideways(end / 4);

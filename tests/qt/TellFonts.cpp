@@ -1,4 +1,5 @@
-// Says in which faces the window would set its texts: a program, for a process has one set of fonts.
+// Prints the faces that the window would use for its texts. A separate program, because a process has one set of
+// fonts.
 #include "frontends/qt/QtToolkit.h"
 #include "frontends/qt/Type.h"
 

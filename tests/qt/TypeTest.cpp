@@ -19,7 +19,7 @@
 namespace kestrum {
 namespace {
 
-/// Where ink stands in a picture of the label, in points.
+/// The extent of the ink in a picture of the label, in points.
 QRect inkOf(const qt::TextLabel& label)
 {
     QImage picture(600, 60, QImage::Format_RGB32);
@@ -112,7 +112,7 @@ TEST(Digits, AreEquallyWide)
 
 TEST(TheTestsFonts, AreTheInstalledLiberationFontsAlone)
 {
-    // Qt adds generic names to what is there.
+    // Qt appends generic names to the list.
     for (const QString& family : QFontDatabase::families())
         EXPECT_TRUE(
             QStringList({"Liberation Mono", "Liberation Sans", "Liberation Serif", "Monospace", "Sans Serif", "Serif"})
@@ -155,18 +155,19 @@ TEST(Helvetica, IsLiberationSansWhereItIsInstalled)
     EXPECT_EQ(QFontInfo(qt::fontOf({"Helvetica", 13})).family(), "Liberation Sans");
 }
 
-/// A machine's fonts, which are Liberation's under the names that the machine has them by.
+/// A machine's fonts: the Liberation fonts under other names.
 struct Machine {
     const char* name;
-    std::vector<std::pair<const char*, const char*>> fonts; ///< a file of the Liberation fonts, and its name
-    const char* desktops;                                   ///< the family that is the desktop's; null: it names none
-    std::string window, helvetica;                          ///< what they are to be set in
+    /// a file of the Liberation fonts, and its name on the machine
+    std::vector<std::pair<const char*, const char*>> fonts;
+    const char* desktops;          ///< the desktop's font family; null: none
+    std::string window, helvetica; ///< the expected families
     friend void PrintTo(const Machine& shown, std::ostream* out) { *out << shown.name; }
 };
 
 class AMachinesWindow : public testing::TestWithParam<Machine> {
 protected:
-    /// The fonts that `tell-fonts` says on that machine.
+    /// The fonts that `tell-fonts` prints on that machine.
     std::string told() const
     {
         std::ofstream settings(_scratch.file("fonts.conf"));

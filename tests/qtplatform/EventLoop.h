@@ -11,11 +11,11 @@
 
 namespace kestrum {
 
-/// Serves the event loop until the condition holds; false when it does not within the bound.
+/// Runs the event loop until the condition is true; false when it is not within the time limit.
 inline bool eventually(const std::function<bool()>& condition,
                        std::chrono::milliseconds bound = std::chrono::seconds(20))
 {
-    QTimer wakes; // the condition may come true by what is no event of this thread
+    QTimer wakes; // something other than an event of this thread may make the condition true
     wakes.start(std::chrono::milliseconds(2));
     for (const QDeadlineTimer end(bound); !condition();) {
         if (end.hasExpired())
@@ -25,7 +25,7 @@ inline bool eventually(const std::function<bool()>& condition,
     return true;
 }
 
-/// The application object that Qt's event loop needs, for the whole test program.
+/// The application object that Qt's event loop needs, one for the whole test program.
 class EventLoopEnvironment : public testing::Environment {
 public:
     void SetUp() override { _application = std::make_unique<QCoreApplication>(_count, _arguments); }

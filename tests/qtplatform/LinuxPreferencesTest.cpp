@@ -45,7 +45,7 @@ TEST(LinuxPreferences, SayWhenTheyCannotBeWritten)
 
 TEST(LinuxPreferences, AnnounceTheChangeOnTheSessionBus)
 {
-    // A bus of the test's own, and somebody who listens.
+    // A separate bus, and a listener.
     QProcess bus;
     bus.start("dbus-daemon", {"--session", "--nofork", "--print-address=1"});
     ASSERT_TRUE(bus.waitForStarted()) << "needs the package dbus";
@@ -56,7 +56,7 @@ TEST(LinuxPreferences, AnnounceTheChangeOnTheSessionBus)
     listener.start("dbus-monitor", {"--session", "type=signal,interface=org.kestrum.Preferences"});
     ASSERT_TRUE(listener.waitForStarted());
     QByteArray heard;
-    ASSERT_TRUE(eventually([&] { // it says that it has its own name once it listens
+    ASSERT_TRUE(eventually([&] { // it reports its own name as soon as it listens
         heard += listener.readAllStandardOutput();
         return heard.contains("NameAcquired") || heard.contains("NameLost");
     }));

@@ -43,7 +43,7 @@ protected:
         return port;
     }
 
-    // Lets everything run that is due by now.
+    // Runs all tasks whose time has come.
     void settle()
     {
         bool settled = false;
@@ -113,7 +113,7 @@ TEST_F(LocalPortTest, GivesUpOnALockThatAnotherProcessKeeps)
 {
     const int kept = ::open(directory.path().c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
     ASSERT_EQ(::flock(kept, LOCK_EX), 0);
-    EXPECT_FALSE(makeLocal()); // would hang here
+    EXPECT_FALSE(makeLocal()); // would block here
     EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("keeps " + directory.path() + " locked")));
     ::close(kept);
     EXPECT_TRUE(makeLocal());
@@ -139,7 +139,7 @@ TEST_F(LocalPortTest, CanBeMadeAgainAtOnceWhenTheFirstIsGone)
 TEST_F(LocalPortTest, ClearsAwayTheSocketsOfProcessesThatHaveGone)
 {
     RawSocket::listenAt(directory / "log.1").close();
-    RawSocket::listenAt(address("log")).close(); // one of an earlier process with this number
+    RawSocket::listenAt(address("log")).close(); // left over from an earlier process with this number
     const auto living = RawSocket::listenAt(directory / "log.2");
     RawSocket::listenAt(directory / "logbook.1").close();
     ASSERT_TRUE(makeLocal());
@@ -211,7 +211,7 @@ TEST_F(LocalPortTest, TakesAMessageLargerThanWhatIsReadAhead)
 TEST_F(LocalPortTest, AFloodLeavesTimersAndOtherSendersTheirTurns)
 {
     int handled = 0, ofTheOther = 0, ticks = 0;
-    // Dear enough that what one read-ahead holds keeps the handler busy for long.
+    // Slow enough that the messages of one read keep the handler busy for long.
     const auto port = ports.createLocal("log", [&](std::int32_t id, Bytes) {
         ++(id == 0 ? handled : ofTheOther);
         const auto end = std::chrono::steady_clock::now() + 200us;
@@ -241,7 +241,7 @@ TEST_F(LocalPortTest, AFloodLeavesTimersAndOtherSendersTheirTurns)
     EXPECT_LT(handled, 1000) << "the other sender waited for the whole flood";
     ASSERT_TRUE(eventually([&] { return handled == 2000; }));
     EXPECT_GE(ticks, 5) << "400 ms of messages, in batches of at most 50 ms";
-    // 50 ms are promised; the rest is for a busy machine.
+    // 50 ms are promised; the rest allows for a busy machine.
     EXPECT_LT(longest, 400ms);
 }
 
@@ -250,7 +250,7 @@ TEST_F(LocalPortTest, RefusesAProcessOfAnotherUser)
     if (::geteuid() != 0)
         GTEST_SKIP() << "only root can become another user";
     const auto port = makeLocal();
-    // The directory would keep the other user out; opened here, so that the credentials must.
+    // The directory would keep the other user out. It is opened here, so that only the credentials do.
     ::chmod(directory.path().c_str(), 0777);
     ::chmod(address("log").c_str(), 0777);
     const std::string path = address("log");
@@ -261,7 +261,7 @@ TEST_F(LocalPortTest, RefusesAProcessOfAnotherUser)
             if (!peer.isOpen())
                 return false;
             peer.send(frame(kMessage, 0, 0, "let me in"));
-            return peer.receive(1).empty(); // until it is closed
+            return peer.receive(1).empty(); // until the connection is closed
         }();
         ::_exit(connected ? 0 : 1);
     }
@@ -273,7 +273,7 @@ TEST_F(LocalPortTest, RefusesAProcessOfAnotherUser)
     EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("refused process " + std::to_string(child) + " of user 65534")));
 }
 
-/// The other end of a remote port: a listener whose answers the test writes.
+/// The peer of a remote port: a listener whose answers the test sends.
 class RemotePortTest : public MessagePortsTest {
 protected:
     void SetUp() override
@@ -344,7 +344,7 @@ TEST_F(RemotePortTest, TellsTheRepliesOfNestedRequestsApart)
     std::vector<Frame> asked;
     answer = [&](const Frame& each) {
         asked.push_back(each);
-        if (asked.size() == 2) { // the outer one's first
+        if (asked.size() == 2) { // the outer request's answer first
             reply(asked[0], "outer");
             reply(asked[1], "inner");
         }
@@ -393,7 +393,7 @@ TEST_F(RemotePortTest, TakesTheReplyThatCameJustBeforeItsOwnerWent)
 
 TEST_F(RemotePortTest, AMalformedReplyInvalidatesWithOneLine)
 {
-    // The listener's own frames are well formed, so this peer is a plain socket.
+    // A listener sends only valid frames, so this peer is a plain socket.
     const auto raw = RawSocket::listenAt(directory / "rude");
     auto rude = ports.createRemote("rude");
     const auto peer = raw.accept();

@@ -1,4 +1,4 @@
-// The model on real sockets, with a service that takes the request for a log channel and never answers it.
+// The model on real sockets, with a service that takes the request for a log channel but never answers.
 #include "core/KestrumModel.h"
 #include "doubles/DecodingDoubles.h"
 #include "platform/qt/LinuxMessagePorts.h"

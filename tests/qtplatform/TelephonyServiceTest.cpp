@@ -17,7 +17,7 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-/// A service that a thread of the test plays on a plain socket, so that it can be slow.
+/// A service on a plain socket in a thread of the test, so that it can be slow.
 class TelephonyServiceTest : public testing::Test {
 protected:
     ~TelephonyServiceTest() override
@@ -26,7 +26,7 @@ protected:
             played.join();
     }
 
-    /// Plays the service to the next client.
+    /// Serves the next client.
     void play(std::function<void(RawSocket&)> part)
     {
         played = std::thread([this, part = std::move(part)] {
@@ -108,7 +108,7 @@ TEST_F(TelephonyServiceTest, GivesUpOnASilentServiceAfterASecond)
     std::atomic<bool> over = false;
     play([&](RawSocket& client) {
         client.receive(kRequestSize);
-        client.receive(1); // until the client goes
+        client.receive(1); // until the client closes
         over = true;
     });
     auto connection = telephony.connect({});
@@ -144,7 +144,7 @@ TEST_F(TelephonyServiceTest, MayBeDestroyedWhileItWaits)
 {
     play([&](RawSocket& client) {
         client.receive(kRequestSize);
-        client.receive(1); // until the client goes
+        client.receive(1); // until the client closes
     });
     auto connection = telephony.connect([](std::string_view) { ADD_FAILURE() << "heard"; });
     queue.post([&] { connection.reset(); });
@@ -205,7 +205,7 @@ TEST_F(TelephonyServiceTest, NotificationsArriveOnTheMainQueueUntilTheConnection
 {
     std::atomic<bool> sent = false;
     play([&](RawSocket& client) {
-        // One within the wait for an answer, one from the event loop.
+        // One during the wait for an answer, one from the event loop.
         client.receive(kRequestSize);
         client.send(frame(kMessage, 2, 0, "first") + frame(kReply, 1, 1, words(0, 0) + "port") +
                     frame(kMessage, 2, 0, "second"));

@@ -15,7 +15,7 @@
 namespace kestrum {
 namespace {
 
-/// What the readings of a display measure: a line "Section/Key: unit" for each key, "a number" without a unit, "a text"
+/// The units of a display's readings: a line "Section/Key: unit" for each key, "a number" without a unit, "a text"
 /// without a number.
 class Measured {
 public:
@@ -56,7 +56,7 @@ private:
         }
         units.erase("a text");
         units.insert(reading.unit().empty() ? "a number" : std::string(reading.unit()));
-        // The unit is the one that the text shows, and the number the one before it.
+        // The unit is the one in the text, and the number the one before it.
         const std::string text = reading.text();
         EXPECT_NE(text.find(reading.unit()), std::string::npos) << key << ": " << text;
         const auto digits = text.find_first_of("-+0123456789");
@@ -83,7 +83,7 @@ Value everyCell()
     return cells;
 }
 
-/// Looks at the display after each record that the generator asks for, of several contents, and after a list of cells.
+/// Reads the display after each record that the generator requests, with several contents, and after a list of cells.
 template <typename Generator>
 std::string measuredBy(std::string_view templateName, const std::vector<RecordBuilder>& others = {})
 {
@@ -116,7 +116,7 @@ std::vector<RecordBuilder> candidates()
     return all;
 }
 
-/// The same of the messages of the sample capture, and of what comes in traffic alone.
+/// The same for the messages of the sample capture, and for records that occur only in traffic.
 std::string measuredInTheCdmaCapture()
 {
     TechnologyRun<C2KLogGenerator> run("C2KTemplate");

@@ -22,8 +22,8 @@ std::atomic<long> allocations{0};
 
 } // namespace
 
-// Counts what this test program takes from the heap. Not inlined: GCC 12 would take one's malloc and the other's free
-// for a mismatch.
+// Counts this program's heap allocations. Not inlined: GCC 12 would report the malloc of one and the free of the
+// other as a mismatch.
 [[gnu::noinline]] void* operator new(std::size_t size)
 {
     ++allocations;
@@ -67,7 +67,7 @@ struct Subscription {
     }
 };
 
-// A modem sends several of these a second for days.
+// A modem sends several of these per second for days.
 template <typename Decode>
 void expectNoAllocation(const std::vector<RecordBuilder>& records, Decode decode)
 {
@@ -104,7 +104,7 @@ std::string nameOf(const testing::TestParamInfo<Subscription>& each)
     return name + "_" + formatted("%x", each.param.code);
 }
 
-/// Of a dictionary section; it has to show something.
+/// For a dictionary section, which must show at least one value.
 template <typename Index>
 void expectNoAllocation(const Subscription& subscription)
 {
@@ -113,7 +113,7 @@ void expectNoAllocation(const Subscription& subscription)
     EXPECT_FALSE(node->empty());
 }
 
-/// Of a list section; the record of ones names as many rows as fit.
+/// For a list section. The record of ones has as many rows as fit.
 template <typename Index>
 void expectNoAllocationInList(const Subscription& subscription)
 {

@@ -1,4 +1,4 @@
-// Compiled once for each case, which has to fail, and once without any.
+// Compiled once per case, which must fail, and once without any case.
 #include "support/Format.h"
 #include "support/Reading.h"
 #include "support/Record.h"
@@ -76,7 +76,7 @@ constexpr Line lines[] = {
 
 const Value value =
 #if defined POINTER_FOR_A_VALUE
-    &fields[0]; // it would become a boolean
+    &fields[0]; // the pointer would be converted to a boolean
 #else
     true;
 #endif

@@ -12,7 +12,7 @@ namespace {
 
 using testing::ElementsAre;
 
-/// Four bytes of `before`, once `field` was set to `value`.
+/// Four bytes of `before`, after `field` was set to `value`.
 std::vector<int> written(Field field, std::int64_t value, int before = 0)
 {
     std::array<std::byte, 4> bytes;

@@ -11,7 +11,7 @@
 namespace kestrum {
 namespace {
 
-/// What the C library makes of the same format.
+/// The C library's result for the same format.
 [[gnu::format(printf, 1, 2)]] std::string printed(const char* format, ...)
 {
     std::va_list arguments;
@@ -22,7 +22,7 @@ namespace {
     return {text, static_cast<std::size_t>(length)};
 }
 
-// One text for both: a format that differs between them would prove nothing.
+// One text for both: a comparison of different formats would prove nothing.
 #define EXPECT_AS_PRINTF(...) EXPECT_EQ(formatted(__VA_ARGS__), printed(__VA_ARGS__))
 
 TEST(Format, SignedIntegersAsPrintf)
@@ -91,7 +91,7 @@ TEST(Format, RealsAsPrintf)
 
 TEST(Format, BinaryFractionsRoundHalfToEvenAsPrintf)
 {
-    // Up to 20 binary places and just beyond, below 2^20 and from there on.
+    // Up to 20 binary places and just beyond, for numbers below and above 2^20.
     for (const double whole : {0.0, 1.0, 2.0, 63.0, 140.0, 1048574.0, 1048575.0, 1048576.0, 1e9})
         for (int places = 1; places <= 23; ++places)
             for (const int eighth : {1, 3, 4, 5, 7}) {

@@ -40,7 +40,7 @@ TEST(Record, NothingUnlessTheWholeWordIsThere)
     EXPECT_EQ(record.read(u16(3)), 0x9A78u);
     EXPECT_FALSE(record.read(u16(4)));
     EXPECT_FALSE(record.read(u32(2)));
-    EXPECT_FALSE(record.read(u32(2).bits(0, 7))); // the byte is there, its word is not
+    EXPECT_FALSE(record.read(u32(2).bits(0, 7))); // the byte is there, but its word is not
     EXPECT_FALSE(Record(Bytes()).read(u8(0)));
 }
 
@@ -60,7 +60,7 @@ TEST(Record, SlicesCountFromTheirOwnStart)
     EXPECT_EQ(part->size(), 3u);
     EXPECT_EQ(part->read(u8(0)), 0x34u);
     EXPECT_EQ(part->read(u8(2)), 0x78u);
-    EXPECT_FALSE(part->read(u8(3))); // the record goes on, the slice does not
+    EXPECT_FALSE(part->read(u8(3))); // the record continues, the slice does not
 }
 
 TEST(Record, SlicesMayBeEmpty)

@@ -15,7 +15,8 @@ namespace {
 
 constexpr Quantity kLevel{[](Quantity::Raw raw) { return raw == 0 ? "Not Present" : formatted("-%lu dBm", raw); },
                           [](Quantity::Raw raw) { return raw == 0 ? NAN : -static_cast<double>(raw); }, "dBm"};
-constexpr Quantity kRatio{[](Quantity::Raw raw) { return formatted("-%lu dBm", raw); }}; // worded alike
+// the same text for different quantities
+constexpr Quantity kRatio{[](Quantity::Raw raw) { return formatted("-%lu dBm", raw); }};
 constexpr Quantity kOnOff{[](Quantity::Raw raw) { return std::string(raw != 0 ? "on" : "off"); }};
 
 std::string percent(double share)
@@ -46,7 +47,7 @@ TEST(Value, OfANullReferenceIsNull)
     EXPECT_TRUE(Value(ArrayRef()).isNull());
     EXPECT_TRUE(Value(DictionaryRef()).isNull());
     EXPECT_FALSE(Value());
-    EXPECT_TRUE(Value(false)); // there is a value, whatever it says
+    EXPECT_TRUE(Value(false)); // true if there is a value, even the value false
 }
 
 TEST(Value, GivesNothingOfAnotherKind)
@@ -197,7 +198,7 @@ TEST(Dictionary, SetsTextInPlace)
 
 TEST(Dictionary, FindsEveryKeyOfMany)
 {
-    // Beyond a few dozen keys an index helps: it has to follow every change.
+    // Above a few dozen keys an index is used. It has to follow every change.
     Dictionary dictionary;
     for (int i = 0; i < 1000; ++i)
         dictionary.set(std::to_string(i), i);
@@ -389,7 +390,7 @@ TEST(Value, TakesAReadingInPlaceOfAnything)
 
 TEST(Dictionary, FindsWithoutAnEffectOnWhatComesNext)
 {
-    // Keys that come in their order reuse the entries that stood there, whatever is looked for in between.
+    // Keys that arrive in their old order reuse the existing entries, whatever is looked up in between.
     Dictionary dictionary{{"a", makeArray({"1"})}, {"b", makeArray({"2"})}};
     const Array* second = dictionary.at("b").array().get();
     dictionary.startOver();
@@ -442,7 +443,7 @@ TEST(Dictionary, HoldsWhatCameSinceItStartedOver)
     Dictionary dictionary;
     for (int round = 0; round < 2000; ++round) {
         round % 10 == 0 ? dictionary.clear() : dictionary.startOver();
-        std::vector<std::pair<std::string, std::string>> expected; // in the order in which the keys first came
+        std::vector<std::pair<std::string, std::string>> expected; // in the order of each key's first insertion
         for (unsigned set = below(70); set > 0; --set) {
             const auto key = "key " + std::to_string(below(round % 2 == 0 ? 5 : 80));
             const auto known = std::ranges::find(expected, key, &std::pair<std::string, std::string>::first);

@@ -69,7 +69,7 @@ void Demonstration::restartService()
         dup2(said[1], STDOUT_FILENO);
         close(said[0]);
         close(said[1]);
-        std::signal(SIGPIPE, SIG_DFL); // whatever runs the tests may ignore it
+        std::signal(SIGPIPE, SIG_DFL); // the process that runs the tests may ignore it
         for (const auto& [name, value] : environment())
             setenv(name.c_str(), value.c_str(), 1);
         std::vector<char*> argv;
@@ -80,7 +80,7 @@ void Demonstration::restartService()
         _exit(127);
     }
     close(said[1]);
-    // It says a line once it serves; nothing comes when it cannot.
+    // It writes a line once it accepts clients, and none when it cannot start.
     char byte = 0;
     const bool serves = read(said[0], &byte, 1) == 1;
     close(said[0]);

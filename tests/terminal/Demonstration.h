@@ -10,7 +10,7 @@
 
 namespace kestrum {
 
-/// A device of the test's own, with the real telephony service on it that replays what the test says.
+/// A device for the test. The real telephony service on it replays the messages that the test sets.
 class Demonstration {
 public:
     Demonstration();
@@ -18,7 +18,7 @@ public:
     Demonstration(const Demonstration&) = delete;
     Demonstration& operator=(const Demonstration&) = delete;
 
-    /// Every message is a property list, which an IFX modem sends as a whole display. One comes every 500 ms.
+    /// Every message is a property list with a whole display, as from an IFX modem. One message is sent every 500 ms.
     void serve(const std::vector<std::string>& displays, const std::vector<std::string>& options = {"--loop"});
     void killService();
     void signalService(int number);
@@ -26,9 +26,9 @@ public:
 
     void offerSave();
     std::filesystem::path diagnosticLogs() const { return _directory / "device/var/log/diagnostics"; }
-    /// How many displays have a socket for the log.
+    /// The number of displays with a socket for the log.
     std::size_t displaysSockets() const;
-    /// For the programs on this device.
+    /// The environment of the programs on this device.
     std::map<std::string, std::string> environment() const;
 
 private:
@@ -37,9 +37,9 @@ private:
     pid_t _service = -1;
 };
 
-/// A property list of the dictionary whose entries these are.
+/// A property list of a dictionary with these entries.
 std::string propertyList(const std::string& entries);
-/// A dictionary's entries, sorted as they are given: texts, and dictionaries made by `dictionary`.
+/// The entries of a dictionary in the given order: texts, and dictionaries made by `dictionary`.
 std::string text(std::string_view key, std::string_view value);
 std::string dictionary(std::string_view key, const std::string& entries);
 

@@ -19,14 +19,14 @@ namespace {
 using testing::HasSubstr;
 using testing::Not;
 
-/// A capture that comes bit by bit.
+/// A capture that arrives in pieces.
 class SlowCapture {
 public:
     SlowCapture()
     {
         if (_rest.empty() || ::mkfifo(path().c_str(), 0600) != 0)
             throw std::runtime_error("no slow capture");
-        _pipe = ::open(path().c_str(), O_RDWR | O_CLOEXEC); // for reading too, so that it need not wait for a reader
+        _pipe = ::open(path().c_str(), O_RDWR | O_CLOEXEC); // for reading too, so that it does not wait for a reader
     }
     ~SlowCapture() { ::close(_pipe); }
     SlowCapture(const SlowCapture&) = delete;

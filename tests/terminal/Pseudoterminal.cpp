@@ -36,7 +36,7 @@ struct Pseudoterminal::Callbacks {
             self._cursorVisible = value->boolean != 0;
         return 1;
     }
-    // The library's versions differ in what else can be called back.
+    // The library's versions differ in the other callbacks.
     static constexpr VTermScreenCallbacks kTable = [] {
         VTermScreenCallbacks table{};
         table.settermprop = property;
@@ -97,7 +97,7 @@ void Pseudoterminal::takeIn(int milliseconds)
     if (_master < 0) {
         poll(nullptr, 0, milliseconds);
     } else if (poll(&readable, 1, milliseconds) > 0) {
-        // In small pieces: a test that looks at what it did not wait for fails each time, not once in a hundred.
+        // In small pieces, so that a test without a needed wait fails every time, not once in a hundred times.
         char bytes[16];
         const auto length = read(_master, bytes, sizeof bytes);
         if (length > 0) {
@@ -114,7 +114,7 @@ void Pseudoterminal::takeIn(int milliseconds)
     }
 }
 
-// What the terminal says on its own account, keys included.
+// The terminal's own output, keys included.
 void Pseudoterminal::answer()
 {
     char bytes[256];
@@ -153,7 +153,7 @@ bool Pseudoterminal::waitForStop()
     return stopped;
 }
 
-/// The last words of a program that writes no more may still be on their way through the terminal.
+/// The last output of a program that writes no more may not have passed the terminal yet.
 void Pseudoterminal::takeInTheRest()
 {
     for (pollfd readable{_master, POLLIN, 0}; _master >= 0 && poll(&readable, 1, 0) > 0 && readable.revents & POLLIN;)
@@ -297,8 +297,8 @@ void Pseudoterminal::type(std::string_view text)
     }
 }
 
-// The interpreter misses that the program asks for mouse reports (it does so together with their form, xterm's SGR
-// one), so they are spelled out here.
+// The interpreter does not recognise the program's request for mouse reports, which comes together with the request
+// for their format (xterm's SGR). So the reports are written here.
 void Pseudoterminal::report(int button, int row, int column, char action)
 {
     type("\x1B[<" + std::to_string(button) + ";" + std::to_string(column + 1) + ";" + std::to_string(row + 1) + action);

@@ -14,8 +14,8 @@ struct VTermScreen;
 
 namespace kestrum {
 
-/// A program on a terminal of the test's own: what it writes goes through a real terminal's interpreter, and the test
-/// sees the screen as a person would.
+/// A program on a separate terminal. Its output goes through a real terminal's interpreter, so the test sees the
+/// screen as a user would.
 class Pseudoterminal {
 public:
     Pseudoterminal(int rows, int columns);
@@ -23,17 +23,17 @@ public:
     Pseudoterminal(const Pseudoterminal&) = delete;
     Pseudoterminal& operator=(const Pseudoterminal&) = delete;
 
-    /// Runs the program of that name in the build's bin directory. The environment is the test's, changed by these; an
-    /// empty value takes the variable out.
+    /// Runs the program of that name in the build's bin directory, with the test's environment and these changes. An
+    /// empty value removes the variable.
     void start(const std::string& program, const std::vector<std::string>& arguments,
                const std::map<std::string, std::string>& environment);
 
-    /// Takes in what the program writes until the condition holds. False when it does not within 20 s.
+    /// Reads the program's output until the condition is true. False when it is not within 20 s.
     bool waitUntil(const std::function<bool()>& condition);
     bool waitFor(std::string_view text);
     bool waitForEnd();
     bool waitForStop();
-    /// Takes in all that the program has written by now.
+    /// Reads all output that the program has written so far.
     void takeInTheRest();
 
     std::string row(int row) const; ///< without trailing blanks
@@ -71,11 +71,11 @@ public:
     void signal(int number);
     void hangUp(); ///< the terminal is closed
 
-    const std::string& written() const { return _written; } ///< everything the program has sent so far
+    const std::string& written() const { return _written; } ///< everything that the program has written so far
     void forgetWritten() { _written.clear(); }
     termios modes() const;
     pid_t process() const { return _program; }
-    int exitStatus() const; ///< as the shell counts it: 128 and the signal's number when one ended it
+    int exitStatus() const; ///< as in a shell: 128 plus the signal's number when a signal ended it
 
 private:
     void takeIn(int milliseconds);

@@ -8,7 +8,7 @@
 #include <fstream>
 #include <iterator>
 
-// The real program on a terminal of the test's own, against the real telephony service.
+// The real program on a separate terminal, with the real telephony service.
 namespace kestrum {
 namespace {
 
@@ -25,7 +25,7 @@ std::string neighbours()
     return entries;
 }
 
-/// All kinds of rows. `beat` is what moves.
+/// All kinds of rows. `beat` is the value that changes.
 std::string display(const std::string& beat)
 {
     return propertyList(
@@ -49,7 +49,7 @@ protected:
         terminal.start("kestrum-terminal", {}, environment);
     }
 
-    /// The first display is on the screen.
+    /// Waits until the first display is on the screen.
     void startAndWait(std::map<std::string, std::string> changes = {})
     {
         serve();
@@ -77,7 +77,7 @@ protected:
             << title << "\n"
             << terminal.text();
     }
-    /// A frame may come in pieces: what a row is to show is waited for, too.
+    /// A frame may arrive in pieces, so the test also waits for the row's contents.
     void expectRow(int row, const testing::Matcher<std::string>& matcher)
     {
         terminal.waitUntil([&] { return matcher.Matches(terminal.row(row)); });
@@ -93,7 +93,7 @@ protected:
         const int row = terminal.rowOf(text);
         terminal.click(row, static_cast<int>(terminal.row(row).find(text)));
     }
-    /// Rows have been drawn anew from later data.
+    /// Waits until rows were drawn again from later data.
     void expectRefresh()
     {
         const auto updated = terminal.row(23);
@@ -166,7 +166,7 @@ TEST_F(Terminal, ScrollsALongRowSideways)
     expectRow(7, EndsWith("eighty columns"));
     const auto furthest = terminal.row(7);
     expectRefresh();
-    expectRow(7, furthest); // a refresh moves nothing
+    expectRow(7, furthest); // a refresh does not scroll
     terminal.type("<<<<<<<<<");
     expectRow(7, StartsWith(" A key"));
 }
@@ -187,7 +187,7 @@ TEST_F(Terminal, OpensRowsAndGoesBackWithArrows)
     terminal.press(Key::Escape);
     expectChosen("Neighbours");
     terminal.press(Key::Backspace);
-    expectChosen("Neighbours"); // there is nothing behind the root
+    expectChosen("Neighbours"); // the root pane has no pane behind it
 }
 
 TEST_F(Terminal, OpensRowsAndGoesBackWithLetters)
@@ -254,7 +254,7 @@ TEST_F(Terminal, JumpsToARowByItsName)
     terminal.press(Key::Enter);
     expectShown("? help");
     expectChosen("Cell 37");
-    terminal.type("n"); // the next one, round the end: the same
+    terminal.type("n"); // the next match, after the last row: the same row
     expectChosen("Cell 37");
 }
 
@@ -267,7 +267,7 @@ TEST_F(Terminal, ComesBackFromAJumpThatFindsNothing)
     terminal.press(Key::Escape);
     expectGone("no such row");
     expectChosen("Cell 00");
-    expectTitle("Kestrum › Neighbours"); // Escape ended the jump alone
+    expectTitle("Kestrum › Neighbours"); // Escape ended only the search
 }
 
 TEST_F(Terminal, KeepsChoiceAndPlaceThroughARefresh)
@@ -288,10 +288,10 @@ TEST_F(Terminal, SendsOnlyWhatChanged)
     startAndWait();
     terminal.type("jl");
     expectTitle("Kestrum › Neighbours");
-    expectRefresh(); // by then the pane has been drawn to its end
+    expectRefresh(); // by then the pane is drawn completely
     terminal.forgetWritten();
     expectRefresh();
-    // Two digits of the time, and where they stand.
+    // Two digits of the time, and their position.
     EXPECT_LT(terminal.written().size(), 100u) << terminal.written();
     EXPECT_EQ(terminal.written().find("dBm"), std::string::npos);
 }
@@ -306,7 +306,7 @@ TEST_F(Terminal, FollowsTheMouse)
     expectRow(1, StartsWith(" Cell 03"));
     terminal.turnWheel(false);
     expectChosen("Cell 00");
-    terminal.click(0, 3); // the title goes back
+    terminal.click(0, 3); // the title line goes back
     expectTitle("Kestrum");
     expectShown("Serving Cell");
     clickOn("? help");
@@ -378,7 +378,7 @@ TEST_F(Terminal, SaysThatTheServiceIsGoneAndGoesOnWhenItIsBack)
     expectChosen("Beat");
     device.killService();
     expectShown("Connecting...");
-    EXPECT_TRUE(terminal.shows("Serving Cell")); // what was known stays
+    EXPECT_TRUE(terminal.shows("Serving Cell")); // the last known values stay
     device.restartService();
     expectShown("Updated 20");
     expectRefresh();
@@ -408,7 +408,7 @@ TEST_F(Terminal, ShowsTheValueOfARowThatOpenedBefore)
     expectRow(1, " Changing" + std::string(55, ' ') + "has a value now");
 }
 
-/// A pane whose rows come and go: `rows` are shown one after the other.
+/// A pane whose rows change: `rows` are shown one after the other.
 class TerminalRows : public Terminal {
 protected:
     static std::string list(const std::vector<std::string>& names)
@@ -596,7 +596,8 @@ TEST_F(TerminalSave, StaysOverPanesThatGo)
     expectTitle("Kestrum › Top › Middle");
     terminal.type("s");
     expectShown("Save Snapshot");
-    // Another display shows the third: this one has had the second, and has no pane left under the sheet but the root.
+    // A second display client shows the third message: the display under test has had the second, and only the root
+    // pane is left under its sheet.
     Pseudoterminal other(24, 80);
     other.start("kestrum-terminal", {}, device.environment());
     EXPECT_TRUE(other.waitFor("third")) << other.text();
@@ -610,7 +611,7 @@ TEST_F(TerminalSave, StaysOverPanesThatGo)
 TEST_F(TerminalSave, IsLeftWithEscape)
 {
     open();
-    terminal.type("q"); // a letter like any other
+    terminal.type("q"); // typed like any other letter
     terminal.press(Key::Escape);
     expectGone("Save Snapshot");
     expectShown("Serving Cell");
@@ -691,7 +692,7 @@ class TerminalCrash : public Terminal, public testing::WithParamInterface<int> {
 TEST_P(TerminalCrash, GivesTheTerminalBackAndEndsWithItsSignal)
 {
     const auto before = terminal.modes();
-    // A sanitizer's own handlers would make it another end.
+    // A sanitizer's handlers would end the program in another way.
     const std::string none = "handle_segv=0:handle_abort=0:handle_sigbus=0:handle_sigfpe=0:handle_sigill=0";
     startAndWait({{"ASAN_OPTIONS", none}, {"UBSAN_OPTIONS", none}});
     terminal.signal(GetParam());
@@ -771,7 +772,7 @@ bool setsColour(const std::string& written)
 TEST_F(Terminal, UsesTheTerminalsColours)
 {
     startAndWait();
-    EXPECT_TRUE(terminal.isColoured(2, 78)); // the mark of a row that opens
+    EXPECT_TRUE(terminal.isColoured(2, 78)); // the mark of a row that opens a pane
     EXPECT_FALSE(terminal.isColoured(2, 1));
     EXPECT_TRUE(setsColour(terminal.written()));
 }

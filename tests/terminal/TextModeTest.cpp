@@ -25,7 +25,7 @@ struct Outcome {
     std::string output, errors;
 };
 
-/// What a shell's command writes to standard output, and its status.
+/// The standard output and the exit status of a shell command.
 Outcome runShell(const std::string& shell)
 {
     Outcome outcome{};
@@ -38,13 +38,13 @@ Outcome runShell(const std::string& shell)
 
 std::string command(const Demonstration& device, const std::string& arguments)
 {
-    std::string command = "env --default-signal=PIPE"; // whatever runs the tests may ignore it
+    std::string command = "env --default-signal=PIPE"; // the process that runs the tests may ignore it
     for (const auto& [name, value] : device.environment())
         command += " " + name + "='" + value + "'";
     return command + " '" + builtProgram("kestrum-terminal") + "' " + arguments + " </dev/null";
 }
 
-/// The program between pipes, with neither terminal nor display server.
+/// The program with pipes for its standard streams, without a terminal or display server.
 Outcome run(const Demonstration& device, const std::string& arguments)
 {
     auto outcome = runShell(command(device, arguments) + " 2>&1 >/dev/null");
@@ -131,7 +131,7 @@ TEST(TextMode, EndsQuietlyWhenItsReaderHasGone)
 {
     Demonstration device;
     device.serve({kDisplay});
-    // The pipe's reader has gone before the first tree is written.
+    // The pipe's reader closes it before the first tree is written.
     const auto outcome = runShell("{ { " + command(device, "--text 1000") + "; echo $? >&3; } 2>&3 | true; } 3>&1");
     EXPECT_EQ(outcome.output, "0\n");
     EXPECT_EQ(device.displaysSockets(), 0u);
@@ -153,7 +153,7 @@ TEST(TextMode, LeavesNoSocketBehindWhateverEndsIt)
     }
 }
 
-/// The display as text on a virtual clock. The test is the telephony service.
+/// The display as text, with a virtual clock. The test is the telephony service.
 class PatientText : public testing::Test, protected MonitorDoubles {
 protected:
     PatientText()

@@ -35,7 +35,7 @@ TEST_F(TerminalText, ReplacesWhatWouldSteerATerminal)
 {
     EXPECT_EQ(harmless("a\xC2\x9B"
                        "31m"),
-              "a\uFFFD31m"); // U+009B begins a sequence as ESC [ does
+              "a\uFFFD31m"); // U+009B begins a control sequence, as ESC [ does
     EXPECT_EQ(harmless("\u202Eabc\u202C"), "\uFFFDabc\uFFFD");
     EXPECT_EQ(harmless("\u2067abc"), "\uFFFDabc");
 }
@@ -43,8 +43,8 @@ TEST_F(TerminalText, ReplacesWhatWouldSteerATerminal)
 TEST_F(TerminalText, ReplacesEachByteThatIsNoUtf8)
 {
     EXPECT_EQ(harmless("a\xFFz"), "a\uFFFDz");
-    EXPECT_EQ(harmless("\xE6\xBC"), "\uFFFD\uFFFD"); // a character that ends too early
-    EXPECT_EQ(harmless("\xC0\xAF"), "\uFFFD\uFFFD"); // a slash in too many bytes
+    EXPECT_EQ(harmless("\xE6\xBC"), "\uFFFD\uFFFD"); // an incomplete character
+    EXPECT_EQ(harmless("\xC0\xAF"), "\uFFFD\uFFFD"); // a slash in an overlong encoding
 }
 
 TEST_F(TerminalText, HoldsAMarkWithoutALetter)
@@ -65,7 +65,7 @@ TEST_F(TerminalText, DropsMarksThatNoCellCanHold)
     EXPECT_FALSE(glyphs.next());
 }
 
-/// Megabytes of text of which only the first page may be looked at.
+/// Megabytes of text, of which only the first page may be read.
 class MostlyForbiddenText {
 public:
     MostlyForbiddenText()

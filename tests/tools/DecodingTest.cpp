@@ -50,7 +50,7 @@ TEST_P(HeadersAlone, AreTooShortForEveryCode)
     }
 }
 
-// Without 0xD0E0: short ones are decoded too.
+// Without 0xD0E0, whose short records are decoded too.
 INSTANTIATE_TEST_SUITE_P(
     Technologies, HeadersAlone,
     testing::Values(Codes{"Cdma",

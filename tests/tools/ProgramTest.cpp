@@ -397,7 +397,7 @@ TEST_F(ProgramTest, ATerminalIsShownNoControlCharacters)
     }
 }
 
-// Ten times as many keys may cost more than ten times as much, but not nearly a hundred times.
+// Ten times as many keys may take more than ten times as long, but much less than a hundred times.
 TEST_F(ProgramTest, KeysThatVanishCostNoMoreThanTheyAreMany)
 {
     const auto seconds = [&](int keys, const char* format) {
@@ -419,7 +419,7 @@ TEST_F(ProgramTest, KeysThatVanishCostNoMoreThanTheyAreMany)
         EXPECT_LE(seconds(50'000, format), 45 * seconds(5'000, format) + 0.5) << format;
 }
 
-// Far more than any buffer goes through a pipe; what the process ever held is asked of the system.
+// The pipe carries far more than any buffer holds. The system reports the process's peak memory.
 TEST_F(ProgramTest, MemoryDoesNotGrowWithTheCapture)
 {
     std::string piece;

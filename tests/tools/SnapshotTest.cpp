@@ -22,7 +22,7 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::StartsWith;
 
-/// What the save screen writes.
+/// The contents that the save screen writes.
 DictionaryRef snapshotOf(const Value& contents)
 {
     return makeDictionary(
@@ -87,7 +87,7 @@ Recovered recovered(const Value& snapshot)
 
 class RoundTrip : public testing::TestWithParam<std::string> {
 protected:
-    /// As the program reads it from the disk.
+    /// As the program reads it from disk.
     Value reread(const DictionaryRef& snapshot) const
     {
         EXPECT_EQ(codec.write(*snapshot, scratch.file("a.kestrum")), PropertyLists::Stored::Written);
@@ -114,7 +114,7 @@ TEST_P(RoundTrip, TheDlfStreamAloneHoldsEveryRecordToo)
     auto contents = live.saved()->at("Data").array();
     const auto dlf = contents->back().dictionary();
     if (!dlf->contains("DLF"))
-        return; // An IFX modem has none.
+        return; // an IFX modem has no raw records
     const auto whole = recovered(live.saved());
     const auto offline = recovered(reread(snapshotOf(makeArray({dlf}))));
     EXPECT_THAT(offline.faults, IsEmpty());

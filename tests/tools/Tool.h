@@ -34,7 +34,7 @@ inline void writeFile(const std::string& path, std::string_view contents, std::i
         throw std::runtime_error(path + " cannot be written");
 }
 
-/// kestrum-decode as a process, with pipes on all its ends.
+/// kestrum-decode as a process, with pipes for its standard streams.
 class Tool {
 public:
     explicit Tool(std::vector<std::string> arguments)
@@ -75,7 +75,7 @@ public:
     Tool(const Tool&) = delete;
     Tool& operator=(const Tool&) = delete;
 
-    /// False when the tool reads no more.
+    /// False when the tool has closed its input.
     bool write(std::string_view text)
     {
         while (!text.empty()) {
@@ -91,13 +91,13 @@ public:
     void signal(int number) const { ::kill(_process, number); }
     ::pid_t process() const { return _process; }
 
-    /// Waits for the next line, which is given without its end.
+    /// Waits for the next line, and returns it without its line end.
     std::string line() { return lineOf(_out); }
-    /// The same of what goes to standard error.
+    /// The same for standard error.
     std::string remark() { return lineOf(_error); }
     std::string output() { return rest(_out); }
     std::string remarks() { return rest(_error); }
-    /// The exit status; 128 and the signal when one ended it.
+    /// The exit status; 128 plus the signal's number when a signal ended it.
     int status()
     {
         int status = 0;
@@ -136,7 +136,7 @@ struct Ran {
     std::string output, remarks;
 };
 
-/// Runs it to its end. Its remarks are few enough for a pipe to hold.
+/// Runs it to its end. Its remarks must fit into a pipe's buffer.
 inline Ran run(std::vector<std::string> arguments, std::string_view input = {})
 {
     Tool tool(std::move(arguments));

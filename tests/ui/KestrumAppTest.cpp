@@ -19,7 +19,7 @@ Value cell(const char* rssi)
     return ServedModem::cell(rssi);
 }
 
-/// The application on its doubles.
+/// The application with doubles of its roles.
 class KestrumAppTest : public testing::Test {
 protected:
     void TearDown() override { EXPECT_THAT(doubles.toolkit.record.faults, IsEmpty()); }
@@ -155,7 +155,7 @@ TEST_F(KestrumAppTest, PaneThatIsOpenedOrRevealedShowsTheStatusOfTheMoment)
     EXPECT_TRUE(top().isLoading());
 }
 
-// A connection that does not come
+// A connection that cannot be made
 
 TEST_F(KestrumAppTest, RootPaneSaysAfterTenSecondsWhatItWaitsFor)
 {
@@ -188,7 +188,7 @@ TEST_F(KestrumAppTest, LostConnectionIsWaitedForTenSecondsAnew)
     launchConnected();
     doubles.queue.advance(60s);
     modem.kill();
-    doubles.queue.advance(2s); // the refresh that finds it
+    doubles.queue.advance(2s); // the refresh that reads it
     doubles.queue.advance(9999ms);
     EXPECT_EQ(top().hint, "");
     doubles.queue.advance(1ms);
@@ -582,7 +582,7 @@ TEST_F(KestrumAppSaveTest, TerminationKeepsItsOrder)
         EXPECT_EQ(app->updateMessage(), std::nullopt);
         EXPECT_EQ(app->saveViewController(), nullptr);
         EXPECT_NE(app->window(), nullptr);
-        // The model is still there: it answers for the status.
+        // The model still exists, because it provides the status.
         app->updateStatus();
         EXPECT_FALSE(top().isLoading());
     };
@@ -596,7 +596,7 @@ TEST_F(KestrumAppSaveTest, TerminationKeepsItsOrder)
     app->updateStatus();
     EXPECT_TRUE(top().isLoading()) << "no model any more";
 
-    // What the properties never held is left alone.
+    // Only what is in the properties is cleaned up.
     EXPECT_EQ(doubles.toolkit.record.windows, 1);
     EXPECT_FALSE(doubles.toolkit.window->visible);
     EXPECT_NE(navigation().presented, nullptr);

@@ -27,7 +27,7 @@ protected:
     {
         return KestrumCell::initWithStyle(toolkit, table, CellStyle::KeyAndDetail, kIdentifier);
     }
-    /// A leaf's row of the given width, laid out; the numbers are the texts' lengths.
+    /// A leaf's row of the given width after its layout. The numbers are the texts' lengths.
     const RecordingCell& leaf(double width, std::size_t key, std::size_t value)
     {
         toolkit.record.tableWidth = width;

@@ -46,7 +46,7 @@ TEST_F(KestrumPaneControllerTest, RowsAreLaidOutInTheTablesWidth)
 {
     toolkit.record.tableWidth = 320;
     start(mixed());
-    // "Serving Cell" beside its mark, "State" 45 wide, "Idle" 36 wide in bold.
+    // "Serving Cell" and its mark, "State" 45 wide, "Idle" 36 wide in bold.
     EXPECT_EQ(top().rows.row(0).key()->frame(), (Rect{10, 13, 108, 18}));
     EXPECT_EQ(top().rows.row(1).key()->frame(), (Rect{10, 13, 45, 18}));
     EXPECT_EQ(top().rows.row(1).value()->frame(), (Rect{284, 13, 36, 18}));
@@ -149,7 +149,7 @@ TEST_F(KestrumPaneControllerTest, RowThatIsGoneIsDrawnBlank)
     start(mixed());
     auto& controller = stack->topViewController();
     controller.reloadWithNode(nullptr);
-    // A table that has not heard of the new node yet still asks.
+    // A table that has not been told of the new node may still ask.
     struct OneMore final : TableDataSource {
         explicit OneMore(TableDataSource& of) : source(of) {}
         std::size_t numberOfRowsInSection(TableView&, std::size_t) override { return 1; }

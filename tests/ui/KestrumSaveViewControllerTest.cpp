@@ -15,7 +15,7 @@ using namespace std::chrono_literals;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-// 2026-11-16 06:05:42 UTC, when the screen is opened.
+// 2026-11-16 06:05:42 UTC, the time at which the screen is opened.
 constexpr const char* kFirstPath = "/logs/KestrumSnapshot-1794809142.kestrum";
 
 Value entry(const char* description)

@@ -16,7 +16,7 @@
 
 namespace kestrum {
 
-/// An application that only counts what its screens ask for.
+/// An application that only counts the requests of its screens.
 class CountingApplication final : public SharedApplication {
 public:
     bool allowSaveButton() const override { return allowed; }
@@ -40,7 +40,7 @@ inline Node inner(std::string name, std::vector<Node> children = {})
     return std::make_shared<KestrumModelTreeNode>(std::move(name), std::move(children));
 }
 
-/// A stack of panes without an application behind it.
+/// A stack of panes without an application.
 class Panes : public testing::Test {
 protected:
     void TearDown() override { EXPECT_THAT(toolkit.record.faults, testing::IsEmpty()); }

@@ -9,12 +9,12 @@
 
 namespace kestrum {
 
-/// The telephony service and its IFX modem, on the doubles of the monitor: the test brings them up and down.
+/// The telephony service and its IFX modem on the monitor's doubles. The test starts and stops them.
 class ServedModem {
 public:
     static constexpr const char* kCommands = "vox.commands";
 
-    /// `lists` are those of the application's roles.
+    /// `lists` are the property lists of the application's roles.
     ServedModem(MonitorDoubles& doubles, PropertyLists& lists) : _doubles(doubles), _lists(lists) {}
 
     void serve(std::string_view technology = kVoxLogChannelTechnology_IFX)
@@ -27,12 +27,12 @@ public:
     }
     void kill() { _doubles.ports.kill(kCommands); }
 
-    /// A message that holds the whole display. False when nothing listens.
+    /// Sends a message with the whole display. False when no port listens.
     bool send(const Value& display)
     {
         return _doubles.ports.send(std::string(kLogChannelServiceName), 0, textOf(wired(display).bytes()));
     }
-    /// The same, and the refresh that finds it.
+    /// The same, followed by the refresh that reads it.
     bool show(const Value& display)
     {
         using namespace std::chrono_literals;
@@ -41,7 +41,7 @@ public:
         return sent;
     }
 
-    /// Two entries at least, so that the modem's wrapper dictionaries do not matter.
+    /// At least two entries, so that they are not taken for one of the modem's wrapper dictionaries.
     static Value cell(const char* rssi)
     {
         return makeDictionary({{"RSSI", rssi}, {"Band", makeDictionary({{"Now", "3"}, {"Before", "8"}})}});
@@ -50,7 +50,7 @@ public:
 private:
     Data wired(const Value& list)
     {
-        _doubles.propertyLists.parsed[describe(list)] = list; // where they are doubled
+        _doubles.propertyLists.parsed[describe(list)] = list; // needed by doubles of the property lists
         return _lists.toXml(list).value();
     }
 
@@ -58,7 +58,7 @@ private:
     PropertyLists& _lists;
 };
 
-/// What Save needs: the marker of an internal installation.
+/// The precondition of Save: the marker of an internal installation.
 inline constexpr const char* kInternalInstall = "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 
 } // namespace kestrum

@@ -78,7 +78,7 @@ TEST(Outbox, DropsTheOldestWholeMessagesAtItsBoundAndCountsThem)
     for (int i = 0; i < 10; ++i)
         outbox.add(message(std::string(200, static_cast<char>('0' + i))));
     EXPECT_LE(outbox.held(), 1000u);
-    EXPECT_EQ(outbox.dropped(), 7u); // 3 messages of 200 bytes and what keeping each costs
+    EXPECT_EQ(outbox.dropped(), 7u); // 3 messages of 200 bytes and their overhead stay
     for (const char each : {'7', '8', '9'})
         EXPECT_EQ(take(outbox), std::string(200, each));
     EXPECT_EQ(take(outbox), "nothing");

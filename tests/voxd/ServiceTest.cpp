@@ -50,17 +50,17 @@ std::string kcap(const std::vector<std::string>& messages)
     return bytes;
 }
 
-/// The service's reply to a request for a log channel that it does not open.
+/// The service's reply to a request for a log channel that it refuses.
 std::string refusal(std::uint32_t serial, std::uint32_t code)
 {
     return frame(kReply, 1, serial, little(1, 4) + little(code, 4));
 }
 constexpr std::size_t kRefusalSize = 13 + 8;
 
-/// The real program, and clients of it in this process.
+/// The real program, and its clients in this process.
 class ServiceTest : public testing::Test {
 protected:
-    /// voxd in a process of its own, in the test's runtime directory.
+    /// voxd in a separate process, in the test's runtime directory.
     struct Voxd {
         QProcess process;
         std::string errors;
@@ -69,7 +69,7 @@ protected:
         {
             auto environment = QProcessEnvironment::systemEnvironment();
             environment.insert("KESTRUM_RUNTIME_DIR", QString::fromStdString(directory));
-            // Its memory is measured, and freed memory that the address sanitizer keeps is none of it.
+            // The test measures its memory, which must not include freed memory that the address sanitizer keeps.
             environment.insert("ASAN_OPTIONS", environment.value("ASAN_OPTIONS") + ":quarantine_size_mb=1");
             process.setProcessEnvironment(environment);
         }
@@ -82,7 +82,7 @@ protected:
         {
             process.start(QString::fromStdString(builtProgram("voxd")), arguments);
         }
-        /// Until it takes connections.
+        /// Waits until it accepts connections.
         bool start(const QStringList& arguments)
         {
             launch(arguments);
@@ -103,7 +103,7 @@ protected:
             EXPECT_EQ(process.exitStatus(), QProcess::NormalExit);
             return process.exitCode();
         }
-        /// Bytes of memory that are really there.
+        /// Bytes of resident memory.
         std::size_t memory() const
         {
             std::ifstream file("/proc/" + std::to_string(process.processId()) + "/statm");
@@ -113,7 +113,7 @@ protected:
         }
     };
 
-    /// A display's side of a channel.
+    /// The display's end of a channel.
     struct Client {
         ServiceTest& test;
         std::string name;
@@ -180,7 +180,7 @@ protected:
         return names;
     }
 
-    /// Asks for a channel to a port that the test plays itself, the service's `number`th: where its commands go.
+    /// Requests a channel to a port that the test serves, the service's `number`th, and returns its command port.
     RawSocket openChannel(const std::string& address, int number) const
     {
         const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
@@ -221,7 +221,7 @@ TEST_F(ServiceTest, StreamsNothingBeforeTheStartCommandAndLosesNothingUntilThen)
     ASSERT_TRUE(voxd.start(replay(capture({record(0xB0C2, "1"), record(0xB0C2, "2")}), {"--speed", "1000"})));
     Client client{*this, "log"};
     client.open();
-    for (int i = 0; i < 20; ++i) // each a round trip through the service's event loop
+    for (int i = 0; i < 20; ++i) // each one a round trip through the service's event loop
         EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_Zephra_LTE");
     EXPECT_THAT(client.received, IsEmpty());
     client.startStreaming();
@@ -255,7 +255,7 @@ TEST_F(ServiceTest, StopsWhenAskedForAnotherState)
     client.startStreaming();
     ASSERT_TRUE(client.hasReceived(5));
     client.send(makeDictionary({{"SetState", Value("Idle")}}));
-    client.technology(); // what was on its way has come when this is answered, or comes in the next loop
+    client.technology(); // earlier messages have arrived when this is answered, or arrive in the next round of the loop
     ASSERT_TRUE(eventually([&, before = std::size_t{0}]() mutable {
         client.technology();
         return std::exchange(before, client.received.size()) == client.received.size();
@@ -276,7 +276,7 @@ TEST_F(ServiceTest, ServesSeveralClientsTheSameLog)
     ASSERT_TRUE(eventually([&] { return std::ranges::count(one.received, two.received[4]) == 1; }));
     const auto at = std::ranges::find(one.received, two.received[0]);
     EXPECT_TRUE(std::equal(two.received.begin(), two.received.begin() + 5, at));
-    one.remote.reset(); // one's end is not two's
+    one.remote.reset(); // closing the first channel must not close the second
     const auto before = two.received.size();
     EXPECT_TRUE(two.hasReceived(before + 5));
 }
@@ -301,7 +301,7 @@ TEST_F(ServiceTest, EndsAChannelWhoseClientHasGoneAndGoesOnForTheNext)
     second.open();
     second.startStreaming();
     ASSERT_TRUE(second.hasReceived(3));
-    // The log stood still between the two.
+    // The log did not advance between the two.
     EXPECT_LT(std::ranges::find(messages, second.received[0]) - messages.begin(),
               static_cast<std::ptrdiff_t>(seen) + 10);
 }
@@ -381,7 +381,7 @@ TEST_F(ServiceTest, KilledItTakesItsPortsWithItAndComesBackOverWhatItLeft)
     voxd.process.kill();
     ASSERT_TRUE(eventually([&] { return !client.remote->isValid(); }));
     EXPECT_TRUE(client.local->isValid());
-    // Its sockets are closed one after the other; all are when it is gone.
+    // Its sockets are closed one after the other. All of them are closed after its end.
     ASSERT_TRUE(eventually([&] { return voxd.process.state() == QProcess::NotRunning; }));
     EXPECT_FALSE(telephony.connect({}));
     EXPECT_THAT(sockets(), testing::Contains("org.kestrum.vox")) << "killed, it could not remove it";
@@ -501,7 +501,7 @@ TEST_F(ServiceTest, AListenerThatAcceptsNobodyStopsItsOwnClientAlone)
         for (std::uint32_t serial = 1; serial <= 10; ++serial)
             askers.back().send(frame(kRequest, 1, serial, "full.1"));
     }
-    // Each of those requests takes a second, during which the others are served.
+    // Each of those requests takes a second. The others are served during that time.
     Client client{*this, "log"};
     EXPECT_EQ(client.open().errorCode, 0);
     client.startStreaming();
@@ -538,7 +538,7 @@ TEST_F(ServiceTest, RepliesThatAreNotReadCostBoundedMemory)
         std::string requests;
         for (int i = 0; i < 2000; ++i)
             requests += request;
-        // Until the service takes no more, which is proven by answers to another client.
+        // Until the service takes no more, which its answers to another client prove.
         std::size_t sent = 0;
         for (int refused = 0; refused < 20;) {
             const auto n = socket.sendSome(std::string_view(requests).substr(sent % requests.size()));
@@ -598,7 +598,7 @@ TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndNobodyElse)
     std::vector<std::string> messages;
     for (int i = 0; i < 100; ++i)
         messages.push_back(record(0xB0C2, std::string(20'000, static_cast<char>('a' + i % 26))));
-    // 0.5 s of nominal spacing in 5 µs: some 200,000 messages a second, were they taken.
+    // The nominal spacing of 0.5 s becomes 5 µs: about 200,000 messages per second, if they were read.
     ASSERT_TRUE(voxd.start(replay(capture(messages), {"--loop", "--speed", "100000"})));
     const auto receiving = RawSocket::listenAt(directory / "deaf.1");
     const auto command = openChannel("deaf.1", 1);
@@ -615,7 +615,7 @@ TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndNobodyElse)
         ASSERT_EQ(each.size(), 20'013u) << "messages are dropped whole";
     EXPECT_LT(voxd.memory(), std::size_t{100} << 20);
 
-    // Reading again, it is told what it has missed, and so is the service's log.
+    // When it reads again, the service reports the lost messages to it, and in the service's log.
     const auto deaf = receiving.accept();
     client.send(makeDictionary({{"SetState", Value("Idle")}}));
     command.send(frame(kMessage, 0, 0, textOf(lists.toXml(makeDictionary({{"SetState", Value("Idle")}}))->bytes())));
@@ -644,7 +644,7 @@ TEST_F(ServiceTest, ItsRecordingHoldsAllAndNotesWhatAClientMissed)
 {
     const auto recording = files / "recording.kcap";
     const std::vector<std::string> messages(100, record(0xB0C2, std::string(20'000, 'r')));
-    // 0.5 s of nominal spacing, 4,000 times as fast: 160 MB a second.
+    // The nominal spacing of 0.5 s, 4,000 times as fast: 160 MB per second.
     ASSERT_TRUE(voxd.start(
         replay(capture(messages), {"--loop", "--speed", "4000", "--record", QString::fromStdString(recording)})));
     const auto receiving = RawSocket::listenAt(directory / "deaf.1");

@@ -205,7 +205,7 @@ TEST(Scenarios, HaveOneMakerPerName)
     EXPECT_FALSE(makeScenario("no such drive", {1, kStart, kLists}));
 }
 
-/// What an hour's drive has shown.
+/// The values that an hour's drive has shown.
 class IfxDrive : public testing::Test {
 protected:
     static void visit(const Value& value, const std::string& path)

@@ -115,7 +115,7 @@ TEST_F(GsmDrive, StatesFollowTheTraffic)
             contextsCame |= contexts->size() == 2;
             contextsWent |= contextsCame && contexts->size() == 1;
         }
-        // A channel is ciphered, and nothing else is.
+        // Only a channel is ciphered.
         if (run.code == 0x4157) {
             const auto state = at("UMTS RR Info", "RRC State");
             EXPECT_EQ(at("UMTS RR Info", "Ciphering") == "Enabled", state != "Disconnected" && state != "Connecting");

@@ -41,7 +41,7 @@ TEST_F(LteDrive, AllRecordsNameTheSameServingCell)
     EXPECT_GT(compared, 3000);
 }
 
-// A cell monitor report tells the cell's identity again, in its own way.
+// A cell monitor report also gives the cell's identity, in another form.
 TEST_F(LteDrive, CellMonitorAgreesWithTheModem)
 {
     std::string area, identity, band;

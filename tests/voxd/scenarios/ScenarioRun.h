@@ -22,7 +22,7 @@
 
 namespace kestrum {
 
-/// How often each error was logged; all other lines are let go, for a drive writes millions.
+/// The number of times each error was logged. All other lines are dropped, because a drive writes millions.
 class ErrorCounts final : public SystemLog {
 public:
     void write(Priority priority, std::string_view text) override
@@ -35,7 +35,7 @@ public:
     std::map<std::string, int> counts;
 };
 
-/// A console that nobody reads: one technology shows its whole display there.
+/// A console without output: one technology prints its whole display there.
 class SilentConsole final : public Console {
 public:
     void printLine(std::string_view) override {}
@@ -43,7 +43,7 @@ public:
     bool isDebugWatched() const override { return false; }
 };
 
-/// A scenario on its way through the real generators, on the templates that ship with the program.
+/// A scenario running through the real generators, on the templates that ship with the program.
 class ScenarioRun {
 public:
     static inline PropertyListCodec kLists = PropertyListCodec();
@@ -56,7 +56,7 @@ public:
             bundle.paths.push_back(inCheckout("resources/").append(name).append(".plist"));
     }
 
-    /// Decodes the next message. The generator changes with the technology, as when a display connects again.
+    /// Decodes the next message. The generator changes with the technology, as when a display reconnects.
     const Source::Message& decodeNext()
     {
         auto next = source->next();
@@ -71,7 +71,7 @@ public:
         return message;
     }
 
-    /// Decodes for so long, calling `after` behind every message, and refreshes every 2 s as the display does.
+    /// Decodes for that time, calls `after` after every message, and refreshes every 2 s as the display does.
     void decodeFor(
         std::chrono::microseconds time, const std::function<void()>& after = [] {})
     {
@@ -103,7 +103,7 @@ public:
 };
 
 /// Calls `seen` for each text of the tree with its path: dictionary keys joined by "/", "[]" for a row of a list. An
-/// empty list is an empty text. Values that are no text are shown as `describe` shows them.
+/// empty list counts as an empty text. Other values are shown as `describe` shows them.
 inline void eachText(const Value& node, const std::string& path,
                      const std::function<void(const std::string& path, const std::string& text)>& seen)
 {
@@ -121,7 +121,7 @@ inline void eachText(const Value& node, const std::string& path,
     }
 }
 
-/// The value under a key, wherever in the tree it stands; null when there is none.
+/// The value under a key, anywhere in the tree; null when there is none.
 inline Value nodeNamed(std::string_view name, const Value& tree)
 {
     if (const auto dictionary = tree.dictionary()) {
@@ -134,7 +134,7 @@ inline Value nodeNamed(std::string_view name, const Value& tree)
     return {};
 }
 
-/// What a section shows under a key; empty when it shows nothing there.
+/// The text that a section shows under a key; empty when there is none.
 inline std::string textAt(const Value& tree, std::string_view section, std::string_view key)
 {
     const auto node = nodeNamed(section, tree).dictionary();

@@ -19,7 +19,7 @@ namespace {
 using namespace std::chrono;
 using namespace std::chrono_literals;
 
-/// The numbers that a key may show, wherever it stands.
+/// The numbers that a key may show, anywhere in the tree.
 struct Range {
     const char* key;
     double least, most;
@@ -51,7 +51,7 @@ protected:
     }
 };
 
-// Those whose display is one all the time.
+// Scenarios whose technology does not change.
 class OneTechnology : public Scenarios {};
 
 TEST_P(Scenarios, EqualSeedsGiveEqualBytes)
@@ -172,7 +172,7 @@ TEST_P(OneTechnology, EveryKeyOfTheDisplayShowsSomethingKnown)
     EXPECT_THAT(unknown, testing::IsEmpty());
     std::vector<std::string> blank;
     for (const auto& path : all)
-        // A list shows something through its rows.
+        // A list shows its texts in its rows.
         if (!shown.contains(path) &&
             std::ranges::none_of(shown, [&](const auto& row) { return row.starts_with(path + "[]"); }))
             blank.push_back(path);
@@ -216,8 +216,8 @@ TEST_P(Scenarios, DecodesWithoutErrors)
     for (const auto& [text, count] : run.log.counts) {
         const bool known =
             text.starts_with("Creating ") || text.starts_with("Created ") || text.starts_with("Class Index: ") ||
-            text == "Received an unknown log message: 45249"; // 0xB0C1 is read, and reported all the same
-        // What the cell monitor sometimes does not know.
+            text == "Received an unknown log message: 45249"; // 0xB0C1 is decoded, but reported nevertheless
+        // Numbers that the cell monitor sometimes does not know.
         const bool missing = text.find("Failed to retrieve ") != text.npos;
         EXPECT_TRUE(!missing || count < 400) << text << count;
         if (!known && !missing)
@@ -233,7 +233,7 @@ long residentPages()
     return resident;
 }
 
-// Hours of driving where the compiler optimises, else a part of them. A whole day is bench_scenarios' to drive.
+// Hours of driving in an optimised build, less in others. bench_scenarios drives a whole day.
 TEST_P(Scenarios, StayWithinBoundsOfMemoryForLong)
 {
 #ifdef NDEBUG
@@ -285,7 +285,7 @@ const std::vector<Range> kGsmRanges{
     {"ARFCN", 1, 124},
 };
 
-// Lists that no record fills, and those that records only empty.
+// Lists that no record fills, and lists that records only empty.
 const std::vector<std::string> kGsmEmpty{
     "2;UMTS/Detected Set",
     "2;UMTS/Monitored Set",
