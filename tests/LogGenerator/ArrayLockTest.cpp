@@ -35,7 +35,7 @@ TEST_F(ArrayLockCounts, NestedPairLocksTwiceAndUnlocksOnce)
     EXPECT_EQ(counts.unlocked, 1);
 }
 
-TEST_F(ArrayLockCounts, UseGoesOnAfterANestedPair)
+TEST_F(ArrayLockCounts, UseContinuesAfterANestedPair)
 {
     ArrayLock::lockArray();
     ArrayLock::lockArray();

@@ -28,7 +28,7 @@ TEST_F(ClassIndexOf, CodeOfTwoSectionsHasThemInTheirOrder)
     EXPECT_THAT(*subscribers, ElementsAre(index->getClass("Cell"), index->getClass("Neighbors")));
 }
 
-TEST_F(ClassIndexOf, CodeThatNobodyTakesHasNoSubscribers)
+TEST_F(ClassIndexOf, UnregisteredCodeHasNoSubscribers)
 {
     EXPECT_EQ(index->getSubscribers(0x4004), nullptr);
     EXPECT_EQ(index->getSubscribers(2), nullptr); // an extra code is registered only under its number plus 0xFF0000

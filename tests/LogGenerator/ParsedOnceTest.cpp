@@ -42,7 +42,7 @@ TEST(ParsedOnce, ReadsEqualBytesOnce)
     EXPECT_EQ(lists.parsed, 1);
 }
 
-TEST(ParsedOnce, ReadsOtherBytesAtTheSameAddressAnew)
+TEST(ParsedOnce, ParsesOtherBytesAtTheSameAddressAgain)
 {
     CountingLists lists;
     ParsedOnce once(lists);

@@ -30,7 +30,7 @@ protected:
     DictionaryRef built;
 };
 
-TEST_F(TakeOver, NextRecordShowsInTheDisplayThatStands)
+TEST_F(TakeOver, NextRecordIsShownInTheExistingDisplay)
 {
     sample::Generator next(doubles.roles);
     next.updateState(doubles.state, message(1, 0x4001, {8, 9}));
@@ -47,7 +47,7 @@ TEST_F(TakeOver, DisplayIsThereAtOnceWithItsOldValues)
     EXPECT_EQ(cellOf(shown), Value("7"));
 }
 
-TEST_F(TakeOver, HistoryGoesOn)
+TEST_F(TakeOver, HistoryContinues)
 {
     sample::Generator next(doubles.roles);
     next.generateLogUsingState(doubles.state);

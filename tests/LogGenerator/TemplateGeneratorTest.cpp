@@ -209,7 +209,7 @@ TEST_F(TemplateGenerator, SectionsOfACodeAreCalledInTheOrderOfTheirRegistration)
     EXPECT_THAT(sample::calls(), ElementsAre("Cell 16385 15", "Neighbors 16385 15"));
 }
 
-TEST_F(TemplateGenerator, CodeThatNobodyTakesCallsNoSection)
+TEST_F(TemplateGenerator, CodeWithoutSubscribersCallsNoSection)
 {
     generator->updateState(doubles.state, message(1, 0x4004));
     generator->updateState(doubles.state, message(1, 2));

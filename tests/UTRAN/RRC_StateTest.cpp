@@ -86,7 +86,7 @@ public:
     int lines = 0;
 };
 
-TEST(RRC_State, SpendsNothingOnAConsoleThatNobodyWatches)
+TEST(RRC_State, FormatsNothingForADisabledConsole)
 {
     DecodingDoubles doubles;
     UnwatchedConsole console;

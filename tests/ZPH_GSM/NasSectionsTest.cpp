@@ -186,7 +186,7 @@ TEST(EquivalentPLMNList, ReadsTheNextNetworkThreeBytesOn)
               R"({"Mobile Country Code": "468", "Mobile Network Code": "579"}])");
 }
 
-TEST(EquivalentPLMNList, ShowsWhatIsNoDigitAsTheSumItMakes)
+TEST(EquivalentPLMNList, ShowsInvalidDigitsAsTheirWeightedSum)
 {
     EXPECT_EQ(decodedList<EquivalentPLMNList>(equivalentPlmns(1, {255, 0, 255, 0, 255, 0})).text(),
               R"([{"Mobile Country Code": "28305", "Mobile Network Code": "0"}])");
@@ -242,7 +242,7 @@ TEST(PDPContextList, IsLeftAsItWasByADictionary)
     EXPECT_EQ(section.row(0)->at("APN"), "internet");
 }
 
-TEST(PDPContextList, SaysNothingOfARecordThatHoldsNoPropertyList)
+TEST(PDPContextList, LogsNothingForARecordWithoutAPropertyList)
 {
     auto section = decodedList<PDPContextList>(propertyListRecord(0xFF0002, makeArray({context("internet")})));
     section.log().lines.clear();

@@ -149,7 +149,7 @@ TEST_P(CellMonitorSection, LogsARecordThatHoldsNoArrayOfCells)
     }
 }
 
-TEST_P(CellMonitorSection, SaysNothingOfAnArrayWithoutCells)
+TEST_P(CellMonitorSection, LogsNothingForAnArrayWithoutCells)
 {
     SectionAtWork run(contractOf(GetParam()));
     const auto empty = cellMonitor({});

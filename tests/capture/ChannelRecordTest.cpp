@@ -49,7 +49,7 @@ struct Told {
 
 class Technology : public testing::TestWithParam<Told> {};
 
-TEST_P(Technology, IsToldByTheMessage)
+TEST_P(Technology, IsFoundInTheMessage)
 {
     EXPECT_EQ(technologyOf(bytesOf(GetParam().message)).value_or("none"), GetParam().technology);
 }

@@ -42,7 +42,7 @@ protected:
 using Worlds = testing::Types<MemoryWorld, LinuxWorld>;
 TYPED_TEST_SUITE(FilesContract, Worlds, DoubleOrAdapter);
 
-TYPED_TEST(FilesContract, WhatStandsThereExists)
+TYPED_TEST(FilesContract, ExistingFilesAreFound)
 {
     EXPECT_FALSE(this->world.files.exists("/marker"));
     this->world.layDownFile("/marker");

@@ -49,7 +49,7 @@ TYPED_TEST(MainQueueContract, ServesTheOthersInAWaitWithinATask)
     EXPECT_THAT(order, ElementsAre(1, 2, 3));
 }
 
-TYPED_TEST(MainQueueContract, RepeatsUntilTheTimerGoes)
+TYPED_TEST(MainQueueContract, RepeatsUntilTheTimerIsDestroyed)
 {
     int ticks = 0;
     auto timer = this->queue.repeat(5ms, [&] { ++ticks; });

@@ -160,7 +160,7 @@ TYPED_TEST(LocalPortContract, RunsItsInvalidationHandlerOnceAndLater)
     EXPECT_EQ(runs, 1);
 }
 
-TYPED_TEST(LocalPortContract, RunsNoHandlerThatWasRemovedOrWhosePortHasGone)
+TYPED_TEST(LocalPortContract, RunsNoHandlerThatWasRemovedOrWhosePortIsDestroyed)
 {
     auto port = this->makeListening();
     port->setInvalidationHandler([] { ADD_FAILURE() << "was removed"; });
@@ -204,7 +204,7 @@ TYPED_TEST(LocalPortContract, MayBeDestroyedInItsReceiveHandler)
     EXPECT_THAT(seen, ElementsAre("first"));
 }
 
-TYPED_TEST(LocalPortContract, HandsNothingOverOnceInvalid)
+TYPED_TEST(LocalPortContract, DeliversNothingAfterItsInvalidation)
 {
     const auto port = this->makeListening();
     this->world.send(0, "under way");
@@ -241,7 +241,7 @@ protected:
 };
 TYPED_TEST_SUITE(RemotePortContract, Worlds, DoubleOrAdapter);
 
-TYPED_TEST(RemotePortContract, IsNotMadeWhereNobodyListens)
+TYPED_TEST(RemotePortContract, IsNotCreatedWithoutAListener)
 {
     EXPECT_FALSE(this->world.ports.createRemote("nobody"));
     this->world.kill();

@@ -51,7 +51,7 @@ TYPED_TEST(PropertyListsContract, WhatIsParsedIsACopy)
     EXPECT_EQ(this->lists.parse(bytes->bytes()), Value(makeDictionary({{"a", 1}})));
 }
 
-TYPED_TEST(PropertyListsContract, NothingIsMadeOfNullOrOfWhatIsNoPropertyList)
+TYPED_TEST(PropertyListsContract, NullHasNoXmlFormAndInvalidListsReadAsNull)
 {
     EXPECT_FALSE(this->lists.toXml(Value()));
     EXPECT_TRUE(this->lists.parse(bytesOf("no list")).isNull());

@@ -95,7 +95,7 @@ protected:
 using Worlds = testing::Types<MemoryWorld, SocketWorld>;
 TYPED_TEST_SUITE(TelephonyServiceContract, Worlds, DoubleOrAdapter);
 
-TYPED_TEST(TelephonyServiceContract, CannotBeReachedOnceItHasGone)
+TYPED_TEST(TelephonyServiceContract, CannotBeReachedAfterItsEnd)
 {
     this->world.goAway();
     EXPECT_FALSE(this->connect());
@@ -170,7 +170,7 @@ TYPED_TEST(TelephonyServiceContract, NotificationsWaitForTheEndOfTheCall)
     EXPECT_TRUE(this->world.eventually([&] { return this->heard.size() == 1; }));
 }
 
-TYPED_TEST(TelephonyServiceContract, NothingIsHeardOnceTheConnectionHasGone)
+TYPED_TEST(TelephonyServiceContract, NoNotificationArrivesAfterTheConnectionEnds)
 {
     this->world.whenAsked([&] { this->world.notify("unheard"); });
     this->world.serve({0, 0, "port"}, 5ms);

@@ -136,7 +136,7 @@ TEST_F(Channel, ClosingLeavesGeneratorAndStateAlone)
     EXPECT_EQ(textAt("/RAT"), "GSM");
 }
 
-TEST_F(Channel, MessageUnderWayWhenTheChannelClosesIsLost)
+TEST_F(Channel, MessageOnItsWayIsLostWhenTheChannelCloses)
 {
     startRunning();
     propertyLists.parsed["list"] = display("GSM");
@@ -207,7 +207,7 @@ TEST_F(Channel, RestartWhileTheReplyIsAwaitedWithAnEarlierGeneratorFailsAtTheSta
     EXPECT_EQ(queue.tasks(), 1u); // the retry
 }
 
-TEST_F(Channel, ModelLetGoWhileTheReplyIsAwaitedEndsItsAttempt)
+TEST_F(Channel, ModelReleasedWhileTheReplyIsAwaitedEndsItsAttempt)
 {
     replyIs(makeDictionary({{"GetTechnology", "kVoxLogChannelTechnology_IFX"}}), std::chrono::milliseconds(500));
     whileAsked = [this] {
@@ -260,7 +260,7 @@ TEST_F(ChannelCreation, GivesUpOnASilentServiceAfterASecond)
     EXPECT_FALSE(ports.hasLocal(kLogPort));
 }
 
-TEST_F(ChannelCreation, IsInVainWhenTheChannelIsClosedMeanwhile)
+TEST_F(ChannelCreation, HasNoEffectWhenTheChannelWasClosedDuringIt)
 {
     inTheWait([this] { model->destroyPorts(); });
     model->startMonitor();
@@ -287,7 +287,7 @@ TEST_F(ChannelCreation, IsNotNestedByAStartAndEndedByARestart)
     EXPECT_EQ(queue.tasks(), 1u); // the retry
 }
 
-TEST_F(ChannelCreation, GoesOnWithAModelThatWasLetGo)
+TEST_F(ChannelCreation, ContinuesWithAModelThatWasReleased)
 {
     inTheWait([this] {
         model->setObserver(nullptr);
@@ -300,7 +300,7 @@ TEST_F(ChannelCreation, GoesOnWithAModelThatWasLetGo)
     EXPECT_FALSE(ports.hasLocal(kLogPort));
 }
 
-TEST_F(Channel, HearsNoNotificationSinceItsConnectionGoesWithTheCall)
+TEST_F(Channel, GetsNoNotificationBecauseItsConnectionEndsWithTheCall)
 {
     model->updateWithData(bytesOf("anything"));
     telephony.whileCreating = [this] { telephony.notify("any name"); };
@@ -346,7 +346,7 @@ TEST_F(Channel, CountsTheMessagesThatTheServiceDroppedAndTellsOnceForSeveral)
     EXPECT_EQ(model->lostMessages(), std::numeric_limits<std::uint64_t>::max()) << "does not wrap";
 }
 
-TEST_F(Channel, IgnoresALossThatSaysNothingAndMessagesOfOtherIds)
+TEST_F(Channel, IgnoresInvalidLossReportsAndMessagesOfOtherIds)
 {
     using namespace std::string_view_literals;
     startRunning();

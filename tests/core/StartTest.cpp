@@ -136,7 +136,7 @@ TEST_P(FailingStart, IsTriedAgainAfterFiveSeconds)
     EXPECT_EQ(queue.timers(), 1u);
 }
 
-TEST_P(FailingStart, IsTriedAgainForEver)
+TEST_P(FailingStart, IsRetriedWithoutLimit)
 {
     apply();
     model->startMonitor();
@@ -300,7 +300,7 @@ TEST_F(Start, AtMostOneRetryIsPending)
     EXPECT_EQ(queue.tasks(), 1u);
 }
 
-TEST_F(Start, DestroyedModelIsToldNothingAndTellsNothing)
+TEST_F(Start, DestroyedModelGetsAndSendsNoNotifications)
 {
     startRunning();
     stream(makeDictionary({{"RAT", "GSM"}}));
@@ -311,7 +311,7 @@ TEST_F(Start, DestroyedModelIsToldNothingAndTellsNothing)
     EXPECT_THAT(told, IsEmpty());
 }
 
-TEST_F(Start, ObserverThatTookItselfOutIsToldNothing)
+TEST_F(Start, RemovedObserverGetsNoNotifications)
 {
     model->startMonitor();
     model->setObserver(nullptr);
@@ -366,7 +366,7 @@ TEST_F(Reconfigured, UnknownTechnologyTakesTheGeneratorAway)
     EXPECT_EQ(model->getSaveContents(), nullptr);
 }
 
-TEST_F(Reconfigured, RestartKeepsTheStateAndMakesTheGeneratorAnew)
+TEST_F(Reconfigured, RestartKeepsTheStateAndReplacesTheGenerator)
 {
     model->refresh();
     model->topLevelNodes();

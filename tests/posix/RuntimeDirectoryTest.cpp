@@ -28,7 +28,7 @@ std::string problemOf(const std::string& directory)
     return secureRuntimeDirectory(directory).value_or(Problem()).text;
 }
 
-TEST(RuntimeDirectory, IsRefusedWhenItBelongsToSomebodyElse)
+TEST(RuntimeDirectory, IsRefusedWhenAnotherUserOwnsIt)
 {
     if (::geteuid() != 0)
         GTEST_SKIP() << "only root can give a directory away";
@@ -39,7 +39,7 @@ TEST(RuntimeDirectory, IsRefusedWhenItBelongsToSomebodyElse)
     EXPECT_THAT(problemOf(theirs), HasSubstr("belongs to another user"));
 }
 
-TEST(RuntimeDirectory, SaysWhyItCannotBeMade)
+TEST(RuntimeDirectory, ReportsWhyItCannotBeCreated)
 {
     const ScratchDirectory scratch;
     writeFile(scratch / "file", "");

@@ -56,7 +56,7 @@ TEST(SignalPipe, PutsTheOldHandlersBack)
     std::signal(SIGHUP, before);
 }
 
-TEST(SignalPipe, KnowsNothingOfWhatAnEarlierOneLeft)
+TEST(SignalPipe, IgnoresSignalsOfAnEarlierOne)
 {
     {
         const SignalPipe earlier({SIGHUP});

@@ -112,7 +112,7 @@ TEST(XmlRead, AKeyThatComesTwiceKeepsItsFirstPlaceAndItsLastValue)
     EXPECT_EQ(describe(read.value), R"({"a": 3, "b": 2})");
 }
 
-TEST(XmlRead, FillsTheContainersOfASpentList)
+TEST(XmlRead, ReusesTheContainersOfAnOldList)
 {
     PropertyListCodec codec;
     const std::string two = xmlList("<array><dict><key>a</key><integer>1</integer></dict>"
@@ -127,10 +127,10 @@ TEST(XmlRead, FillsTheContainersOfASpentList)
     EXPECT_EQ(describe(read), R"([{"a": 3}])");
     EXPECT_EQ(read.array().get(), list);
     EXPECT_EQ((*list)[0].borrowedDictionary(), first);
-    EXPECT_TRUE(second.expired()) << "what the list has no use for is let go";
+    EXPECT_TRUE(second.expired()) << "containers that the list cannot reuse are released";
 }
 
-TEST(XmlRead, LeavesWhatSomebodyStillHolds)
+TEST(XmlRead, KeepsContainersWithAnotherOwner)
 {
     PropertyListCodec codec;
     Value spent = codec.parse(bytesOf(xmlList("<array><dict><key>a</key><integer>1</integer></dict></array>")));
@@ -141,7 +141,7 @@ TEST(XmlRead, LeavesWhatSomebodyStillHolds)
     EXPECT_EQ(describe(held), R"({"a": 1})");
 }
 
-TEST(XmlRead, ASpentListDoesNotShowInARefusedOne)
+TEST(XmlRead, ARefusedListShowsNothingOfAnOldOne)
 {
     PropertyListCodec codec;
     EXPECT_TRUE(codec.parseOver(bytesOf(xmlList("")), makeArray({"a"})).isNull());
@@ -259,7 +259,7 @@ INSTANTIATE_TEST_SUITE_P(
                                "too many values"}),
     caseName);
 
-TEST(XmlRefused, TellsWhere)
+TEST(XmlRefused, ReportsThePlace)
 {
     EXPECT_EQ(parsed("<plist><array><set/></array></plist>").offset, 14u);
 }

@@ -185,7 +185,7 @@ TEST_F(Accessibility, ScrollsNoTableFromOutside)
     EXPECT_EQ(bar->valueInterface(), nullptr);
 }
 
-TEST_F(Accessibility, ReachesNothingOfAPaneThatHasLeft)
+TEST_F(Accessibility, ReachesNothingInARemovedPane)
 {
     const auto left = everything();
     Rows others = Rows::leaves(3);

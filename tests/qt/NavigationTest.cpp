@@ -179,7 +179,7 @@ TEST_F(ANavigationView, ShowsTheNextPaneWhileOneStillMoves)
     EXPECT_EQ(table().x(), 0);
 }
 
-TEST_F(ANavigationView, LetsGoOfAPaneThatHasLeft)
+TEST_F(ANavigationView, ReleasesAPaneThatWasRemoved)
 {
     makeVisible();
     push();

@@ -176,7 +176,7 @@ TEST_F(ATable, KeepsFocusOnARowOutOfView)
     EXPECT_EQ(offset(), 0);
 }
 
-TEST_F(ATable, HandsFocusToTheNeighbourOfARowThatGoes)
+TEST_F(ATable, PassesFocusToTheNeighbourOfARemovedRow)
 {
     Rows rows = Rows::leaves(5);
     show(rows);
@@ -248,7 +248,7 @@ TEST_F(ATable, StaysWithinItsRowsWhenTheyBecomeFewer)
     EXPECT_THAT(rows.selected, IsEmpty());
 }
 
-TEST_F(ATable, AsksForItsVisibleRowsAnewWhenItsWidthChanges)
+TEST_F(ATable, RequestsItsVisibleRowsAgainWhenItsWidthChanges)
 {
     Rows rows = Rows::leaves(10);
     show(rows);
@@ -354,7 +354,7 @@ TEST_F(ATable, AnswersAPressAtOnce)
     EXPECT_FALSE(cell(2).look().pressed);
 }
 
-TEST_F(ATable, DoesNothingForATapOnARowThatWentAwayUnderTheFinger)
+TEST_F(ATable, DoesNothingForATapOnARowRemovedUnderTheFinger)
 {
     Rows rows = Rows::leaves(5);
     show(rows);

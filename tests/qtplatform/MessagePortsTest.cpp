@@ -127,7 +127,7 @@ TEST_F(LocalPortTest, IsNotMadeTwiceInAProcess)
     EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("another process listens")));
 }
 
-TEST_F(LocalPortTest, CanBeMadeAgainAtOnceWhenTheFirstIsGone)
+TEST_F(LocalPortTest, CanBeCreatedAgainRightAfterTheFirstIsDestroyed)
 {
     auto port = makeLocal();
     port.reset();
@@ -136,7 +136,7 @@ TEST_F(LocalPortTest, CanBeMadeAgainAtOnceWhenTheFirstIsGone)
     EXPECT_TRUE(port);
 }
 
-TEST_F(LocalPortTest, ClearsAwayTheSocketsOfProcessesThatHaveGone)
+TEST_F(LocalPortTest, RemovesTheSocketsOfEndedProcesses)
 {
     RawSocket::listenAt(directory / "log.1").close();
     RawSocket::listenAt(address("log")).close(); // left over from an earlier process with this number
@@ -165,7 +165,7 @@ TEST_F(LocalPortTest, AMalformedFrameClosesThatPeerAloneWithOneLine)
     EXPECT_TRUE(port->isValid());
 }
 
-TEST_F(LocalPortTest, ASilentPeerAndHalfAFrameHarmNobody)
+TEST_F(LocalPortTest, ASilentPeerAndHalfAFrameDelayNoOtherPeer)
 {
     const auto port = makeLocal();
     const auto silent = RawSocket::connectTo(address("log")), half = RawSocket::connectTo(address("log"));
@@ -313,7 +313,7 @@ protected:
     std::unique_ptr<RemotePort> port;
 };
 
-TEST_F(MessagePortsTest, ARemotePortIsNotMadeWhereNobodyListens)
+TEST_F(MessagePortsTest, ARemotePortIsNotCreatedWithoutAListener)
 {
     EXPECT_FALSE(ports.createRemote("nobody"));
     RawSocket::listenAt(directory / "gone").close();
@@ -461,14 +461,14 @@ TEST_F(FrameConnectionAttemptTest, ConnectsFromTheEventLoop)
     EXPECT_EQ(peer.receive(13), frame(kMessage, 7, 0, ""));
 }
 
-TEST_F(FrameConnectionAttemptTest, EndsWithoutAConnectionWhereNobodyListens)
+TEST_F(FrameConnectionAttemptTest, EndsUnconnectedWithoutAListener)
 {
     const auto running = attempt(20s);
     ASSERT_TRUE(eventually([&] { return ended > 0; }));
     EXPECT_FALSE(made);
 }
 
-TEST_F(FrameConnectionAttemptTest, WaitsForRoomInAFullBacklogAndServesTheLoopMeanwhile)
+TEST_F(FrameConnectionAttemptTest, WaitsForRoomInAFullBacklogWhileTheLoopRuns)
 {
     const auto listening = RawSocket::listenAt(directory / "port", 0);
     const auto first = RawSocket::connectTo(directory / "port");

@@ -34,7 +34,7 @@ TEST(QtMainQueue, LeavesWhatATaskPostsToTheNextTurnOfTheLoop)
     EXPECT_TRUE(eventually([&] { return runs == 1000; }));
 }
 
-TEST(QtMainQueue, ClearingLetsGoOfAnOwnerThatItsOwnTimerHolds)
+TEST(QtMainQueue, ClearingReleasesAnOwnerThatItsTimerHolds)
 {
     struct Owner {
         std::unique_ptr<Timer> timer;

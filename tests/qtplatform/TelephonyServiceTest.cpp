@@ -56,7 +56,7 @@ protected:
 const std::string kRequestForLog = "log." + std::to_string(::getpid());
 const std::size_t kRequestSize = 13 + kRequestForLog.size();
 
-TEST_F(TelephonyServiceTest, IsNotReachedWhereNobodyListens)
+TEST_F(TelephonyServiceTest, IsNotReachedWithoutAListener)
 {
     listening.close();
     EXPECT_FALSE(telephony.connect({}));
@@ -164,7 +164,7 @@ TEST_F(TelephonyServiceTest, TakesTheAnswerThatCameBehindManyNotificationsJustBe
     EXPECT_EQ(telephony.connect({})->networkMonitorCreateLogChannel("log").remotePort, "port");
 }
 
-TEST_F(TelephonyServiceTest, FailsAtOnceWhenTheServiceGoes)
+TEST_F(TelephonyServiceTest, FailsAtOnceWhenThePeerCloses)
 {
     play([&](RawSocket& client) { client.receive(kRequestSize); });
     const auto before = std::chrono::steady_clock::now();
@@ -313,7 +313,7 @@ TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
     EXPECT_EQ(telephony.problem(), Problem{"No telephony service can be reached in " + directory.path() + "."});
 }
 
-TEST_F(TelephonyServiceTest, SaysThatTheReceivePortCouldNotBeMade)
+TEST_F(TelephonyServiceTest, ReportsThatTheReceivePortCouldNotBeCreated)
 {
     EXPECT_FALSE(ports.createLocal("log", [](auto, auto) {}));
     local.reset();

@@ -231,7 +231,7 @@ TEST(Array, FillsItsRowsAgainWhenItStartsOver)
     EXPECT_EQ(list.size(), 1u);
 }
 
-TEST(Array, LeavesARowAloneThatSomebodyElseHolds)
+TEST(Array, KeepsARowWithAnotherOwnerUnchanged)
 {
     Array list;
     list.appendRow().setText("RSSI", "-71 dBm");
@@ -255,7 +255,7 @@ TEST(Array, HoldsWhatCameSinceItStartedOver)
     EXPECT_EQ(list.back(), Value("g"));
 }
 
-TEST(Array, LetsGoOfWhatItHeldWhenItIsCleared)
+TEST(Array, ReleasesItsElementsWhenItIsCleared)
 {
     const auto held = makeDictionary();
     Array list{held, "text"};
@@ -308,7 +308,7 @@ TEST(Value, BecomesTheContainerThatItHolds)
     EXPECT_TRUE(dictionary->empty());
 }
 
-TEST(Value, LeavesAContainerThatSomebodyElseHolds)
+TEST(Value, KeepsAContainerWithAnotherOwnerUnchanged)
 {
     Value array = makeArray({"4"}), dictionary = makeDictionary({{"RSSI", "-71 dBm"}});
     const Value heldArray = array, heldDictionary = dictionary;
@@ -334,7 +334,7 @@ TEST(Reading, OfANameHasATextAlone)
     EXPECT_EQ(name.unit(), "");
 }
 
-TEST(Reading, OfWhatMeasuresNothingHasATextAlone)
+TEST(Reading, OfAnAbsentValueHasOnlyAText)
 {
     const Reading absent(kLevel, 0);
     EXPECT_EQ(absent.text(), "Not Present");

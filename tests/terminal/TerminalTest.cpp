@@ -371,7 +371,7 @@ TEST_F(Terminal, BearsTheSmallestSizes)
     expectShown("Serving Cell");
 }
 
-TEST_F(Terminal, SaysThatTheServiceIsGoneAndGoesOnWhenItIsBack)
+TEST_F(Terminal, ReportsALostServiceAndContinuesAfterItsReturn)
 {
     startAndWait();
     terminal.type("jjj");
@@ -385,7 +385,7 @@ TEST_F(Terminal, SaysThatTheServiceIsGoneAndGoesOnWhenItIsBack)
     expectChosen("Beat");
 }
 
-TEST_F(Terminal, GoesBackWhenWhatItShowsIsNoMore)
+TEST_F(Terminal, GoesBackWhenItsNodeIsRemoved)
 {
     const auto without = propertyList(text("_sorted", "_sorted") + text("3;Beat", "alone") + text("4;Other", "1"));
     device.serve({display("tick"), without}, {"--speed", "0.1"}); // the second display comes after 5 s
@@ -455,7 +455,7 @@ TEST_F(TerminalRows, HandTheChoiceToTheirNeighbour)
     expectChosen("State");
 }
 
-TEST_F(TerminalRows, HandTheChoiceUpWhenTheLastGoes)
+TEST_F(TerminalRows, PassTheChoiceUpWhenTheLastIsRemoved)
 {
     show({"Serving", "Neighbours", "State"}, {"Serving", "Neighbours"});
     terminal.type("G");
@@ -581,7 +581,7 @@ TEST_F(TerminalSave, WritesATimestampAloneBeforeTheFirstConnection)
     EXPECT_THAT(saved(), testing::Not(HasSubstr("<key>Description</key>")));
 }
 
-TEST_F(TerminalSave, StaysOverPanesThatGo)
+TEST_F(TerminalSave, StaysOverRemovedPanes)
 {
     const auto without = [](const std::string& beat) {
         return propertyList(text("_sorted", "_sorted") + text("3;Beat", beat) + text("4;Other", "1"));

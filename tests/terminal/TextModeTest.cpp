@@ -127,7 +127,7 @@ TEST(TextMode, SaysThatItsOutputCannotBeWritten)
     EXPECT_EQ(closed.output, "kestrum-terminal: standard output is closed\n");
 }
 
-TEST(TextMode, EndsQuietlyWhenItsReaderHasGone)
+TEST(TextMode, EndsQuietlyAfterItsReaderHasClosed)
 {
     Demonstration device;
     device.serve({kDisplay});

@@ -25,7 +25,7 @@ protected:
     }};
 };
 
-TEST_F(ChangesTest, TellsAllValuesAtFirst)
+TEST_F(ChangesTest, ReportsAllValuesAtFirst)
 {
     const auto display =
         makeDictionary({{"_sorted", "_sorted"}, {"0;Cell", makeDictionary({{"MCC", "1"}})}, {"L", makeArray({"a"})}});
@@ -33,7 +33,7 @@ TEST_F(ChangesTest, TellsAllValuesAtFirst)
     EXPECT_THAT(look(display), IsEmpty());
 }
 
-TEST_F(ChangesTest, TellsEditsOfTheSameContainer)
+TEST_F(ChangesTest, ReportsEditsOfTheSameContainer)
 {
     const auto display = makeDictionary({{"a", "1"}, {"b", "2"}});
     look(display);
@@ -41,14 +41,14 @@ TEST_F(ChangesTest, TellsEditsOfTheSameContainer)
     EXPECT_THAT(look(display), ElementsAre("/b=\"3\""));
 }
 
-TEST_F(ChangesTest, TellsWhatIsGone)
+TEST_F(ChangesTest, ReportsRemovedValues)
 {
     look(makeDictionary({{"a", "1"}, {"b", makeDictionary({{"c", "2"}})}, {"l", makeArray({"x", "y", "z"})}}));
     EXPECT_THAT(look(makeDictionary({{"a", "1"}, {"l", makeArray({"x"})}})),
                 UnorderedElementsAre("/b/c gone", "/l/1 gone", "/l/2 gone"));
 }
 
-TEST_F(ChangesTest, TellsAValueThatBecomesATreeAndBack)
+TEST_F(ChangesTest, ReportsAValueThatBecomesATreeAndBack)
 {
     look(makeDictionary({{"a", "1"}}));
     EXPECT_THAT(look(makeDictionary({{"a", makeDictionary({{"b", "2"}})}})), ElementsAre("/a gone", "/a/b=\"2\""));

@@ -82,7 +82,7 @@ TEST_F(DecodingTest, TellsTimeAndCodeOfEachMessage)
     EXPECT_EQ(seen[1].code, 0xFF0002u);
 }
 
-TEST_F(DecodingTest, DoesNotWaitForEverForAMessageThatTells)
+TEST_F(DecodingTest, LimitsTheWaitForAMessageThatShowsTheTechnology)
 {
     auto decoded = decoding({});
     const auto service = message(1, std::string(60'000, ' '), kStamp, 0xFF);

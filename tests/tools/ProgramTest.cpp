@@ -127,7 +127,7 @@ TEST_F(ProgramTest, MessagesThatTellNoTechnologyNeedItNamed)
     EXPECT_EQ(run({"--technology", "lte", file}).status, 0);
 }
 
-TEST_F(ProgramTest, MessagesBeforeTheOneThatTellsAreDecodedToo)
+TEST_F(ProgramTest, MessagesBeforeTheOneThatShowsTheTechnologyAreDecodedToo)
 {
     const auto ran = run({"--stats", capture(kcap(message(1, "no list", kStamp, 0xFF)) + kcap(antennas(4)))});
     EXPECT_THAT(ran.remarks, HasSubstr("0xFF0001           1"));
@@ -143,7 +143,7 @@ TEST_F(ProgramTest, StatisticsCountTheMessagesThatARecordingNotesAsMissing)
     EXPECT_THAT(ran.remarks, EndsWith("bytes skipped: 0\nmessages missing: 34\n"));
 }
 
-TEST_F(ProgramTest, ALogThatGoesOnInAnotherTechnologyShowsThatOne)
+TEST_F(ProgramTest, ALogThatContinuesInAnotherTechnologyShowsThatTechnology)
 {
     const auto ran = run({"--format", "json", capture(kcap(antennas(4)) + kcap(ifx("here")))});
     EXPECT_THAT(ran.output, HasSubstr("\"technology\": \"kVoxLogChannelTechnology_IFX\""));
@@ -295,7 +295,7 @@ TEST_F(ProgramTest, AClosedPipeEndsItQuietly)
     EXPECT_EQ(tool.status(), 0);
 }
 
-TEST_F(ProgramTest, AFullDiskIsTold)
+TEST_F(ProgramTest, AFullDiskIsReported)
 {
     const auto file = capture(kcap(antennas(1))), told = scratch.file("told");
     const auto command = "'" + builtProgram("kestrum-decode") + "' '" + file + "' >/dev/full 2>'" + told + "'";

@@ -156,7 +156,7 @@ struct Hostile {
 
 class HostileSnapshot : public testing::TestWithParam<Hostile> {};
 
-TEST_P(HostileSnapshot, IsToldOf)
+TEST_P(HostileSnapshot, IsReported)
 {
     EXPECT_FALSE(recovered(GetParam().snapshot).faults.empty());
 }

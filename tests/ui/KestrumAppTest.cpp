@@ -128,7 +128,7 @@ TEST_F(KestrumAppTest, UpdateTimeIsShownInTheDevicesZone)
     EXPECT_EQ(top().status(), "Updated 2026-11-16 at 08:05:44");
 }
 
-TEST_F(KestrumAppTest, UpdateMessageStandsWhileThereIsNoConnection)
+TEST_F(KestrumAppTest, UpdateMessageIsShownWhileThereIsNoConnection)
 {
     launchConnected();
     showCells();
@@ -183,7 +183,7 @@ TEST_F(KestrumAppTest, ConnectionThatComesInTimeLeavesNoHint)
     EXPECT_EQ(top().hint, "");
 }
 
-TEST_F(KestrumAppTest, LostConnectionIsWaitedForTenSecondsAnew)
+TEST_F(KestrumAppTest, LostConnectionStartsAnotherWaitOfTenSeconds)
 {
     launchConnected();
     doubles.queue.advance(60s);
@@ -195,7 +195,7 @@ TEST_F(KestrumAppTest, LostConnectionIsWaitedForTenSecondsAnew)
     EXPECT_EQ(top().hint, connectionHint());
 }
 
-TEST_F(KestrumAppTest, HintIsTheRootPanesWhateverIsOpen)
+TEST_F(KestrumAppTest, RootPaneKeepsTheHintWhileAnotherPaneIsOpen)
 {
     launchConnected();
     showCells();
@@ -228,7 +228,7 @@ TEST_F(KestrumAppTest, HintFollowsTheReasonThatIsKnown)
     EXPECT_EQ(top().hint, connectionHint(Problem{"The telephony service has no channel left for this display."}));
 }
 
-TEST_F(KestrumAppTest, LostMessagesAreToldInALineThatGoesAway)
+TEST_F(KestrumAppTest, LostMessagesAreReportedInALineThatDisappears)
 {
     using namespace std::string_view_literals;
     launchConnected();
@@ -251,7 +251,7 @@ TEST(ConnectionHintTest, SaysWhatIsMissingAndHowToStartIt)
 
 // Notices
 
-TEST_F(KestrumAppTest, NoticeGoesAwayByItself)
+TEST_F(KestrumAppTest, NoticeDisappearsAfterItsTime)
 {
     launch();
     app->showNotice("first");
@@ -263,7 +263,7 @@ TEST_F(KestrumAppTest, NoticeGoesAwayByItself)
     EXPECT_EQ(doubles.toolkit.navigation->notice, "");
 }
 
-TEST_F(KestrumAppTest, NoticeThatIsShownAtTheEndGoesWithTheApplication)
+TEST_F(KestrumAppTest, ApplicationCanEndWhileANoticeIsShown)
 {
     launch();
     app->showNotice("first");
@@ -292,7 +292,7 @@ TEST_F(KestrumAppTest, EveryPaneFollowsItsPath)
     EXPECT_THAT(top().rows.texts(), ElementsAre("Detected", "Serving"));
 }
 
-TEST_F(KestrumAppTest, MiddlePaneWhosePathIsGonePopsBackToTheReloadedRoot)
+TEST_F(KestrumAppTest, MiddlePaneWithARemovedPathPopsToTheReloadedRoot)
 {
     launchConnected();
     showCells();
@@ -305,7 +305,7 @@ TEST_F(KestrumAppTest, MiddlePaneWhosePathIsGonePopsBackToTheReloadedRoot)
     EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:46");
 }
 
-TEST_F(KestrumAppTest, TopPaneWhosePathIsGonePopsAlone)
+TEST_F(KestrumAppTest, TopPaneWithARemovedPathPopsAlone)
 {
     launchConnected();
     showCells();
@@ -348,7 +348,7 @@ TEST_F(KestrumAppTest, RowThatARefreshRemovedTakesNoTap)
     EXPECT_THAT(path(), ElementsAre("Kestrum"));
 }
 
-TEST_F(KestrumAppTest, WithoutAGeneratorTheRootIsCalledKestrumAndHasNoRows)
+TEST_F(KestrumAppTest, WithoutAGeneratorTheRootTitleIsKestrumAndThereAreNoRows)
 {
     launch();
     doubles.queue.run();
@@ -545,7 +545,7 @@ TEST_F(KestrumAppSaveTest, ScreenTakesTheKeyboardFromThePaneAndGivesItBackItsToo
     EXPECT_NE(top().saveButton(), nullptr);
 }
 
-TEST_F(KestrumAppSaveTest, PaneWhosePathGoesUnderTheScreenIsClosedThere)
+TEST_F(KestrumAppSaveTest, PaneWhosePathIsRemovedIsClosedUnderTheScreen)
 {
     launchConnected();
     showCells();
@@ -611,7 +611,7 @@ TEST_F(KestrumAppTest, RunningMonitorKeepsTheChannelOpenUntilTheQueueIsDropped)
     const int reloads = top().rows.reloads;
     modem.send(cell("-80 dBm"));
     doubles.queue.advance(4s);
-    EXPECT_EQ(top().rows.reloads, reloads) << "nobody is told any more";
+    EXPECT_EQ(top().rows.reloads, reloads) << "no observer is notified any more";
 
     doubles.queue.drop();
     EXPECT_FALSE(doubles.ports.hasLocal("org.kestrum.vox.baseband-state-report.log"));

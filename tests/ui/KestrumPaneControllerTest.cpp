@@ -16,7 +16,7 @@ protected:
     }
 };
 
-TEST_F(KestrumPaneControllerTest, WithoutANodeItIsCalledKestrumAndHasNoRows)
+TEST_F(KestrumPaneControllerTest, WithoutANodeTheTitleIsKestrumAndThereAreNoRows)
 {
     start(nullptr);
     EXPECT_EQ(top().title(), "Kestrum");
@@ -115,7 +115,7 @@ TEST_F(KestrumPaneControllerTest, OpenedPaneStartsWithTheStatusOfThePaneItWasOpe
 
     stack->topViewController().setStatus("Connecting...", true);
     toolkit.navigation->pressBack();
-    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:42") << "each pane has a status of its own";
+    EXPECT_EQ(top().status(), "Updated 2026-11-16 at 06:05:42") << "each pane has a separate status";
 }
 
 TEST_F(KestrumPaneControllerTest, LeafOnlyLosesItsSelection)
@@ -135,7 +135,7 @@ TEST_F(KestrumPaneControllerTest, NoRowSelectsNothing)
     EXPECT_EQ(top().rows.deselectedAnimated, std::nullopt);
 }
 
-TEST_F(KestrumPaneControllerTest, TapOnARowThatIsGoneDoesNothing)
+TEST_F(KestrumPaneControllerTest, TapOnARemovedRowDoesNothing)
 {
     start(mixed());
     stack->topViewController().reloadWithNode(inner("Kestrum", {inner("Serving Cell")}));
@@ -144,7 +144,7 @@ TEST_F(KestrumPaneControllerTest, TapOnARowThatIsGoneDoesNothing)
     EXPECT_EQ(top().rows.deselectedAnimated, std::nullopt);
 }
 
-TEST_F(KestrumPaneControllerTest, RowThatIsGoneIsDrawnBlank)
+TEST_F(KestrumPaneControllerTest, RemovedRowIsDrawnBlank)
 {
     start(mixed());
     auto& controller = stack->topViewController();
@@ -275,7 +275,7 @@ TEST_F(KestrumPaneControllerTest, ToolbarHoldsExactlyThreeItemsWhereSaveIsNotOff
     EXPECT_FALSE(toolkit.navigation->toolbarHidden);
 }
 
-TEST_F(KestrumPaneControllerTest, SaveStandsAtTheEndAndAsksTheApplication)
+TEST_F(KestrumPaneControllerTest, SaveIsTheLastItemAndAsksTheApplication)
 {
     application.allowed = true;
     start(nullptr);

@@ -167,7 +167,7 @@ TEST_F(KestrumSaveViewControllerTest, ANameThatAnotherDisplayTookIsLeftToIt)
     EXPECT_THAT(doubles.toolkit.alerts, IsEmpty());
 }
 
-TEST_F(KestrumSaveViewControllerTest, WhatIsSavedIsWhatWasOffered)
+TEST_F(KestrumSaveViewControllerTest, SavesTheContentsThatItListed)
 {
     const auto display = makeDictionary({{"State", "Idle"}});
     const auto first = makeDictionary({{"Display", display}, {"Description", "first"}});
@@ -182,7 +182,7 @@ TEST_F(KestrumSaveViewControllerTest, WhatIsSavedIsWhatWasOffered)
     EXPECT_EQ(doubles.propertyLists.files.at(kFirstPath).dictionary()->at("Data"), Value(makeArray({entry("first")})));
 }
 
-TEST_F(KestrumSaveViewControllerTest, FailedWriteIsLoggedAndTold)
+TEST_F(KestrumSaveViewControllerTest, FailedWriteIsLoggedAndReportedToTheUser)
 {
     doubles.propertyLists.writable = false;
     open(makeArray());
@@ -305,7 +305,7 @@ TEST_F(SnapshotFile, ReadsBackFromADirectoryThatDidNotExist)
     EXPECT_THAT(doubles.toolkit.alerts, IsEmpty());
 }
 
-TEST_F(SnapshotFile, DirectoryThatCannotBeMadeIsTold)
+TEST_F(SnapshotFile, FailureToCreateTheDirectoryIsReported)
 {
     std::ofstream(scratch.file("file")) << "in the way";
     save(scratch.file("file/logs"));

@@ -104,7 +104,7 @@ TEST_F(NavigationStackTest, PopToRootLeavesTheRootAlone)
     EXPECT_EQ(toolkit.navigation->transitions.size(), 5u);
 }
 
-TEST_F(NavigationStackTest, PaneThatSomebodyStillHoldsTakesNoTapsAfterItWasPopped)
+TEST_F(NavigationStackTest, PoppedPaneWithAnotherOwnerTakesNoTaps)
 {
     open(1);
     const auto held = stack->viewControllers()[1];
@@ -113,7 +113,7 @@ TEST_F(NavigationStackTest, PaneThatSomebodyStillHoldsTakesNoTapsAfterItWasPoppe
     EXPECT_THAT(paths(), ElementsAre("/"));
 }
 
-TEST_F(NavigationStackTest, PaneThatSomebodyStillHoldsSurvivesItsStack)
+TEST_F(NavigationStackTest, PaneWithAnotherOwnerSurvivesItsStack)
 {
     open(1);
     const auto held = stack->viewControllers()[1];

@@ -371,7 +371,7 @@ TEST_F(ServiceTest, WritesACaptureAtOnceEqualForEqualSeeds)
     EXPECT_TRUE(one == contentsOf(files / "two.kcap"));
 }
 
-TEST_F(ServiceTest, KilledItTakesItsPortsWithItAndComesBackOverWhatItLeft)
+TEST_F(ServiceTest, AfterAKillItsPortsAreInvalidAndItStartsAgain)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
     Client client{*this, "log"};
@@ -478,7 +478,7 @@ TEST_F(ServiceTest, IgnoresOtherMessageIds)
     EXPECT_THAT(client.received, IsEmpty());
 }
 
-TEST_F(ServiceTest, RefusesALogChannelToNobody)
+TEST_F(ServiceTest, RefusesALogChannelToAPortWithoutAListener)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
     const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
@@ -490,7 +490,7 @@ TEST_F(ServiceTest, RefusesALogChannelToNobody)
     EXPECT_EQ(client.open().errorCode, 0);
 }
 
-TEST_F(ServiceTest, AListenerThatAcceptsNobodyStopsItsOwnClientAlone)
+TEST_F(ServiceTest, AListenerThatNeverAcceptsDelaysOnlyItsClient)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
     const auto full = RawSocket::listenAt(directory / "full.1", 0);
@@ -510,7 +510,7 @@ TEST_F(ServiceTest, AListenerThatAcceptsNobodyStopsItsOwnClientAlone)
     EXPECT_EQ(askers.back().receive(kRefusalSize), refusal(1, 3));
 }
 
-TEST_F(ServiceTest, TellsARefusalOnceUntilSomethingChanges)
+TEST_F(ServiceTest, LogsARefusalOnceUntilSomethingChanges)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
     const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
@@ -565,7 +565,7 @@ TEST_F(ServiceTest, RepliesThatAreNotReadCostBoundedMemory)
     EXPECT_LT(voxd.memory(), before + (std::size_t{16} << 20));
 }
 
-TEST_F(ServiceTest, SilentConnectionsHarmNobody)
+TEST_F(ServiceTest, SilentConnectionsDelayNoOtherClient)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "50"}));
     std::vector<RawSocket> silent;
@@ -593,7 +593,7 @@ TEST_F(ServiceTest, BoundsItsConnectionsAndItsChannels)
     EXPECT_TRUE(voxd.logs("refused a server connection: 64 stand already"));
 }
 
-TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndNobodyElse)
+TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndDelaysNoOther)
 {
     std::vector<std::string> messages;
     for (int i = 0; i < 100; ++i)
@@ -684,7 +684,7 @@ struct BadUse {
 
 class BadUses : public ServiceTest, public testing::WithParamInterface<BadUse> {};
 
-TEST_P(BadUses, AreToldClearly)
+TEST_P(BadUses, AreReportedWithTheirReason)
 {
     voxd.launch(GetParam().arguments);
     EXPECT_EQ(voxd.finish(), GetParam().status);
@@ -710,7 +710,7 @@ INSTANTIATE_TEST_SUITE_P(
                            "/nowhere/a.kcap: cannot be written"}),
     [](const auto& each) { return std::string(each.param.name); });
 
-TEST_F(ServiceTest, TellsItsVersionAndItsHelp)
+TEST_F(ServiceTest, PrintsItsVersionAndItsHelp)
 {
     voxd.launch({"--version"});
     EXPECT_EQ(voxd.finish(), 0);
@@ -724,7 +724,7 @@ TEST_F(ServiceTest, TellsItsVersionAndItsHelp)
         EXPECT_THAT(text, HasSubstr(each));
 }
 
-TEST_F(ServiceTest, SaysThatItsDirectoryCannotBeMade)
+TEST_F(ServiceTest, ReportsThatItsDirectoryCannotBeCreated)
 {
     std::ofstream(files / "file") << "";
     Voxd elsewhere(files / "file/inside");

@@ -108,7 +108,7 @@ TEST_F(ReplaySourceTest, LoopsWithTimesThatGoOn)
     EXPECT_THAT(times(source, 5), ElementsAre(0ms, 200ms, 700ms, 900ms, 1400ms));
 }
 
-TEST_F(ReplaySourceTest, TellsTheTechnologyByALaterMessageWhenTheFirstDoesNot)
+TEST_F(ReplaySourceTest, FindsTheTechnologyInALaterMessage)
 {
     const auto monitor = "\xFF"s + little(12, 2) + little(1, 2) + "........";
     ReplaySource source(file(kcap({monitor, stampedRecord(0, 0x417A)})), false);
@@ -135,7 +135,7 @@ TEST_F(ReplaySourceTest, ReadsDlf)
     EXPECT_EQ(second->at, 100ms);
 }
 
-TEST_F(ReplaySourceTest, EndsAtDamageAndTellsWhereItIs)
+TEST_F(ReplaySourceTest, EndsAtDamageAndReportsItsPlace)
 {
     const auto path = file(kcap({stampedRecord(0)}) + "\xFF\xFF\xFF\xFF");
     ReplaySource source(path, true);
