@@ -1,4 +1,4 @@
-"""Installs the build into folders of its own and tries it there; compares man pages and completions with --help."""
+"""Installs the build into separate folders and runs it there; compares man pages and completions with --help."""
 import os
 import pathlib
 import re
