@@ -9,7 +9,7 @@ namespace kestrum {
 /// An internal inconsistency: where it was found, and what it is. `what()` tells it all.
 class AssertionFailure : public std::runtime_error {
 public:
-    /// `object` is the one, or the class, whose operation found it. An empty `file` is reported as "<Unknown File>".
+    /// `object` is the object or class whose operation found it. An empty `file` is reported as "<Unknown File>".
     AssertionFailure(const std::string& operation, const std::string& object, const std::string& file, int line,
                      std::string description);
 
