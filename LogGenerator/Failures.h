@@ -6,7 +6,7 @@
 
 namespace kestrum {
 
-/// An internal inconsistency: where it was found, and what it is. `what()` tells it all.
+/// An internal inconsistency, with the place where it was found. `what()` contains all fields.
 class AssertionFailure : public std::runtime_error {
 public:
     /// `object` is the object or class whose operation found it. An empty `file` is reported as "<Unknown File>".

@@ -58,7 +58,7 @@ public:
     bool isConnected() const;
     /// Why the last attempt to connect failed; nothing when it did not, or when there is nothing to say.
     const std::optional<Problem>& connectionProblem() const { return _problem; }
-    /// Log messages that the service has dropped because this display did not take them in time, since the start.
+    /// The number of messages that the service has dropped since the start because this display did not read them.
     std::uint64_t lostMessages() const { return _lostMessages; }
     /// The same as text for the user.
     std::string lossNotice() const;
