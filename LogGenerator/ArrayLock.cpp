@@ -13,7 +13,7 @@ namespace {
 struct Shared {
     std::unique_ptr<RecursiveMutex> mutex = std::make_unique<StandardRecursiveMutex>();
     std::uint8_t depth = 0;
-    std::thread::id user; // of the first lock; another thread would wait for ever after a nested use
+    std::thread::id user; // of the first lock; after a nested use another thread would never get the lock
 };
 
 Shared& shared()

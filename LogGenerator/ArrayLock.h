@@ -6,15 +6,15 @@ namespace kestrum {
 
 class RecursiveMutex;
 
-/// The one lock of the display's array nodes: sections hold it while they rewrite an array, the display-tree
-/// builder while it walks one.
+/// The lock of all array nodes of the display. Sections hold it while they rewrite an array, the builder of the display
+/// tree while it walks one.
 ///
-/// Deliberately lopsided: every `lockArray` locks the mutex, `unlockArray` unlocks it only when the 8-bit depth is
-/// back at 0. A nested pair so leaves the mutex held by its thread, which never blocks as long as one thread does
-/// it all; a debug build checks that.
+/// Kept: every `lockArray` locks the mutex, but `unlockArray` unlocks it only when the 8-bit depth returns to 0. After
+/// a nested pair the thread still holds the mutex. That blocks nothing while only one thread uses the lock, which a
+/// debug build checks.
 class ArrayLock {
 public:
-    /// Starts over with that mutex, at depth 0. Without it the first use starts with the standard library's.
+    /// Sets the mutex, and the depth to 0. Without this call the first use takes StandardRecursiveMutex.
     static void initialize(std::unique_ptr<RecursiveMutex> mutex);
 
     static void lockArray();

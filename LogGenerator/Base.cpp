@@ -76,16 +76,16 @@ void Base::replaceArray(const SectionRef& array, std::vector<Value> With)
 
 std::int16_t Base::lookUpECNO(std::uint32_t linear)
 {
-    // The least ratio of each step is one above the number given here: -1 dB from 417648, -2 dB from 331809, ...
+    // A step begins one above the number given here: -1 dB from 417648, -2 dB from 331809, ...
     constexpr std::uint32_t kAbove[] = {417647, 331808, 263624, 209463, 166441, 132268, 105123, 83562,
                                         66435,  52830,  42023,  33440,  26621,  21205,  16903,  13486,
                                         10771,  8615,   6902,   5542,   4461,   3603,   2921,   2240,
                                         1949,   1607,   1336,   1120,   949,    813,    705};
     if (linear >= 524288)
         return 0;
-    // Counted rather than searched for: energies vary too much for a search to be foreseen by the processor.
+    // Counts all steps instead of a binary search: energies vary so much that the processor mispredicts its branches.
     const auto step = std::ranges::count_if(kAbove, [linear](std::uint32_t above) { return linear <= above; });
-    // Kept: below the scale 0 stands for "no energy", which reads like full scale.
+    // Kept: below the scale the result is 0, as at full scale.
     return step == std::ssize(kAbove) ? std::int16_t{0} : static_cast<std::int16_t>(-1 - step);
 }
 

@@ -23,20 +23,20 @@ class Base;
 
 /// Section name to section. The class index owns the sections.
 using ClassDictionary = std::map<std::string, Base*, std::less<>>;
-/// A log code to the sections that subscribed to it, in the order in which they did.
+/// Log code to the sections that subscribe to it, in the order in which they subscribed.
 using CodeDictionary = std::unordered_map<LogCode, std::vector<Base*>>;
 
-/// A section's node in the display: a dictionary or an array that the generator state owns. Harmless when it was
-/// never set, is of the other shape, or is gone.
+/// A section's node in the display: a dictionary or an array that the state owns. Its accessors give null when the node
+/// was never set, has the other kind, or was destroyed.
 class SectionRef {
 public:
     SectionRef() = default;
     explicit SectionRef(const Value& node) : _dictionary(node.dictionary()), _array(node.array()) {}
 
-    /// Borrowed: the thread that decodes is the one that lets go of displays.
+    /// Borrowed. Only the thread that decodes destroys displays, so the node stays valid during a call.
     Dictionary* dictionary() const { return _dictionary.borrowed(); }
     Array* array() const { return _array.borrowed(); }
-    /// Shared; null when there is none.
+    /// The node, shared; null when there is none.
     Value node() const
     {
         return _dictionary.borrowed() != nullptr ? Value(_dictionary.shared()) : Value(_array.shared());
@@ -61,21 +61,21 @@ private:
     Watched<Array> _array;
 };
 
-/// Elements inside a record, as many as a field of it says.
+/// Elements inside a record, and the field with their number.
 struct Repeated {
     Field count;
     Elements elements;
 };
 
-/// A record that a section takes. Without rows it is decoded by the section's own code.
+/// The layout of one record of a section. Without rows the section overrides `decode`.
 struct Layout {
     LogCode code;
-    std::size_t minimumLength = 0;     ///< in bytes, header included: a shorter record is dropped silently
-    std::span<const Row> rows = {};    ///< of the section's dictionary, or of each element of its list
-    std::optional<Repeated> list = {}; ///< where the section is a list: its elements
+    std::size_t minimumLength = 0;     ///< bytes, header included; a shorter record is dropped without a log line
+    std::span<const Row> rows = {};    ///< rows of the section's dictionary, or of each element of its list
+    std::optional<Repeated> list = {}; ///< the elements, when the section is a list
 };
 
-/// Whether the shortest record of each layout holds all of its fields, and each element all of its own.
+/// Whether the fields of each layout lie inside its shortest record, and an element's fields inside the element.
 constexpr bool fits(std::span<const Layout> layouts)
 {
     return std::ranges::all_of(layouts, [](const Layout& layout) {
@@ -86,25 +86,25 @@ constexpr bool fits(std::span<const Layout> layouts)
     });
 }
 
-/// What a section does with a record of a code that it does not list.
+/// What a section does with a record whose code is in none of its layouts.
 enum class ForeignCode { Reported, Ignored, Decoded };
 
-/// What a section is, but for code of its own.
+/// The data of a section: constants from which Base does what all sections have in common.
 struct SectionTraits {
-    std::string_view name;                ///< the key under which the section's node stands in the template
-    std::span<const Layout> layouts = {}; ///< none for a section that only shows what the template says
-    std::string_view entryLine = name;    ///< the line that each record logs first
+    std::string_view name;                ///< the key of the section's node in the template
+    std::span<const Layout> layouts = {}; ///< empty for a section that shows only the template's texts
+    std::string_view entryLine = name;    ///< logged first for each record
     Priority entryPriority = Priority::Warning;
     ForeignCode foreignCode = ForeignCode::Reported;
 };
 
-/// A section of the display: decodes records of the codes it names into its node.
+/// A section of the display: decodes the records of its layouts into its node.
 ///
-/// It edits the node in place, so that the next refresh shows the change. A dictionary section sets keys; a key that
-/// a record does not carry keeps its value. A list section rewrites its array.
+/// It edits the node in place; the next refresh shows the change. A dictionary section sets keys; a key whose field is
+/// not in the record keeps its value. A list section replaces the contents of its array. Both store readings.
 class Base {
 public:
-    /// `traits` is a constant: what it refers to outlives the section.
+    /// `traits` is a constant, and so is everything that it refers to: both outlive the section.
     Base(DecodingRoles& decodingRoles, const SectionTraits& traits) : roles(decodingRoles), _traits(traits) {}
     virtual ~Base() = default;
     Base(const Base&) = delete;
@@ -114,18 +114,18 @@ public:
     void initWithDict(ClassDictionary& classDict, CodeDictionary& codeDict);
 
     std::string_view getSectionName() const { return _traits.name; }
-    /// The codes it decodes, in the order in which it registers them.
+    /// The codes of its layouts, in the order in which it registers them.
     std::vector<LogCode> getLogCodeArray() const;
-    /// Decodes one record, header included: logs the entry line, leaves out foreign codes and short records.
+    /// Decodes one record, header included. Logs the entry line; drops foreign codes and short records.
     virtual void updateWithData(Record data, LogCode logCode);
 
     void updateSectionRef(const Value& node);
     void updateLogCodeDict(CodeDictionary& codeDict);
 
-    /// Both under ArrayLock; nothing happens to a node that is no array.
+    /// Empty or replace an array under ArrayLock. They do nothing when the node is no array.
     static void clearElementsInArray(const SectionRef& array);
     static void replaceArray(const SectionRef& array, std::vector<Value> With);
-    /// The same, by what `append` appends. It is called without a node too: decoding may log.
+    /// Replaces the contents by the values that `append` appends. `append` runs also without a node: decoding may log.
     template <std::invocable<Array&> Append>
     static void replaceArray(const SectionRef& array, Append append)
     {
@@ -137,12 +137,12 @@ public:
         append(list);
     }
 
-    /// The Ec/No in whole dB of a linear energy ratio, full scale 2^19. At or above full scale, and at or below 705,
-    /// it is 0.
+    /// The Ec/No in whole dB (-31 to 0) of a linear energy ratio with full scale 2^19. 0 at or above full scale, and at
+    /// or below 705.
     static std::int16_t lookUpECNO(std::uint32_t linear);
 
 protected:
-    /// Shows a record that is long enough, by its layout. A section overrides it for what is particular to it.
+    /// Shows a record of sufficient length by its layout. A section overrides it for its particular code.
     virtual void decode(Record data, const Layout& layout);
 
     void logError(std::string_view text) const;
@@ -157,7 +157,7 @@ protected:
     void publish(std::string_view key, Value value) const;
     void publish(std::string_view key, const char* text) const { publish(key, std::string_view(text)); }
     void publish(std::string_view key, const std::string& text) const { publish(key, std::string_view(text)); }
-    /// Sets a list, which `append` fills.
+    /// Sets one key to a list that `append` fills.
     template <std::invocable<Array&> Append>
     void publish(std::string_view key, Append append) const
     {

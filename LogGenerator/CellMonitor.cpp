@@ -8,7 +8,7 @@
 namespace kestrum {
 namespace {
 
-/// The record's cells; logs when there are none to be had.
+/// The record's cells. Null, with a log line, when it holds no array of cells.
 ArrayRef cellsIn(Record data, DecodingRoles& roles)
 {
     auto cells = CellInfoArray(data, roles).cells();

@@ -41,7 +41,7 @@ std::vector<std::string> ClassIndex::getAllLogCodes() const
 
 void ClassIndex::status() const
 {
-    // The registry's type is settled at compile time: it is a dictionary, and no string.
+    // The registry is always a dictionary, so the line is constant.
     roles.log.write(Priority::Warning, "Dictionary = %d", 1);
     roles.log.write(Priority::Warning, "String = %d", 0);
 }

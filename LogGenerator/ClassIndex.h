@@ -17,11 +17,11 @@ public:
 
     /// The section of that name; null when there is none.
     Base* getClass(std::string_view sectionName) const;
-    /// The sections that subscribed to the code, in their order; null when there are none.
+    /// The sections that subscribed to the code, in order of creation; null when there are none.
     const std::vector<Base*>* getSubscribers(LogCode logCode) const;
-    /// The decimal texts of all codes, in the order of the texts.
+    /// All codes as decimal texts, sorted as texts.
     std::vector<std::string> getAllLogCodes() const;
-    /// Logs what the registry is; diagnostics only.
+    /// Logs the kind of the registry; diagnostics only.
     void status() const;
 
 protected:
@@ -33,12 +33,12 @@ protected:
         return section;
     }
 
-    DecodingRoles roles; ///< as given, but for the property lists
+    DecodingRoles roles; ///< as given, but `propertyLists` is `_parsedOnce`
     ClassDictionary classDict;
     CodeDictionary codeDictionary;
 
 private:
-    ParsedOnce _parsedOnce; ///< the sections', through `roles`
+    ParsedOnce _parsedOnce; ///< used by the sections
 };
 
 } // namespace kestrum

@@ -12,7 +12,7 @@ namespace {
 constexpr int kSuccess = 0, kTooSmall = 3;
 constexpr std::uint16_t kVersionReportCode = 0x1FFD;
 
-/// A text in a field of `width` bytes that is 0: cut where it is too long, always ended by a NUL.
+/// Copies a text to a field of `width` zero bytes. A longer text is cut, so that a NUL always ends it.
 void put(std::string_view text, std::span<std::byte> report, std::size_t offset, std::size_t width)
 {
     std::ranges::copy(bytesOf(text.substr(0, width - 1)), report.subspan(offset, width).begin());
@@ -27,7 +27,7 @@ int QrelDLFAddVersionReport(std::byte* output, std::uint32_t capacity, std::uint
     written = 0;
     if (capacity < kDlfVersionReportSize)
         return kTooSmall;
-    // What is not named, time stamp included, is 0.
+    // All other bytes, the time stamp included, are 0.
     const std::span report(output, kDlfVersionReportSize);
     std::ranges::fill(report, std::byte{0});
     FieldWriter(report)

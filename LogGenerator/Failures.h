@@ -6,10 +6,10 @@
 
 namespace kestrum {
 
-/// An internal inconsistency: where it was found, and what it is. `what()` tells it all.
+/// An internal inconsistency, with the place where it was found. `what()` contains all fields.
 class AssertionFailure : public std::runtime_error {
 public:
-    /// `object` is the one, or the class, whose operation found it. An empty `file` is reported as "<Unknown File>".
+    /// `object` is the object or class whose operation found it. An empty `file` is reported as "<Unknown File>".
     AssertionFailure(const std::string& operation, const std::string& object, const std::string& file, int line,
                      std::string description);
 

@@ -9,7 +9,7 @@ namespace {
 
 constexpr std::size_t kHistoryLength = 5;
 
-/// Beside "Display": {"Technology": who built it, "Display": that very container}.
+/// Key of {"Technology": the technology that built the display, "Display": the same container as under "Display"}.
 constexpr std::string_view kOrigin = "DisplayOrigin";
 
 bool isSameContainer(const Value& left, const Value& right)

@@ -9,47 +9,47 @@
 
 namespace kestrum {
 
-/// Interprets the diagnostic log of one baseband technology. It keeps its decoding machinery alone; what it decodes
-/// goes into the state. Main thread only.
+/// Decodes the diagnostic log of one baseband technology into a state that the caller owns. The roles are borrowed.
+/// Main thread only.
 class LogGenerator {
 public:
     virtual ~LogGenerator() = default;
     LogGenerator(const LogGenerator&) = delete;
     LogGenerator& operator=(const LogGenerator&) = delete;
 
-    /// A new generator for the technology that the telephony service named; null for any other value.
+    /// Creates the generator of a technology (a kVoxLogChannelTechnology_... text); null for any other value.
     static std::unique_ptr<LogGenerator> generatorFromTechnology(const Value& technology, DecodingRoles& roles);
 
-    /// The identifier of the technology it decodes.
+    /// The identifier of the generator's technology.
     virtual std::string_view technology() const = 0;
 
-    /// Whether the state holds the display of another technology, which this one will put aside.
+    /// Whether the state holds the display of another technology, which this generator will remove.
     bool replacesDisplayOf(const State& state) const { return originOfDisplay(state) == Origin::Other; }
 
-    /// Decodes one channel message. What it throws ends this message alone.
+    /// Decodes one channel message. May throw for an invalid one; the next message can be decoded.
     virtual void updateState(State& state, Bytes withData) = 0;
-    /// The display dictionary (null when there is none yet); also rolls the history.
+    /// The display dictionary, null when there is none yet. Also appends the display to the history.
     virtual Value generateLogUsingState(State& state) = 0;
-    /// The dictionary that starts the modem's log.
+    /// The command that starts the modem's log.
     virtual DictionaryRef getStartCommand() const = 0;
-    /// What a snapshot file holds: a list of dictionaries, each with a "Description".
+    /// The contents of a snapshot file: dictionaries with a "Description" each.
     virtual ArrayRef getSaveContentsFromState(const State& state) const = 0;
 
 protected:
     explicit LogGenerator(DecodingRoles& roles);
-    /// Stays without the initialisation that logs its creation.
+    /// Selects the constructor that does not initialise the generator and does not log its creation.
     struct Uninitialized {};
     LogGenerator(DecodingRoles& roles, Uninitialized) : _roles(roles) {}
 
-    /// Appends a snapshot of the display to the history, which keeps the newest five.
+    /// Appends a copy of the display to the history, which keeps the newest five.
     void updateHistoryInState(State& state) const;
 
-    /// Who built the "Display" of the state. A restart of the service may have brought another technology since.
+    /// Which technology built the "Display" of the state: a restart of the service may change the technology.
     enum class Origin { None, Own, Other, Unknown };
     Origin originOfDisplay(const State& state) const;
-    /// Sets "Display", and remembers that this technology built it.
+    /// Sets "Display", and records in the state that this technology built it.
     void setDisplay(State& state, Value display) const;
-    /// Removes what another technology left to be shown, so that nothing of it looks current. "History" stays.
+    /// Removes another technology's display and its data, so that no old value looks current. "History" stays.
     void dropForeignDisplay(State& state) const;
 
     DecodingRoles& _roles;

@@ -6,14 +6,14 @@
 
 namespace kestrum {
 
-/// Property lists that remember the list they parsed last: up to five sections read the list of one record, and the
-/// service often sends the same list again. Callers share the value and do not change it.
+/// Caches the last parsed property list: up to five sections read the list of one record, and the service often repeats
+/// a list. Callers share the value and must not change it.
 class ParsedOnce final : public PropertyLists {
 public:
     explicit ParsedOnce(PropertyLists& lists) : _lists(lists) {}
 
     Value parse(Bytes bytes) override;
-    /// What it parsed last is spent instead.
+    /// Ignores its second argument: the memory of the cached value is reused.
     Value parseOver(Bytes bytes, Value /*spent*/) override { return parse(bytes); }
     std::optional<Data> toXml(const Value& value) const override { return _lists.toXml(value); }
     Value load(const std::string& path) const override { return _lists.load(path); }
@@ -25,7 +25,7 @@ public:
 private:
     PropertyLists& _lists;
     std::vector<std::byte> _bytes;
-    Value _value; ///< what `_bytes` are
+    Value _value; ///< parsed from `_bytes`
 };
 
 } // namespace kestrum

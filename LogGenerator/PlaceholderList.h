@@ -4,8 +4,7 @@
 
 namespace kestrum {
 
-/// A list that stays empty: which cells of its record belong to it is not known. The record empties it, nothing fills
-/// it.
+/// A list that stays empty: it is not known which cells of its record belong to it. Each record empties it.
 class PlaceholderList : public Base {
 public:
     using Base::Base;

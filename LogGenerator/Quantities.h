@@ -19,25 +19,25 @@ constexpr std::uint32_t fieldOf(Quantity::Raw raw)
     return static_cast<std::uint32_t>(raw);
 }
 
-/// The number that `Number` makes of a field.
+/// Applies `Number` to a field.
 template <auto Number>
 constexpr double numberOf(Quantity::Raw raw)
 {
     return static_cast<double>(Number(fieldOf(raw)));
 }
 
-/// Names, and texts that measure nothing: what `Word` makes of a field.
+/// A quantity with a text but no number, such as a state's name. `Word` gives the text of a field.
 template <auto Word>
 inline constexpr Quantity named{[](Quantity::Raw raw) { return std::string(Word(fieldOf(raw))); }};
 
-/// The text at `value` in a table of names that begins at 0; "Unknown" beyond its end.
+/// The name at index `value`; "Unknown" beyond the table's end.
 template <std::size_t Count>
 constexpr std::string_view nameIn(const std::string_view (&names)[Count], std::uint32_t value)
 {
     return value < Count ? names[value] : std::string_view("Unknown");
 }
 
-// The integers that a field can hold.
+// Interpretations of a field as an integer.
 constexpr std::int32_t signed32(std::uint32_t raw)
 {
     return static_cast<std::int32_t>(raw);
@@ -55,16 +55,16 @@ constexpr std::uint32_t unsigned32(std::uint32_t raw)
     return raw;
 }
 
-/// A plain number, in decimal.
+/// A decimal number without a unit.
 template <auto Number>
 inline constexpr Quantity decimal{[](Quantity::Raw raw) { return std::to_string(Number(fieldOf(raw))); },
                                   numberOf<Number>};
-/// A word is printed as signed 32 bits: from 2^31 it shows negative.
+/// Kept: 32-bit fields are printed as signed numbers; field logs show values from 2^31 as negative.
 inline constexpr const Quantity& decimalSigned32 = decimal<signed32>;
 inline constexpr const Quantity& decimalSigned16 = decimal<signed16>;
 inline constexpr const Quantity& decimalUnsigned = decimal<unsigned32>;
 
-/// Levels and ratios: whole ones as "-98 dBm" and "-11 dB", others with two digits after the point.
+/// Levels in dBm and ratios in dB: integers as "-98 dBm" and "-11 dB", others with two digits after the point.
 template <auto Number>
 inline constexpr Quantity inWholeDbm{[](Quantity::Raw raw) { return formatted("%d dBm", Number(fieldOf(raw))); },
                                      numberOf<Number>, "dBm"};

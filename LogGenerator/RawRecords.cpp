@@ -6,9 +6,9 @@
 namespace kestrum {
 namespace {
 
-// A capacity holds this many full blocks: at most one part in as many is dropped too early.
+// Full blocks in the capacity. Dropping one block so drops at most 1/kBlocks of the capacity too early.
 constexpr std::size_t kBlocks = 16;
-// An ordinary interval is far smaller. Room for more is not kept after a flood.
+// An ordinary interval is far smaller. Larger memory is freed after a flood.
 constexpr std::size_t kLargestReserve = 1 << 20;
 
 } // namespace
@@ -41,7 +41,7 @@ RawRecords::Interval RawRecords::take()
         _full.clear();
         _fullBytes = 0;
     }
-    // The next interval will be much like this one.
+    // Reserves memory for an interval of the same size.
     _newest.bytes.reserve(std::min(interval.bytes.size() + interval.bytes.size() / 8, kLargestReserve));
     return interval;
 }

@@ -8,8 +8,8 @@
 
 namespace kestrum {
 
-/// The raw messages of one refresh interval, one behind the other. Its size does not follow the peer's rate: at the
-/// bound the oldest messages are dropped and counted.
+/// The raw messages of one refresh interval, one after the other. Its memory is bounded: above `capacity` the oldest
+/// messages are dropped and counted.
 class RawRecords {
 public:
     static constexpr std::size_t kCapacity = 64 << 20; ///< bytes
@@ -20,13 +20,13 @@ public:
 
     struct Interval {
         std::vector<std::byte> bytes;
-        std::size_t dropped = 0; ///< messages that are missing at the beginning
+        std::size_t dropped = 0; ///< messages missing at the beginning
     };
-    /// What was appended since the last call.
+    /// The messages since the last call.
     Interval take();
 
 private:
-    // Whole messages. The oldest are dropped a block at a time, because nothing tells where a message in it ends.
+    // Whole messages. The oldest block is dropped as a whole, because it does not record where its messages end.
     struct Block {
         std::vector<std::byte> bytes;
         std::size_t messages = 0;

@@ -14,14 +14,14 @@
 
 namespace kestrum {
 
-/// One line of a record's layout: where the field stands, the key it is shown under, what its raw value means.
+/// One line of a record's layout: the field, its key in the display, and its quantity.
 struct Row {
     Field field;
     std::string_view key;
     QuantityRef quantity;
 };
 
-/// Where the last field of a layout ends.
+/// The offset behind the last field of a layout.
 constexpr std::size_t reach(std::span<const Row> rows)
 {
     std::size_t end = 0;
@@ -33,8 +33,8 @@ constexpr std::size_t reach(std::span<const Row> rows)
 /// Sets the key of each row whose field lies inside the record; the other keys keep their values.
 void show(Record record, std::span<const Row> rows, Dictionary& into);
 
-/// Elements that follow one another inside a record. Where they overlap or leave gaps, `length`, the bytes that an
-/// element's fields take, differs from `stride`.
+/// Equal elements inside a record. `stride` is the distance between two elements, `length` the bytes of one; they
+/// differ when elements overlap or leave gaps.
 struct Elements {
     std::size_t first;
     std::size_t stride;
@@ -45,14 +45,14 @@ struct Elements {
     {}
 };
 
-/// The element of that index; nothing unless all of its bytes lie inside the record.
+/// The element with the index; nothing unless all of its bytes lie inside the record.
 inline std::optional<Record> elementOf(Record record, Elements elements, std::size_t index)
 {
     return record.slice(elements.first + elements.stride * index, elements.length);
 }
 
-/// Calls `use` with each element up to the first that does not lie inside the record: a count may promise more than
-/// there is.
+/// Calls `use` with each element. Ends at the first element that does not lie inside the record: a count may be too
+/// large.
 template <std::invocable<Record> Use>
 void forEachElement(Record record, Elements elements, std::size_t count, Use use)
 {
@@ -64,8 +64,7 @@ void forEachElement(Record record, Elements elements, std::size_t count, Use use
     }
 }
 
-/// For `Base::replaceArray` and `Base::publish`: what is to stand in a list, a row for each element with the keys that
-/// `show` sets.
+/// For `Base::replaceArray` and `Base::publish`: appends a row for each element, with the keys that `showElement` sets.
 template <std::invocable<Record, Dictionary&> Show>
 auto listed(Record record, Elements elements, std::size_t count, Show showElement)
 {
@@ -79,7 +78,7 @@ inline auto listed(Record record, Elements elements, std::size_t count, std::spa
     return listed(record, elements, count, [rows](Record element, Dictionary& row) { show(element, rows, row); });
 }
 
-/// The same with a field of each element.
+/// The same with a reading of one field for each element.
 inline auto listed(Record record, Elements elements, std::size_t count, Field field, QuantityRef quantity)
 {
     return [=](Array& list) {

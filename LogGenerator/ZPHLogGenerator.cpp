@@ -11,7 +11,7 @@
 namespace kestrum {
 namespace {
 
-/// When this file was compiled: "Aug  1 2017 22:02:27".
+/// The time of compilation: "Aug  1 2017 22:02:27".
 constexpr std::string_view kBuildText = __DATE__ " " __TIME__;
 
 std::uint64_t packedTime(Date now, Clock::Zone zone)
@@ -56,8 +56,7 @@ std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) co
                                  "Got wrong class writing history to DLF; aborting writing the DLF file");
                 return std::nullopt;
             }
-            // Without the first record's type byte, so that the stream goes on with a record's length; the further
-            // type bytes stay.
+            // Without the type byte of the interval's first record. The other records keep theirs.
             const Bytes raw = recorded.data()->bytes();
             if (raw.size() >= 2)
                 stream.insert(stream.end(), raw.begin() + 1, raw.end());

@@ -12,7 +12,7 @@
 namespace kestrum {
 namespace {
 
-/// Announced before anything is initialised.
+/// Logged before the members are initialised.
 DecodingRoles& announced(DecodingRoles& roles, const ClassIndex* index)
 {
     roles.log.write(Priority::Error, "Creating ZPHLogGenerator2 object with %p", roles.log.shownAddress(index));
@@ -26,13 +26,13 @@ ZPHLogGenerator2::ZPHLogGenerator2(DecodingRoles& roles, std::string pListName, 
       _pListName(std::move(pListName)),
       _cIndex(std::move(cIndexObj))
 {
-    // The index has this one owner.
+    // The number of the index's owners, always 1.
     _roles.log.write(Priority::Error, "Class Index: %ld", 1L);
 }
 
 ZPHLogGenerator2::~ZPHLogGenerator2()
 {
-    // The text names the GSM generator whatever the concrete class, on purpose.
+    // Kept: the line names the GSM generator for every technology; field logs show it so.
     _roles.log.write(Priority::Warning, "ZPH_GSMLogGenerator is destructed %p", _roles.log.shownAddress(this));
 }
 
@@ -40,7 +40,7 @@ void ZPHLogGenerator2::updateState(State& state, Bytes withData)
 {
     if (!isOwnDisplay(state))
         getDisplayFromState(state);
-    // Kept before it is decoded: the raw message outlives a decoder's failure.
+    // Before decoding, so that the raw message is kept when a decoder throws.
     appendToBinData(withData);
     updateWithData(withData);
 }

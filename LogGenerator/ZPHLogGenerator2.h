@@ -8,24 +8,24 @@
 
 namespace kestrum {
 
-/// The generator of the technologies whose display is a template filled in by sections: loads the template, hands
-/// each section its node, and routes every record to the sections that subscribe to its code.
+/// Base class for technologies with a template and sections: loads the template, gives each section its node, and
+/// passes every record to the sections that subscribe to its code.
 class ZPHLogGenerator2 : public ZPHLogGenerator {
 public:
     ~ZPHLogGenerator2() override;
 
-    /// The display and the section references are made before the first record is decoded.
+    /// Creates the display and the sections' references before it decodes the first record.
     void updateState(State& state, Bytes withData) override;
-    /// Decodes and routes one channel message.
+    /// Decodes one channel message and passes it to the sections of its code.
     void updateWithData(Bytes message);
 
-    /// A copy of a template node, in which each section whose name is met gets its own node. Null for what a
-    /// template cannot hold: anything but dictionaries, arrays and strings.
+    /// Copies a template node. A section whose name is a key gets the copied value as its node. Null for a value other
+    /// than a dictionary, an array or a string.
     Value processTemplate(const Value& node) const;
-    /// Walks a tree and logs what it does not know; diagnostics only.
+    /// Walks a tree and logs values of unexpected kinds; diagnostics only.
     void printDict(const Value& node) const;
 
-    /// The display in the state. The call that creates it returns null on purpose: only later ones return it.
+    /// The display in the state. Kept: the call that creates the display returns null, later calls return it.
     Value getDisplayFromState(State& state);
     Value generateLogUsingState(State& state) override;
     DictionaryRef getStartCommand() const override;
@@ -33,20 +33,20 @@ public:
 protected:
     /// `pListName`: the template's resource name, without extension.
     ZPHLogGenerator2(DecodingRoles& roles, std::string pListName, std::unique_ptr<ClassIndex> cIndexObj);
-    /// A generator without template and sections: every call on it is harmless.
+    /// A generator without template and sections: its functions do nothing.
     ZPHLogGenerator2(DecodingRoles& roles, Uninitialized uninitialized) : ZPHLogGenerator(roles, uninitialized) {}
 
 private:
-    /// Whether the display in the state is the one whose nodes the sections hold.
+    /// Whether the sections refer to nodes of the display in the state.
     bool isOwnDisplay(const State& state) const;
     Value loadTemplate(State& state) const;
-    /// Gives the sections the nodes of a display that an earlier generator built from the same template. Walks both
-    /// side by side: only keys that the template has can be sections.
+    /// Gives the sections the nodes of a display that an earlier generator built from the same template. Walks template
+    /// and display together: only the template's keys can be sections.
     void takeOver(const Value& templateNode, const Value& displayNode) const;
 
     std::string _pListName;
     std::unique_ptr<ClassIndex> _cIndex;
-    SectionRef _display; ///< whose nodes the sections hold
+    SectionRef _display; ///< the display with the sections' nodes
 };
 
 } // namespace kestrum

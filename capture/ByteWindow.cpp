@@ -28,7 +28,7 @@ ByteWindow::ByteWindow(Bytes bytes)
 Bytes ByteWindow::peek(std::size_t count)
 {
     while (_end - _begin < count && !_ended) {
-        // Bytes before the window are dropped once they are as many as those in it: each byte moves once on average.
+        // Drops the bytes before the window when they are as many as those in it, so each byte moves once on average.
         if (_begin >= _end - _begin) {
             std::copy(_held.begin() + static_cast<std::ptrdiff_t>(_begin),
                       _held.begin() + static_cast<std::ptrdiff_t>(_end), _held.begin());

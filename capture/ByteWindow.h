@@ -10,10 +10,10 @@
 
 namespace kestrum {
 
-/// The unread rest of a file, a pipe or memory. Holds only as much of it as is looked at.
+/// The unread rest of a file, a pipe or memory. Buffers only the bytes that were peeked.
 class ByteWindow {
 public:
-    /// Reads some bytes, waiting for them where it must; 0 at the (present) end.
+    /// Reads some bytes, and waits for them if necessary. 0 at the end, which may be the end only for now.
     using Read = std::function<std::size_t(std::span<std::byte>)>;
 
     explicit ByteWindow(Read read) : _read(std::move(read)) {}
@@ -22,13 +22,13 @@ public:
     /// The bytes outlive the window.
     explicit ByteWindow(Bytes bytes);
 
-    /// All bytes held, at least `count` unless the input ends before; valid until the next call.
+    /// The buffered bytes, at least `count` unless the input ends before. Valid until the next call.
     Bytes peek(std::size_t count);
-    /// `count` is at most what was peeked.
+    /// Skips bytes. `count` is at most the size of the last peek.
     void skip(std::size_t count);
-    /// Where in the input the window begins.
+    /// The offset of the window's beginning in the input.
     std::uint64_t offset() const { return _offset; }
-    /// Reads again where the input had ended: it may have grown.
+    /// Allows reading after the end of the input: the input may have grown.
     void resume() { _ended = false; }
 
 private:

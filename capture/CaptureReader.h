@@ -11,20 +11,20 @@
 
 namespace kestrum {
 
-/// Bytes of a capture that are no message, or a message that has a flaw.
+/// Bytes of a capture that are no message, or a message with a flaw.
 struct CaptureFault {
     std::uint64_t offset;
-    std::uint64_t size; ///< bytes skipped; 0: none
+    std::uint64_t size; ///< bytes skipped; 0 for a message with a flaw
     std::string reason;
 };
 
-/// What a reader does where a capture is damaged.
+/// What a reader does at damage.
 enum class OnDamage {
-    Stop,  ///< Messages are taken by their lengths alone, up to the first length that cannot be true.
-    Search ///< The next message is searched for; what lies between is reported as skipped.
+    Stop,  ///< Reads messages by their lengths only, and ends at the first impossible length.
+    Search ///< Searches for the next message, and reports the bytes before it as skipped.
 };
 
-/// Reads the channel messages of a capture of any length, in time and memory that do not grow with what it skips.
+/// Reads the channel messages of a capture of any size. Memory does not grow with the number of skipped bytes.
 class CaptureReader {
 public:
     using OnFault = std::function<void(const CaptureFault&)>;
@@ -37,10 +37,10 @@ public:
     static std::unique_ptr<CaptureReader> make(CaptureFormat format, ByteWindow& window, OnDamage onDamage,
                                                OnFault onFault);
 
-    /// The next message, valid until the next call, with the window at its beginning; nothing at the end, and where reading stops at damage. While the
-    /// input may still grow, a message that is not yet complete is waited for.
+    /// The next message, valid until the next call; the window is then at its beginning. Nothing at the end, or when
+    /// reading stops at damage. With `mayGrow`, nothing also for an incomplete message, which is read again later.
     std::optional<Bytes> next(bool mayGrow = false);
-    /// How many messages are missing so far, as the capture's notes say.
+    /// The number of missing messages by the capture's notes so far.
     std::uint64_t missing() const { return _missing; }
 
 protected:
@@ -48,18 +48,18 @@ protected:
         : _window(window), _onDamage(onDamage), _onFault(std::move(onFault))
     {}
 
-    /// What stands at the window's beginning.
+    /// A message, or no message, at the window's beginning.
     struct Found {
-        std::size_t size = 0;                  ///< of the message with what frames it; 0: no message
-        bool incomplete = false;               ///< no message yet: the stream ends before the message does
-        std::string reason = {};               ///< why there is none; of a message: its flaw
-        std::optional<std::uint64_t> gap = {}; ///< not a message but a note that this many are missing here
+        std::size_t size = 0;                  ///< bytes of the message and its framing; 0: no message
+        bool incomplete = false;               ///< no message yet: the stream ends before its end
+        std::string reason = {};               ///< why there is no message; or the message's flaw
+        std::optional<std::uint64_t> gap = {}; ///< a note instead of a message: this many messages are missing
     };
-    /// By the length alone.
+    /// Finds a message by its length only.
     virtual Found byLength() = 0;
-    /// Behind a message, where the next one should begin: by the length, unless the bytes behind it contradict it.
+    /// Finds a message directly after another one: by its length, unless the following bytes contradict it.
     virtual Found inOrder() = 0;
-    /// Behind damage, where anything may stand: only what is very unlikely to be an accident.
+    /// Finds a message after damage: accepts only bytes that are very unlikely to look like a message by accident.
     virtual Found behindDamage() = 0;
     /// The channel message in the first `size` bytes of the window.
     virtual Bytes message(std::size_t size) = 0;
@@ -77,7 +77,7 @@ private:
     const OnDamage _onDamage;
     OnFault _onFault;
     bool _mayGrow = false, _hasStopped = false;
-    std::size_t _given = 0; ///< bytes of the message given last, which are still in the window
+    std::size_t _given = 0; ///< bytes of the last returned message, still in the window
     std::uint64_t _missing = 0;
     std::optional<CaptureFault> _skipping;
 };

@@ -39,7 +39,7 @@ bool writeDlf(const ByteSink& to, Bytes message)
     const Bytes record = read->record.bytes().subspan(kType);
     if (record.size() < ChannelMessage::kHeaderSize - kType || record.size() > kLongest)
         return false;
-    // The length as it is, whatever the record says.
+    // Writes the true length, not the one in the record.
     std::array<std::byte, kLength> length{};
     FieldWriter(length).set(u16(0), static_cast<std::int64_t>(record.size()));
     to(length);

@@ -12,8 +12,8 @@ constexpr std::size_t kLengthSize = 4;
 constexpr std::size_t kHead = kLengthSize + ChannelMessage::kPrefixSize + ChannelMessage::kHeaderSize + 5;
 constexpr Field kRecordLength = u16(1);
 
-// How far lengths are followed ahead of a message whose contents do not agree with its length. Arbitrary bytes taken
-// for lengths lead to an impossible one much sooner.
+// Lengths are followed this far after a message whose contents do not agree with its length. Arbitrary bytes read as
+// lengths lead to an impossible length much sooner.
 constexpr std::size_t kLookAhead = 1 << 20;
 
 bool endsAsXml(Bytes list)
@@ -24,8 +24,8 @@ bool endsAsXml(Bytes list)
     return text.ends_with("</plist>") || text.ends_with("<plist/>");
 }
 
-// The trailer of a binary property list counts its objects, and says where the table of their offsets begins: the
-// table ends where the trailer begins.
+// The trailer of a binary property list has the number of its objects and the offset of the table of their offsets. The
+// table must end where the trailer begins.
 bool endsAsBinary(Bytes list)
 {
     constexpr std::size_t kTrailer = 32, kWidth = 6, kCount = 8, kTable = 24;
@@ -47,7 +47,7 @@ bool endsAsPropertyList(Bytes list)
     return isPropertyList(list) && (endsAsXml(list) || endsAsBinary(list));
 }
 
-// Decided by the head alone, so that a search need not read as far as every supposed length reaches.
+// Checks the header only, so that a search does not read to the end of every supposed message.
 bool maybeBeginsMessage(Bytes head, std::size_t length)
 {
     if (isPropertyList(head))
@@ -75,7 +75,7 @@ bool isSound(Bytes message)
     return payload && endsAsPropertyList(payload->bytes());
 }
 
-/// How many messages are missing; nothing where no whole note stands.
+/// The number of missing messages; nothing without a complete note.
 std::optional<std::uint64_t> gapIn(Bytes bytes)
 {
     const Record note(bytes);
@@ -105,8 +105,8 @@ KcapReader::Look KcapReader::look(std::size_t at)
     return {isSound(all.subspan(at + kLengthSize, *length)) ? Sound::Yes : Sound::Perhaps, size};
 }
 
-// Whether the lengths lead on from `at`: to the end, to a message whose contents agree, or far enough. Each part of the
-// stream is followed once: the messages on the way share the result.
+// Whether the lengths from `at` lead to the end, to a message whose contents agree, or far enough. Each part of the
+// stream is followed once; the messages on the way share the result.
 bool KcapReader::leadsOn(std::size_t at)
 {
     if (_window.offset() + at <= _followedTo)
@@ -167,7 +167,7 @@ CaptureReader::Found KcapReader::inOrder()
     const auto here = look(0);
     if (here.sound != Sound::Perhaps || leadsOn(here.size))
         return found(here);
-    // There is damage ahead: this length is true unless it hides a message.
+    // Damage follows: the length is true unless another message begins inside it.
     for (std::size_t at = 1; at < here.size; ++at)
         if (proof(at) == Sound::Yes)
             return {.reason = formatted("no message follows the one of %lu bytes", here.size - kLengthSize)};

@@ -4,8 +4,8 @@
 
 namespace kestrum {
 
-/// Messages of a channel capture: each behind its length, 32 bits, little-endian. Where the lengths lead from one
-/// message to the next, they alone decide, whatever the messages hold.
+/// Reads a channel capture: a length (32 bits, little-endian) before each message. Lengths that lead to the end of the
+/// capture are true; the contents of the messages do not matter then.
 class KcapReader final : public CaptureReader {
 public:
     KcapReader(ByteWindow& window, OnDamage onDamage, OnFault onFault)
@@ -19,21 +19,21 @@ protected:
     Bytes message(std::size_t size) override;
 
 private:
-    /// Perhaps: its length is possible. Yes: its contents agree with its length.
+    /// Perhaps: the length is possible. Yes: the contents agree with the length.
     enum class Sound { No, Incomplete, Perhaps, Yes };
     struct Look {
         Sound sound;
-        std::size_t size; ///< with the length before it
+        std::size_t size; ///< the message and the length before it
     };
-    /// What stands `at` bytes into the window.
+    /// Checks the message at offset `at` of the window.
     Look look(std::size_t at);
     Found found(const Look& look);
     bool leadsOn(std::size_t at);
-    /// Yes: what stands at `at` is very unlikely to be an accident. Incomplete: its missing rest would have to decide.
+    /// Yes: the bytes at `at` are very unlikely to look like a message by accident. Incomplete: more bytes are needed.
     Sound proof(std::size_t at);
 
-    std::uint64_t _followedTo = 0; ///< in the stream: as far as the lengths were followed ahead
-    bool _leadsOn = false;         ///< what was found there
+    std::uint64_t _followedTo = 0; ///< offset in the stream up to which the lengths were followed
+    bool _leadsOn = false;         ///< the result there
 };
 
 } // namespace kestrum

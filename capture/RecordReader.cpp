@@ -10,12 +10,12 @@ namespace kestrum {
 namespace {
 
 constexpr std::size_t kHead = 12;    // length, log code, time stamp
-constexpr std::size_t kBeyond = 256; // how far a record may reach behind the end that it says
+constexpr std::size_t kBeyond = 256; // bytes that a record may be longer than its length
 constexpr std::size_t kLongestPreamble = 3;
 constexpr LogCode kMostExtraCode = 0xFF;
 constexpr std::byte kOrdinary{ChannelMessage::kOrdinary}, kExtraCode{ChannelMessage::kExtraCode};
 
-// How far lengths are followed ahead; and how far ahead a record is searched that time stamps prove, twice the longest.
+// How far lengths are followed; and how far a record proven by time stamps is searched (twice the longest record).
 constexpr std::size_t kLookAhead = 1 << 20, kSearch = 128 << 10;
 
 // Time stamps in counts of 1.25 ms since 1980.
@@ -29,7 +29,7 @@ bool isLikely(std::uint64_t stamp)
     return count > kEarliest && count < kLatest;
 }
 
-// A stamp of 0 is none, and fits any other.
+// A stamp of 0 means none and agrees with every other.
 bool isNear(std::uint64_t left, std::uint64_t right)
 {
     const auto [early, late] = std::minmax({left >> kSubdivisionBits, right >> kSubdivisionBits});
@@ -38,7 +38,7 @@ bool isNear(std::uint64_t left, std::uint64_t right)
 
 } // namespace
 
-// In the order in which they are tried: complete ones first. A preamble of 2 bytes is a prefix without its marker.
+// In the order of the tries: complete ones first. A preamble of 2 bytes is a prefix without its marker.
 const RecordReader::Preamble RecordReader::kPreambles[] = {
     {1, true, false}, {3, true, false}, {0, false, false}, {2, false, false}, {1, true, true}};
 constexpr std::size_t kPrefixAndType = 1, kNoPreamble = 2, kAnyType = 4;
@@ -66,7 +66,7 @@ std::optional<RecordReader::Head> RecordReader::headAt(std::size_t at, const Pre
     return Head{&preamble, length, record.read(u16(2)).value_or(0), stamp};
 }
 
-// The record at `at` of an undamaged stream: whole, with the preamble that records of this origin have there.
+// The record at `at` of an undamaged stream: complete, with the preamble that this origin has there.
 std::optional<RecordReader::Head> RecordReader::framed(std::size_t at)
 {
     const Bytes all = _window.peek(at + 1);
@@ -79,7 +79,7 @@ std::optional<RecordReader::Head> RecordReader::framed(std::size_t at)
     return head && _window.peek(end).size() >= end ? head : std::nullopt;
 }
 
-// Each length leads to one place, so what was followed to an impossible length is not followed again.
+// A length always leads to the same place, so records that led to an impossible length are not followed again.
 RecordReader::Chain RecordReader::follow()
 {
     const auto offset = _window.offset();
@@ -102,8 +102,8 @@ RecordReader::Chain RecordReader::follow()
     return Chain::GoesOn;
 }
 
-// Whether the lengths decide from the window's beginning on. Lengths that were followed far without meeting the end
-// decide unless time stamps prove that a record begins elsewhere.
+// Whether the lengths from the window's beginning are true. Lengths that lead far without reaching the end are true
+// unless time stamps prove that a record begins elsewhere.
 bool RecordReader::leadsOn(const Head& head)
 {
     const auto next = framed(head.size());
@@ -149,7 +149,7 @@ RecordReader::Next RecordReader::whatFollows(std::size_t at, std::uint64_t stamp
             continue;
         if (isNear(head->stamp, stamp))
             return Next::Record;
-        // Time may jump, where a log was interrupted; then it goes on from there.
+        // Time may jump where a log was interrupted. Later stamps are near the new time.
         const std::size_t end = at + preamble.size + head->length;
         if (links > 0 && isLikely(head->stamp) && _window.peek(end).size() >= end &&
             whatFollows(end, head->stamp, links - 1) != Next::Nothing)
@@ -164,7 +164,7 @@ std::size_t RecordReader::endOfPropertyList(std::size_t at)
     constexpr std::string_view kBegin = "<?xml", kEnd = "</plist>";
     if (!textOf(_window.peek(at + kBegin.size())).substr(std::min(at, _window.peek(at).size())).starts_with(kBegin))
         return 0;
-    // The same end serves all lists that would begin before it, and is searched for once.
+    // All lists that would begin before this end share it, so it is searched once.
     const auto offset = _window.offset();
     if (_list.from > offset + at || (_list.end == 0 ? _list.to : _list.end) <= offset + at) {
         const auto all = textOf(_window.peek(at + kLongestMessage));
@@ -182,8 +182,8 @@ bool RecordReader::isInTime(std::uint64_t stamp) const
     return _lastStamp != 0 ? isNear(stamp, _lastStamp) : stamp == 0 || isLikely(stamp);
 }
 
-// Whether its time stamp speaks for a record that ends at `end`: of a likely year, near the last one, or, where
-// none is known yet, near the next two.
+// Whether the time stamp of a record that ends at `end` is plausible: in a likely year, near the last stamp, or, when
+// none is known, near the next two.
 bool RecordReader::isFamiliar(const Head& head, std::size_t end)
 {
     if (head.stamp == 0)
@@ -264,7 +264,7 @@ CaptureReader::Found RecordReader::inOrder()
     const auto found = look(0, Evidence::Structure);
     if (found.size != 0)
         return accept(*found.head, found.size);
-    // Damage is ahead: this record is whole unless it hides another one.
+    // Damage follows: the record is complete unless another one begins inside it.
     if (!found.head && record && !isContradicted(*record))
         return accept(*record, size);
     if (!found.head)
@@ -273,7 +273,7 @@ CaptureReader::Found RecordReader::inOrder()
                 .reason = "no record begins here"};
 
     _accepted = found.head;
-    // What it says of its length is not true when the next record begins elsewhere.
+    // The record's length is wrong when the next record begins elsewhere.
     const std::size_t said = found.head->size();
     const std::size_t there = std::min(_window.peek(said + kBeyond).size(), said + kBeyond);
     for (std::size_t at = found.head->preamble->size + kHead; at < there; ++at)
@@ -291,7 +291,7 @@ CaptureReader::Found RecordReader::behindDamage()
 {
     if (const auto found = look(0, Evidence::TimeStamp); found.size != 0)
         return accept(*found.head, found.size);
-    // Where no stamps help, the lengths have to lead on from here, and not at once to the end by accident.
+    // Without helpful stamps, the lengths must lead on from here, and not directly to the end by accident.
     if (const auto record = framed(0); record && !isProvenAhead() && follow() != Chain::Breaks && _way.size() > 1)
         return accept(*record, record->size());
     return {.incomplete = _window.peek(kLongestPreamble + kHead).size() < kLongestPreamble + kHead};

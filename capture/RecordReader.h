@@ -7,9 +7,9 @@
 
 namespace kestrum {
 
-/// Log records one behind the other: length, log code, time stamp, payload. Where the lengths lead from record to record
-/// up to the end, they alone decide; time stamps help where they do not. A time stamp is only a hint: a modem without
-/// network time counts from 1980, and any stamp may be wrong.
+/// Reads log records (length, log code, time stamp, payload) that follow one another. Lengths that lead to the end are
+/// true; otherwise time stamps help. A time stamp is only a hint: a modem without network time counts from 1980, and
+/// any stamp may be wrong.
 class RecordReader final : public CaptureReader {
 public:
     enum class Origin {
@@ -31,7 +31,7 @@ protected:
     Bytes message(std::size_t size) override;
 
 private:
-    /// What stands before the length.
+    /// The bytes before the length.
     struct Preamble {
         std::size_t size;
         bool inInterval; ///< records of an interval may have it
@@ -41,7 +41,7 @@ private:
 
     struct Head {
         const Preamble* preamble;
-        std::size_t length; ///< as the record says, 12 bytes of header included
+        std::size_t length; ///< from the record, 12 bytes of header included
         std::uint32_t code;
         std::uint64_t stamp;
 
@@ -49,7 +49,7 @@ private:
     };
     std::optional<Head> headAt(std::size_t at, const Preamble& preamble);
     std::optional<Head> framed(std::size_t at);
-    /// Where the lengths lead: to the end of the stream, farther than is looked, or to an impossible length.
+    /// The lengths lead to the end of the stream, beyond the limit of the search, or to an impossible length.
     enum class Chain { Ends, GoesOn, Breaks };
     Chain follow();
     bool leadsOn(const Head& head);
@@ -61,9 +61,9 @@ private:
 
     enum class Next { Nothing, End, Record };
     Next whatFollows(std::size_t at, std::uint64_t stamp, int links);
-    /// What makes a record: what follows it, or that and a time stamp that fits.
+    /// The evidence for a record: the bytes after it, or these and a plausible time stamp.
     enum class Evidence { Structure, TimeStamp };
-    /// The record at `at`: its size where the evidence is there; else the likeliest head.
+    /// The record at `at`: its size when the evidence suffices; else the most likely head.
     struct Look {
         std::size_t size = 0;
         bool incomplete = false;
@@ -73,13 +73,13 @@ private:
     std::size_t endOfPropertyList(std::size_t at);
 
     Origin _origin;
-    // Offsets in the stream. Results are kept, so that no part of the stream is searched again for each record.
-    std::vector<std::uint64_t> _way; ///< the records that were followed last
+    // Offsets in the stream. Cached results, so that no part of the stream is searched twice.
+    std::vector<std::uint64_t> _way; ///< the records followed last
     Chain _chain = Chain::Breaks;    ///< where they lead
     std::set<std::uint64_t> _broken; ///< records whose lengths lead to an impossible one
     std::uint64_t _searchedTo = 0;   ///< time stamps prove no record before this place
     struct {
-        std::uint64_t from = 0, end = 0; ///< the first end of a list behind `from`; 0: none before `to`
+        std::uint64_t from = 0, end = 0; ///< the first end of a list after `from`; 0: none before `to`
         std::uint64_t to = 0;
     } _list;
     std::uint64_t _lastStamp = 0;

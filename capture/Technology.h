@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// The technology (kVoxLogChannelTechnology_...) that alone has such messages; nothing for what several may send.
+/// The only technology (kVoxLogChannelTechnology_...) that sends such messages; nothing when several may.
 std::optional<std::string_view> technologyOf(Bytes message);
 
 } // namespace kestrum

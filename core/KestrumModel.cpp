@@ -30,7 +30,7 @@ KestrumModel::~KestrumModel()
 
 void KestrumModel::startMonitor()
 {
-    // The wait for a reply serves timers and messages, which may call this again.
+    // The wait for a reply serves timers and messages, which may call this function.
     if (_displayUpdateTimer || _starting)
         return;
     const auto self = shared_from_this();

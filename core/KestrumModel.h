@@ -18,74 +18,74 @@ namespace kestrum {
 
 class Timer;
 
-/// Whom the model tells of its changes: always from the main queue, never from inside a call of the model.
+/// Receives the model's notifications, always from the main queue and never from inside a call of the model.
 class KestrumModelObserver {
 public:
     virtual ~KestrumModelObserver() = default;
-    /// New data has come since the display was last asked for.
+    /// The display has new data.
     virtual void updateViewControllerFromModel() = 0;
-    /// An attempt to start has ended: monitoring runs, or the next attempt is waited for.
+    /// An attempt to start has ended: monitoring runs, or the model waits for the next attempt.
     virtual void updateStatus() = 0;
-    /// The modem runs another technology than the one whose display was shown: nothing of that is current.
+    /// The modem now runs another technology: the display that was shown is out of date.
     virtual void displayReplaced() = 0;
-    /// The service has dropped messages that this display did not take in time; see `lostMessages`.
+    /// The service has dropped messages that this display did not read in time; see `lostMessages`.
     virtual void messagesLost() = 0;
 };
 
-/// The one object between the telephony service and the screens: owns the log channel, the generator, its state and
-/// the display tree. Main thread only.
+/// Connects the telephony service with the screens: owns the log channel, the generator, its state and the display
+/// tree. Main thread only.
 ///
-/// Always held by a shared_ptr. The refresh timer and a waiting retry hold it too: while monitoring runs the model
-/// lives on when its owner lets it go, until the queue's tasks and timers are dropped.
+/// Always owned by shared_ptrs. The refresh timer and a pending retry own it too: while monitoring runs the model lives
+/// until the queue's tasks and timers are destroyed.
 class KestrumModel final : public std::enable_shared_from_this<KestrumModel> {
 public:
-    /// Opens nothing yet. The roles are borrowed, and outlive the model.
+    /// Opens nothing. The roles are borrowed and outlive the model.
     explicit KestrumModel(MonitorRoles& roles);
     /// Closes the channel.
     ~KestrumModel();
     KestrumModel(const KestrumModel&) = delete;
     KestrumModel& operator=(const KestrumModel&) = delete;
 
-    /// Borrowed; null for nobody. Whoever goes before the model takes itself out.
+    /// Borrowed, may be null. Reset it before the observer is destroyed.
     void setObserver(KestrumModelObserver* observer) { _observer = observer; }
 
-    /// Opens the channel, asks for the technology, has the log started and refreshes every 2 s. Every failure closes
-    /// the channel and is tried again 5 s later. Nothing happens while monitoring runs or is being started.
+    /// Opens the channel, asks for the technology, starts the log and refreshes every 2 s. After a failure it closes
+    /// the channel and tries again 5 s later. Does nothing while monitoring runs or is being started.
     void startMonitor();
     void restartMonitor();
 
-    /// The log channel is open in both directions.
+    /// Whether the log channel is open in both directions.
     bool isConnected() const;
     /// Why the last attempt to connect failed; nothing when it did not, or when there is nothing to say.
     const std::optional<Problem>& connectionProblem() const { return _problem; }
-    /// Log messages that the service has dropped because this display did not take them in time, since the start.
+    /// The number of messages that the service has dropped since the start because this display did not read them.
     std::uint64_t lostMessages() const { return _lostMessages; }
-    /// The same in words for a person.
+    /// The same as text for the user.
     std::string lossNotice() const;
 
-    /// Takes one log message. What it holds can be nonsense: it is logged, and the next message is served.
+    /// Decodes one log message. An invalid message is logged and has no other effect.
     void updateWithData(Bytes data);
 
-    /// Looks after the channel, and has the display rebuilt when messages have come since the last time.
+    /// Checks that the channel is open, and rebuilds the display when messages have arrived since the last refresh.
     void refresh();
 
-    /// The root of the display tree, built when there is none; null without a generator.
+    /// The root of the display tree, built when needed; null without a generator.
     KestrumModelNodeRef topLevelNodes();
     /// The node under a path, see `joinPath`; null when there is none.
     KestrumModelNodeRef nodeAtPath(const std::string& path);
 
-    /// What a snapshot can hold: dictionaries, each with a "Description". The list is the caller's, its entries are
-    /// the history's own. Null without a generator.
+    /// The contents of a snapshot: dictionaries with a "Description" each. The list is new, its entries are shared with
+    /// the history. Null without a generator.
     ArrayRef getSaveContents() const;
 
     // The log channel (LogChannel.cpp).
 
-    /// Opens the channel. False when it cannot be opened, which is logged; what was opened stays for `destroyPorts`.
+    /// Opens the channel. False, with a log line, when it cannot be opened; call `destroyPorts` then.
     bool createPorts();
-    /// Stops the refresh timer and closes the channel; harmless in any state.
+    /// Stops the refresh timer and closes the channel. Can be called in any state.
     void destroyPorts();
-    /// Asks the service which technology the modem runs, and takes that technology's generator, or none for a
-    /// technology without one. When there is no answer the earlier generator stays, on purpose.
+    /// Asks the service for the modem's technology and creates its generator, or none for an unknown technology.
+    /// Kept: without an answer the earlier generator stays in use.
     void configureGenerator();
 
 private:
@@ -107,20 +107,20 @@ private:
     MonitorRoles& _roles;
     KestrumModelObserver* _observer = nullptr;
 
-    // Shared, so that a port which is closed while it waits for its reply lives to the end of that call.
+    // Shared: a port that is closed during its wait for a reply must live until that call returns.
     std::shared_ptr<LocalPort> _recvPort;
     std::shared_ptr<RemotePort> _sendPort;
-    std::unique_ptr<Timer> _displayUpdateTimer; ///< there while monitoring runs
-    bool _updated = false;                      ///< a message has come since the last refresh
+    std::unique_ptr<Timer> _displayUpdateTimer; ///< not null while monitoring runs
+    bool _updated = false;                      ///< a message has arrived since the last refresh
     std::unique_ptr<LogGenerator> _logGenerator;
     State _state; ///< outlives every generator
     KestrumModelNodeRef _nodes;
-    std::optional<PathDictionary> _nodesByPath; ///< there when `_nodes` is
+    std::optional<PathDictionary> _nodesByPath; ///< present when `_nodes` is not null
 
     std::optional<Problem> _problem;
     std::uint64_t _lostMessages = 0;
-    bool _lossPending = false; ///< the observer has not been told yet
-    bool _starting = false;    ///< an attempt is on the stack
+    bool _lossPending = false; ///< a notification of lost messages is posted
+    bool _starting = false;    ///< an attempt to start is running
     bool _retryPending = false;
 };
 

@@ -15,20 +15,20 @@ namespace {
 constexpr std::string_view kTitle = "Kestrum";
 constexpr char kOrderSeparator = ';';
 
-/// What stands before the first ";" of a key, and what behind it.
+/// The parts of a key before and after the first ";".
 std::pair<std::string_view, std::string_view> splitAtOrder(std::string_view key)
 {
     const auto end = std::min(key.find(kOrderSeparator), key.size());
     return {key.substr(0, end), key.substr(std::min(end + 1, key.size()))};
 }
 
-/// "3;Neighbor" is shown as "Neighbor". A key of more parts is no such pair, and is shown whole.
+/// "3;Neighbor" is shown as "Neighbor". A key with several ";" is shown whole.
 std::string_view nameInSortedMode(std::string_view key)
 {
     return std::ranges::count(key, kOrderSeparator) == 1 ? splitAtOrder(key).second : key;
 }
 
-/// The entries to show, in their order.
+/// The entries to show, in display order.
 std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary, bool sorted)
 {
     std::vector<const Dictionary::Entry*> entries;
@@ -36,18 +36,18 @@ std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary,
     for (const auto& entry : dictionary)
         if (entry.key != kSortedKey && entry.value)
             entries.push_back(&entry);
-    // Part by part: ";" sorts behind the digits, and would put "10;" before "1;". No numbers are read: "10" stands
-    // before "2" on purpose.
+    // Part by part, because ";" sorts after the digits: "10;" would come before "1;". Kept: parts are compared as
+    // texts, "10" before "2"; field displays show this order.
     if (sorted)
         std::ranges::sort(entries, {}, [](const auto* entry) { return splitAtOrder(entry->key); });
     return entries;
 }
 
-/// The text of all paths of a tree. Real displays take a thousandth of it; a message of long names inside each other
-/// would take thousands of times its own size. What exceeds it is in the tree, but cannot be found by its path.
+/// The limit of all paths of a tree, in bytes. Real displays need a thousandth of it, but nested long names would need
+/// thousands of times the size of their message. Nodes beyond the limit are in the tree without a path.
 constexpr std::size_t kPathBytes = std::size_t{64} << 20;
 
-/// Builds one tree. A node has no path when those built before it have used up all there is.
+/// Builds one tree. A node gets no path when earlier paths have reached the limit.
 class Builder {
 public:
     using Path = std::optional<std::string>;
@@ -89,7 +89,7 @@ private:
 
     KestrumModelNodes childrenOf(const Array& array, const Path& path)
     {
-        const ArrayLocked locked; // For the whole walk, so that no section rewrites the array under it.
+        const ArrayLocked locked; // for the whole walk: no section may rewrite the array meanwhile
         KestrumModelNodes children;
         children.reserve(array.size());
         for (const auto& element : array)

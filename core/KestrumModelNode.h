@@ -12,19 +12,19 @@ namespace kestrum {
 
 class KestrumModelNode;
 
-/// Nodes never change, so whoever holds one may keep it after the tree was built anew.
+/// Nodes are immutable: a reference stays valid after the tree is rebuilt.
 using KestrumModelNodeRef = std::shared_ptr<const KestrumModelNode>;
 using KestrumModelNodes = std::vector<KestrumModelNodeRef>;
-/// Node path to node. Sorted, for paths can be chosen to collide in any hash.
+/// Maps a path to its node. A sorted map, because a hash can be attacked with colliding paths.
 using PathDictionary = std::map<std::string, KestrumModelNodeRef>;
 
 inline constexpr std::string_view kRootPath = "/";
 
-/// The path of a child: its display name behind the parent's path, with exactly one "/" between them. Slashes at the
-/// name's ends are left out, those inside stay; of a name of which nothing is left, "(empty)" stands there.
+/// The path of a child: the parent's path, one "/" and the child's display name. Leading and trailing slashes of the
+/// name are removed; "(empty)" replaces a name without other characters.
 std::string joinPath(std::string_view path, std::string_view name);
 
-/// A row of the display, and what lies below it.
+/// A row of the display and the rows below it.
 class KestrumModelNode {
 public:
     virtual ~KestrumModelNode() = default;
@@ -32,15 +32,16 @@ public:
     KestrumModelNode& operator=(const KestrumModelNode&) = delete;
 
     const std::string& displayName() const { return _name; }
-    /// The rows of an inner node, perhaps none; null for a leaf. This alone tells the one from the other.
+    /// The rows of an inner node, possibly none; null for a leaf.
     virtual const KestrumModelNodes* childNodes() const { return nullptr; }
     /// The text of a leaf; null for an inner node.
     virtual const std::string* value() const { return nullptr; }
 
-    /// The tree of a display, named "Kestrum" at "/"; never null. Fills the empty dictionary with a node for each
-    /// path: of several nodes with the same path, the one built last. Paths of more than 64 MiB in all are not kept.
+    /// Builds the tree of a display; the root is named "Kestrum" and has the path "/". Never null. Fills the empty
+    /// dictionary with a node for each path; of nodes with the same path the last one. Paths beyond 64 MiB of text in
+    /// all are left out.
     ///
-    /// Recursive: for values as property lists bound them, a few hundred levels deep.
+    /// Recursive: at most as deep as property lists may be (512 levels).
     static KestrumModelNodeRef makeTreeFromObject(const Value& object, PathDictionary& withPathDictionary);
 
 protected:
@@ -74,7 +75,7 @@ private:
     KestrumModelNodes _childNodes;
 };
 
-/// The node of one value under a display name, registered in the dictionary under its path, behind its children.
+/// Builds the node of a value, and registers first its children, then the node itself in the dictionary.
 KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary,
                               const std::string& path);
 

@@ -1,4 +1,4 @@
-// The model's log channel: how it is opened and closed, which generator it takes, what comes in.
+// The model's log channel: opening, closing, choice of the generator, received messages.
 #include "core/KestrumModel.h"
 
 #include "platform/MainQueue.h"
@@ -17,11 +17,11 @@ namespace {
 
 using namespace std::chrono_literals;
 
-constexpr std::int32_t kMessageId = 0; // of all that travels in either direction, but for:
-constexpr std::int32_t kLossId = 1;    // how many messages the service dropped before the next one
+constexpr std::int32_t kMessageId = 0; // commands and log messages
+constexpr std::int32_t kLossId = 1;    // from the service: how many messages it dropped before the next one
 constexpr auto kSendTimeout = 1s;
 constexpr auto kReplyTimeout = 1s;
-constexpr std::int32_t kNoPort = -1; // the status of a message for which no port is open
+constexpr std::int32_t kNoPort = -1; // the status of a message when no port is open
 
 constexpr std::string_view kGetTechnology = "GetTechnology";
 
@@ -32,7 +32,8 @@ bool KestrumModel::createPorts()
     const auto self = shared_from_this();
     _recvPort = _roles.ports.createLocal(
         kLogChannelServiceName, [this](std::int32_t messageId, Bytes payload) { handleMessage(messageId, payload); });
-    // Without a local port the channel is asked for all the same, on purpose: the service is the one to refuse it.
+    // Kept: a missing local port does not end the attempt here. The service refuses the channel, and its answer is
+    // logged.
     if (_recvPort) {
         _recvPort->setDeliveryQueue(_roles.queue);
         _recvPort->setInvalidationHandler([this, port = _recvPort.get()] { handleInvalidation(port); });
@@ -55,7 +56,7 @@ bool KestrumModel::createPorts()
         logError("Could not create a log channel (Vox returned null port)!");
         return false;
     }
-    // The wait for the answer serves tasks: one of them may have closed the channel.
+    // The wait for the answer serves tasks. One of them may have closed the channel.
     if (_recvPort != recvPort)
         return false;
     _sendPort = _roles.ports.createRemote(*answer.remotePort);
@@ -70,12 +71,12 @@ bool KestrumModel::createPorts()
 
 void KestrumModel::destroyPorts()
 {
-    // The timer may be the last to hold this model; the destructor, which comes here too, has nobody left to ask.
+    // Keeps the model alive: the timer may be its last owner. Null when the destructor calls.
     const auto self = weak_from_this().lock();
     std::exchange(_displayUpdateTimer, nullptr).reset();
     const auto close = [](auto& field) {
         if (const auto port = std::exchange(field, nullptr)) {
-            port->setInvalidationHandler({}); // Closed on purpose: no restart.
+            port->setInvalidationHandler({}); // closed by the model itself: no restart
             port->invalidate();
         }
     };
@@ -120,7 +121,7 @@ void KestrumModel::takeGenerator(std::unique_ptr<LogGenerator> generator)
 
 RemotePort::Sent KestrumModel::send(Bytes payload, RemotePort::Reply reply)
 {
-    const auto port = _sendPort; // The wait may close it.
+    const auto port = _sendPort; // a copy: the wait may close the port
     if (!port)
         return {kNoPort, std::nullopt};
     return port->sendRequest(kMessageId, payload, kSendTimeout,
@@ -135,7 +136,7 @@ void KestrumModel::handleMessage(std::int32_t messageId, Bytes payload)
         countLost(payload);
 }
 
-// Never a record: the history, the raw records and the DLF stay what the modem sent.
+// Only counts: history, raw records and DLF hold nothing but what the modem sent.
 void KestrumModel::countLost(Bytes payload)
 {
     const auto low = Record(payload).read(u32(0)), high = Record(payload).read(u32(4));
@@ -144,7 +145,7 @@ void KestrumModel::countLost(Bytes payload)
         return;
     const auto most = std::numeric_limits<std::uint64_t>::max();
     _lostMessages = count > most - _lostMessages ? most : _lostMessages + count;
-    // A slow display gets many of these. One task is enough for all that come before it runs.
+    // A slow display gets many of these messages. One task reports all that arrive before it runs.
     if (std::exchange(_lossPending, true))
         return;
     _roles.queue.post([model = weak_from_this()] {

@@ -2,12 +2,12 @@
 
 namespace kestrum {
 
-/// The application object, as the main loop sees it.
+/// What the main loop calls on the application object.
 class ApplicationDelegate {
 public:
     virtual ~ApplicationDelegate() = default;
     virtual void applicationDidFinishLaunching() = 0;
-    virtual void applicationWillTerminate() = 0; ///< exactly once, whatever ends the program
+    virtual void applicationWillTerminate() = 0; ///< exactly once, however the program ends
 };
 
 } // namespace kestrum

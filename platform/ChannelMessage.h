@@ -7,8 +7,8 @@
 
 namespace kestrum {
 
-/// One message of the log channel: type (1), length (2), log code (2), time stamp (8), payload; little-endian. A
-/// first byte of 0x81 announces a prefix of two bytes before all that.
+/// One message of the log channel: type (1 byte), length (2), log code (2), time stamp (8), payload; little-endian.
+/// When the first byte is 0x81, a prefix of two bytes comes before the type.
 struct ChannelMessage {
     static constexpr std::size_t kHeaderSize = 13;
     static constexpr std::size_t kPrefixSize = 2;
@@ -17,12 +17,12 @@ struct ChannelMessage {
     static constexpr std::uint8_t kExtraCode = 0xFF; ///< a property list of the telephony service
     static constexpr LogCode kExtraCodes = 0xFF0000; ///< added to the code of an extra-code record
 
-    Record record; ///< less the prefix, header included
+    Record record; ///< without the prefix, with the header; borrowed
     std::uint8_t type;
-    LogCode logCode; ///< the effective one
+    LogCode logCode; ///< with kExtraCodes added for type 0xFF
 
-    /// Nothing for a message of fewer than 13 bytes. The test comes before the prefix is removed, so that a record
-    /// may be left with 11 bytes; its type and code are there all the same.
+    /// Nothing for a message of fewer than 13 bytes, prefix included. A record behind a prefix may so have only 11
+    /// bytes; its type and code are always there.
     static std::optional<ChannelMessage> read(Bytes message);
 
     bool isOfKnownType() const { return type == kOrdinary || type == kExtraCode; }
@@ -30,7 +30,7 @@ struct ChannelMessage {
     std::optional<std::uint64_t> timeStamp() const;
 };
 
-/// The telephony service's own records, property lists behind a header.
+/// Log codes of the telephony service's records: a property list follows the header.
 inline constexpr LogCode kSimFilesRecord = ChannelMessage::kExtraCodes;        ///< a dictionary of elementary files
 inline constexpr LogCode kCellMonitorRecord = ChannelMessage::kExtraCodes + 1; ///< an array of cells
 inline constexpr LogCode kPdpContextsRecord = ChannelMessage::kExtraCodes + 2; ///< an array of rows
@@ -41,10 +41,10 @@ struct ChannelRecord {
     std::uint64_t timeStamp; ///< CDMA system time
 };
 
-/// Nothing for a message that is no log record: too short, of another type, a property list.
+/// Nothing for a message that is not a log record: too short, of another type, or a property list.
 std::optional<ChannelRecord> channelRecord(Bytes message);
 
-/// Whether the message looks like a property list (XML or binary), as an IFX modem sends them.
+/// Whether the message begins like a property list (XML or binary), the messages of an IFX modem.
 bool isPropertyList(Bytes message);
 
 } // namespace kestrum

@@ -21,8 +21,8 @@ public:
     };
     virtual Zone zoneAt(Date date) const = 0;
 
-    /// `date` in the device's zone and locale by a Unicode date pattern (UTS #35): "yyyy-MM-dd HH:mm:ss", text in
-    /// single quotes is literal.
+    /// `date` as text in the device's zone and locale. `pattern` is a Unicode date pattern (UTS #35) such as
+    /// "yyyy-MM-dd HH:mm:ss"; text in single quotes is literal.
     virtual std::string localText(Date date, std::string_view pattern) const = 0;
 };
 

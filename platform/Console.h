@@ -4,15 +4,15 @@
 
 namespace kestrum {
 
-/// Where the program writes what is neither display nor log.
+/// Output that is neither display nor system log.
 class Console {
 public:
     virtual ~Console() = default;
 
-    /// A line on standard output (without its newline).
+    /// Writes a line, given without its newline, to standard output.
     virtual void printLine(std::string_view line) = 0;
 
-    /// A line for whoever watches the program under development. Whoever builds a costly one asks first.
+    /// Writes a line for developers. Ask `isDebugWatched` first when the line is expensive to build.
     virtual void debug(std::string_view line) = 0;
     virtual bool isDebugWatched() const = 0;
 };

@@ -10,10 +10,10 @@ class FileSystem {
 public:
     virtual ~FileSystem() = default;
 
-    /// Whether a file or directory stands at the absolute device path.
+    /// Whether a file or directory exists at the absolute device path.
     virtual bool exists(std::string_view path) const = 0;
 
-    /// The directory in which the device collects diagnostic logs; it need not exist yet.
+    /// The path of the device's directory of diagnostic logs. The directory may not exist yet.
     virtual std::string diagnosticLogDirectory() const = 0;
 };
 

@@ -6,7 +6,7 @@
 
 namespace kestrum {
 
-/// A repeating timer; it ends with this object, which may be destroyed within its own action.
+/// A repeating timer. Destroying the object stops it; the timer's action may do so.
 class Timer {
 public:
     virtual ~Timer() = default;
@@ -17,12 +17,12 @@ class MainQueue {
 public:
     virtual ~MainQueue() = default;
 
-    /// Runs `task` once, `delay` from now or later; never from within this call. Tasks due at the same time run
-    /// in the order in which they were posted.
+    /// Runs `task` once, after `delay` or later, and never during this call. Tasks with the same time run in the order
+    /// in which they were posted.
     virtual void post(std::chrono::milliseconds delay, std::function<void()> task) = 0;
     void post(std::function<void()> task) { post(std::chrono::milliseconds(0), std::move(task)); }
 
-    /// Runs `action` every `interval`, first after one interval, until the timer is destroyed.
+    /// Runs `action` every `interval`, for the first time after one interval, until the timer is destroyed.
     virtual std::unique_ptr<Timer> repeat(std::chrono::milliseconds interval, std::function<void()> action) = 0;
 };
 

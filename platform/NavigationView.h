@@ -19,23 +19,22 @@ public:
 
 enum class Transition { None, Push, Pop };
 
-/// Shows the top of a stack of panes. It owns none: the stack of ui/ keeps them, and shows another one before it
-/// lets go of one that is shown.
+/// Shows the top of a stack of panes. It owns no pane: NavigationStack (ui/) owns them, and shows another pane before
+/// it destroys the one that is shown.
 class NavigationView {
 public:
     virtual ~NavigationView() = default;
 
-    /// The pane to show, at once as far as input goes: the transition only draws, and what leaves takes no input.
-    /// `titles` are the stack's, root first, the shown pane's last.
+    /// Shows a pane. It takes input at once; the pane that leaves takes none, also while a transition is drawn.
+    /// `titles` are those of the stack, root first, the shown pane last.
     virtual void show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated) = 0;
     /// The titles changed, the pane did not.
     virtual void setTitles(std::vector<std::string> titles) = 0;
     virtual void setToolbarHidden(bool hidden) = 0;
-    /// One line that says what was done, over whichever pane is shown, until another text replaces it; empty for
-    /// none. It takes no input.
+    /// Shows one line of text over every pane until another text replaces it; empty for none. The line takes no input.
     virtual void setNotice(std::string_view text) = 0;
 
-    /// A modal screen over the panes, and its end. At most one.
+    /// Shows a modal screen over the panes, and closes it. At most one is shown; `screen` is borrowed until then.
     virtual void present(SaveInterface& screen, bool animated) = 0;
     virtual void dismiss(bool animated) = 0;
 };

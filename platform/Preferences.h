@@ -9,13 +9,13 @@ class Preferences {
 public:
     virtual ~Preferences() = default;
 
-    /// Sets a value of the application whose domain is given; it is kept at the next `synchronize`.
+    /// Sets a value of the application with that domain. `synchronize` writes it.
     virtual void setApplicationValue(std::string_view domain, std::string_view key, bool value) = 0;
 
-    /// Writes what was set in the domain. False when it cannot be written.
+    /// Writes the values that were set in the domain. False when they cannot be written.
     virtual bool synchronize(std::string_view domain) = 0;
 
-    /// Tells that application that the key changed. Without anybody to tell, nothing happens.
+    /// Notifies that application that the key changed. Does nothing when no application listens.
     virtual void postChanged(std::string_view domain, std::string_view key) = 0;
 };
 

@@ -9,19 +9,19 @@
 
 namespace kestrum {
 
-/// Property lists: the serialised form of values that travels to and from the telephony service.
+/// Property lists: values in serialised form, as messages of the telephony service and files hold them.
 class PropertyLists {
 public:
     virtual ~PropertyLists() = default;
 
-    /// Any form (XML or binary), told apart by the bytes. Null for anything that is no property list; nothing that
-    /// the bytes hold can crash, hang or exhaust memory.
+    /// Reads the XML or the binary form, recognised by its bytes. Null when the bytes are no property list. No bytes
+    /// can crash the reader, block it or exhaust memory.
     virtual Value parse(Bytes bytes) = 0;
-    /// Like `parse`, but may reuse the memory of `spent`: pass a value that is no longer read. Containers that are
-    /// shared stay as they are.
+    /// Like `parse`, but may reuse the memory of `spent`: pass a value that is no longer read. Containers that another
+    /// value shares do not change.
     virtual Value parseOver(Bytes bytes, Value spent) = 0;
 
-    /// The XML form, version 1.0. Nulls are left out, characters that XML forbids become U+FFFD.
+    /// The XML form (XML 1.0). Nulls are left out; characters that XML forbids become U+FFFD.
     /// Nothing when the value is null or nested too deeply.
     virtual std::optional<Data> toXml(const Value& value) const = 0;
 
@@ -29,9 +29,9 @@ public:
     virtual Value load(const std::string& path) const = 0;
 
     enum class Stored { Written, NameTaken, Failed };
-    /// Writes a dictionary in XML form into a file of its own, for the user's eyes alone, whole or not at all. A missing
-    /// directory is created. The same path again replaces what these lists wrote there; anything else that stands
-    /// there stays as it is.
+    /// Writes a dictionary in XML form to a file that only the user can read. The file is complete or does not exist.
+    /// Creates a missing directory. Replaces only the file that the last call wrote; for any other file at the path the
+    /// result is NameTaken.
     virtual Stored write(const Dictionary& dictionary, const std::string& path) const = 0;
 };
 

@@ -2,12 +2,12 @@
 
 namespace kestrum {
 
-/// Who counts what becomes of records. The display needs none.
+/// Counts records that decoders drop; used by kestrum-decode for its statistics.
 class RecordWatch {
 public:
     virtual ~RecordWatch() = default;
 
-    /// A decoder drops the record at hand, which is too short for it (or of a length that it does not know).
+    /// A decoder drops the current record: it is too short, or of an unknown length.
     virtual void tooShort() = 0;
 };
 

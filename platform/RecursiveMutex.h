@@ -13,7 +13,7 @@ public:
     virtual void unlock() = 0;
 };
 
-/// The standard library's.
+/// std::recursive_mutex.
 class StandardRecursiveMutex final : public RecursiveMutex {
 public:
     void lock() override { _mutex.lock(); }

@@ -9,7 +9,7 @@
 
 namespace kestrum {
 
-/// A cell as a table keeps it for reuse: controllers derive from it to hold on to what they added.
+/// A cell that a table keeps for reuse. Controllers derive from it to own the views that they added.
 class ReusableCell {
 public:
     ReusableCell(std::unique_ptr<TableCell> cell, std::string_view reuseIdentifier)

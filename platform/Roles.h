@@ -15,24 +15,24 @@ class SystemLog;
 class TelephonyService;
 class Toolkit;
 
-/// What decoding needs of the device. References: main() owns the adapters, and they outlive what uses them.
+/// The roles that decoding needs. Borrowed: main() owns the adapters, and they outlive their users.
 struct DecodingRoles {
     SystemLog& log;
     Console& console;
     Clock& clock;
     Bundle& bundle;
     PropertyLists& propertyLists;
-    RecordWatch* watch = nullptr; ///< optional
+    RecordWatch* watch = nullptr; ///< may be null
 };
 
-/// What the monitor model needs besides.
+/// The roles that the monitor model needs.
 struct MonitorRoles : DecodingRoles {
     MainQueue& queue;
     MessagePorts& ports;
     TelephonyService& telephony;
 };
 
-/// What the application needs besides.
+/// The roles that the application needs.
 struct ApplicationRoles : MonitorRoles {
     Preferences& preferences;
     FileSystem& files;

@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// What the save screen's interface tells its controller.
+/// What the save screen reports to its controller.
 class SaveInterfaceOwner : public TableDataSource {
 public:
     virtual void savePressed() = 0;
@@ -16,7 +16,7 @@ public:
     virtual bool textFieldShouldReturn() = 0; ///< Return was pressed in the field
 };
 
-/// What the description field shows while it is empty: ASCII.
+/// The text that an empty description field shows. ASCII.
 inline constexpr std::string_view kDescriptionPlaceholder = "What was seen, and where";
 
 /// The interface "KestrumSaveViewController": a table of what is saved, a description, Save and Cancel.

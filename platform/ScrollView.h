@@ -6,8 +6,8 @@
 
 namespace kestrum {
 
-/// A strip that scrolls sideways when its content is wider than its frame. A tap on it that does not scroll
-/// reaches the row behind it.
+/// A view that scrolls sideways when its content is wider than its frame. A tap without scrolling goes to the row
+/// below the view.
 class ScrollView : public View {
 public:
     virtual void addSubview(std::shared_ptr<View> view) = 0;

@@ -7,7 +7,7 @@
 
 namespace kestrum {
 
-/// Priorities of syslog(3). The DLF writer logs at the raw number 16, outside the usual eight.
+/// Priorities of syslog(3). The DLF writer logs at 16, which is outside syslog's range of 0 to 7.
 enum class Priority : int { Error = 3, Warning = 4, Notice = 5, Raw16 = 16 };
 
 /// The system's log.
@@ -15,10 +15,10 @@ class SystemLog {
 public:
     virtual ~SystemLog() = default;
 
-    /// One line, its arguments filled in. Never blocks for long and never fails: a line that cannot be kept is
-    /// counted instead. The text is borrowed for the call.
+    /// Logs one line. Never blocks for long and never fails: lines that do not fit the queue are counted. The text is
+    /// borrowed for the call.
     virtual void write(Priority priority, std::string_view text) = 0;
-    /// The same with arguments, formatted without allocating when the line is of usual length.
+    /// Formats a line and logs it. A line of up to 128 bytes is formatted without allocating.
     template <typename... Arguments>
         requires(sizeof...(Arguments) > 0)
     void write(Priority priority, FormatString<std::type_identity_t<Arguments>...> format,
@@ -27,8 +27,7 @@ public:
         write(priority, formatting::formatted(format, arguments...).text());
     }
 
-    /// How an object's address is shown in a line. Offline, addresses mean nothing and are shown as null, so that
-    /// two runs log the same.
+    /// The address to print for an object. An offline decoder prints null, so that two runs give equal logs.
     virtual const void* shownAddress(const void* address) const { return address; }
 };
 

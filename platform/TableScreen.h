@@ -9,17 +9,17 @@
 
 namespace kestrum {
 
-/// The front end's side of a pane: a table filling the screen under a title, over a toolbar.
+/// A pane as the front end draws it: title, table and toolbar.
 class TableScreen {
 public:
     virtual ~TableScreen() = default;
     virtual TableView& table() = 0;
     virtual void setTitle(std::string_view title) = 0;
     virtual std::string title() const = 0;
-    /// Left to right. An item equal to the one at its place stays the same object.
+    /// Items from left to right. An item that equals the old one at the same place keeps its object.
     virtual void setToolbarItems(std::vector<ToolbarItem> items, bool animated) = 0;
     virtual void resignFirstResponder() = 0;
-    /// Lines that stand, in muted text, where the rows would be while there are none; empty for nothing.
+    /// The text, in a muted colour, of a table without rows; lines are separated by "\n". Empty for none.
     virtual void setHint(std::string_view text) = 0;
 };
 

@@ -13,27 +13,27 @@ struct IndexPath {
     std::size_t section = 0, row = 0;
 };
 
-/// Rows of one section, as many as fit, drawn with few cells.
+/// A table with one section. It draws the visible rows with few cells, which it reuses.
 class TableView {
 public:
     virtual ~TableView() = default;
 
-    /// Asks the data source for everything anew. Scroll offset, selection, focus and a row's sideways scroll stay.
+    /// Asks the data source for all rows again. Keeps scroll offset, selection, focus and the rows' sideways scroll.
     virtual void reloadData() = 0;
 
-    /// Within `cellForRowAtIndexPath`: a cell that may be used again for that row, of whatever kind; the cell that
-    /// last showed that same row comes first. Null when there is none.
+    /// Called from `cellForRowAtIndexPath`: a cell to reuse for the row, of any kind, preferably the one that showed
+    /// the same row before. Null when there is none.
     virtual std::shared_ptr<ReusableCell> dequeueReusableCell(std::string_view reuseIdentifier) = 0;
 
-    /// A new cell for this table. Its content area has the width of the table's rows from the start, so that it can
-    /// be laid out before the table takes it.
+    /// A new cell for this table. Its content area has the width of the table's rows, so that the caller can lay it out
+    /// at once.
     virtual std::unique_ptr<TableCell> makeCell(CellStyle style) = 0;
 
     virtual void deselectRow(IndexPath indexPath, bool animated) = 0;
     virtual void sizeToFit() = 0;
 };
 
-/// What a table shows, and who is told of its selection. Asked again whenever the table's width changes.
+/// Provides a table's rows and receives its selection. The table asks again when its width changes.
 class TableDataSource {
 public:
     virtual ~TableDataSource() = default;

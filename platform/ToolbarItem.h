@@ -22,7 +22,7 @@ struct FlexibleSpaceItem {
 };
 struct SaveItem { ///< the platform's standard Save button
     std::function<void()> action;
-    /// The button is the same whenever it is there: a held one is not lost when its bar is rebuilt.
+    /// Always equal: a button that the user holds down survives an update of the toolbar.
     friend bool operator==(const SaveItem&, const SaveItem&) { return true; }
 };
 using ToolbarItem = std::variant<ActivityIndicatorItem, LabelItem, FlexibleSpaceItem, SaveItem>;

@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// Something that is drawn inside another view. Views that hold it keep it.
+/// A part of the screen, drawn inside another view. The view that holds it shares its ownership.
 class View {
 public:
     virtual ~View() = default;

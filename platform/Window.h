@@ -4,7 +4,7 @@ namespace kestrum {
 
 class NavigationView;
 
-/// The one window.
+/// The application's only window.
 class Window {
 public:
     virtual ~Window() = default;

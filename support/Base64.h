@@ -12,8 +12,8 @@ namespace kestrum {
 /// Bytes as base64 (RFC 4648), padded, on one line.
 std::string base64(Bytes bytes);
 
-/// Reads base64; blanks, tabs and line ends between the characters do not count. Nothing for a character outside the
-/// alphabet, wrong padding, or bits that no byte takes.
+/// Reads base64; skips blanks, tabs and line ends between the characters. Nothing for a character outside the alphabet,
+/// wrong padding, or left-over bits that are not zero.
 std::optional<std::vector<std::byte>> bytesFromBase64(std::string_view text);
 
 } // namespace kestrum

@@ -24,7 +24,7 @@ inline std::string_view textOf(Bytes bytes)
     return {reinterpret_cast<const char*>(bytes.data()), bytes.size()};
 }
 
-/// Immutable bytes, shared by all copies: the raw records of an interval are kept once, whoever holds them.
+/// Immutable bytes. Copies share the storage, so the raw records of an interval exist once.
 class Data {
 public:
     Data() = default;
@@ -37,7 +37,7 @@ public:
     std::size_t size() const { return bytes().size(); }
     bool empty() const { return size() == 0; }
 
-    /// Whether both are the very same storage, not merely equal bytes.
+    /// Whether both use the same storage. Equal bytes in different storage: false.
     bool sharesStorageWith(const Data& other) const { return _bytes == other._bytes; }
 
 private:

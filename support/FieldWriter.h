@@ -9,13 +9,13 @@
 
 namespace kestrum {
 
-/// Writes the fields of a record where Record reads them. Owns nothing: the bytes must outlive it.
+/// Writes fields into a record, at the places where Record reads them. Owns nothing: the bytes must outlive it.
 class FieldWriter {
 public:
     explicit FieldWriter(std::span<std::byte> bytes) : _bytes(bytes) {}
 
-    /// Puts a number, signed or not, into the field's bits and leaves the other bits of its word as they are. A number
-    /// that the bits cannot hold, or a field beyond the end, is the caller's mistake: throws std::out_of_range.
+    /// Writes a number, signed or unsigned, into the field's bits; the other bits of the word keep their values. Throws
+    /// std::out_of_range for a number that does not fit the bits and for a field beyond the end.
     FieldWriter& set(Field field, std::int64_t value)
     {
         const unsigned bits = field.last - field.first + 1;
@@ -32,7 +32,7 @@ public:
         return *this;
     }
 
-    /// Puts a 64-bit number at `offset`, little-endian.
+    /// Writes a 64-bit number at `offset`, little-endian. Throws std::out_of_range beyond the end.
     FieldWriter& set64(std::size_t offset, std::uint64_t value)
     {
         const FieldWriter word = part(offset, 8);
@@ -41,7 +41,7 @@ public:
         return *this;
     }
 
-    /// The `length` bytes at `offset`, whose fields count from their own first byte.
+    /// Writes to the `length` bytes at `offset`; offsets count from there. Throws std::out_of_range beyond the end.
     FieldWriter part(std::size_t offset, std::size_t length) const
     {
         // offset + length could wrap; this difference cannot.

@@ -14,7 +14,7 @@ void pad(Output& out, char with, std::size_t count)
         out.append({&with, 1});
 }
 
-/// A number under construction, its sign before its digits.
+/// A number that is being formatted: sign, then digits.
 class Number {
 public:
     Number(const Conversion& conversion, bool negative)
@@ -24,11 +24,11 @@ public:
         _signs = _size;
     }
 
-    char* begin() { return _text + _size; } ///< of the digits still to come
+    char* begin() { return _text + _size; } ///< where the next digits go
     char* end() { return std::end(_text); }
     void endAt(const char* behind) { _size = static_cast<std::size_t>(behind - _text); }
 
-    /// Filled up to the conversion's width: zeros stand behind the sign, blanks before it.
+    /// Pads to the conversion's width: with zeros after the sign, or with blanks before it.
     void appendTo(Output& out, const Conversion& conversion)
     {
         const auto width = static_cast<std::size_t>(conversion.width);
@@ -43,7 +43,7 @@ public:
     }
 
 private:
-    char _text[400]; // the largest double has 309 digits before the point, and 60 may stand behind it
+    char _text[400]; // a double has at most 309 digits before the point, and 60 after it are allowed
     std::size_t _size = 0, _signs;
 };
 
@@ -54,8 +54,8 @@ void appendInteger(Output& out, const Conversion& conversion, bool negative, std
     number.appendTo(out, conversion);
 }
 
-/// The magnitude with so many digits behind the point, when it has no more than 20 binary places, as measurements in
-/// fractions of a dB do: in integers, which takes a fifth of the time of std::to_chars. Else nothing is written.
+/// Writes a magnitude with at most 20 binary places (fractions of a dB have few) by integer arithmetic, which takes a
+/// fifth of the time of std::to_chars. `precision` digits follow the point. Writes nothing for other magnitudes.
 char* writeShort(char* to, char* end, double magnitude, int precision)
 {
     constexpr unsigned kPlaces = 20;
@@ -106,7 +106,7 @@ void appendSigned(Output& out, const Conversion& conversion, std::int64_t value)
 
 void appendUnsigned(Output& out, Conversion conversion, std::uint64_t value)
 {
-    conversion.plus = false; // only a conversion that can show "-" shows "+"
+    conversion.plus = false; // "+" applies to signed conversions only
     appendInteger(out, conversion, false, value, conversion.letter == 'x' ? 16 : 10);
 }
 

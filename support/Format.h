@@ -19,7 +19,7 @@ struct Conversion {
     bool plus = false, zero = false;
     int width = 0;
     int precision = -1;
-    bool wide = false; ///< "l": an argument of more than 32 bits may be given
+    bool wide = false; ///< "l": the argument may have more than 32 bits
     char letter = 0;   ///< 0 at the format's end
 };
 
@@ -28,7 +28,7 @@ constexpr bool isDigit(char c)
     return c >= '0' && c <= '9';
 }
 
-/// Reads the conversion behind a "%" at `at`, and moves `at` behind it.
+/// Reads the conversion that follows a "%". `at` is the position after the "%" and is moved behind the conversion.
 constexpr Conversion parse(std::string_view format, std::size_t& at)
 {
     const auto next = [&] { return at < format.size() ? format[at] : '\0'; };
@@ -56,8 +56,8 @@ constexpr Conversion parse(std::string_view format, std::size_t& at)
     return found;
 }
 
-/// Whether an argument of type T may stand for the conversion. Integers are checked for their width, so
-/// that what the format says ("%d" is signed, 32 bits) is what is shown.
+/// Whether the conversion accepts an argument of type T. Integers must match in sign and width: "%d" takes signed
+/// numbers of at most 32 bits.
 template <typename T>
 constexpr bool fits(const Conversion& conversion)
 {
@@ -85,7 +85,7 @@ constexpr bool fits(const Conversion& conversion)
     }
 }
 
-/// Text under construction: on the stack while it is short, as all display values are.
+/// A text that is being built. Up to 128 bytes stay on the stack; display values are shorter.
 class Output {
 public:
     void append(std::string_view text)
@@ -108,7 +108,7 @@ private:
     std::string _spilled;
 };
 
-/// The text before a conversion of a format, or behind the last one.
+/// The literal text before a conversion, or after the last one.
 struct Plain {
     std::string_view text;
     bool percents = false; ///< holds "%%", which stands for a percent sign
@@ -150,7 +150,7 @@ void appendArgument(Output& out, const Conversion& conversion, const T& value)
 
 } // namespace formatting
 
-/// A printf format that the compiler reads, and whose arguments it checks.
+/// A printf format that is parsed, and checked against its arguments, at compile time.
 template <typename... Arguments>
 class FormatString {
 public:
@@ -185,7 +185,7 @@ public:
         _plain[used].text = format.substr(begin);
     }
 
-    /// As many as conversions, and one behind them.
+    /// `at`: 0 to the number of conversions; the last text follows the last conversion.
     constexpr const formatting::Plain& plain(std::size_t at) const { return _plain[at]; }
     constexpr const formatting::Conversion& conversion(std::size_t at) const { return _conversions[at]; }
 
@@ -213,9 +213,9 @@ Output formatted(const FormatString<std::type_identity_t<Arguments>...>& format,
 
 } // namespace formatting
 
-/// printf, checked by the compiler: %d %u %x %c %f %s %p, with "+", "0", width, precision and "l", and "%@"
-/// for the text of an object. Not-a-number has no sign, whatever the platform; a null pointer is "0x0", a null text
-/// "(null)". Integers take no precision.
+/// printf with arguments checked at compile time: %d %u %x %c %f %s %p with "+", "0", width, precision and "l", and
+/// "%@" for a text. The result does not depend on the locale. Not-a-number is "nan" without a sign; a null pointer is
+/// "0x0", a null text "(null)". Integers take no precision.
 template <typename... Arguments>
 std::string formatted(FormatString<std::type_identity_t<Arguments>...> format, const Arguments&... arguments)
 {

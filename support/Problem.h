@@ -4,8 +4,8 @@
 
 namespace kestrum {
 
-/// Why something failed, in words for a person. An operation that gives nothing else returns std::optional<Problem>:
-/// nothing on success.
+/// The reason of a failure, as text for the user. An operation without another result returns std::optional<Problem>;
+/// nothing means success.
 struct Problem {
     std::string text;
 

@@ -8,19 +8,18 @@
 
 namespace kestrum {
 
-/// What a raw number means: its text and, where it measures something, its number and unit. Quantities are named
-/// constants; readings refer to them.
+/// The meaning of a raw number: its text, and for a measurement its number and unit. Quantities are constants;
+/// readings refer to them.
 struct Quantity {
-    /// A field of a record, at most 32 bits, unsigned; or the bits of a double, for what is computed from several
-    /// fields.
+    /// A record's field (unsigned, at most 32 bits), or the bits of a double for a computed value.
     using Raw = std::uint64_t;
 
     std::string (*text)(Raw raw);
-    double (*number)(Raw raw) = nullptr; ///< not a number where this raw value measures nothing ("Not Present")
-    std::string_view unit = {};          ///< as the text words it ("dBm", "dB", "kbps", "%"); empty for a plain number
+    double (*number)(Raw raw) = nullptr; ///< null for names; NaN for a raw value without a number ("Not Present")
+    std::string_view unit = {};          ///< as in the text: "dBm", "dB", "kbps", "%"; empty for a plain number
 };
 
-/// A quantity that outlives all readings: a temporary or a local one does not compile.
+/// A reference to a constant quantity. A temporary or a local quantity does not compile: readings outlive it.
 class QuantityRef {
 public:
     consteval QuantityRef(const Quantity& quantity) : _quantity(&quantity) {}
@@ -33,23 +32,23 @@ private:
     const Quantity* _quantity;
 };
 
-/// A raw number and what it means. It becomes text when it is read; until then it costs no more than the number.
+/// A raw number and its quantity. The text is made when it is read, so a new record only stores the number.
 class Reading {
 public:
     Reading(QuantityRef quantity, Quantity::Raw raw) : _quantity(quantity), _raw(raw) {}
-    /// Of a quantity that `computedQuantity` made.
+    /// `quantity` was made by `computedQuantity`.
     static Reading computed(QuantityRef quantity, double number)
     {
         return {quantity, std::bit_cast<Quantity::Raw>(number)};
     }
 
     std::string text() const { return _quantity->text(_raw); }
-    /// Nothing for names and for what measures nothing; always finite.
+    /// The number in `unit()`; always finite. Nothing for names, "Not Present" and the like.
     std::optional<double> number() const;
-    /// The unit of the number; empty for a plain number, and where there is none.
+    /// The unit of the number; empty for a plain number and when there is no number.
     std::string_view unit() const { return number() ? _quantity->unit : std::string_view(); }
 
-    /// The same raw number of the same quantity, and so the same text. Different readings may have one text too.
+    /// Same quantity and same raw number. Readings that differ may still have the same text.
     friend bool operator==(const Reading&, const Reading&) = default;
 
 private:
@@ -57,7 +56,7 @@ private:
     Quantity::Raw _raw;
 };
 
-/// A quantity of numbers that are computed: `Text` words them.
+/// The quantity of a computed number (an average, a rate); `Text` formats the number.
 template <std::string (*Text)(double)>
 constexpr Quantity computedQuantity(std::string_view unit)
 {

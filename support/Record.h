@@ -11,8 +11,8 @@ namespace kestrum {
 /// A modem log code: the record's 16-bit code, plus 0xFF0000 for the telephony service's extra codes.
 using LogCode = std::uint32_t;
 
-/// Bits `first` to `last` (0 is the least significant) of the word of `width` bytes at `offset`,
-/// which counts from the record's first byte, header included. Little-endian unless said otherwise.
+/// Bits `first` to `last` (0 is the least significant) of the word of `width` bytes at `offset`. Offsets count from the
+/// record's first byte, header included. Little-endian unless `bigEndian`.
 struct Field {
     std::size_t offset;
     unsigned width;
@@ -28,7 +28,7 @@ struct Field {
     }
     consteval Field bit(unsigned which) const { return bits(which, which); }
 
-    /// Where the field's word ends.
+    /// The offset behind the field's word.
     constexpr std::size_t end() const { return offset + width; }
 };
 
@@ -83,7 +83,7 @@ public:
         if (field.bigEndian)
             for (std::size_t at = 0; at < field.width; ++at)
                 word = (word << 8) | byte(at);
-        else if (field.width == 4) // written out, each is a single load
+        else if (field.width == 4) // each expression compiles to a single load
             word = byte(0) | (byte(1) << 8) | (byte(2) << 16) | (byte(3) << 24);
         else if (field.width == 2)
             word = byte(0) | (byte(1) << 8);

@@ -2,7 +2,7 @@
 
 namespace kestrum {
 
-/// Sets a flag for as long as this object lives, whatever ends it.
+/// Sets a flag, and clears it when the scope ends, also by an exception. The flag must outlive this object.
 class ScopedFlag {
 public:
     explicit ScopedFlag(bool& flag) : _flag(flag) { _flag = true; }

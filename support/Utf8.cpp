@@ -30,7 +30,7 @@ void appendUtf8(std::string& text, char32_t character)
     if (character < 0x80)
         return append(character);
     const int more = character < 0x800 ? 1 : character < 0x10000 ? 2 : 3;
-    append((0xFF80u >> more & 0xFFu) | character >> 6 * more); // as many leading ones as bytes
+    append((0xFF80u >> more & 0xFFu) | character >> 6 * more); // the number of leading ones is the number of bytes
     for (int i = more; i-- > 0;)
         append(0x80 | (character >> 6 * i & 0x3F));
 }

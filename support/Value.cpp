@@ -9,7 +9,7 @@
 namespace kestrum {
 namespace {
 
-// Room for the keys of most rows and cells at once.
+// Enough for the keys of most rows and cells, so that one allocation serves.
 constexpr std::size_t kKeysOfARow = 8;
 
 } // namespace

@@ -26,7 +26,7 @@ class Dictionary;
 using ArrayRef = std::shared_ptr<Array>;
 using DictionaryRef = std::shared_ptr<Dictionary>;
 
-/// Under this key, a dictionary asks to be shown in the order of its keys; of "n;Name" only the name is shown.
+/// A dictionary with this key is shown in the order of its keys; of a key "n;Name" only the name is shown.
 inline constexpr char kSortedKey[] = "_sorted";
 
 /// A node of the display, of a template, of the generator state or of a property list.
@@ -41,13 +41,13 @@ public:
     Value(const char* text) : _held(std::string(text)) {}
     Value(ArrayRef array);                     ///< null for a null reference
     Value(DictionaryRef dictionary);           ///< null for a null reference
-    Value(Reading reading) : _held(reading) {} ///< a string, whose text is made when it is read
+    Value(Reading reading) : _held(reading) {} ///< a string; its text is made when it is read
     Value(Data data) : _held(std::move(data)) {}
     Value(Date date) : _held(date) {}
     Value(std::floating_point auto real) : _held(static_cast<double>(real)) {}
     Value(std::same_as<bool> auto boolean) : _held(boolean) {} // no conversions: a pointer is no boolean
 
-    /// 64-bit integers, signed and unsigned told apart by what they hold: 2^64-1 is not -1.
+    /// An integer from -2^63 to 2^64-1. Signed and unsigned integers are equal when their numbers are.
     template <std::integral Number>
         requires(!std::same_as<Number, bool> && !std::same_as<Number, char>)
     Value(Number number)
@@ -63,10 +63,10 @@ public:
     bool isText() const { return kind() == Kind::String; }
     explicit operator bool() const { return !isNull(); }
 
-    /// What the value holds when it is of that kind; else nothing (a null pointer, an empty optional).
-    std::optional<std::string> text() const;              ///< of a string, readings included
+    /// The contents when the value has that kind; else nothing (a null pointer, an empty optional).
+    std::optional<std::string> text() const;              ///< of a string or a reading
     std::optional<Reading> reading() const;               ///< nothing for a plain string
-    std::optional<std::int64_t> integer() const;          ///< nothing above 2^63-1 too
+    std::optional<std::int64_t> integer() const;          ///< nothing above 2^63-1
     std::optional<std::uint64_t> unsignedInteger() const; ///< nothing below 0
     std::optional<double> real() const;
     std::optional<bool> boolean() const;
@@ -74,22 +74,21 @@ public:
     const Data* data() const { return std::get_if<Data>(&_held); }
     ArrayRef array() const;
     DictionaryRef dictionary() const;
-    /// The same, borrowed from the value.
+    /// Borrowed: valid until the value changes.
     const Dictionary* borrowedDictionary() const;
     const std::string* borrowedString() const { return std::get_if<std::string>(&_held); } ///< null for a reading
 
-    /// A 32-bit number: an integer in range, or a real without fraction in range. A boolean is no number.
+    /// A 32-bit number: an integer in range, or a real in range without a fraction. Nothing for a boolean.
     std::optional<std::int32_t> int32() const;
 
-    /// Makes this an empty container: the one it holds, started over, unless somebody else holds that too.
+    /// Makes this an empty container. Reuses the container it holds when no other value shares it.
     Array& becomeArray();
     Dictionary& becomeDictionary();
 
-    /// Forgets what it holds, but keeps the memory: a text or a container becomes empty (null when somebody else holds
-    /// the container), all else null.
+    /// Empties a text or a container and keeps its memory for reuse. A shared container and any other kind become null.
     void startOver();
 
-    /// Makes this a string, reusing the storage of the one it holds.
+    /// Makes this a string. Reuses the memory of the string it holds.
     void assignText(std::string_view text);
     void assign(Reading reading)
     {
@@ -99,12 +98,12 @@ public:
             _held = reading;
     }
 
-    /// Equal kind and contents: strings and readings by their texts, containers element by element (dictionaries
-    /// without regard to order). Not for self-referring structures.
+    /// Same kind and equal contents: strings and readings by text, containers element by element (dictionaries in any
+    /// order). Recursive: a container must not contain itself.
     friend bool operator==(const Value& left, const Value& right);
     friend bool operator==(const Value& value, std::string_view text) { return value.is(text); }
     friend bool operator==(const Value& value, const char* text) { return value.is(text); }
-    /// Whether it is a string, a reading included, with this text.
+    /// Whether it is a string or a reading with this text.
     bool is(std::string_view text) const;
 
 private:
@@ -116,17 +115,17 @@ private:
         _held;
 };
 
-/// The kind's name as it is put into messages: "string", "integer", ...
+/// The kind's name for messages: "string", "integer", ...
 std::string_view nameOf(Value::Kind kind);
 
-/// Values in order. `startOver` keeps the elements as spares, whose memory is used again: lists are rewritten thousands
-/// of times a second, mostly with as much as before.
+/// Values in order. `startOver` empties the array but keeps the elements as spares, whose memory the next elements
+/// reuse: lists are rewritten thousands of times a second with about the same contents.
 class Array {
 public:
     Array() = default;
     Array(std::initializer_list<Value> elements) : _elements(elements), _size(elements.size()) {}
     explicit Array(std::vector<Value> elements) : _elements(std::move(elements)), _size(_elements.size()) {}
-    Array(const Array&) = default; // and no move, which would leave a size without elements
+    Array(const Array&) = default; // no move: the source would keep its size but lose its elements
     Array& operator=(const Array&) = default;
 
     std::size_t size() const { return _size; }
@@ -136,10 +135,10 @@ public:
         _elements.clear();
         _size = 0;
     }
-    void startOver() { _size = 0; } ///< empty, as after `clear`
+    void startOver() { _size = 0; } ///< empty; keeps the elements as spares
     void dropSpares();
     void reserve(std::size_t count) { _elements.reserve(count); }
-    /// Appends a null value, an empty text or an empty container, whichever stood there.
+    /// Appends an empty value: null, or an empty text or container when a spare of that kind is reused.
     Value& slot()
     {
         Value& value = reuse();
@@ -151,7 +150,7 @@ public:
     void appendText(std::string_view text) { reuse().assignText(text); }
     /// Appends a dictionary without entries.
     Dictionary& appendRow() { return reuse().becomeDictionary(); }
-    /// `count` is not above `size()`.
+    /// `count`: 0 to `size()`.
     void removeFirst(std::size_t count)
     {
         _elements.erase(_elements.begin(), _elements.begin() + static_cast<std::ptrdiff_t>(count));
@@ -167,7 +166,7 @@ public:
     auto end() { return _elements.begin() + static_cast<std::ptrdiff_t>(_size); }
 
 private:
-    /// Appends a value that is to be set at once: a spare one, or null.
+    /// Appends a spare, with its old contents, or null. The caller sets it at once.
     Value& reuse()
     {
         if (_size == _elements.size())
@@ -175,12 +174,12 @@ private:
         return _elements[_size++];
     }
 
-    std::vector<Value> _elements; ///< the spares behind the others
+    std::vector<Value> _elements; ///< from `_size` on: spares
     std::size_t _size = 0;
 };
 
-/// Values under string keys, in the order in which the keys first came. `startOver` keeps the entries as spares; keys
-/// that come again in their order use their memory again.
+/// Values under string keys, in the order in which the keys were first set. `startOver` empties the dictionary but
+/// keeps the entries as spares, which are reused when the same keys are set in the same order.
 class Dictionary {
 public:
     struct Entry {
@@ -190,7 +189,7 @@ public:
 
     Dictionary() = default;
     Dictionary(std::initializer_list<Entry> entries);
-    Dictionary(const Dictionary&) = default; // and no move, which would leave a size without entries
+    Dictionary(const Dictionary&) = default; // no move: the source would keep its size but lose its entries
     Dictionary& operator=(const Dictionary&) = default;
 
     std::size_t size() const { return _size; }
@@ -199,21 +198,21 @@ public:
     /// The value under `key`, null when there is none.
     const Value* find(std::string_view key) const { return valueAt(indexOf(key)); }
     Value* find(std::string_view key) { return const_cast<Value*>(valueAt(advanceTo(key))); }
-    /// As `find`, as a value: the null value when there is none.
+    /// A copy of the value under `key`; the null value when there is none.
     Value at(std::string_view key) const;
     bool contains(std::string_view key) const { return find(key) != nullptr; }
 
-    /// The value under `key`. A key that is not there is appended with a null value, an empty text or an empty
-    /// container, whichever stood there.
+    /// The value under `key`. A missing key is appended with an empty value: null, or an empty text or container when
+    /// a spare of that kind is reused.
     Value& slot(std::string_view key);
     /// Replaces the value under `key` in its place, or appends the key.
     void set(std::string_view key, Value value) { reuse(key) = std::move(value); }
     void set(std::string_view key, Reading reading) { reuse(key).assign(reading); }
-    /// As `set`, without allocating when a text of that length stands there already.
+    /// As `set`. Does not allocate when the old text's memory is large enough.
     void setText(std::string_view key, std::string_view text) { reuse(key).assignText(text); }
     void remove(std::string_view key);
     void clear();
-    void startOver() ///< empty, as after `clear`
+    void startOver() ///< empty; keeps the entries as spares
     {
         _size = _next = 0;
         if (!_index.empty())
@@ -229,10 +228,10 @@ public:
 private:
     static constexpr std::size_t kNotThere = static_cast<std::size_t>(-1);
 
-    // Below this many keys a look through them is faster than the index.
+    // Up to this many keys a linear search is faster than the index.
     static constexpr std::size_t kIndexFrom = 48;
 
-    /// The value under `key`, which is to be set at once: that of a new key is a spare one, or null.
+    /// The value under `key`; of a new key a spare, with its old contents, or null. The caller sets it at once.
     Value& reuse(std::string_view key)
     {
         const auto expected = _entries.begin() + static_cast<std::ptrdiff_t>(_next);
@@ -245,7 +244,7 @@ private:
     Value& reuseElsewhere(std::string_view key);
     const Value* valueAt(std::size_t index) const { return index == kNotThere ? nullptr : &_entries[index].value; }
     std::size_t indexOf(std::string_view key) const;
-    std::size_t advanceTo(std::string_view key); ///< as `indexOf`; moves `_next` behind the entry
+    std::size_t advanceTo(std::string_view key); ///< like `indexOf`; moves `_next` behind the entry
     void takeSpare()
     {
         if (++_size > kIndexFrom)
@@ -253,26 +252,26 @@ private:
     }
     void index();
 
-    std::vector<Entry> _entries; ///< the spares behind the others; no two keys are equal
+    std::vector<Entry> _entries; ///< from `_size` on: spares; no two keys are equal
     std::size_t _size = 0;
-    // Decoders set their keys in the same order each time, or ask for the same one: the entry behind the last one
-    // found is tried first, then that itself. Not above `_size`.
+    // The entry after the last one found, at most `_size`. It is tried first, then the last one itself: decoders set
+    // their keys in the same order each time, or the same key again.
     std::size_t _next = 0;
-    // Kept beyond a few dozen keys only: property lists from outside may hold many thousands. Sorted, for keys can be
-    // chosen to collide in any hash.
+    // Used above `kIndexFrom` keys: property lists from outside may hold many thousands. A sorted map, because a hash
+    // can be attacked with colliding keys.
     std::map<std::string, std::size_t, std::less<>> _index;
 };
 
 ArrayRef makeArray(std::vector<Value> elements = {});
 DictionaryRef makeDictionary(std::initializer_list<Dictionary::Entry> entries = {});
 
-/// A dictionary of the entries before the first null value: a null ends the list, whatever follows it.
+/// A dictionary of the entries before the first null value. The null and all entries after it are ignored.
 DictionaryRef makeDictionaryUntilNull(std::initializer_list<Dictionary::Entry> entries);
 
-/// A copy of the top-level container alone; its children are shared. Other values are copied as they are.
+/// A copy of the top container; its children are shared. A value that is no container is copied.
 Value shallowCopy(const Value& value);
-/// A copy that shares no container with the original (data bytes are shared: they cannot change).
-/// Not for self-referring structures.
+/// A copy that shares no container with the original. Data bytes are shared, as they cannot change. Recursive: a
+/// container must not contain itself.
 Value deepCopy(const Value& value);
 
 /// One line: {"key": "text", "list": [1, 2.5, true, <3 bytes>]}. For logs and test messages.

@@ -8,10 +8,10 @@
 
 namespace kestrum {
 
-/// How long a connection may take before an empty root pane says what is missing.
+/// An empty root pane shows the hint when the connection takes longer than this.
 inline constexpr std::chrono::seconds kConnectionPatience{10};
 
-/// The pane's lines then: what it waits for, why it does not come (a sentence), what to do.
+/// The hint, in lines: what the display waits for, `problem` (a sentence), what the user can do.
 std::string connectionHint(const std::optional<Problem>& problem = {});
 
 } // namespace kestrum

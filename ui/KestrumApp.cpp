@@ -17,7 +17,7 @@ constexpr std::string_view kInternalInstallMarker =
     "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 constexpr std::string_view kShowGSMRSSI = "HXShowGSMRSSI";
 constexpr std::string_view kConnecting = "Connecting...";
-constexpr std::chrono::seconds kNoticeTime{8}; // to read a path in
+constexpr std::chrono::seconds kNoticeTime{8}; // enough to read a path
 
 } // namespace
 
@@ -43,14 +43,14 @@ void KestrumApp::applicationDidFinishLaunching()
     _dateFormatter.emplace(_roles.clock, "'Updated' yyyy-MM-dd 'at' HH:mm:ss");
 
     auto root = std::make_shared<KestrumPaneController>(_roles.toolkit, *this, nullptr, "/");
-    root->setStatus("Connecting", true); // without dots, until the first attempt has ended
+    root->setStatus("Connecting", true); // without dots until the first attempt has ended
     _navController = std::make_unique<NavigationStack>(_roles.toolkit, std::move(root));
     _navController->setDelegate(this);
     _window->setRoot(_navController->view());
     _window->makeKeyAndVisible();
     followConnection();
 
-    // The first screen is up before anything is opened.
+    // Shows the first screen before the channel is opened.
     _roles.queue.post([self = shared_from_this()] {
         if (const auto model = self->_model)
             model->restartMonitor();
@@ -173,7 +173,7 @@ void KestrumApp::messagesLost()
 
 void KestrumApp::releaseModel()
 {
-    // While monitoring runs the refresh timer holds the model too: the channel then stays open until the end.
+    // While monitoring runs the refresh timer owns the model too: the channel stays open until the queue is cleared.
     if (const auto model = std::exchange(_model, nullptr))
         model->setObserver(nullptr);
 }

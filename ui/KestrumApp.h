@@ -17,37 +17,37 @@
 
 namespace kestrum {
 
-/// The application: a window, a stack of panes in it, and the monitor model that they show.
+/// The application: a window with a stack of panes, and the monitor model that they show.
 class KestrumApp final : public std::enable_shared_from_this<KestrumApp>,
                          public ApplicationDelegate,
                          public NavigationStackDelegate,
                          public KestrumModelObserver,
                          public SharedApplication {
 public:
-    /// Does nothing before it is launched. The roles are borrowed: they outlive the application and what it leaves in
-    /// the queue, the model of a running refresh timer included.
+    /// Does nothing before the launch. The roles are borrowed. They outlive the application and its tasks and timers in
+    /// the queue, which own the model while monitoring runs.
     static std::shared_ptr<KestrumApp> make(ApplicationRoles& roles);
     ~KestrumApp() override;
 
     void applicationDidFinishLaunching() override;
     void applicationWillTerminate() override;
 
-    /// Offers the Save button where the device software is an internal installation.
+    /// Offers the Save button when the device software is an internal installation.
     void getSaveButtonPref();
-    /// Whether the home screen shows the GSM signal strength as a number.
+    /// Sets whether the home screen shows the GSM signal strength as a number.
     void _setGSMRSSI(bool value);
 
     void showSaveView() override;
     void closeSaveView() override;
     void showNotice(std::string_view text) override;
 
-    /// Gives the pane the status as it is now.
+    /// Shows the current status in the pane.
     void updateStatusForViewController(KestrumPaneController& viewController);
-    /// New data: gives every pane the node that now stands at its path, and drops those whose path is gone.
+    /// New data: gives each pane the node at its path, and closes panes whose path no longer exists.
     void updateViewControllerFromModel() override;
-    /// An attempt to connect has ended: the pane on the screen says so.
+    /// An attempt to connect has ended: updates the status of the shown pane.
     void updateStatus() override;
-    /// Another technology's display: nothing that was opened in the old one stays open.
+    /// Another technology's display: closes all panes but the root.
     void displayReplaced() override;
     void messagesLost() override;
     void willShowViewController(NavigationStack& navigationController, KestrumPaneController& viewController,
@@ -73,21 +73,21 @@ private:
 
     bool isConnected() const { return _model && _model->isConnected(); }
     void releaseModel();
-    /// Keeps the root pane's hint: there once a connection has been missing for `kConnectionPatience`.
+    /// Shows the root pane's hint after `kConnectionPatience` without a connection, and removes it on connection.
     void followConnection();
 
     ApplicationRoles& _roles;
-    // In this order, so that at the end what borrows goes before what it borrows.
+    // In this order, so that a member is destroyed before the members that it borrows.
     std::shared_ptr<KestrumModel> _model;
     std::optional<DateFormatter> _dateFormatter;
     std::shared_ptr<KestrumSaveViewController> _saveViewController;
     std::unique_ptr<NavigationStack> _navController;
     std::shared_ptr<Window> _window;
-    std::unique_ptr<Timer> _unconnected; ///< there while no connection is
-    std::unique_ptr<Timer> _noticeEnd;   ///< there while a notice is shown
+    std::unique_ptr<Timer> _unconnected; ///< not null while there is no connection
+    std::unique_ptr<Timer> _noticeEnd;   ///< not null while a notice is shown
 
-    // The properties have storage of their own. Those for the window and the save screen are only ever cleared, which
-    // leaves the window and the save screen in use alone: kept so on purpose.
+    // Kept: the properties are separate from the members above. Clearing the property `window` or `saveViewController`
+    // does not close the window or the save screen in use.
     struct {
         std::optional<std::string> updateMessage;
         bool allowSaveButton = false;

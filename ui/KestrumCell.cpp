@@ -66,13 +66,13 @@ void KestrumCell::setLayout()
     if (!_view)
         return;
 
-    // The value is measured in bold, although it is drawn in the regular font: kept so on purpose.
+    // Kept: the value is measured in bold but drawn in the regular font, so that values stand where testers know them.
     const Size value = measured(_value.get());
     const double needed = key.width + kInset + kGap + value.width;
     const double x = needed < b.width ? b.width - value.width : b.x + kInset + key.width + kGap;
     _value->setFrame({x, centred(value.height, b), value.width, value.height});
 
-    // Wider than what the texts need: kept so on purpose too.
+    // Kept: wider than the texts need, so a row scrolls beyond the end of its value.
     const double content = needed > b.width ? b.width + key.width + value.width : b.width;
     _view->setContentSize({content, kStripHeight});
     _view->setFrame({b.x, b.y, b.width, kStripHeight});

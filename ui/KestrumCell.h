@@ -11,13 +11,13 @@
 
 namespace kestrum {
 
-/// A row of a pane: the bold key and, for a leaf, its value behind it in a strip that scrolls sideways.
+/// A row of a pane: a bold key and, for a leaf, its value, in a strip that scrolls sideways.
 class KestrumCell final : public ReusableCell {
 public:
-    /// A cell for the key alone, without value and strip.
+    /// A key-only cell, without value and strip.
     static std::shared_ptr<KestrumCell> initWithStyleKey(Toolkit& toolkit, TableView& table, CellStyle style,
                                                          std::string_view reuseIdentifier);
-    /// A cell for key and value.
+    /// A cell with key and value.
     static std::shared_ptr<KestrumCell> initWithStyle(Toolkit& toolkit, TableView& table, CellStyle style,
                                                       std::string_view reuseIdentifier);
 
@@ -27,19 +27,19 @@ public:
     const std::shared_ptr<Label>& value() const { return _value; }
     void setValue(std::shared_ptr<Label> value) { _value = std::move(value); }
 
-    /// Sets both labels' texts, as far as the cell has the labels.
+    /// Sets the texts of the labels that the cell has.
     void setTexts(std::string_view key, std::optional<std::string_view> value);
 
-    /// Places the texts of a row that opens something: the key alone.
+    /// Lays out a row that opens another pane: the key.
     void setLayoutKey();
-    /// Places the texts of a leaf: the value at the right edge when both fit, else behind the key.
+    /// Lays out a leaf: the value is at the right edge when both texts fit, else behind the key.
     void setLayout();
 
 private:
     KestrumCell(Toolkit& toolkit, TableView& table, CellStyle style, std::string_view reuseIdentifier);
 
     Size measured(const Label* label) const;
-    /// Places the key, and tells the size of its text.
+    /// Places the key and returns the size of its text.
     Size placeKey(Rect bounds);
 
     Toolkit& _toolkit;

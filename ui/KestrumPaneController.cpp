@@ -11,7 +11,7 @@
 namespace kestrum {
 namespace {
 
-// One identifier for both kinds of cell: a cell of either kind may come back for any row.
+// One identifier for both kinds of cell: the table may offer either kind for any row.
 constexpr std::string_view kReuseIdentifier = "KestrumPaneControllerCell";
 
 } // namespace
@@ -68,7 +68,7 @@ std::shared_ptr<ReusableCell> KestrumPaneController::cellForRowAtIndexPath(Table
 {
     const auto child = childAtIndexPath(indexPath);
     auto cell = std::static_pointer_cast<KestrumCell>(table.dequeueReusableCell(kReuseIdentifier));
-    // A reused cell may be of the other kind: a leaf then shows its name alone, an inner row keeps its empty strip.
+    // A reused cell may be of the other kind: a leaf then shows its name only, an inner row keeps an empty strip.
     if (child && child->childNodes()) {
         if (!cell)
             cell = KestrumCell::initWithStyleKey(_toolkit, table, CellStyle::KeyAndDetail, kReuseIdentifier);
@@ -81,7 +81,7 @@ std::shared_ptr<ReusableCell> KestrumPaneController::cellForRowAtIndexPath(Table
         if (child)
             cell->setTexts(child->displayName(), *child->value());
         else
-            cell->setTexts("", std::nullopt); // The row went away before the table heard of it.
+            cell->setTexts("", std::nullopt); // the row was removed before the table reloaded
         cell->cell().setAccessory(Accessory::None);
         cell->setLayout();
     }
@@ -92,12 +92,12 @@ void KestrumPaneController::didSelectRowAtIndexPath(TableView& table, std::optio
 {
     const auto child = indexPath ? childAtIndexPath(*indexPath) : nullptr;
     if (!child)
-        return; // No row, or one that went away under the finger.
+        return; // no row, or a row that was just removed
     if (!child->childNodes()) {
         table.deselectRow(*indexPath, false);
         return;
     }
-    // A second tap can arrive on a pane that the first one has already covered.
+    // A second tap can reach a pane that the first tap has already covered.
     if (!_navigationController || &_navigationController->topViewController() != this)
         return;
     auto pane = std::make_shared<KestrumPaneController>(_toolkit, _application, child,
@@ -106,7 +106,7 @@ void KestrumPaneController::didSelectRowAtIndexPath(TableView& table, std::optio
     _navigationController->pushViewController(std::move(pane), true);
 }
 
-/// From the left: activity indicator, status, and at the right edge the Save button where it is offered.
+/// From the left: activity indicator, status, and at the right edge the Save button when it is offered.
 void KestrumPaneController::createToolbarItems()
 {
     std::vector<ToolbarItem> items{ActivityIndicatorItem{_isLoading}, LabelItem{_status, systemFont(14)},

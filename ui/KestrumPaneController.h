@@ -14,26 +14,26 @@ class KestrumModelNode;
 class NavigationStack;
 class SharedApplication;
 
-/// One level of the display tree as a table: a row per child node.
+/// One level of the display tree as a table: a row for each child node.
 class KestrumPaneController final : public TableDataSource {
 public:
     using Node = std::shared_ptr<const KestrumModelNode>;
 
-    /// `node` may be null: no rows. `atPath` is its path, "/" for the root pane.
+    /// `node` may be null: the pane has no rows. `atPath` is the node's path, "/" for the root pane.
     KestrumPaneController(Toolkit& toolkit, SharedApplication& application, Node node, std::string atPath);
 
     const std::string& path() const { return _keyPath; }
     TableScreen& screen() { return *_screen; }
 
-    /// Told by the stack: before the pane comes onto the screen, and before it leaves it.
+    /// Called by the stack before the pane appears and before it disappears.
     void viewWillAppear(bool animated);
     void viewWillDisappear(bool animated);
-    /// The stack that holds the pane; null as soon as it does no longer.
+    /// The stack that owns the pane; null after the pane was removed.
     void setNavigationController(NavigationStack* navigationController);
 
-    /// The toolbar's text, none for nothing, and whether its activity indicator runs.
+    /// Sets the toolbar's text (nothing: none) and whether the activity indicator runs.
     void setStatus(std::optional<std::string_view> status, bool isLoading);
-    /// Replaces the node by the one of a newer tree.
+    /// Replaces the node by that of a newer tree.
     void reloadWithNode(Node node);
 
     std::size_t numberOfRowsInSection(TableView& table, std::size_t section) override;
@@ -43,13 +43,13 @@ public:
 private:
     void createToolbarItems();
     void updateTitle();
-    /// Null for a row that is gone.
+    /// Null when the row no longer exists.
     Node childAtIndexPath(IndexPath indexPath) const;
 
     Toolkit& _toolkit;
     SharedApplication& _application;
     NavigationStack* _navigationController = nullptr;
-    Node _nodes; ///< one node, despite the name: its children are the rows
+    Node _nodes; ///< one node; its children are the rows
     std::string _keyPath;
     std::string _status;
     bool _isLoading = true;

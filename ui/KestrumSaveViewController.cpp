@@ -19,7 +19,7 @@ namespace {
 constexpr std::string_view kReuseIdentifier = "SaveHistoryContentCell";
 constexpr Font kRowFont{"Helvetica", 13};
 
-// A name that another display took in the same second is that display's: the next second's is as good.
+// A name contains the second. When another display has taken the name, the next second is tried, up to a minute.
 constexpr std::chrono::seconds kMostNames{60};
 
 std::string snapshotPath(const FileSystem& files, std::chrono::seconds moment)
@@ -67,7 +67,7 @@ std::shared_ptr<ReusableCell> KestrumSaveViewController::cellForRowAtIndexPath(T
     const Value description = entry ? entry->at(StateKey::kDescription) : Value();
     auto& cell = reusable->cell();
     cell.textLabel().setFont(kRowFont);
-    // An entry without a description is a blank row: it is saved like the others.
+    // An entry without a description is a blank row. It is saved like the others.
     cell.textLabel().setText(description.text());
     cell.setAccessory(Accessory::CheckMark);
     return reusable;
@@ -119,7 +119,7 @@ bool KestrumSaveViewController::textFieldShouldReturn()
 
 void KestrumSaveViewController::postClose()
 {
-    // Not this screen's own pointer: pressed twice, it is gone by the time of the second task.
+    // Captures the application, not this screen: after a second press the screen no longer exists.
     _roles.queue.post([&application = _application] { application.closeSaveView(); });
 }
 

@@ -12,10 +12,10 @@ namespace kestrum {
 
 class SharedApplication;
 
-/// The save screen: lists what will be saved, takes a description, and writes one snapshot file.
+/// The save screen: lists the contents, takes a description and writes one snapshot file.
 class KestrumSaveViewController final : public SaveInterfaceOwner {
 public:
-    /// Saves the contents as they are now, whatever happens to the list later. Null: there is nothing to save.
+    /// Copies the contents: later changes of the list have no effect. Null when there is nothing to save.
     KestrumSaveViewController(ApplicationRoles& roles, SharedApplication& application,
                               const Value& initWithSaveHistory);
 
@@ -29,7 +29,7 @@ public:
     std::shared_ptr<ReusableCell> cellForRowAtIndexPath(TableView& table, IndexPath indexPath) override;
     void didSelectRowAtIndexPath(TableView& table, std::optional<IndexPath> indexPath) override;
 
-    /// Both close the screen, but not before the call has returned.
+    /// Both close the screen, after the call has returned.
     void savePressed() override;
     void cancelPressed() override;
     void backgroundTouched() override;

@@ -18,14 +18,14 @@ NavigationStack::NavigationStack(Toolkit& toolkit, std::shared_ptr<KestrumPaneCo
 
 NavigationStack::~NavigationStack()
 {
-    // Somebody else may hold a pane for longer.
+    // A pane may have other owners and outlive the stack.
     for (const auto& pane : _panes)
         pane->setNavigationController(nullptr);
 }
 
 void NavigationStack::pushViewController(std::shared_ptr<KestrumPaneController> pane, bool animated)
 {
-    // What lies under the save screen takes no input, whatever way it comes.
+    // Panes under the save screen take no input of any kind.
     if (_presenting)
         return;
     topViewController().viewWillDisappear(animated);
@@ -40,7 +40,7 @@ void NavigationStack::popToViewController(const KestrumPaneController& pane, boo
     if (found == _panes.end() || std::next(found) == _panes.end())
         return;
     topViewController().viewWillDisappear(animated);
-    // The view draws the leaving pane until it is given another one: the panes are dropped after that.
+    // The view draws the old pane until it shows another one. The panes are destroyed after that.
     const Panes leaving(std::next(found), _panes.end());
     _panes.erase(std::next(found), _panes.end());
     for (const auto& each : leaving)
@@ -76,7 +76,7 @@ void NavigationStack::setToolbarHidden(bool hidden)
 
 void NavigationStack::titlesChanged()
 {
-    // A pane that is only about to be shown brings its title along.
+    // A pane that is about to be shown passes its title with `show`.
     if (_shown == &topViewController())
         _view->setTitles(titles());
 }

@@ -13,23 +13,22 @@ class KestrumPaneController;
 class KestrumSaveViewController;
 class NavigationStack;
 
-/// Who is told what the stack is about to show.
+/// Receives the stack's notifications.
 class NavigationStackDelegate {
 public:
     virtual ~NavigationStackDelegate() = default;
-    /// Before a pushed or revealed pane is on the screen; it is the stack's top by then.
+    /// A pushed or revealed pane is about to be shown. It is already the top of the stack.
     virtual void willShowViewController(NavigationStack& navigationController, KestrumPaneController& viewController,
                                         bool animated) = 0;
 };
 
-/// The panes that the user has opened, root first, and the save screen over them. Keeps the order and tells the
-/// controllers what happens to them; the navigation view only draws. Every change is complete when its call returns:
-/// animation delays nothing.
+/// The open panes, root first, and the save screen over them. Owns the panes and notifies their controllers; the
+/// navigation view only draws. A change is complete when its call returns, also while an animation is drawn.
 class NavigationStack final : private NavigationViewDelegate {
 public:
     using Panes = std::vector<std::shared_ptr<KestrumPaneController>>;
 
-    /// Starts with `root`, which is never popped. The delegate hears of later panes only.
+    /// Starts with `root`, which is never popped. The delegate is not notified of it.
     NavigationStack(Toolkit& toolkit, std::shared_ptr<KestrumPaneController> root);
     ~NavigationStack() override;
     NavigationStack(const NavigationStack&) = delete;
@@ -41,18 +40,18 @@ public:
     const Panes& viewControllers() const { return _panes; }
     KestrumPaneController& topViewController() const { return *_panes.back(); }
 
-    /// Nothing happens under the save screen.
+    /// Does nothing while the save screen is shown.
     void pushViewController(std::shared_ptr<KestrumPaneController> pane, bool animated);
-    /// Drops what lies over `pane`. Nothing happens when it is the top, or not on the stack.
+    /// Removes the panes over `pane`. Does nothing when it is the top or not on the stack.
     void popToViewController(const KestrumPaneController& pane, bool animated);
     void popToRootViewController(bool animated);
 
-    /// The save screen, over the panes; borrowed until it is dismissed.
+    /// Shows the save screen over the panes. It is borrowed until it is dismissed.
     void presentViewController(KestrumSaveViewController& screen, bool animated);
     void dismissViewController(bool animated);
 
     void setToolbarHidden(bool hidden);
-    /// A pane of the stack has another title.
+    /// The title of a pane of the stack has changed.
     void titlesChanged();
 
 private:
@@ -65,7 +64,7 @@ private:
     Panes _panes;
     const KestrumPaneController* _shown = nullptr; ///< the pane that the view draws
     bool _presenting = false;
-    std::unique_ptr<NavigationView> _view; // behind the panes: it ends first, for it draws their screens
+    std::unique_ptr<NavigationView> _view; // after the panes: destroyed first, because it draws their screens
 };
 
 } // namespace kestrum

@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// The application object, as its screens see it. It outlives them.
+/// The operations of the application that its screens use. It outlives them.
 class SharedApplication {
 public:
     virtual ~SharedApplication() = default;
@@ -13,9 +13,9 @@ public:
     virtual bool allowSaveButton() const = 0;
     /// Presents the save screen, unless it is shown already.
     virtual void showSaveView() = 0;
-    /// Dismisses the save screen and lets go of it; nothing when none is shown.
+    /// Dismisses and destroys the save screen. Does nothing when none is shown.
     virtual void closeSaveView() = 0;
-    /// Shows a line about what was done; it goes away by itself.
+    /// Shows one line of text for a few seconds.
     virtual void showNotice(std::string_view text) = 0;
 };
 

@@ -5,7 +5,7 @@
 
 namespace kestrum {
 
-/// The name of a CDMA band class (3GPP2 C.S0057), worded as testers know it: the blank missing in "900 MHzband" too.
+/// The name of a CDMA band class (3GPP2 C.S0057). Kept: testers know these texts, also "900 MHzband" without its blank.
 std::string bandClassName(std::uint32_t bandClass);
 
 } // namespace kestrum

@@ -13,7 +13,7 @@
 namespace kestrum {
 namespace {
 
-/// A log code, and what decodes its records.
+/// A log code and its decoder.
 struct Decoder {
     LogCode code;
     void (*decode)(Record record, C2KContext& context);
@@ -49,7 +49,7 @@ void C2KLogGenerator::updateFromLog(Bytes message, const DictionaryRef& usingLoo
     const auto read = ChannelMessage::read(message);
     if (!read)
         return;
-    // Logged, and routed by its code all the same, on purpose.
+    // Kept: such a message is logged, and its record is still decoded by its code.
     if (read->type != ChannelMessage::kOrdinary)
         _roles.log.write(Priority::Error, "Invalid log type: %x. Dropping.", read->type);
     const auto* decoder = std::ranges::find(kDecoders, read->logCode, &Decoder::code);

@@ -4,7 +4,7 @@
 namespace kestrum {
 namespace {
 
-/// The names under which a link's numbers are kept between records, shown, and put into the history.
+/// The keys of a link's numbers in the state, in the display and in the history.
 struct Link {
     std::string_view identifier;
     std::string_view sequence, sent;                 ///< in the state: the previous record's
@@ -27,7 +27,7 @@ std::string rate(double kilobits)
 }
 constexpr Quantity kRate = computedQuantity<rate>("kbps");
 
-/// Publishes the rate since the previous record, and keeps this one's numbers for the next.
+/// Publishes the rate since the previous record, and stores this record's numbers for the next one.
 void publishRate(C2KContext& context, const Link& link, std::uint32_t sequence, std::uint64_t bitsSent)
 {
     State& state = context.state;
@@ -41,7 +41,7 @@ void publishRate(C2KContext& context, const Link& link, std::uint32_t sequence, 
     if (previousSequence && previousSent) {
         const auto before = static_cast<std::uint32_t>(*previousSequence);
         const auto elapsed = static_cast<std::int32_t>(sequence - before);
-        // Across the wrap of the number nothing is published: the difference alone would not show it.
+        // Publishes nothing when the number wraps around: the difference alone would not show the wrap.
         if (sequence > before && elapsed >= 1) {
             const auto bits = static_cast<double>(static_cast<std::int64_t>(bitsSent - *previousSent));
             context.publish(link.identifier, Reading::computed(kRate, bits / (elapsed * 1024.0)));
@@ -57,7 +57,7 @@ void publishRate(C2KContext& context, const Link& link, std::uint32_t sequence, 
     note(link.thisSent, bitsSent);
 }
 
-/// The 32-bit counter at a place that is known at run time only.
+/// The 32-bit counter at an offset that is known only at run time.
 std::uint64_t counterAt(Record record, std::size_t offset)
 {
     const auto counter = record.slice(offset, 4);
@@ -80,11 +80,11 @@ constexpr std::uint64_t kForwardBits[] = {
     1024, 3072, 0,   512,  1024, 2048, 0,   4096, 0,    1024, 3072, 0,   4096, 0,    5120, 0,   5120, 0};
 static_assert(std::size(kForwardBits) == 56);
 
-// By the index of the rate.
+// Indexed by the rate.
 constexpr std::uint64_t kReverseBits[] = {128, 256, 512, 768, 1024, 1536, 2048, 3072, 4096, 6144, 8192, 12288};
 constexpr std::size_t kReverseGroups = 3;
 constexpr std::size_t kReverseGroupSize = 576, kReverseRateSize = 24;
-constexpr std::size_t kReverseCounters[] = {18, 306}; // each the first of four in a row
+constexpr std::size_t kReverseCounters[] = {18, 306}; // the first of four successive counters
 
 } // namespace
 

@@ -13,27 +13,27 @@ namespace kestrum {
 
 class SystemLog;
 
-/// What a CDMA decoder works on. Values are published under lookup identifiers: the template says at which places
-/// of the display each is shown.
+/// The input and output of a CDMA decoder. It publishes values under lookup identifiers; the template determines the
+/// places of each identifier in the display.
 class C2KContext {
 public:
     C2KContext(State& runState, const DictionaryRef& places, DecodingRoles& roles)
         : state(runState), log(roles.log), _lookup(places), _watch(roles.watch)
     {}
 
-    /// Sets the text at all places of the identifier, up to the first that is none.
+    /// Sets the text at all places of the identifier. Stops at the first entry of the lookup that is no place.
     void publish(std::string_view identifier, std::string_view text) const;
     void publish(std::string_view identifier, Reading reading) const;
-    /// The same with what `set` makes of the value that stands there.
+    /// The same; `set` changes the value at each place.
     template <std::invocable<Value&> Set>
     void publish(std::string_view identifier, Set set) const
     {
         atPlacesOf(identifier, [&set](Dictionary& node, const std::string& key) { set(node.slot(key)); });
     }
-    /// The rows' keys are the identifiers.
+    /// Publishes the fields of the rows; the rows' keys are identifiers.
     void publish(Record record, std::span<const Row> rows) const;
 
-    /// Ends a record of a wrong length: one line, at error priority.
+    /// Reports a record of a wrong length: one line at error priority.
     void rejectLength(std::string_view line) const;
 
     State& state;
@@ -65,9 +65,8 @@ void C2KContext::atPlacesOf(std::string_view identifier, Set set) const
     }
 }
 
-// One decoder for each log code (3GPP2 C.S0005 for 1x, C.S0024 for EV-DO). A record of a wrong length publishes
-// nothing, logs one line, and leaves every value as it was. Offsets count from the record's first byte, header
-// included.
+// One decoder for each log code (3GPP2 C.S0005 for 1x, C.S0024 for EV-DO). A record of a wrong length logs one line and
+// changes no value. Offsets count from the record's first byte, header included.
 void decodeEvdoStatus(Record record, C2KContext& context);          // 0x1183
 void decodeActiveSetPilots(Record record, C2KContext& context);     // 0x12B6
 void decodeFingers(Record record, C2KContext& context);             // 0x108A

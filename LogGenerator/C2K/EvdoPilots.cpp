@@ -9,11 +9,11 @@ namespace {
 
 constexpr std::uint32_t kUnusedFinger = 0xFFFF, kNone = 0x10000; // PNs have 16 bits
 
-/// Where a record keeps its pilots, and what of each is read.
+/// The layout of a record's list of pilots.
 struct PilotList {
     Field count;
     std::size_t first, size;
-    Field pn, energy;      ///< from the pilot's first byte; energies are in units of 1/512
+    Field pn, energy;      ///< offsets from the pilot's first byte; energies in units of 1/512
     std::uint32_t leftOut; ///< the PN that marks an entry as unused
 };
 
@@ -27,8 +27,8 @@ unsigned lengthOf(Record record)
     return static_cast<unsigned>(record.size());
 }
 
-/// Lists {"_sorted", "0;PN": strength, ...}: the index first, so that the list keeps the record's order. A pilot that
-/// is left out leaves a gap in the index.
+/// Publishes {"_sorted", "0;PN": strength, ...}. The index comes first, so that the list keeps the record's order; an
+/// omitted pilot leaves a gap in the index.
 void listStrengths(Record record, const PilotList& list, std::uint32_t count, Dictionary& shown)
 {
     shown.setText(kSortedKey, kSortedKey);
@@ -83,7 +83,7 @@ void decodeFingers(Record record, C2KContext& context)
     }
     const auto count = record.read(kFingers.count).value_or(0);
     if (record.size() != kFingers.first + kFingers.size * count) {
-        // "size" is the fixed part's, not a finger's; kept so.
+        // Kept: "size" is that of the fixed part, not of a finger.
         context.rejectLength(formatted("Log code 0x108a has bad length of %u bytes, but has %d substructs (size=%lu).",
                                        lengthOf(record), static_cast<std::int32_t>(count), kFingers.first));
         return;

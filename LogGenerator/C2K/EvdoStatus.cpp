@@ -56,7 +56,7 @@ constexpr Row kTuning[] = {
     {u16(13).bits(11, 15), "kBandClass",          named<bandClassName>},
     {u8(15),               "kRxAGC0",             kSignedDbm},
 };
-// The second chain and the transmitter mean something only while there is a link.
+// The second receive chain and the transmitter have valid values only while there is a link.
 constexpr Row kLink[] = {
     {u8(16),               "kRxAGC1",             kSignedDbm},
     {u8(17),               "kTxAGC",              kSignedDbm},

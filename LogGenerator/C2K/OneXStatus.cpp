@@ -63,7 +63,7 @@ std::string oldFrameErrors(double percent)
 constexpr Quantity kOldFrameErrors = computedQuantity<oldFrameErrors>("%");
 
 // clang-format off
-// From the first byte of their subpacket.
+// Offsets from the first byte of the subpacket.
 constexpr Field kDeviceState = u8(4);
 
 constexpr Row kStateRows[] = {
@@ -84,8 +84,8 @@ constexpr Row kChain1[] = {
 constexpr std::size_t kRfLength = std::max(reach(kChain0), reach(kChain1));
 constexpr std::size_t kActiveSetLength = 12;
 
-/// 10 log10 of the pilot's share of the received power, at least -50 dB. A quotient that is no number takes the floor
-/// as well, since no comparison with it holds.
+/// 10 log10 of the pilot's share of the received power, at least -50 dB. Not-a-number gives -50 dB too, because every
+/// comparison with it is false.
 double strengthDb(double n, double gain, double k, double energy)
 {
     constexpr double kFloor = 0.00001;
@@ -93,7 +93,7 @@ double strengthDb(double n, double gain, double k, double energy)
     return 10.0 * std::log10(share > kFloor ? share : kFloor);
 }
 
-/// Lists {"_sorted", "0;PN": strength, ...}, up to the first pilot that does not lie inside the record.
+/// Publishes {"_sorted", "0;PN": strength, ...}, up to the first pilot that does not lie inside the record.
 void listPilots(Record activeSet, Dictionary& shown)
 {
     const auto field = [&](Field which) { return activeSet.read(which).value_or(0); };
@@ -126,7 +126,7 @@ void decodeOneXStatus(Record record, C2KContext& context)
     const auto state = findSubpacket(record, kState, context.log);
     const auto rf = findSubpacket(record, kRf, context.log);
     const auto activeSet = findSubpacket(record, kActiveSet, context.log);
-    const auto fingers = findSubpacket(record, kFingers, context.log); // has to be there, though nothing of it is read
+    const auto fingers = findSubpacket(record, kFingers, context.log); // must be present; its fields are not read
     if (!state || !rf || !activeSet || !fingers) {
         context.log.write(Priority::Warning, "Log code 0x119c: missing subpacket (ss=%d,rf=%d,ai=%d,fi=%d).",
                           state ? 1 : 0, rf ? 1 : 0, activeSet ? 1 : 0, fingers ? 1 : 0);
@@ -146,7 +146,7 @@ void decodeOneXStatus(Record record, C2KContext& context)
             context.publish(row.key, "N/A");
     context.publish("k1xActiveSetInfo", [&](Value& shown) { listPilots(*activeSet, shown.becomeDictionary()); });
 
-    // The last call's frame errors, once, after it ended.
+    // Publishes the frame errors of the last call once, after its end.
     if (const auto ratio = context.state.at("TrafficFER").real(); ratio && !inTraffic) {
         context.publish("k1xTrafficFER", Reading::computed(kOldFrameErrors, *ratio * 100.0));
         context.state.remove("TrafficFER");

@@ -8,7 +8,7 @@ inline std::string signedDecibels(double ratio)
 {
     return formatted("%+.2f dB", ratio);
 }
-/// A pilot's energy over all that is received (Ec/Io): "-5.25 dB".
+/// A pilot's energy relative to the total received energy (Ec/Io): "-5.25 dB".
 inline constexpr Quantity kPilotStrength = computedQuantity<signedDecibels>("dB");
 
 } // namespace kestrum

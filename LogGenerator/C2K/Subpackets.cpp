@@ -8,7 +8,7 @@ namespace {
 
 constexpr Field kCount = u8(14);
 
-// From the subpacket's first byte.
+// Offsets from the subpacket's first byte.
 constexpr Field kIdentifier = u8(0);
 constexpr Field kSize = u16(2);
 
@@ -23,8 +23,8 @@ std::optional<Record> findSubpacket(Record record, std::uint32_t identifier, Sys
         const auto size = subpacket ? subpacket->read(kSize) : std::nullopt;
         if (!size)
             return std::nullopt;
-        // The bound lies 17 bytes beyond the record's end, and comes before the identifier; both are meant so. The
-        // reader keeps every read inside the record.
+        // Kept: the bound lies 17 bytes beyond the record's end and is checked before the identifier; field logs
+        // depend on both. Record keeps every read inside the record.
         if (start + *size >= kSubpacketsStart + record.size()) {
             log.write(Priority::Error, "Log code error in subpkt#%d: bad size (%d).", static_cast<std::int32_t>(index),
                       static_cast<std::int32_t>(*size));
@@ -32,7 +32,7 @@ std::optional<Record> findSubpacket(Record record, std::uint32_t identifier, Sys
         }
         if (subpacket->read(kIdentifier) == identifier)
             return subpacket;
-        // A size of 0 stays on the spot until the index reaches the count.
+        // A size of 0 does not advance; the loop ends when the index reaches the count.
         start += *size;
     }
     return std::nullopt;

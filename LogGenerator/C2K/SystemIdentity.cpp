@@ -42,7 +42,7 @@ constexpr Row kIdentifiers[] = {
 };
 constexpr Row kBase[] = {
     {u8(131),  "kPacketZoneId",     decimalSigned32},
-    {u16(184), "kBaseId",           decimalSigned32}, // beyond the minimum length: records without it leave it as it was
+    {u16(184), "kBaseId",           decimalSigned32}, // beyond the minimum length: a shorter record does not change it
     {u8(133),  "kProtocolRevision", decimalSigned32},
 };
 // clang-format on

@@ -10,7 +10,7 @@ constexpr std::uint32_t kDemodulationSubpacket = 11;
 
 constexpr Field kFrameError = u8(24); // from the subpacket's first byte; not 0: the frame was bad
 
-// A running average over the last 64 frames or so, in single precision.
+// An exponential average over about 64 frames, in single precision.
 constexpr float kNewWeight = 0.015625F;
 constexpr float kOldWeight = 0.984375F;
 

@@ -11,7 +11,7 @@
 namespace kestrum {
 namespace {
 
-// Reported with a failed assertion: the lines are part of the message's text, whatever this file looks like.
+// Kept: the line numbers are part of the message of a failed assertion. They are not lines of this file.
 constexpr const char* kSourceFile = "LogGenerator/GSM/GSMLogGenerator";
 constexpr int kUnknownObjectLine = 78;
 constexpr int kNoObjectLine = 90;
@@ -61,7 +61,7 @@ Value GSMLogGenerator::processObject(const Value& object)
     }
     if (const auto array = object.array()) {
         auto processed = makeArray();
-        // The first element is always left out, on purpose.
+        // Kept: the first element is always left out; field displays show it so.
         for (std::size_t i = 1; i < array->size(); ++i)
             processed->append(collapsed(processObject((*array)[i])));
         return processed;

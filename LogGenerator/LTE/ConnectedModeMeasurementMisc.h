@@ -4,8 +4,8 @@
 
 namespace kestrum {
 
-/// The serving cell in an intra-frequency measurement of connected mode: log code 0xB179. RSRP and RSRQ are the layer 3
-/// filtered ones of 3GPP TS 36.331.
+/// The serving cell in an intra-frequency measurement of connected mode: log code 0xB179. RSRP and RSRQ are filtered by
+/// layer 3 (3GPP TS 36.331).
 class ConnectedModeMeasurementMisc final : public Base {
 public:
     explicit ConnectedModeMeasurementMisc(DecodingRoles& decodingRoles);

@@ -15,7 +15,7 @@
 
 namespace kestrum {
 
-/// The sections of LTE. Those that share a log code are called in the order of the fields.
+/// The sections of LTE. Sections with the same log code are called in the order of the fields.
 class LTEClassIndex final : public ClassIndex {
 public:
     explicit LTEClassIndex(DecodingRoles& decodingRoles);

@@ -17,7 +17,7 @@ DecodingRoles& announced(DecodingRoles& roles)
 } // namespace
 
 LTELogGenerator::LTELogGenerator(DecodingRoles& roles)
-    // In braces the arguments are made in order: the creation is announced before the index logs its own.
+    // Braces evaluate the arguments in order: this object logs its creation before the index does.
     : ZPHLogGenerator2{announced(roles), "LTE", std::make_unique<LTEClassIndex>(roles)}
 {}
 

@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// LTE (3GPP E-UTRA) by binary records, template "LTE".
+/// LTE (3GPP E-UTRA) from binary records; template "LTE".
 class LTELogGenerator final : public ZPHLogGenerator2 {
 public:
     static std::unique_ptr<LTELogGenerator> generator(DecodingRoles& roles);

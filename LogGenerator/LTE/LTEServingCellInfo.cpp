@@ -8,7 +8,7 @@ namespace {
 
 constexpr LogCode kServingCellRecord = 0xB0C2, kAntennasRecord = 0xB0C1;
 
-/// A channel bandwidth (3GPP TS 36.101) by its number of resource blocks.
+/// The channel bandwidth (3GPP TS 36.101) for a number of resource blocks.
 struct Bandwidth {
     std::uint32_t resourceBlocks;
     double megahertz;
@@ -38,7 +38,7 @@ constexpr Row kServingCell[] = {
     {u16(18), "Upload Frequency",    decimalSigned32},
     {u8(20),  "Download Bandwidth",  kBandwidth},
     {u8(21),  "Upload Bandwidth",    kBandwidth},
-    // Kept: words are printed signed. From 2^31 they show negative.
+    // Kept: 32-bit fields are printed as signed numbers; field logs show values from 2^31 as negative.
     {u32(22), "Cell Identity",       decimalSigned32},
     {u16(26), "Tracking Area Code",  decimalSigned32},
     {u32(28), "Freq Band Indicator", decimalSigned32},
@@ -78,7 +78,7 @@ void LTEServingCellInfo::decode(Record data, const Layout& layout)
     if (layout.code == kAntennasRecord)
         reportUnknown(layout.code); // kept: field logs show the line although the record is decoded
     else if (auto* node = sectionRef.dictionary())
-        node->remove("UARFCN"); // the cell monitor's, which this record's frequencies replace
+        node->remove("UARFCN"); // set by the cell monitor; this record's frequencies replace it
 }
 
 } // namespace kestrum

@@ -16,7 +16,7 @@ constexpr Field kAverageRsrq = u16(6).bits(0, 6);
 constexpr Field kFrameOffset = u32(12).bits(0, 10);
 constexpr Field kSampleOffset = u32(12).bits(11, 29);
 
-// RSRP has steps of half a dB here, twice those of the serving cell's records.
+// RSRP has steps of 0.5 dB here; the serving cell's records have 0.25 dB.
 // clang-format off
 constexpr Row kCell[] = {
     {kPhysicalCellId,    "Physical Cell ID",    decimalSigned32},
@@ -29,7 +29,7 @@ constexpr Row kCell[] = {
     {u16(8),             "Frequency Offset",    decimalSigned32},
     {kFrameOffset,       "Ant 0 Frame Offset",  decimalSigned32},
     {kSampleOffset,      "Ant 0 Sample Offset", decimalSigned32},
-    // Kept: antenna 1 shows the bits of antenna 0. What stands behind them is not read.
+    // Kept: antenna 1 shows the bits of antenna 0; the bits after them are not read.
     {kFrameOffset,       "Ant 1 Frame Offset",  decimalSigned32},
     {kSampleOffset,      "Ant 1 Sample Offset", decimalSigned32},
 };
@@ -38,7 +38,7 @@ constexpr Row kCell[] = {
 constexpr Elements kCells{21, 20, 16};
 static_assert(reach(kCell) == kCells.length);
 
-/// The real-valued fields as they are logged.
+/// The fields with real values, logged for each cell.
 constexpr struct {
     Field field;
     double (*quantity)(std::uint32_t raw);
@@ -76,7 +76,7 @@ void NeighborCellsList::logMeasurements(Record cell) const
 {
     const auto raw = [cell](Field field) { return cell.read(field).value_or(0); };
     roles.log.write(Priority::Warning, "Physical Cell ID: %d\n", static_cast<std::int32_t>(raw(kPhysicalCellId)));
-    // Kept: one label for RSSI, RSRP and RSRQ alike.
+    // Kept: the line has the same label for RSSI, RSRP and RSRQ.
     for (const auto& [field, quantity] : kLogged)
         roles.log.write(Priority::Warning, "Measured RSSI: %lf\n", quantity(raw(field)));
 }

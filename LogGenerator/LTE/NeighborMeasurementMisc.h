@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// What the neighbour cells of an idle-mode measurement have in common: log code 0xB180.
+/// The common part of an idle-mode measurement of neighbour cells: log code 0xB180.
 class NeighborMeasurementMisc final : public Base {
 public:
     explicit NeighborMeasurementMisc(DecodingRoles& decodingRoles);

@@ -6,7 +6,8 @@
 
 namespace kestrum {
 
-// What a raw value measures, in dB, dBm. The ranges begin where the reporting ranges of 3GPP TS 36.133 and TS 36.331 do, or below.
+// Raw values to dB and dBm. The ranges begin at the lower ends of the reporting ranges of 3GPP TS 36.133 and TS 36.331,
+// or below.
 constexpr double rsrpQuarterDb(std::uint32_t raw)
 {
     return raw * 0.25 - 140.0;
@@ -28,7 +29,7 @@ constexpr int srxlev(std::uint32_t raw)
 {
     return static_cast<int>(raw) - 30;
 }
-/// The least level that cell selection accepts, sent in steps of 2 dB.
+/// The lowest level for cell selection (3GPP TS 36.304), sent in steps of 2 dB.
 constexpr int qrxlevmin(std::uint32_t raw)
 {
     return 2 * static_cast<int>(raw) - 140;

@@ -3,17 +3,17 @@
 namespace kestrum {
 namespace {
 
-// Of the 16-bit count only the low byte counts.
+// The count has 16 bits; only the low byte is used.
 constexpr Field kCount = u8(19);
-// Candidates stand 4 bytes apart though each is longer: a payload lies over the next header. The modem packs them so; a
-// wider stride would misread the second candidate.
+// Candidates begin 4 bytes apart although each is longer: a payload overlaps the next header. The modem packs them so;
+// a larger stride would misread the second candidate.
 constexpr std::size_t kFirst = 21, kStride = 4;
 
 constexpr Row kPriority[] = {{u16(0), "Candidate Priority", decimalSigned32}};
 constexpr Field kRatType = u16(2);
 constexpr std::size_t kHeaderSize = 4;
 
-// The payloads, from the candidate's first byte.
+// The payloads; offsets from the candidate's first byte.
 // clang-format off
 constexpr Row kLte[] = {
     {u16(4),             "E ARFCN", decimalSigned32},

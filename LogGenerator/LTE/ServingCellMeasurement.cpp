@@ -16,7 +16,7 @@ constexpr int threshold(std::uint32_t raw)
     return 2 * static_cast<int>(raw);
 }
 
-/// `Ordinary`, but for the raw value that marks what is absent.
+/// The quantity `Ordinary`, except for the raw value that means "absent".
 template <std::uint32_t Absent, const Quantity& Ordinary>
 constexpr Quantity kOrAbsent{
     [](Quantity::Raw raw) { return raw == Absent ? std::string("Not Present") : Ordinary.text(raw); },
@@ -40,13 +40,13 @@ constexpr Row kRows[] = {
     {u32(25).bits(0, 8),   "Measured RSSI",                         inDbm<powerHalfDb>},
     {u32(25).bits(9, 14),  "Qrxlevmin",                             inWholeDbm<qrxlevmin>},
     {u32(25).bits(15, 21), "P_Max",                                 kOrAbsent<64, inWholeDbm<power>>},
-    // Kept: six bits wide, so that the marker for absent, 64, is never reached.
+    // Kept: the field has six bits, so it never holds 64, the value for "absent".
     {u32(25).bits(22, 27), "Max UE Tx Power",                       kOrAbsent<64, inWholeDbm<power>>},
-    // Kept: a ratio, worded as a power.
+    // Kept: a ratio, shown in dBm.
     {u32(29).bits(0, 6),   "Srxlev",                                inWholeDbm<srxlev>},
     {u32(29).bits(7, 12),  "Num of Consecutive DRX Cycles of S < 0", decimalSigned32},
     {u32(29).bits(13, 18), "S Intra Search",                        kOrAbsent<32, inWholeDb<threshold>>},
-    // Kept: a ratio like the other threshold, worded as a power.
+    // Kept: a ratio like the other threshold, shown in dBm.
     {u32(29).bits(19, 24), "S Non Intra Search",                    kOrAbsent<32, inWholeDbm<threshold>>},
     {u32(29).bit(25),      "Measurement Rules Updated",             named<trueOrFalse>},
     {u32(29).bits(26, 29), "Measurement Rules",                     decimalSigned32},

@@ -6,7 +6,7 @@ namespace {
 constexpr Field kTransportChannels = u16(14).bits(6, 11);
 constexpr Field kCount = u16(14).bits(12, 15);
 
-/// The entries stand behind a block of 34 bytes for each transport channel.
+/// The entries follow the transport channels' blocks of 34 bytes each.
 constexpr Elements entries(std::size_t transportChannels)
 {
     return {289 + 34 * transportChannels, 8};

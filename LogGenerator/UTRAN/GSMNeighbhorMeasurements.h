@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// The GSM neighbour cells: log code 0xD00E. Empty after every record, on purpose.
+/// The GSM neighbour cells: log code 0xD00E. Kept: every record empties the list; field displays show it so.
 class GSMNeighbhorMeasurements final : public PlaceholderList {
 public:
     explicit GSMNeighbhorMeasurements(DecodingRoles& decodingRoles);

@@ -43,7 +43,7 @@ RRC_State::RRC_State(DecodingRoles& decodingRoles) : Base(decodingRoles, kTraits
 
 void RRC_State::decode(Record data, const Layout&)
 {
-    // Kept: a short record is decoded all the same. Without a mode it says that the mode is not known.
+    // Kept: a short record is decoded too. Without the mode field it shows an unknown mode.
     if (data.size() < kExpectedLength)
         roles.log.write(Priority::Warning, "LogCode_0xD0E0 is length is %ld expected size %ld",
                         static_cast<long>(data.size()), static_cast<long>(kExpectedLength));

@@ -12,7 +12,7 @@
 
 namespace kestrum {
 
-/// The sections of UTRAN. Those that share a log code are called in the order of the fields.
+/// The sections of UTRAN. Sections with the same log code are called in the order of the fields.
 class UTRANClassIndex final : public ClassIndex {
 public:
     explicit UTRANClassIndex(DecodingRoles& decodingRoles);

@@ -4,8 +4,8 @@
 
 namespace kestrum {
 
-/// UTRAN (TD-SCDMA and W-CDMA measurements) by binary records. Its template is the first property-list resource
-/// whose file name contains "UTRAN", in any case; without one it stays uninitialised, and every call is harmless.
+/// UTRAN (TD-SCDMA and W-CDMA measurements) from binary records. Its template is the first property-list resource whose
+/// file name contains "UTRAN" in upper or lower case. Without a template its functions do nothing.
 class UTRANLogGenerator final : public ZPHLogGenerator2 {
 public:
     static std::unique_ptr<UTRANLogGenerator> generator(DecodingRoles& roles);

@@ -4,13 +4,13 @@ namespace kestrum {
 namespace {
 
 constexpr Field kCount = u8(16).bits(1, 7);
-// Kept: the cells begin far behind the fields that come before them. Of each 16 bytes the first 4 are read.
+// Kept: the cells begin far behind the preceding fields. Only the first 4 of each cell's 16 bytes are read.
 constexpr Elements kCells{168, 16, 4};
 
 constexpr Field kCellSet = u32(0).bits(29, 30);
 constexpr std::uint32_t kNoCellSet = 3;
 
-// Kept: a 256th of the raw value, without an offset and a unit.
+// Kept: 1/256 of the raw value, without an offset and without a unit.
 constexpr Quantity kFilteredRscp{[](Quantity::Raw raw) { return formatted("%f", fieldOf(raw) / 256.0); },
                                  [](Quantity::Raw raw) { return fieldOf(raw) / 256.0; }};
 

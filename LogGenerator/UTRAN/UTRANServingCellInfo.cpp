@@ -14,7 +14,7 @@ std::string_view access(std::uint32_t raw)
 // clang-format off
 constexpr Row kServingCell[] = {
     {u8(14),        "Cell Access Restrictions", decimalSigned32},
-    // Kept: printed signed. From 2^31 it shows negative.
+    // Kept: printed as a signed number; field logs show values from 2^31 as negative.
     {u32(21),       "Cell ID",                  decimalSigned32},
     {u16(19),       "Downlink UARFCN",          decimalSigned32},
     {u16(17),       "Uplink UARFCN",            decimalSigned32},
@@ -27,7 +27,7 @@ constexpr CellRow kMonitoredCell[] = {
     {kVoxCell_CellId,         "Cell ID",              "Serving Cell Info: Failed to retrieve Cell ID\n"},
     {kVoxCell_BandInfo,       "Freq Band Indicator",  "Serving Cell Info: Failed to retrieve Freq Band Indicator\n"},
     {kVoxCell_ScramblingCode, "Cell Scrambling Code", "Serving Cell Info: Failed to retrieve Cell Scrambling Code\n"},
-    // Kept: one number is shown as both frequencies. That it is missing is logged once.
+    // Kept: one number is shown as both frequencies. When it is missing, one line is logged.
     {kVoxCell_UARFCN,         "Uplink UARFCN",        "Serving Cell Info: Failed to retrieve UARFCN\n"},
     {kVoxCell_UARFCN,         "Downlink UARFCN",      ""},
 };
@@ -56,7 +56,7 @@ void UTRANServingCellInfo::decode(Record data, const Layout& layout)
     const auto cells = CellInfoArray(data, roles).cells();
     if (!cells)
         return;
-    // Kept: every serving cell is shown in turn, so that the last one stays.
+    // Kept: the last serving cell of the record wins.
     for (const Value& cell : *cells)
         if (isCell(cell, kVoxCellTechnology_UTRAN2, kVoxCellType_Serving))
             showCell(cell, kMonitoredCell, sectionRef.dictionary(), roles.log);

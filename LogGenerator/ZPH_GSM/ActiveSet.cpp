@@ -5,7 +5,7 @@
 namespace kestrum {
 namespace {
 
-// In a cell.
+// Offsets in a cell.
 constexpr Field kScramblingCode = u16(7).bits(0, 12);
 constexpr Field kSetMembership = u16(7).bits(13, 15);
 constexpr std::uint32_t kActive = 0;
@@ -13,7 +13,7 @@ constexpr std::uint32_t kActive = 0;
 // In a measurement: linear Ec/Io, full scale 2^19.
 constexpr Field kEnergies[] = {u32(32), u32(36), u32(40)};
 
-/// The first that is not zero; zero when all are.
+/// The first value that is not zero; zero when all are.
 std::uint32_t energyOf(Record measurement)
 {
     for (const Field field : kEnergies)
@@ -22,7 +22,7 @@ std::uint32_t energyOf(Record measurement)
     return 0;
 }
 
-/// Received power in whole dBm, of a raw AGC value in tenths of a dB above -106 dBm, less 512.
+/// Received power in whole dBm. The raw AGC value plus 512 is the level above -106 dBm in 0.1 dB.
 int receivedPower(std::int16_t agc)
 {
     return (agc + 512) / 10 - 106; // truncated toward zero
@@ -32,7 +32,7 @@ void showCell(Record cell, Record measurement, int power, Dictionary& row)
 {
     const int energyPerChip = Base::lookUpECNO(energyOf(measurement));
     row.set("Scrambling Code", Reading(decimalSigned32, cell.read(kScramblingCode).value_or(0)));
-    // Kept: "dB", though it is a level in dBm.
+    // Kept: shown in "dB" although it is a level in dBm.
     row.set("RSCP", Reading(inWholeDb<signed32>, static_cast<std::uint32_t>(power + energyPerChip)));
     row.set("Energy Per Chip", Reading(inWholeDb<signed32>, static_cast<std::uint32_t>(energyPerChip)));
 }

@@ -5,7 +5,7 @@ namespace {
 
 constexpr SectionTraits kTraits{
     .name = "Coding Scheme",
-    // Kept: the word of another section.
+    // Kept: the text of another section.
     .entryLine = "CellChangeCounters",
     .foreignCode = ForeignCode::Ignored,
 };

@@ -4,10 +4,10 @@ namespace kestrum {
 namespace {
 
 constexpr Field kCount = u8(16);
-// Each network is six digits, a byte each, yet the next one begins three bytes on: kept.
+// Kept: a network has six digits of one byte each, but the next network begins three bytes further on.
 constexpr Elements kNetworks{17, 3, 6};
 
-/// The number of three digits, the first at `first`, each two bytes from the next.
+/// The number of three digits: the first at `first`, the others 2 and 4 bytes behind it.
 Reading number(Record network, std::size_t first)
 {
     std::uint32_t value = 0;
@@ -16,7 +16,7 @@ Reading number(Record network, std::size_t first)
     return {decimalUnsigned, value};
 }
 
-/// The digits of both numbers take turns.
+/// The digits of both numbers alternate.
 void showNetwork(Record network, Dictionary& row)
 {
     row.set("Mobile Country Code", number(network, 0));

@@ -5,7 +5,7 @@ namespace {
 
 std::string_view rrState(std::uint32_t raw)
 {
-    // Blanks inside a name are its own.
+    // Kept: blanks inside a name, as field logs show them.
     static constexpr std::string_view kNames[] = {
         "RR_INACTIVE",
         "RR_GOING_ACTIVE",

@@ -6,7 +6,7 @@ namespace kestrum {
 namespace {
 
 constexpr Field kCount = u8(14);
-// Kept: from where the UMTS cells begin too, not from behind them.
+// Kept: the list begins at the same offset as the UMTS cells, not behind them.
 constexpr Elements kCells{ranking::kFirstCell, 7};
 
 // clang-format off

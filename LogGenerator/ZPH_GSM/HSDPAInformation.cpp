@@ -25,7 +25,7 @@ constexpr Row kProcess[] = {
 
 constexpr Field kPrimaryCount = u8(16), kSecondaryCount = u8(17);
 constexpr Elements kPrimary{18, 9};
-// Kept: the secondary processes lie 162 bytes further for each primary one, though that takes 9.
+// Kept: each primary process moves the secondary ones by 162 bytes although it has only 9.
 constexpr std::size_t kRoomForPrimary = 162;
 
 static_assert(reach(kProcess) == kPrimary.length);

@@ -4,7 +4,7 @@
 
 #include <string_view>
 
-/// Mobility management (3GPP TS 24.008) as several sections name it: the record, its least length, the names.
+/// Mobility management (3GPP TS 24.008) for several sections: the record, its minimum length, the names of the states.
 namespace kestrum::nas {
 
 inline constexpr LogCode kGmmState = 0x7130, kMmState = 0x7131, kRegistration = 0x7132;
@@ -12,7 +12,7 @@ inline constexpr std::size_t kMinimumLength = 16; ///< of each of them
 
 inline std::string_view mmState(std::uint32_t raw)
 {
-    // Gaps of the modem's numbering are "Unknown"; blanks inside a name are its own.
+    // Numbers that the modem does not use are "Unknown". Kept: blanks inside a name, as field logs show them.
     static constexpr std::string_view kNames[] = {
         "MM_NULL",
         "Unknown",

@@ -24,7 +24,7 @@ constexpr Field kColourCodeCount = u8(14);
 constexpr Elements kColoured{15, 4};
 constexpr Field kBsic = u8(2);
 
-/// Kept: doubled.
+/// Kept: the level is doubled.
 constexpr int doubled(std::uint32_t raw)
 {
     return 2 * signed16(raw);

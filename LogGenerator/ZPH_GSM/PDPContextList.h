@@ -4,14 +4,14 @@
 
 namespace kestrum {
 
-/// The PDP contexts (3GPP TS 24.008), one row each as the telephony service sends it. Other technologies show the same
-/// section.
+/// The PDP contexts (3GPP TS 24.008), one row each, as the telephony service sends them. LTE and UTRAN have this
+/// section too.
 class PDPContextList final : public Base {
 public:
     explicit PDPContextList(DecodingRoles& decodingRoles);
 
 private:
-    /// Does not look at the code: a record of any code is taken for one of PDP contexts.
+    /// Ignores the code: decodes every record as one of PDP contexts.
     void decode(Record data, const Layout& layout) override;
 };
 

@@ -18,7 +18,7 @@ static_assert(fits(kLayouts));
 constexpr SectionTraits kTraits{
     .name = "Process CO",
     .layouts = kLayouts,
-    // Kept: the word of another section.
+    // Kept: the text of another section.
     .entryLine = "ProcessCS",
 };
 

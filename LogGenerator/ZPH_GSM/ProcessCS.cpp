@@ -32,7 +32,7 @@ std::string_view updateStatus(std::uint32_t raw)
 constexpr Row kMobilityManagement[] = {
     {u8(13), "MM State",        named<nas::mmState>},
     {u8(14), "MM Sub State",    named<mmSubstate>},
-    {u8(15), "LU Reject Cause", named<updateStatus>}, // kept: shows the status
+    {u8(15), "LU Reject Cause", named<updateStatus>}, // kept: shows the update status
 };
 // clang-format on
 

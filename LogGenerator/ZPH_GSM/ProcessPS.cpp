@@ -31,7 +31,7 @@ std::string_view gmmSubstate(std::uint32_t raw)
         "GMM_PLMN_SEARCH",
         "GMM_SUSPENDED",
         "GMM_UPDATE_NEEDED",
-        "GMM_ATTEMPING_TO_UPDATE", // the modem's own spelling
+        "GMM_ATTEMPING_TO_UPDATE", // kept: the modem's spelling
         "GMM_ATTEMPTING_TO_UPDATE_MM",
         "GMM_IMSI_DETACH_INITIATED",
         "GMM_NULL_SUBSTATE",

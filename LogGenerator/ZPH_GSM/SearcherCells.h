@@ -11,6 +11,6 @@ inline constexpr std::size_t kMinimumLength = 16;
 inline constexpr Field kReceiveAgc = u16(13); ///< signed, 0.1 dB
 inline constexpr Field kCount = u8(15);
 inline constexpr Elements kCells{16, 15};
-inline constexpr std::size_t kMeasurementSize = 44; ///< a measurement a cell, behind all cells
+inline constexpr std::size_t kMeasurementSize = 44; ///< bytes; one measurement for each cell, after all cells
 
 } // namespace kestrum::searcher

@@ -25,14 +25,14 @@ std::string_view serviceType(std::uint32_t raw)
     return nameIn(kNames, raw);
 }
 
-/// The digit in a half byte; a blank where there is none.
+/// The digit in a half byte; a blank for 10 to 15.
 char digit(std::uint32_t identity, unsigned halfByte)
 {
     const std::uint32_t value = (identity >> (4 * halfByte)) & 0xF;
     return value < 10 ? static_cast<char>('0' + value) : ' ';
 }
 
-// The network's identity, three bytes of digits (3GPP TS 24.008, 10.5.1.3). From the first half byte: MCC 1, MCC 2,
+// The network's identity: digits in three bytes (3GPP TS 24.008, 10.5.1.3). Order of the half bytes: MCC 1, MCC 2,
 // MCC 3, MNC 3, MNC 1, MNC 2.
 constexpr Field kIdentity = u32(15).bits(0, 23);
 
@@ -53,7 +53,7 @@ constexpr Row kSelection[] = {
 constexpr Row kNetwork[] = {
     {kIdentity,        "Mobile Country Code", named<countryCode>},
     {kIdentity,        "Mobile Network Code", named<networkCode>},
-    {u16BigEndian(18), "Location Area Code",  decimalSigned32}, // as it is on the air, unlike all else
+    {u16BigEndian(18), "Location Area Code",  decimalSigned32}, // as on the air; all other fields are little-endian
     {u8(20),           "Routing Area Code",   decimalSigned32},
     {u8(14),           "Service Type",        named<serviceType>},
 };

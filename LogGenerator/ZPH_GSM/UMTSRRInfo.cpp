@@ -49,7 +49,7 @@ constexpr Quantity kMeanPower = computedQuantity<decibelMilliwatts>("dBm");
 
 constexpr Field kEntryCount = u8(14);
 constexpr Elements kEntries{16, 14};
-constexpr Field kAgc = u16(4); // signed, 0.1 dB above -70 dBm, less 512; 0 means no value
+constexpr Field kAgc = u16(4); // signed; plus 512 it is the level above -70 dBm in 0.1 dB; 0 means no value
 
 constexpr Layout kLayouts[] = {
     {.code = kRrcState, .minimumLength = 14, .rows = kState},
@@ -97,12 +97,12 @@ void UMTSRRInfo::showTransmitPower(Record data) const
         sum += power;
         ++values;
     }
-    publish("Transmit Power", Reading::computed(kMeanPower, sum / values)); // not a number without any value
+    publish("Transmit Power", Reading::computed(kMeanPower, sum / values)); // NaN without a value
 }
 
 void UMTSRRInfo::forgetMonitoredFrequency() const
 {
-    // The modem's own downlink frequency replaces it until the cell monitor speaks again.
+    // The modem's downlink frequency replaces it until the next cell-monitor record.
     if (auto* node = sectionRef.dictionary())
         node->remove("UARFCN");
 }

@@ -10,7 +10,7 @@ namespace {
 constexpr Field kCount = u8(13);
 constexpr Elements kRanked{ranking::kFirstCell, 10};
 
-// Kept: levels, worded as ratios.
+// Kept: levels, shown in dB.
 constexpr int rscp(std::uint32_t raw)
 {
     return signed8(raw) - 21;

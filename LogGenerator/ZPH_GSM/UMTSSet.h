@@ -4,8 +4,8 @@
 
 namespace kestrum {
 
-/// The UMTS cells ranked for reselection (log code 0x4005), or the UMTS neighbours of the telephony service's cell
-/// monitor: whichever came last. One row each.
+/// The UMTS cells of the last record, one row each: those ranked for reselection (log code 0x4005), or the neighbours
+/// of the telephony service's cell monitor.
 class UMTSSet final : public Base {
 public:
     explicit UMTSSet(DecodingRoles& decodingRoles);

@@ -30,7 +30,7 @@
 
 namespace kestrum {
 
-/// The sections of GSM and UMTS. Those that share a log code are called in the order of the fields.
+/// The sections of GSM and UMTS. Sections with the same log code are called in the order of the fields.
 class ZPH_GSMClassIndex final : public ClassIndex {
 public:
     explicit ZPH_GSMClassIndex(DecodingRoles& decodingRoles);

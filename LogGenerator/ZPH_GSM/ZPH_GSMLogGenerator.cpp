@@ -17,7 +17,7 @@ DecodingRoles& announced(DecodingRoles& roles)
 } // namespace
 
 ZPH_GSMLogGenerator::ZPH_GSMLogGenerator(DecodingRoles& roles)
-    // In braces the arguments are made in order: the creation is announced before the index logs its own.
+    // Braces evaluate the arguments in order: this object logs its creation before the index does.
     : ZPHLogGenerator2{announced(roles), "ZPH_GSM", std::make_unique<ZPH_GSMClassIndex>(roles)}
 {}
 

@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// GSM, GPRS and UMTS (3GPP) by binary records: 26 sections, template "ZPH_GSM".
+/// GSM, GPRS and UMTS (3GPP) from binary records: 26 sections; template "ZPH_GSM".
 class ZPH_GSMLogGenerator final : public ZPHLogGenerator2 {
 public:
     static std::unique_ptr<ZPH_GSMLogGenerator> generator(DecodingRoles& roles);

@@ -93,7 +93,7 @@ void TextDisplay::updateViewControllerFromModel()
          << treeText(*root) << std::endl;
     if (!_out && errno != EPIPE)
         end(1, formatted("standard output: %s", std::strerror(errno)));
-    else if (!_out || --_refreshes == 0) // with its reader gone, the rest is not wanted
+    else if (!_out || --_refreshes == 0) // also ends when the reader has closed the pipe
         end(0);
 }
 

@@ -13,19 +13,19 @@ namespace kestrum {
 /// The tree under `node` as lines, two blanks deeper for each level; a leaf is "name: value".
 std::string treeText(const KestrumModelNode& node);
 
-/// The display without a screen: the whole tree of the first refreshes, as text. Where nobody looks at a terminal, it
-/// shows that the modem is heard, and what it says.
+/// Prints the display as text: the whole tree after each of the first refreshes. For scripts, and to check a connection
+/// without a screen.
 class TextDisplay final : private KestrumModelObserver {
 public:
-    /// How it ended: an exit status, and for standard error why it is not 0.
+    /// Receives the exit status and, when it is not 0, the reason for standard error.
     using End = std::function<void(int status, const std::string& why)>;
 
-    /// Writes to `out` after each of that many refreshes. The roles and the stream outlive it.
+    /// Writes to `out` after each refresh, `refreshes` times. Roles and stream are borrowed and outlive this object.
     TextDisplay(MonitorRoles& roles, std::ostream& out, int refreshes, End end);
     ~TextDisplay() override;
 
-    /// Connects. `end` is called once: with 0 when all has been written or the reader has gone, with 1 when nothing came
-    /// for half a minute, or it cannot be written.
+    /// Connects. Calls `end` once: with 0 when everything is written or the reader has closed the pipe, with 1 after
+    /// 30 s without data or when the output cannot be written.
     void start();
 
 private:

@@ -18,11 +18,11 @@ using namespace kestrum;
 
 namespace {
 
-/// Prints the display to standard output, and gives the exit status. A signal that ends it leaves nothing behind; the
-/// status is then 128 and its number.
+/// Prints the display to standard output; returns the exit status. After SIGTERM, SIGINT or SIGHUP it removes its
+/// sockets and returns 128 plus the signal's number.
 int printDisplay(MonitorRoles& roles, int refreshes)
 {
-    std::signal(SIGPIPE, SIG_IGN); // a reader that goes away is told by the write
+    std::signal(SIGPIPE, SIG_IGN); // the write reports a reader that has closed the pipe
     int endedBy = 0;
     SignalPipe pipe({SIGTERM, SIGHUP, SIGINT});
     QSocketNotifier signalled(pipe.descriptor(), QSocketNotifier::Read);
@@ -46,14 +46,14 @@ int printDisplay(MonitorRoles& roles, int refreshes)
 
 int main(int argc, char** argv)
 {
-    // What the program opens first would take the place of a closed output.
+    // The first file that the program opens would take the descriptor of a closed standard output.
     const bool hasOutput = fcntl(STDOUT_FILENO, F_GETFD) != -1;
     const auto charset = terminal::chooseLocale();
     const QCoreApplication loop(argc, argv);
 
     CLI::App arguments("Cellular field test in a terminal. Keys: ? shows them.");
     constexpr int kRefreshes = 3;
-    int refreshes = 0; // stays 0 for a bare --text
+    int refreshes = 0; // stays 0 when --text has no number
     arguments.set_version_flag("--version", "kestrum-terminal " KESTRUM_VERSION);
     const auto* text = arguments.add_option("--text", refreshes, "Print the tree of the first N refreshes, then end")
                            ->option_text("[N=3]")

@@ -11,7 +11,7 @@ namespace kestrum {
 namespace {
 
 constexpr Field kLength = u32(0), kKind = u8(4), kMessageId = u32(5), kSerial = u32(9);
-constexpr std::size_t kLengthSize = kLength.end(); // the length counts what follows it
+constexpr std::size_t kLengthSize = kLength.end(); // the length does not count itself
 
 } // namespace
 
@@ -36,7 +36,7 @@ std::span<std::byte> FrameReader::room(std::size_t least)
         std::memmove(_buffer.data(), _buffer.data() + _begin, _end - _begin);
         _end -= std::exchange(_begin, 0);
     }
-    // Grows with what has come, never on the promise of a length.
+    // The buffer grows with the bytes received, never by a length that a peer only announces.
     if (_buffer.size() - _end < least)
         _buffer.resize(std::max(_end + least, 2 * _buffer.size()));
     return std::span(_buffer).subspan(_end);
@@ -48,7 +48,7 @@ std::optional<Frame> FrameReader::next()
     const std::size_t length = rest.read(kLength).value_or(0);
     if (!_fault.empty() || rest.size() < kLengthSize)
         return std::nullopt;
-    // Judged at once, so that no peer makes us wait for bytes that mean nothing.
+    // Checked before the payload arrives: the reader does not wait for the rest of a malformed frame.
     if (length < kFrameHeader - kLengthSize || length > kFrameHeader - kLengthSize + kMaximumPayload) {
         _fault = formatted("a frame of %lu bytes, allowed are %lu to %lu", length, kFrameHeader - kLengthSize,
                            kFrameHeader - kLengthSize + kMaximumPayload);

@@ -36,7 +36,7 @@ std::optional<std::string> LinuxBundle::pathForResource(std::string_view name, s
 
 std::vector<std::string> LinuxBundle::pathsForResourcesOfType(std::string_view type) const
 {
-    // By file name: what stands in an earlier directory hides its namesakes.
+    // By file name: a file in an earlier directory hides files of the same name in later ones.
     std::map<std::string, std::string> found;
     const std::string ending = formatted(".%s", type);
     for (const auto& directory : _directories) {

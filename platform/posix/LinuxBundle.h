@@ -7,12 +7,12 @@
 
 namespace kestrum {
 
-/// Resources as files. Looked for in $KESTRUM_RESOURCES, in "resources" beside the program (a build folder has a link
-/// there), and in share/kestrum of the prefix in which the program stands, wherever that is; in this order.
+/// Resources as files. Searched in this order: $KESTRUM_RESOURCES, "resources" beside the program (in a build folder a
+/// link), share/kestrum of the prefix in which the program is installed.
 class LinuxBundle final : public Bundle {
 public:
     LinuxBundle();
-    /// In these directories alone.
+    /// Searches these directories only.
     explicit LinuxBundle(std::vector<std::string> directories) : _directories(std::move(directories)) {}
 
     std::optional<std::string> pathForResource(std::string_view name, std::string_view type) const override;

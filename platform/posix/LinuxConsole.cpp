@@ -9,7 +9,7 @@ namespace {
 
 void writeLine(std::FILE* to, std::string_view line)
 {
-    // In one piece, so that lines of several processes do not mix. A closed pipe loses the line, nothing else.
+    // One write for the whole line, so that lines of several processes do not mix. A closed pipe only loses the line.
     const std::string whole = std::string(line) + "\n";
     std::fwrite(whole.data(), 1, whole.size(), to);
     std::fflush(to);

@@ -4,7 +4,7 @@
 
 namespace kestrum {
 
-/// Lines on standard output; those for developers on standard error, when KESTRUM_DEBUG is set.
+/// Lines on standard output; lines for developers on standard error when KESTRUM_DEBUG is set.
 class LinuxConsole final : public Console {
 public:
     LinuxConsole();
@@ -17,7 +17,7 @@ private:
     bool _debugWatched;
 };
 
-/// Says nothing: for a program whose terminal is its display.
+/// Drops all lines: for a program whose terminal is its display.
 class QuietConsole final : public Console {
 public:
     void printLine(std::string_view) override {}

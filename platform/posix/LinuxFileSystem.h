@@ -11,11 +11,11 @@ public:
 
     bool exists(std::string_view path) const override;
 
-    /// $XDG_STATE_HOME/kestrum/DiagnosticLogs on a desktop, <device root>/var/log/diagnostics under a root of its own.
+    /// $XDG_STATE_HOME/kestrum/DiagnosticLogs; under another device root <root>/var/log/diagnostics.
     std::string diagnosticLogDirectory() const override;
 
 private:
-    std::string _root; // without a "/" at its end: empty is the system's
+    std::string _root; // without a trailing "/"; empty: the system's root
 };
 
 } // namespace kestrum

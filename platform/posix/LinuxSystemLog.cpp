@@ -15,13 +15,13 @@
 namespace kestrum {
 namespace {
 
-// 16 would be an emergency of the mail facility, which the daemon shouts at every terminal.
+// syslog(3) would take 16 for an emergency of the mail facility, which the daemon prints on every terminal.
 int levelOf(Priority priority)
 {
     return priority == Priority::Raw16 ? LOG_NOTICE : static_cast<int>(priority);
 }
 
-// Not within a character.
+// Cuts between two UTF-8 characters.
 std::string lineOf(std::string_view text)
 {
     constexpr std::string_view kEllipsis = "\u2026";
@@ -36,7 +36,7 @@ std::string lineOf(std::string_view text)
 
 } // namespace
 
-// Outlives the log when the thread hangs in its sink at the end.
+// Shared with the thread: it outlives the log when the thread hangs in its sink at the end.
 struct LinuxSystemLog::Shared {
     struct Line {
         std::size_t number;
@@ -57,7 +57,7 @@ struct LinuxSystemLog::Shared {
     {
         if (errors.size() + others.size() >= capacity) {
             ++lost;
-            // A failure is worth more than the trace of a record.
+            // A line of error priority replaces an ordinary one.
             if (level > LOG_ERR || others.empty())
                 return;
             others.pop_front();
@@ -82,7 +82,7 @@ struct LinuxSystemLog::Shared {
             if (errors.empty() && others.empty())
                 break;
             const auto line = next();
-            // Also during a flood without an end, in which the queue is never empty.
+            // Not only when the queue is empty: during a long flood it never is.
             const bool report = lost > 0 && (++sinceReport >= capacity || (errors.empty() && others.empty()));
             const std::size_t count = report ? std::exchange(lost, 0) : 0;
             lock.unlock();
@@ -101,7 +101,7 @@ struct LinuxSystemLog::Shared {
 LinuxSystemLog::LinuxSystemLog(const std::string& program)
     : LinuxSystemLog([](int level, const std::string& text) { ::syslog(level, "%s", text.c_str()); })
 {
-    // syslog keeps the pointer for as long as the program runs.
+    // openlog(3) keeps the pointer until the program ends.
     static const std::string kept = program;
     ::openlog(kept.c_str(), LOG_PID, LOG_USER);
 }

@@ -19,7 +19,7 @@ namespace {
 
 constexpr int kLargestProcess = 4'194'304; // the kernel's limit
 
-// What the longest socket name leaves of a socket's path, which ends with a zero.
+// The longest path of the directory: a socket's path less the terminating zero, the "/" and the longest socket name.
 std::size_t longestDirectory()
 {
     const auto longestName = vox::addressOfPort(kLogChannelServiceName, kLargestProcess);
@@ -39,27 +39,27 @@ std::string runtimeDirectory()
 
 std::optional<Problem> secureRuntimeDirectory(const std::string& named)
 {
-    // With a slash at its end, the name of a link would mean what the link leads to.
+    // With a trailing slash, lstat would follow a symbolic link.
     const std::string directory = named.substr(0, named.find_last_not_of('/') + 1);
     if (!directory.starts_with('/'))
         return Problem{formatted("the runtime directory %s is not an absolute path", named)};
     if (directory.size() > longestDirectory())
         return Problem{formatted("the runtime directory %s is too long: %lu bytes, sockets in it leave room for %lu",
                                  directory, directory.size(), longestDirectory())};
-    std::error_code ignored; // mkdir below tells what is wrong with a parent that could not be made
+    std::error_code ignored; // mkdir below reports a parent that could not be created
     std::filesystem::create_directories(std::filesystem::path(directory).parent_path(), ignored);
     const bool made = ::mkdir(directory.c_str(), 0700) == 0;
     if (!made && errno != EEXIST)
         return Problem{formatted("cannot create %s: %s", directory, std::strerror(errno))};
     struct stat found {};
-    // lstat: in a directory that others can write, a link may have been laid.
+    // lstat: another user may have placed a symbolic link in a shared directory such as /tmp.
     if (::lstat(directory.c_str(), &found) != 0)
         return Problem{formatted("cannot look at %s: %s", directory, std::strerror(errno))};
     if (!S_ISDIR(found.st_mode))
         return Problem{formatted("%s is no directory", directory)};
     if (found.st_uid != ::geteuid())
         return Problem{formatted("%s belongs to another user", directory)};
-    if (made && ::chmod(directory.c_str(), 0700) == 0) // whatever the umask took away
+    if (made && ::chmod(directory.c_str(), 0700) == 0) // the umask may have removed bits
         return std::nullopt;
     if (const unsigned mode = found.st_mode & 0777; mode != 0700)
         return Problem{

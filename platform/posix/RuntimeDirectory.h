@@ -8,16 +8,16 @@
 
 namespace kestrum {
 
-/// Where the sockets of this user's programs stand: $KESTRUM_RUNTIME_DIR, else $XDG_RUNTIME_DIR/kestrum, else
+/// The directory of the sockets of this user's programs: $KESTRUM_RUNTIME_DIR, else $XDG_RUNTIME_DIR/kestrum, else
 /// /tmp/kestrum-<uid>.
 std::string runtimeDirectory();
 
-/// Creates the directory with mode 0700 where there is none. It is a problem when the path is relative or leaves no
-/// room for a display's socket in it, and when the directory cannot be made, belongs to another user, is open to
-/// others, or is no directory. The mode of a directory that exists is never changed.
+/// Creates the directory, with mode 0700, when it does not exist. A problem: the path is relative, or too long for a
+/// display's socket in it; the directory cannot be created, belongs to another user, is open to others, or is no
+/// directory. Never changes the mode of an existing directory.
 std::optional<Problem> secureRuntimeDirectory(const std::string& directory);
 
-/// Whether a name may stand for a port: letters, digits, ".", "-" and "_", not beginning with ".".
+/// Whether the name is a valid port name: letters, digits, ".", "-" and "_"; does not begin with ".".
 bool isPortName(std::string_view name);
 
 } // namespace kestrum

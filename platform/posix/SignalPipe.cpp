@@ -18,7 +18,7 @@ void note(int signal)
 {
     const int before = errno;
     arrived[signal] = 1;
-    // A full pipe wakes up just as well.
+    // A full pipe needs no further byte to wake the reader.
     [[maybe_unused]] const auto written = ::write(ends[1], "", 1);
     errno = before;
 }

@@ -5,18 +5,18 @@
 
 namespace kestrum {
 
-/// Signals turned into something to read: a handler may do next to nothing. One object at a time; its end puts the old
-/// handlers back.
+/// Writes signals to a pipe, because a signal handler may do almost nothing else. One object at a time. The destructor
+/// restores the old handlers.
 class SignalPipe {
 public:
-    /// std::system_error when there is no pipe to be had.
+    /// Throws std::system_error when no pipe can be created.
     explicit SignalPipe(std::vector<int> signals);
     ~SignalPipe();
     SignalPipe(const SignalPipe&) = delete;
     SignalPipe& operator=(const SignalPipe&) = delete;
 
     int descriptor() const; ///< readable when a signal has arrived
-    /// What has arrived since the last call, each once, in the order given to the constructor.
+    /// The signals that arrived since the last call, each once, in the order given to the constructor.
     std::vector<int> taken();
 
 private:

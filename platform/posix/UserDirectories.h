@@ -4,9 +4,9 @@
 
 namespace kestrum {
 
-/// A base directory of the user by the XDG rules: the value of `variable` where it is an absolute path, else `fallback`
-/// below the home directory: userDirectory("XDG_STATE_HOME", ".local/state"). Without HOME the home directory is that of
-/// the user database; a user without one gets a path that does not exist, never the root directory.
+/// A base directory by the XDG Base Directory Specification: the value of `variable` when it is an absolute path, else
+/// `fallback` below the home directory: userDirectory("XDG_STATE_HOME", ".local/state"). Without HOME the user database
+/// gives the home directory; without an entry there the path does not exist (it is never the root directory).
 std::string userDirectory(const char* variable, const std::string& fallback);
 
 } // namespace kestrum

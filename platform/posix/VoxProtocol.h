@@ -10,29 +10,29 @@
 #include <string_view>
 #include <vector>
 
-/// What a display and the telephony service say to each other beside the log channel; docs/protocol.md has the bytes.
+/// The messages on a server connection between a display and the telephony service; docs/protocol.md has the bytes.
 namespace kestrum::vox {
 
-/// The port at which the service takes server connections.
+/// The port on which the service accepts server connections.
 inline constexpr std::string_view kServerPort = "org.kestrum.vox";
 
 // Message ids on a server connection.
 inline constexpr std::int32_t kCreateLogChannel = 1; ///< request: the address of the receiving port, as text
-inline constexpr std::int32_t kNotification = 2;     ///< message of the service: the notification's name, as text
+inline constexpr std::int32_t kNotification = 2;     ///< message from the service: the notification's name, as text
 
 // Error domains of an answer; 0 is success.
 inline constexpr std::int32_t kServiceErrors = 1; ///< codes below
-inline constexpr std::int32_t kSystemErrors = 2;  ///< codes are errno's
+inline constexpr std::int32_t kSystemErrors = 2;  ///< codes are errno values
 // Codes of kServiceErrors.
 inline constexpr std::int32_t kBadRequest = 1;
 inline constexpr std::int32_t kTooManyChannels = 2;
-inline constexpr std::int32_t kNoReceiver = 3; ///< nobody listens at the address given
+inline constexpr std::int32_t kNoReceiver = 3; ///< no process listens at the given address
 
-/// The address of a process's receive port of this name. Two displays of a user have the same port name.
+/// The address of a process's receive port: name and process number. All displays of a user have the same port name.
 std::string addressOfPort(std::string_view name, int process);
 
-/// The answer's payload: error domain, error code (32-bit little-endian each), the remote port's name.
+/// The answer's payload: error domain and error code (32 bits each, little-endian), the remote port's name.
 std::vector<std::byte> encode(const LogChannelAnswer& answer);
-std::optional<LogChannelAnswer> decodeAnswer(Bytes payload);
+std::optional<LogChannelAnswer> decodeAnswer(Bytes payload); ///< nothing when it is too short
 
 } // namespace kestrum::vox

@@ -10,12 +10,12 @@
 namespace kestrum::propertylist {
 namespace {
 
-// Header, objects, table of their offsets, and at the end a trailer: 6 unused bytes, the widths of an offset and of
-// a reference (1 byte each), then the number of objects, the root's number and the table's offset (8 bytes each).
-// All numbers are big-endian.
+// The file: header, objects, table of the objects' offsets, trailer. The trailer: 6 unused bytes, the widths of an
+// offset and of a reference (1 byte each), the number of objects, the root's number and the table's offset (8 bytes
+// each). All numbers are big-endian.
 constexpr std::size_t kTrailer = 32;
 
-// Objects may be shared, so a list can be larger than its file; honest files gain little by it.
+// Objects may be shared, so the value can be larger than its file. Ordinary files share little.
 constexpr std::size_t kMaxGrowth = 64;
 
 constexpr Date kEpoch = std::chrono::sys_days(std::chrono::year{2001} / 1 / 1);
@@ -53,7 +53,7 @@ public:
     }
 
 private:
-    /// A container some of whose children are still to be read.
+    /// A container whose children are not all read.
     struct Open {
         std::size_t object;
         ArrayRef array;
@@ -95,7 +95,7 @@ private:
         }
         const std::size_t index = _open[inner].next++;
         if (_open[inner].array) {
-            // `begin` may open a container of its own: _open is looked up anew.
+            // `begin` may open another container and move the elements of `_open`: use the index.
             Value element = begin(reference(_open[inner], index));
             _open[inner].array->append(std::move(element));
             return;
@@ -123,7 +123,7 @@ private:
         return text(marker);
     }
 
-    /// The object's value; of a container its beginning, left open.
+    /// Reads an object. A container is returned empty and becomes the innermost open one.
     Value begin(std::size_t object)
     {
         _budget.takeNode();
@@ -173,7 +173,7 @@ private:
         return array ? Value(array) : Value(dictionary);
     }
 
-    /// 2^`exponent` bytes: up to 4 unsigned, 8 signed, 16 for what needs the 64th bit.
+    /// An integer of 2^`exponent` bytes: 1, 2 and 4 are unsigned, 8 signed, 16 for numbers above 2^63-1.
     Value integer(unsigned exponent)
     {
         if (exponent <= 2)
@@ -190,7 +190,7 @@ private:
         throw Refusal{"not an integer of 64 bits"};
     }
 
-    /// ASCII or, in big-endian units, UTF-16.
+    /// A text in ASCII or in big-endian UTF-16.
     std::string text(unsigned marker)
     {
         if (marker >> 4 == 0x6)
@@ -222,7 +222,7 @@ private:
         return text;
     }
 
-    /// The count in the marker's lower half, or in the integer behind it.
+    /// The count in the marker's lower half, or in the integer that follows the marker.
     std::size_t takeCount(unsigned marker)
     {
         if ((marker & 0xF) != 0xF)
@@ -266,7 +266,7 @@ private:
             throw Refusal{"an object runs over its end"};
     }
 
-    /// Inside the file: the caller has checked.
+    /// The caller has checked that the bytes lie inside the file.
     std::uint64_t number(std::size_t offset, std::size_t width) const
     {
         std::uint64_t value = 0;
@@ -277,9 +277,9 @@ private:
 
     Bytes _bytes;
     Budget _budget;
-    std::size_t _at = 0; ///< where reading stands, or failed
+    std::size_t _at = 0; ///< the current offset; after a refusal the place of the fault
     std::size_t _offsetWidth = 0, _referenceWidth = 0, _table = 0;
-    std::vector<bool> _inside; ///< by object: whether it is a container that is open
+    std::vector<bool> _inside; ///< for each object: whether it is an open container
     std::vector<Open> _open;
 };
 

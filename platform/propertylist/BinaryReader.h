@@ -8,7 +8,7 @@ namespace kestrum::propertylist {
 
 inline constexpr std::string_view kBinaryMagic = "bplist00";
 
-/// The value of a binary property list, which begins with `kBinaryMagic`; throws `Refusal` when the rest is none.
+/// Reads a binary property list; the bytes begin with `kBinaryMagic`. Throws `Refusal` when they are malformed.
 Value readBinary(Bytes bytes);
 
 } // namespace kestrum::propertylist

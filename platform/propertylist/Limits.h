@@ -7,16 +7,16 @@
 #include <string>
 #include <utility>
 
-/// What the readers and the writer share: not for other folders.
+/// Shared by the readers and the writer; not for other folders.
 namespace kestrum::propertylist {
 
-/// Thrown by whatever finds a property list to be none; never leaves this folder.
+/// Thrown by a reader or the writer that refuses a property list. Caught inside this folder.
 struct Refusal {
     std::string reason;
     std::size_t offset = 0;
 };
 
-/// How much may still be made of a list. What is shared counts each time it is met: that is what it costs.
+/// The values and bytes that reading or writing a list may still use. A shared object counts each time it occurs.
 class Budget {
 public:
     Budget(std::size_t nodes, std::size_t bytes) : _nodes(nodes), _bytes(bytes) {}
@@ -38,7 +38,7 @@ private:
     std::size_t _nodes, _bytes;
 };
 
-/// Throws where one container more would nest too deeply inside the `open` ones.
+/// Throws `Refusal` when one more container inside `open` containers would exceed the depth limit.
 inline void checkDepth(std::size_t open)
 {
     if (open >= PropertyListCodec::kMaxDepth)

@@ -18,7 +18,7 @@ struct CloseFile {
 };
 using File = std::unique_ptr<std::FILE, CloseFile>;
 
-/// The file's bytes; nothing when it cannot be read, or holds more than `most`.
+/// The file's bytes; nothing when it cannot be read or holds more than `most` bytes.
 std::optional<std::vector<std::byte>> contents(const std::string& path, std::size_t most)
 {
     const File file(std::fopen(path.c_str(), "rb"));
@@ -88,7 +88,7 @@ PropertyLists::Stored PropertyListCodec::write(const Dictionary& dictionary, con
     if (!text || text->size() > _maxBytes)
         return Stored::Failed;
     if (const auto directory = std::filesystem::path(path).parent_path(); !directory.empty()) {
-        std::error_code ignored; // a directory that is missing still shows when the file is made
+        std::error_code ignored; // creating the file reports a directory that is still missing
         std::filesystem::create_directories(directory, ignored);
     }
     try {

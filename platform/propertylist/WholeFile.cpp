@@ -25,7 +25,7 @@ std::string directoryOf(const std::string& path)
 
 WholeFile::WholeFile(std::string path) : _path(std::move(path)), _written(_path + ".XXXXXX")
 {
-    _file = ::mkostemp(_written.data(), O_CLOEXEC); // made anew, mode 0600
+    _file = ::mkostemp(_written.data(), O_CLOEXEC); // creates the file, mode 0600
     if (_file < 0)
         fail();
 }
@@ -63,7 +63,7 @@ void WholeFile::store()
 bool WholeFile::finish(Existing existing)
 {
     store();
-    // The name must not be on the disk before what it stands for.
+    // The contents must reach the disk before the name does.
     if (::fsync(_file) != 0)
         fail();
     if (existing == Existing::Replaced) {
@@ -72,7 +72,7 @@ bool WholeFile::finish(Existing existing)
     } else if (::renameat2(AT_FDCWD, _written.c_str(), AT_FDCWD, _path.c_str(), RENAME_NOREPLACE) != 0) {
         if (errno == EEXIST)
             return false;
-        // Some file systems do not know how.
+        // Some file systems do not support this.
         if ((errno != EINVAL && errno != ENOSYS) || ::link(_written.c_str(), _path.c_str()) != 0) {
             if (errno == EEXIST)
                 return false;
@@ -81,7 +81,7 @@ bool WholeFile::finish(Existing existing)
         ::unlink(_written.c_str());
     }
     _written.clear();
-    // A directory that cannot be opened or synced keeps the name all the same.
+    // Best effort: the file has its name even when its directory cannot be opened or synced.
     if (const int directory = ::open(directoryOf(_path).c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC); directory >= 0) {
         ::fsync(directory);
         ::close(directory);

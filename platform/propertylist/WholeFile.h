@@ -8,13 +8,13 @@
 
 namespace kestrum {
 
-/// A file that is there whole or not at all: it is written beside its place under another name, for its owner's eyes
-/// alone (mode 0600), brought to the disk, and then given its name. No link at its place is followed. All throw
-/// std::system_error, with the path.
+/// Writes a file that is complete or does not exist. The bytes go to a temporary file in the same directory (mode
+/// 0600), are synced to the disk, and then the file gets its name. A symbolic link at the path is not followed. All
+/// operations throw std::system_error with the path.
 class WholeFile {
 public:
     explicit WholeFile(std::string path);
-    /// Removes what was not finished.
+    /// Removes a file that was not finished.
     ~WholeFile();
     WholeFile(const WholeFile&) = delete;
     WholeFile& operator=(const WholeFile&) = delete;
@@ -22,10 +22,10 @@ public:
     void write(Bytes bytes);
 
     enum class Existing { Kept, Replaced };
-    /// Gives the file its name; false when something has it that is to be kept.
+    /// Gives the file its name. False when the name is taken and `existing` is Kept.
     bool finish(Existing existing);
 
-    /// Which file it is, wherever its name leads later.
+    /// Identifies a file independently of its name.
     struct Identity {
         ::dev_t device = 0;
         ::ino_t number = 0;
@@ -33,15 +33,15 @@ public:
         friend bool operator==(const Identity&, const Identity&) = default;
     };
     Identity identity() const;
-    /// Of what stands at the path, links not followed; none when there is nothing.
+    /// The identity of the file at the path, or of the link itself; a default Identity when there is none.
     static Identity at(const std::string& path);
 
 private:
     void store();
     [[noreturn]] void fail() const;
 
-    std::string _path, _written; ///< `_written`: what it is called meanwhile; empty once it is finished
-    std::string _held;           ///< not yet written
+    std::string _path, _written; ///< `_written`: the temporary name; empty when finished
+    std::string _held;           ///< bytes not yet written
     int _file;
 };
 

@@ -42,7 +42,7 @@ std::string_view withoutPlus(std::string_view text)
     return text.starts_with('+') && !text.substr(1).starts_with('-') ? text.substr(1) : text;
 }
 
-/// Decimal, or hexadecimal behind "0x", from -2^63 to 2^64-1.
+/// A decimal number, or a hexadecimal one after "0x", from -2^63 to 2^64-1.
 Value integerFrom(std::string_view text)
 {
     text = withoutPlus(trimmed(text));
@@ -54,7 +54,7 @@ Value integerFrom(std::string_view text)
     throw Refusal{"not an integer of 64 bits"};
 }
 
-/// Decimal, "nan", "inf" or "infinity". A number so large or so small that it would become infinite or zero is none.
+/// A decimal number, "nan", "inf" or "infinity". Nothing for a number that would be rounded to infinity or to zero.
 Value realFrom(std::string_view text)
 {
     text = withoutPlus(trimmed(text));
@@ -92,8 +92,8 @@ struct FreeParser {
     void operator()(XML_Parser parser) const { XML_ParserFree(parser); }
 };
 
-/// A parser that has read nothing. It waits for the thread's next list: a telephony service sends them without end, and
-/// a parser asks for its memory in many pieces.
+/// An expat parser, reset after each list. Each thread keeps one: a telephony service sends many lists, and a new
+/// parser makes many allocations.
 class Parser {
 public:
     explicit Parser(std::size_t bytesToRead) : _parser(std::move(spare())), _isKept(bytesToRead <= kKeptUpTo)
@@ -112,7 +112,7 @@ public:
     XML_Parser get() const { return _parser.get(); }
 
 private:
-    static constexpr std::size_t kKeptUpTo = 1 << 20; // a parser keeps room for what it has read
+    static constexpr std::size_t kKeptUpTo = 1 << 20; // bytes; after a longer list the parser is freed with its buffers
 
     using Owner = std::unique_ptr<XML_ParserStruct, FreeParser>;
     static Owner& spare()
@@ -138,8 +138,8 @@ public:
         XML_SetCharacterDataHandler(_parser.get(), [](void* self, const char* text, int length) {
             guarded(self, &XmlReader::characters, std::string_view(text, static_cast<std::size_t>(length)));
         });
-        // A DOCTYPE may name the usual DTD, which is not read. Declarations of the document's own could grow without
-        // end (entities) or slow every element down (attributes).
+        // A DOCTYPE may name a DTD, which is not read. Declarations inside the document are refused: entities could
+        // expand without limit, attributes could slow every element down.
         XML_SetStartDoctypeDeclHandler(_parser.get(), [](void* self, const char*, const char*, const char*, int own) {
             guarded(self, &XmlReader::doctype, own != 0);
         });
@@ -157,15 +157,15 @@ public:
 private:
     enum class Element { Plist, Dict, Array, Key, String, Integer, Real, Date, Data, True, False };
 
-    /// An element that holds others; <plist> holds the root. What it fills stands in the root already.
+    /// An open element with children; <plist> holds the root. The container that it fills is already part of the root.
     struct Container {
         Array* array = nullptr;
         Dictionary* dictionary = nullptr;
         std::string key = {};
-        bool awaitsValue = false; ///< of the key that was read
+        bool awaitsValue = false; ///< a key was read, its value was not
     };
 
-    /// Runs a handler. Nothing may be thrown through expat, so a refusal waits here until it has returned.
+    /// Runs a handler. Exceptions must not pass through expat, so a refusal is stored and thrown when expat returns.
     template <typename... Parameters, typename... Arguments>
     static void guarded(void* self, void (XmlReader::*handler)(Parameters...), Arguments... arguments)
     {
@@ -185,12 +185,12 @@ private:
 
     std::size_t offset() const
     {
-#if XML_MAJOR_VERSION > 2 || XML_MINOR_VERSION >= 9 // where the other name is deprecated
+#if XML_MAJOR_VERSION > 2 || XML_MINOR_VERSION >= 9 // the other name is deprecated there
         const auto index = XML_GetCurrentByteIndex64(_parser.get());
 #else
         const auto index = XML_GetCurrentByteIndex(_parser.get());
 #endif
-        return index < 0 ? 0 : static_cast<std::size_t>(index); // below 0 before the first byte
+        return index < 0 ? 0 : static_cast<std::size_t>(index); // negative before the first byte
     }
 
     static Element elementNamed(std::string_view name)
@@ -214,7 +214,7 @@ private:
         if (element != Element::Plist && element != Element::Key)
             _budget.takeNode();
         if (element == Element::Dict || element == Element::Array)
-            checkDepth(_open.size() - 1); // <plist> is no level of its own
+            checkDepth(_open.size() - 1); // <plist> does not count
         if (element == Element::Dict)
             _open.push_back({.dictionary = &slot().becomeDictionary()});
         else if (element == Element::Array)
@@ -268,7 +268,7 @@ private:
         _open.pop_back();
     }
 
-    /// By exchange: the next text finds room.
+    /// Swaps the strings, so that the next text reuses memory.
     void takeKey()
     {
         Container& inner = _open.back();
@@ -276,7 +276,7 @@ private:
         inner.awaitsValue = true;
     }
 
-    /// Of the text that has been read, for all leaves but keys and strings.
+    /// The value of the text read, for all leaves except keys and strings.
     Value valueOf(Element leaf)
     {
         switch (leaf) {
@@ -293,7 +293,7 @@ private:
         }
     }
 
-    /// Where the innermost open element wants its next value.
+    /// The place of the next value in the innermost open element.
     Value& slot()
     {
         Container& inner = _open.back();
@@ -318,9 +318,9 @@ private:
     Parser _parser;
     std::optional<Refusal> _refusal;
     std::vector<Container> _open;
-    std::optional<Element> _leaf; ///< inside the innermost of those
+    std::optional<Element> _leaf; ///< inside the innermost open element
     std::string _text;            ///< of the leaf
-    Value _root;                  ///< before it is read, the spent one
+    Value _root;                  ///< holds the spent value until the root element begins
     bool _hasRoot = false;
     Budget _budget{PropertyListCodec::kMaxNodes, PropertyListCodec::kMaxBytes};
 };

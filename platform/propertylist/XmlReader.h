@@ -4,8 +4,7 @@
 
 namespace kestrum::propertylist {
 
-/// The value of a property list in XML; throws `Refusal` for anything else. Made of the containers and texts of the
-/// `spent` one where it can.
+/// Reads a property list in XML; throws `Refusal` for anything else. Reuses the containers and texts of `spent`.
 Value readXml(Bytes bytes, Value spent = {});
 
 } // namespace kestrum::propertylist

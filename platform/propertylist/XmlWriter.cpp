@@ -47,7 +47,7 @@ public:
     }
 
 private:
-    /// A container whose closing tag is still to come. Its owner keeps it.
+    /// A container whose closing tag is not written. Borrowed.
     struct Open {
         const Array* array;
         const Dictionary* dictionary;
@@ -81,7 +81,7 @@ private:
         open(value);
     }
 
-    /// Writes the value, of a container its opening tag.
+    /// Writes a value; of a container only the opening tag.
     void open(const Value& value)
     {
         _budget.takeNode();
@@ -105,7 +105,7 @@ private:
         case Value::Kind::Data:
             return data(value.data()->bytes());
         case Value::Kind::Null:
-            break; // left out by child(), refused before for the root
+            break; // child() leaves nulls out; a null root was refused before
         }
     }
 
@@ -176,7 +176,7 @@ private:
         else if (*character == '>')
             append("&gt;");
         else if (*character == '\r')
-            append("&#13;"); // as it stands it would be read as a line feed
+            append("&#13;"); // a reader would turn a raw carriage return into a line feed
         else
             append(text.substr(from, at - from));
     }

@@ -6,7 +6,7 @@
 
 namespace kestrum::propertylist {
 
-/// The value, which is not null, as a property list in XML; throws `Refusal` when it has no such form.
+/// Writes a value, which is not null, as a property list in XML. Throws `Refusal` when it has no XML form.
 std::string writeXml(const Value& value);
 
 } // namespace kestrum::propertylist

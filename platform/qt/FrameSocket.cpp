@@ -23,10 +23,10 @@ namespace {
 using namespace std::chrono;
 
 constexpr milliseconds kLockTimeout{1000}, kLockInterval{10};
-// How long until a listener whose backlog was full is tried again.
+// The pause before the next try when the listener's backlog is full.
 constexpr milliseconds kRetryInterval{20};
 constexpr std::size_t kChunk = 64 << 10;
-// What Qt reads ahead while a receiver is busy; the rest stays with the sender.
+// Bytes that Qt reads ahead while the receiver is busy; the rest stays with the sender.
 constexpr qint64 kReadAhead = 256 << 10;
 
 struct Peer {
@@ -72,10 +72,10 @@ bool isStaleSocket(const std::string& path)
     return refused;
 }
 
-// Keeps two processes from clearing and taking the same address at the same time.
+// The lock of a directory. It prevents two processes from removing and binding the same address at the same time.
 class DirectoryLock {
 public:
-    // A process may hold it for as long as it likes, so there is no wait without an end.
+    // Any process of the user may hold the lock, so the wait is bounded.
     DirectoryLock(const std::string& directory, milliseconds patience)
         : _descriptor(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC))
     {
@@ -130,15 +130,15 @@ FrameConnectionAttempt::FrameConnectionAttempt(std::string path, milliseconds ti
 
 void FrameConnectionAttempt::attempt()
 {
-    // A Unix socket connects at once, or not at all, or its listener's backlog is full. Qt would then try without a
-    // pause.
+    // A Unix socket connects at once or fails at once. When the listener's backlog is full, Qt would try again without
+    // a pause.
     auto socket = std::make_unique<QLocalSocket>();
     socket->connectToServer(QString::fromStdString(_path));
     if (socket->state() == QLocalSocket::ConnectingState && steady_clock::now() < _end) {
         QTimer::singleShot(kRetryInterval, &_context, [this] { attempt(); });
         return;
     }
-    const auto done = std::move(_done); // it may destroy this object
+    const auto done = std::move(_done); // moved out: it may destroy this object
     done(socket->state() == QLocalSocket::ConnectedState ? FrameConnection::ofThisUser(std::move(socket), _path, _log)
                                                          : nullptr);
 }
@@ -155,7 +155,7 @@ FrameConnection::FrameConnection(std::unique_ptr<QLocalSocket> socket, std::stri
 FrameConnection::~FrameConnection()
 {
     close();
-    // The socket may not go while one of its signals is being served.
+    // A QObject must not be deleted inside one of its signals.
     if (*_running > 0)
         _socket.release()->deleteLater();
 }
@@ -164,7 +164,7 @@ void FrameConnection::run(const std::function<void()>& handler)
 {
     if (_waiting || !handler)
         return;
-    // Copies: the handler may destroy this object, and itself with it.
+    // Copies: the handler may destroy this object and so itself.
     const auto running = _running;
     const auto copy = handler;
     ++*running;
@@ -255,7 +255,7 @@ void FrameListener::accept()
     std::unique_ptr<QLocalSocket> socket(_server.nextPendingConnection());
     if (!socket)
         return;
-    socket->setParent(nullptr); // ours, and not the server's to delete
+    socket->setParent(nullptr); // owned here, no longer by the server
     if (accepted && isThisUser(*socket, _name, _log))
         accepted(std::make_unique<FrameConnection>(std::move(socket), _name, _log));
 }

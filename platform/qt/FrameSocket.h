@@ -16,40 +16,40 @@ namespace kestrum {
 
 class SystemLog;
 
-/// One end of a connection that carries frames. Its handlers may destroy it.
+/// One end of a connection that carries frames. Its handlers may destroy it. The log is borrowed.
 class FrameConnection {
 public:
-    /// Connects to the socket at `path`; null when nobody of this user listens there.
+    /// Connects to the socket at `path`; null when no process of this user listens there.
     static std::unique_ptr<FrameConnection> connectTo(const std::string& path, std::chrono::milliseconds timeout,
                                                       SystemLog& log);
-    /// Of a connected socket; null, with a log line, when the other side is another user's process.
+    /// Takes a connected socket. Null, with a log line, when the peer is another user's process.
     static std::unique_ptr<FrameConnection> ofThisUser(std::unique_ptr<QLocalSocket> socket, const std::string& path,
                                                        SystemLog& log);
     FrameConnection(std::unique_ptr<QLocalSocket> socket, std::string name, SystemLog& log);
     ~FrameConnection();
 
     bool isOpen() const { return _socket->state() == QLocalSocket::ConnectedState; }
-    /// Ends it at once; what was not sent or read is lost. `closed` is not run.
+    /// Closes at once; unsent and unread bytes are lost. Does not run `closed`.
     void close();
 
-    /// The next frame that has arrived, also after the other side has gone. Its payload is valid until the next call.
-    /// A malformed one is logged, closes the connection and runs `closed`.
+    /// The next received frame, also after the peer has closed. Its payload is valid until the next call. A malformed
+    /// frame is logged, closes the connection and runs `closed`.
     std::optional<Frame> next();
 
-    /// Hands a frame to the socket, which keeps what the system does not take at once. False when closed.
+    /// Sends a frame. The socket buffers the bytes that the system does not take at once. False when closed.
     bool send(const Frame& frame);
-    /// The bytes that the socket keeps.
+    /// The number of buffered bytes.
     std::size_t unsent() const { return static_cast<std::size_t>(_socket->bytesToWrite()); }
-    /// Gives the system what it takes of them at once, rather than from the event loop. Runs no handler.
+    /// Writes buffered bytes to the system now instead of from the event loop. Runs no handler.
     void push();
-    /// The system's socket, for what is no frame.
+    /// The socket's file descriptor, for operations on the socket itself.
     int descriptor() const { return static_cast<int>(_socket->socketDescriptor()); }
 
-    /// Waits until nothing is kept; false when time is up or the connection closed. Serves nothing else and runs no
-    /// handler: look at `isOpen` and `next` afterwards.
+    /// Waits until all bytes are sent; false after `timeout` or when the connection closed. Serves nothing else and
+    /// runs no handler: call `isOpen` and `next` afterwards.
     bool waitUntilSent(std::chrono::milliseconds timeout);
 
-    // From the event loop: bytes have come; the other side has gone; some kept bytes went.
+    // Run from the event loop: bytes were received; the peer has closed; buffered bytes were sent.
     std::function<void()> readable, closed, written;
 
 private:
@@ -59,18 +59,18 @@ private:
     std::string _name;
     SystemLog& _log;
     FrameReader _reader;
-    std::vector<std::byte> _outgoing; // kept for its storage
+    std::vector<std::byte> _outgoing; // a member so that its memory is reused
     std::shared_ptr<int> _running = std::make_shared<int>(0);
     bool _waiting = false;
 };
 
-/// Connects without blocking. A listener whose backlog is full is tried again until the time is up.
+/// Connects without blocking. While the listener's backlog is full, it tries again until `timeout`.
 class FrameConnectionAttempt {
 public:
     using Done = std::function<void(std::unique_ptr<FrameConnection>)>;
 
     /// `done` runs once, from the event loop: with the connection, or with null when no process of this user listens
-    /// at the path. It may destroy the attempt, which cancels it.
+    /// at the path. It may destroy the attempt. Destroying the attempt cancels it.
     FrameConnectionAttempt(std::string path, std::chrono::milliseconds timeout, SystemLog& log, Done done);
 
 private:
@@ -80,7 +80,7 @@ private:
     std::chrono::steady_clock::time_point _end;
     SystemLog& _log;
     Done _done;
-    QObject _context; // ends the retries with the attempt
+    QObject _context; // its end cancels the retries
 };
 
 /// Listens for connections of this user's processes.
@@ -88,13 +88,13 @@ class FrameListener {
 public:
     explicit FrameListener(SystemLog& log) : _log(log) {}
 
-    /// Listens at the path, from which it removes the socket of a process that has ended; that of a running process
-    /// is left alone. Waits up to 1 s for the directory's lock.
+    /// Listens at the path. Removes the socket of a process that has ended, never that of a running one. Waits up to
+    /// 1 s for the directory's lock.
     std::optional<Problem> listen(const std::string& path);
-    /// Stops, and removes the socket.
+    /// Stops listening and removes the socket.
     void close() { _server.close(); }
 
-    /// Takes each new connection. Must not destroy the listener.
+    /// Called with each new connection. Must not destroy the listener.
     std::function<void(std::unique_ptr<FrameConnection>)> accepted;
 
 private:
@@ -105,8 +105,8 @@ private:
     std::string _name;
 };
 
-/// Removes the sockets in a directory whose names begin so and whose processes have gone. Does nothing while another
-/// process keeps the directory locked.
+/// Removes the sockets in a directory whose names begin with `prefix` and whose processes have ended. Does nothing
+/// while another process holds the directory's lock.
 void removeStaleSockets(const std::string& directory, std::string_view prefix);
 
 } // namespace kestrum

@@ -7,21 +7,21 @@
 
 namespace kestrum {
 
-/// All roles of the device but the toolkit, on Linux: what a program's main() makes once its Qt application object
-/// stands. Make it before, and let it go after, whatever uses the roles.
+/// The adapters of all roles except the toolkit, on Linux. main() creates it after the Qt application object. It must
+/// outlive everything that uses the roles.
 class LinuxDevice {
 public:
-    enum class Output { Standard, Quiet }; ///< the console: standard output, or nothing
+    enum class Output { Standard, Quiet }; ///< the console's; Quiet drops all lines
 
-    /// `program` is the name in the system's log.
+    /// `program` is the name in the system log.
     explicit LinuxDevice(const std::string& program, Output output = Output::Standard);
     ~LinuxDevice();
 
     MonitorRoles monitorRoles();
     ApplicationRoles applicationRoles(Toolkit& toolkit);
 
-    /// Drops queued tasks and timers, and so what they hold, while the ports and the log still stand: before the
-    /// last owners of the model go.
+    /// Destroys the queued tasks and timers and the objects that they hold, such as the model. Call it before the
+    /// destructor, while ports and log still exist.
     void dropQueued();
 
 private:

@@ -22,15 +22,15 @@ namespace {
 
 using namespace std::chrono;
 
-// How long messages are handed over before timers and the interface have their turn.
+// Messages are delivered for this long before timers and the interface get a turn.
 constexpr milliseconds kBatch{20};
-// So many of one sender, then the next sender's.
+// Messages taken from one sender before the next gets a turn.
 constexpr int kTurn = 16;
 constexpr std::size_t kMaximumSenders = 64;
 constexpr milliseconds kConnectTimeout{1000};
 
-// A port's validity and its handler, which runs at most once, from the main queue. Held by shared_ptr: tasks and
-// stack frames outlive the port.
+// A port's validity and its invalidation handler, which runs at most once, from the main queue. Shared, because tasks
+// and stack frames may outlive the port.
 struct Validity : std::enable_shared_from_this<Validity> {
     explicit Validity(MainQueue& on) : queue(on) {}
 
@@ -57,13 +57,13 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
     {
         if (senders.size() == kMaximumSenders)
             return;
-        // What is still in the socket of a sender that has gone is handed over before it is let go.
+        // A sender that has closed is kept until its remaining messages are delivered.
         connection->readable = connection->closed = [this] { schedule(); };
         senders.push_back(std::move(connection));
         schedule();
     }
 
-    // Something may have come.
+    // Schedules a delivery: messages may have arrived.
     void schedule()
     {
         if (queue == nullptr)
@@ -93,7 +93,7 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
         bool more = true;
         while (more && isOpen() && steady_clock::now() < end) {
             more = false;
-            // By index: the handler may run a loop in which senders are added.
+            // By index: the handler may run a nested event loop that adds senders.
             for (std::size_t i = 0; i < senders.size() && isOpen(); ++i)
                 more |= deliverFrom(i);
             std::erase(senders, nullptr);
@@ -106,10 +106,10 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
             schedule();
     }
 
-    // A turn of one sender; true when it may have more.
+    // Delivers one sender's turn; true when the sender may have more messages.
     bool deliverFrom(std::size_t index)
     {
-        const auto sender = senders[index]; // its bytes are borrowed by the handler, which may close the port
+        const auto sender = senders[index]; // a copy: the handler borrows its bytes and may close the port
         for (int i = 0; i < kTurn; ++i) {
             const auto frame = sender->next();
             if (!frame) {
@@ -137,10 +137,10 @@ struct Receiver : std::enable_shared_from_this<Receiver> {
 
     MessagePorts::ReceiveHandler handler;
     FrameListener listener;
-    std::shared_ptr<const void> listening; // there while new senders can come
+    std::shared_ptr<const void> listening; // not null while new senders can connect
     std::vector<std::shared_ptr<FrameConnection>> senders;
     MainQueue* queue = nullptr;
-    // More can come while messages are handed over: their handler may run a loop.
+    // Deliveries can nest: a handler may run a nested event loop.
     enum class State { Idle, Scheduled, Delivering, DeliveringAndMoreCame, Closed } state = State::Idle;
 };
 
@@ -169,7 +169,7 @@ private:
     std::shared_ptr<Validity> _validity;
 };
 
-// The connection of a remote port, and the replies that are awaited on it.
+// The connection of a remote port and its pending replies.
 struct Sender {
     explicit Sender(MainQueue& queue) : validity(std::make_shared<Validity>(queue)) {}
 
@@ -184,7 +184,7 @@ struct Sender {
             const auto frame = connection->next();
             if (!frame)
                 return;
-            // A reply that nobody awaits came too late.
+            // A reply without a pending request arrived too late and is dropped.
             const auto found = awaited.find(frame->serial);
             if (frame->kind != Frame::Kind::Reply || found == awaited.end())
                 continue;
@@ -212,7 +212,7 @@ public:
     explicit SocketRemotePort(std::shared_ptr<Sender> sender) : _sender(std::move(sender)) {}
     ~SocketRemotePort() override
     {
-        _sender->validity->valid = false; // nobody is left to be told
+        _sender->validity->valid = false; // without the handler: the port is being destroyed
         _sender->end();
     }
 
@@ -226,7 +226,7 @@ public:
     Sent sendRequest(std::int32_t messageId, Bytes payload, milliseconds sendTimeout, milliseconds receiveTimeout,
                      Reply reply) override
     {
-        // The port may be destroyed while the reply is awaited.
+        // The port may be destroyed during the wait for the reply.
         const auto sender = _sender;
         if (!sender->connection)
             return {EPIPE, std::nullopt};
@@ -239,19 +239,19 @@ public:
             return {EPIPE, std::nullopt};
         if (!sender->connection->waitUntilSent(sendTimeout)) {
             const bool gone = !sender->connection || !sender->connection->isOpen();
-            // Half a frame cannot be taken back, and a peer that reads nothing for so long is of no use.
+            // A frame that is partly sent cannot be withdrawn, so the connection is closed.
             sender->end();
             return {gone ? EPIPE : ETIMEDOUT, std::nullopt};
         }
         if (!awaits) {
-            sender->read(); // what has come while it was sent: an outer request's reply
+            sender->read(); // an outer request's reply may have arrived during the send
             return {0, std::nullopt};
         }
 
         Sender::Awaited awaited;
         sender->awaited[serial] = &awaited;
         QTimer::singleShot(receiveTimeout, Qt::PreciseTimer, &awaited.loop, &QEventLoop::quit);
-        sender->read(); // the reply may have come while the request was sent
+        sender->read(); // the reply may have arrived during the send
         if (!awaited.reply && sender->connection)
             awaited.loop.exec();
         sender->awaited.erase(serial);
@@ -286,7 +286,7 @@ std::unique_ptr<LocalPort> LinuxMessagePorts::createLocal(std::string_view name,
     if (auto problem = receiver->listener.listen(path))
         return failed(*std::move(problem));
     _problem.reset();
-    // Of the listening alone: a receiver that is closed may live on in a task.
+    // Refers to the listening only: a closed receiver may still exist in a task.
     receiver->listening = std::make_shared<int>();
     _listening.insert_or_assign(std::string(name), receiver->listening);
     return std::make_unique<SocketLocalPort>(std::move(receiver), _queue);

@@ -13,20 +13,20 @@ namespace kestrum {
 
 class SystemLog;
 
-/// Message ports on Unix-domain sockets in one directory, which is this user's alone.
+/// Message ports on Unix-domain sockets in one directory, which only this user can access.
 class LinuxMessagePorts final : public MessagePorts {
 public:
-    /// Invalidation handlers run on `queue`. Both outlive the ports.
+    /// Invalidation handlers run on `queue`. Queue and log are borrowed and outlive the ports.
     LinuxMessagePorts(std::string directory, MainQueue& queue, SystemLog& log);
 
-    /// The address is the name and this process's number. Null, with a log line, when it is taken.
+    /// The address is the name and this process's number. Null, with a log line, when the address is taken.
     std::unique_ptr<LocalPort> createLocal(std::string_view name, ReceiveHandler handler) override;
-    /// `name` is an address as the telephony service gives it.
+    /// `name` is an address that the telephony service gave.
     std::unique_ptr<RemotePort> createRemote(std::string_view name) override;
 
     /// Whether messages can reach a local port of this name.
     bool isListening(std::string_view name) const;
-    /// Why the last local port could not be made; nothing when it could.
+    /// Why the last local port could not be created; nothing after success.
     const std::optional<Problem>& problem() const { return _problem; }
 
 private:

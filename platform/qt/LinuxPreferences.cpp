@@ -17,7 +17,7 @@ QString text(std::string_view utf8)
     return QString::fromUtf8(utf8.data(), static_cast<qsizetype>(utf8.size()));
 }
 
-// Without one Qt would try to start a bus.
+// Without a session bus Qt would try to start one.
 bool hasSessionBus()
 {
     return qEnvironmentVariableIsSet("DBUS_SESSION_BUS_ADDRESS") ||
@@ -53,7 +53,8 @@ void LinuxPreferences::postChanged(std::string_view domain, std::string_view key
         auto changed = QDBusMessage::createSignal("/org/kestrum/Preferences", "org.kestrum.Preferences", "Changed");
         changed << text(domain) << text(key);
         bus.send(changed);
-        // A signal is only queued; the bus answers this once it has passed, so it goes out though the program ends.
+        // A signal is only queued. The bus answers this call after it has taken the signal, so that the signal is sent
+        // even when the program ends now.
         bus.call(QDBusMessage::createMethodCall("org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus",
                                                 "GetId"),
                  QDBus::Block, kBusTimeout);

@@ -16,7 +16,7 @@ public:
     void postChanged(std::string_view domain, std::string_view key) override;
 
 private:
-    std::map<std::string, std::map<std::string, bool>> _set; // by domain: what the next synchronize writes
+    std::map<std::string, std::map<std::string, bool>> _set; // by domain: values that the next synchronize writes
 };
 
 } // namespace kestrum

@@ -24,7 +24,7 @@ using namespace std::chrono;
 
 constexpr milliseconds kTimeout{1000};
 
-// A peer that sends more of them than the main queue serves gets one task, not one for each.
+// Notifications waiting for the main queue. One task delivers all of them, so a peer cannot fill the queue.
 class Notifications : public std::enable_shared_from_this<Notifications> {
 public:
     Notifications(TelephonyService::NotificationHandler handler, MainQueue& queue)
@@ -44,7 +44,7 @@ public:
             post();
     }
 
-    // The wait for an answer serves the queue; who waits is told of nothing meanwhile.
+    // The wait for an answer serves the queue; the handler is not called during the wait.
     void hold() { _held = true; }
     void release()
     {
@@ -68,7 +68,7 @@ private:
     {
         if (_held)
             return;
-        // The handler may end the connection, and with it what is left.
+        // The handler may end the connection and with it the remaining notifications.
         const auto self = weak_from_this();
         constexpr int kThisTask = 1;
         for (const auto& name : std::exchange(_names, {}))
@@ -78,7 +78,7 @@ private:
 
     TelephonyService::NotificationHandler _handler;
     MainQueue& _queue;
-    std::vector<std::string> _names; // that wait for their turn
+    std::vector<std::string> _names; // not yet delivered
     bool _held = false;
 };
 
@@ -103,7 +103,7 @@ std::string inWords(const LogChannelAnswer& answer)
     }
 }
 
-// A connection's socket and the answer that is awaited on it. The wait serves tasks, which may end the connection.
+// A connection's socket and the pending answer. The wait for it serves tasks, which may end the connection.
 struct Link {
     struct Awaited {
         explicit Awaited(std::uint32_t as) : serial(as) {}
@@ -118,7 +118,7 @@ struct Link {
     {
         connection->readable = [this] { read(); };
         connection->closed = [this] {
-            read(); // the answer may have come before
+            read(); // the answer may have arrived already
             quit();
         };
     }
@@ -139,8 +139,8 @@ struct Link {
         return failure(connection && connection->isOpen() ? ETIMEDOUT : EPIPE);
     }
 
-    // In turns, so that a flood takes no longer than silence; what is left comes with the next event. After the other
-    // side has gone there is no next event, and what is left is bounded.
+    // Reads a bounded number of frames for each event, so that a flood does not block the loop. After the peer has
+    // closed no further event comes; then all remaining frames are read, and their number is bounded.
     void read()
     {
         for (int i = 0; i < kTurn || !connection->isOpen(); ++i) {
@@ -187,8 +187,8 @@ struct Link {
     std::shared_ptr<Notifications> notifications;
     Awaited* awaited = nullptr;
     std::uint32_t lastSerial = 0;
-    bool scheduled = false;                                         // more reading
-    std::unique_ptr<QObject> context = std::make_unique<QObject>(); // ends the reading with the connection
+    bool scheduled = false;                                         // another read is scheduled
+    std::unique_ptr<QObject> context = std::make_unique<QObject>(); // its end cancels the scheduled read
 };
 
 class SocketServerConnection final : public VoxServerConnection {
@@ -200,12 +200,12 @@ public:
 
     LogChannelAnswer networkMonitorCreateLogChannel(std::string_view serviceName) override
     {
-        // Without its port the display would run and hear nothing.
+        // Without a receive port the display would run without messages.
         if (!_ports.isListening(serviceName)) {
             _problem = ofPorts(_ports);
             return Link::failure(ENOTCONN);
         }
-        // The wait may end this connection.
+        // The wait may destroy this connection.
         const auto link = _link;
         auto& problem = _problem;
         auto answer = link->request(vox::addressOfPort(serviceName, ::getpid()));

@@ -10,11 +10,11 @@ class LinuxMessagePorts;
 class MainQueue;
 class SystemLog;
 
-/// The telephony service that listens in the runtime directory: voxd, or another one that speaks its protocol.
+/// Connects to the telephony service in the runtime directory: voxd, or another service with the same protocol.
 class LinuxTelephonyService final : public TelephonyService {
 public:
-    /// Notifications are handed over on `queue`. A log channel is asked for only when one of `ports` listens for it.
-    /// All outlive the connections.
+    /// Notifications are delivered on `queue`. A log channel is requested only when one of `ports` listens for it. All
+    /// three are borrowed and outlive the connections.
     LinuxTelephonyService(std::string directory, const LinuxMessagePorts& ports, MainQueue& queue, SystemLog& log);
 
     std::unique_ptr<VoxServerConnection> connect(NotificationHandler handler) override;

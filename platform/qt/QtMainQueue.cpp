@@ -17,7 +17,7 @@ struct QtMainQueue::Repetition {
 QtMainQueue::QtMainQueue()
 {
     _timer.setSingleShot(true);
-    _timer.setTimerType(Qt::PreciseTimer); // a coarse one may run before its time
+    _timer.setTimerType(Qt::PreciseTimer); // a coarse timer may run early
     QObject::connect(&_timer, &QTimer::timeout, &_timer, [this] { runDue(); });
 }
 
@@ -28,7 +28,7 @@ void QtMainQueue::post(milliseconds delay, std::function<void()> task)
 
 std::unique_ptr<Timer> QtMainQueue::repeat(milliseconds interval, std::function<void()> action)
 {
-    // The queue alone holds the action, which often holds the timer's owner: a cleared queue lets go of both.
+    // Only the queue owns the action, which often owns the timer's owner: `clear` destroys both.
     struct Handle final : Timer {
         explicit Handle(std::weak_ptr<Repetition> of) : repetition(std::move(of)) {}
         ~Handle() override
@@ -50,7 +50,7 @@ void QtMainQueue::schedule(const std::shared_ptr<Repetition>& repetition)
         if (repetition->ended)
             return;
         repetition->action();
-        // Only now, so that a nested loop within the action does not run the action again.
+        // After the action, so that a nested loop inside the action does not run it again.
         repetition->due = std::max(repetition->due + repetition->interval, steady_clock::now());
         if (!repetition->ended && clearings == _clearings)
             schedule(repetition);
@@ -61,7 +61,7 @@ void QtMainQueue::clear()
 {
     ++_clearings;
     _timer.stop();
-    // Outside of the map: what a task held may post once more as it goes.
+    // Destroyed outside of the map: a destructor may post again.
     while (!_tasks.empty())
         std::exchange(_tasks, {}).clear();
 }
@@ -82,12 +82,12 @@ void QtMainQueue::wake()
 
 void QtMainQueue::runDue()
 {
-    // What the tasks post is left for the next turn of the loop: sockets and the interface come first.
+    // Tasks that these tasks post run in the next turn of the loop: sockets and the interface come first.
     const Moment now = steady_clock::now();
     const unsigned clearings = _clearings;
     while (clearings == _clearings && !_tasks.empty() && _tasks.begin()->first <= now) {
         const auto task = _tasks.extract(_tasks.begin());
-        wake(); // a nested loop within the task serves the others
+        wake(); // a nested loop inside the task serves the other tasks
         task.mapped()();
     }
 }

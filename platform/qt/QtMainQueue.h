@@ -8,7 +8,7 @@
 
 namespace kestrum {
 
-/// The main queue on the event loop of the thread that made it; nested loops serve it too.
+/// The main queue on the event loop of the thread that created it. Nested event loops serve it too.
 class QtMainQueue final : public MainQueue {
 public:
     QtMainQueue();
@@ -18,7 +18,7 @@ public:
     void post(std::chrono::milliseconds delay, std::function<void()> task) override;
     std::unique_ptr<Timer> repeat(std::chrono::milliseconds interval, std::function<void()> action) override;
 
-    /// Drops all tasks and ends all timers, so that what they hold goes while the other adapters still stand.
+    /// Destroys all tasks and stops all timers. Call it while the other adapters exist: tasks may own users of them.
     void clear();
 
 private:
@@ -30,7 +30,7 @@ private:
     void wake();
     void runDue();
 
-    // In order of their moments; of equal moments in the order posted.
+    // Sorted by time; tasks with the same time in the order in which they were posted.
     std::multimap<Moment, std::function<void()>> _tasks;
     unsigned _clearings = 0;
     QTimer _timer;

@@ -5,12 +5,11 @@
 
 namespace kestrum {
 
-/// Turns SIGTERM, SIGINT and SIGHUP into a call from the event loop. One at a time in a program, made once its Qt
-/// application object stands (std::system_error when there is no pipe for signals); at its end the signals do what they
-/// did before.
+/// Turns SIGTERM, SIGINT and SIGHUP into a call from the event loop. One object at a time, created after the Qt
+/// application object. Throws std::system_error when no pipe can be created. The destructor restores the old handlers.
 class TerminationSignals {
 public:
-    /// `action` runs once for the signals that came since its last run. It must not destroy this object.
+    /// `action` runs once for all signals since its last run. It must not destroy this object.
     explicit TerminationSignals(std::function<void()> action);
     ~TerminationSignals();
 
