@@ -1,4 +1,4 @@
-// Messages between two processes through the message ports. The sender is a second process of this program.
+// Messages through the message ports between two processes, which both run this program.
 #include "platform/SystemLog.h"
 #include "platform/qt/FrameSocket.h"
 #include "platform/qt/LinuxMessagePorts.h"

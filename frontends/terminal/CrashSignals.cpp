@@ -6,7 +6,7 @@
 #include <cstdint>
 #include <unistd.h>
 
-// curses.h defines macros like `columns`, so it comes second.
+// term.h defines macros like `columns`.
 #include <curses.h>
 #include <term.h>
 

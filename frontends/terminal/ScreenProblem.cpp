@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <unistd.h>
 
-// Separate from Screen.cpp, because the second header defines macros like `columns`.
+// Separate from Screen.cpp, because term.h defines macros like `columns`.
 #include <curses.h>
 #include <term.h>
 

@@ -43,7 +43,7 @@ std::shared_ptr<ReusableCell> TerminalTable::cellFor(std::size_t row)
     if (_offered)
         terminalCell(*_offered).setColumns(_area.columns);
     auto cell = _source.cellForRowAtIndexPath(*this, {0, row});
-    // The row now is of the other kind, which this cell cannot show. It needs a new cell.
+    // The row is of the other kind now, which this cell cannot show. It needs a new cell.
     if (cell == _offered && terminalCell(*cell).accessory() != before) {
         _offered = nullptr;
         cell = _source.cellForRowAtIndexPath(*this, {0, row});

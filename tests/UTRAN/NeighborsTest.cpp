@@ -13,7 +13,7 @@ namespace {
 using testing::ElementsAre;
 using testing::Pair;
 
-/// A record of `cells` cells whose fields are all 0.
+/// A record of `count` cells whose fields are all 0.
 RecordBuilder neighbors(unsigned count)
 {
     return record(0xD00A, 168 + 16 * count).u8(16, count << 1);

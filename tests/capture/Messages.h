@@ -31,7 +31,7 @@ inline std::string kcap(std::string_view message)
     return littleEndian(message.size(), 4) + std::string(message);
 }
 
-/// A note that `count` messages are missing.
+/// A note that `missing` messages were lost.
 inline std::string note(std::uint64_t missing)
 {
     return littleEndian(0x8000'0008, 4) + littleEndian(missing, 8);

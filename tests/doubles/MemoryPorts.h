@@ -92,7 +92,7 @@ public:
     std::vector<Request> requests;
 
 private:
-    /// The state that a port shares with its task: it may outlive the port while a handler runs.
+    /// The state that a port shares with its tasks: it may outlive the port while a handler runs.
     struct End : std::enable_shared_from_this<End> {
         explicit End(CrankedQueue& of) : queue(of) {}
 
