@@ -1,7 +1,7 @@
 #include "LogGenerator/LTE/LTELogGenerator.h"
 
 #include "doubles/RecordBuilder.h"
-#include "doubles/TechnologyRun.h"
+#include "sections/TechnologyRun.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

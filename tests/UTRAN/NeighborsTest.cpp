@@ -2,7 +2,7 @@
 #include "LogGenerator/UTRAN/UTRANNeighbhorMeasurements.h"
 
 #include "doubles/DecodedSection.h"
-#include "doubles/FieldCase.h"
+#include "sections/FieldCase.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

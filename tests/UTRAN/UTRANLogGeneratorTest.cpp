@@ -2,7 +2,7 @@
 
 #include "doubles/DecodingDoubles.h"
 #include "doubles/RecordBuilder.h"
-#include "doubles/TechnologyRun.h"
+#include "sections/TechnologyRun.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

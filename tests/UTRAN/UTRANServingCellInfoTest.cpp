@@ -1,7 +1,7 @@
 #include "LogGenerator/UTRAN/UTRANServingCellInfo.h"
 
 #include "doubles/DecodedSection.h"
-#include "doubles/FieldCase.h"
+#include "sections/FieldCase.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

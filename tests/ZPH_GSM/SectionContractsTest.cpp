@@ -1,139 +1,83 @@
-#include "ZPH_GSM/Contracts.h"
+#include "LogGenerator/ZPH_GSM/ZPH_GSMClassIndex.h"
+#include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
+
+#include "sections/SectionContracts.h"
 
 #include <gtest/gtest.h>
 
 namespace kestrum {
-namespace {
 
-class EverySection : public testing::TestWithParam<SectionContract> {};
-class DecodingSection : public testing::TestWithParam<SectionContract> {};
+using Kind = Value::Kind;
 
-TEST_P(EverySection, HasItsNameAndItsCodesInOrder)
+const TechnologyContract& technology()
 {
-    SectionAtWork run(GetParam());
-    EXPECT_EQ(run.section->getSectionName(), GetParam().name);
-    std::vector<LogCode> codes;
-    for (const auto& each : GetParam().codes)
-        codes.push_back(each.code);
-    EXPECT_EQ(run.section->getLogCodeArray(), codes);
-}
-
-TEST_P(EverySection, LogsItsWordFirstWhateverTheRecord)
-{
-    // The section's codes, short and long, and a foreign code.
-    std::vector<RecordBuilder> records = {record(0x1234, 64)};
-    for (const auto& each : GetParam().codes) {
-        if (each.minimumLength == 0)
-            continue;
-        records.push_back(record(each.code, each.minimumLength - 1));
-        records.push_back(record(each.code, each.minimumLength));
-    }
-    for (const auto& each : records) {
-        SectionAtWork run(GetParam());
-        run.receive(each);
-        ASSERT_FALSE(run.doubles.log.lines.empty());
-        EXPECT_EQ(run.doubles.log.lines.front(), RecordingLog::Line(Priority::Warning, GetParam().traceWord));
-        EXPECT_EQ(run.doubles.log.texts(Priority::Warning).size(), 1u);
-    }
-}
-
-TEST_P(EverySection, IsNotChangedByAForeignCode)
-{
-    SectionAtWork run(GetParam());
-    run.receive(record(0x1234, 300).fill(13, 1));
-    EXPECT_TRUE(run.isUntouched()) << run.text();
-    EXPECT_EQ(run.doubles.log.errors(), GetParam().reportsForeign
-                                            ? std::vector<std::string>{"Received an unknown log message: 4660"}
-                                            : std::vector<std::string>{});
-}
-
-TEST_P(EverySection, IsHarmlessWithoutANode)
-{
-    for (const auto& each : GetParam().codes) {
-        if (each.minimumLength == 0)
-            continue;
-        SectionAtWork run(GetParam());
-        run.section->updateSectionRef(Value());
-        run.receive(record(each.code, each.minimumLength + 300).fill(13, 1));
-        run.section->updateSectionRef(GetParam().isList ? Value(makeDictionary()) : Value(makeArray()));
-        run.receive(record(each.code, each.minimumLength + 300).fill(13, 1));
-        EXPECT_TRUE(run.isUntouched());
-    }
-}
-
-TEST_P(DecodingSection, IsNotChangedByARecordOneByteShort)
-{
-    for (const auto& each : GetParam().codes) {
-        if (each.minimumLength == 0)
-            continue;
-        for (const std::size_t length : {std::size_t{11}, std::size_t{13}, each.minimumLength - 1}) {
-            SectionAtWork run(GetParam());
-            run.receive(record(each.code, each.minimumLength).fill(13, 1).length(length));
-            EXPECT_TRUE(run.isUntouched()) << each.code << " of " << length << " bytes: " << run.text();
-            EXPECT_TRUE(run.doubles.log.errors().empty());
-        }
-    }
-}
-
-TEST_P(DecodingSection, DecodesARecordOfTheLeastLength)
-{
-    for (const auto& each : GetParam().codes) {
-        // The list of colour codes is only stored for the next measurements.
-        if (each.minimumLength == 0 || each.code == 0x51FF)
-            continue;
-        SectionAtWork run(GetParam());
-        run.receive(record(each.code, each.minimumLength));
-        EXPECT_FALSE(run.isUntouched()) << each.code;
-        EXPECT_TRUE(run.doubles.log.errors().empty());
-    }
-}
-
-TEST_P(DecodingSection, DoesNotLookAtWhatFollows)
-{
-    for (const auto& each : GetParam().codes) {
-        if (each.minimumLength == 0)
-            continue;
-        SectionAtWork least(GetParam()), longer(GetParam());
-        least.receive(record(each.code, each.minimumLength));
-        longer.receive(record(each.code, each.minimumLength + 500).fill(each.minimumLength, 0x5A));
-        EXPECT_EQ(longer.text(), least.text()) << each.code;
-    }
-}
-
-TEST_P(DecodingSection, ShowsNoMoreThanTheRecordHolds)
-{
-    // All counts are 255, whatever the record's length.
-    for (const auto& each : GetParam().codes) {
-        if (each.minimumLength == 0)
-            continue;
-        for (std::size_t length = each.minimumLength; length < each.minimumLength + 120; ++length) {
-            SectionAtWork run(GetParam());
-            run.receive(record(each.code, length).fill(13, 0xFF));
-            EXPECT_TRUE(hasOnlyKeys(run.node, GetParam().keys)) << run.text();
-            const auto list = run.node.array();
-            EXPECT_LE(list ? list->size() : 0, 1 + length / 3);
-        }
-    }
-}
-
-std::vector<SectionContract> decoding()
-{
-    auto found = kContracts;
-    std::erase_if(found, [](const SectionContract& contract) {
-        return std::ranges::none_of(contract.codes, [](const CodeContract& each) { return each.minimumLength != 0; });
+    constexpr bool kKept = false; // the list of colour codes is only stored for the next measurements
+    // clang-format off
+    static const auto kTechnology = TechnologyContract::of<ZPH_GSMClassIndex, ZPH_GSMLogGenerator>("ZPH_GSM", 500, {
+        {"ActiveSet", "Active Set", Kind::Array, "ActiveSet", {{0x417A, 16}},
+         {"Scrambling Code", "RSCP", "Energy Per Chip"}},
+        {"CodingScheme", "Coding Scheme", Kind::Dictionary, "CellChangeCounters", {}, {}, {}, false},
+        {"GPRSInformation", "GPRS Information", Kind::Dictionary, "GPRSInformation",
+         {{0x51F5, 18}, {0x7135, 32}, {0x51F6, 24}, {0x51FB, 34}, {0x51FD, 35}, {0x51F4, 15}, {0x5137, 29}},
+         {"SI13 Position", "Network Control Order", "PFC Supported", "Priority Access Threshold", "T3192",
+          "Access Burst Type", "DRX Timer Max", "PBCCH Present", "Ext Measurement Order", "Packet PSI Status",
+          "Packet SI Status", "Count LR", "Count HR", "Network Operating Mode", "Cell Reselect Hysteresis"}},
+        {"GSMServingCell", "GSM Serving Cell", Kind::Dictionary, "GSMServingCell",
+         {{0x5134, 26}, {0x5137, 29}, {0x5076, 17}, {0xFF0001}},
+         {"Cell ID", "ARFCN", "BSIC", "RSSI", "C1 Value", "C2 Value", "MA Dedicated ARFCN"}},
+        {"MobileAllocation", "Mobile Allocation", Kind::Dictionary, "MobileAllocation", {{0x51F8, 15}},
+         {"HSN", "ARFCNs"}},
+        {"NeighboringCells", "Neighboring Cells", Kind::Array, "NeighboringCells",
+         {{0x5137, 29}, {0x51FF, 15, kKept}, {0xFF0001}}, {"ARFCN", "RSSI", "C1 Value", "BSIC"}},
+        kPdpContextList,
+        {"ProcessPS", "Process PS", Kind::Dictionary, "ProcessPS", {{0x7130, 16}, {0x7132, 16}},
+         {"MM State", "MM Sub State", "Attach Reject Cause", "MM Service State"}},
+        {"UMTSRRMeasurement", "UMTS RR Measurement", Kind::Dictionary, "UMTSRRMeasurement", {}, {}, {}, false},
+        {"CellChangeCounters", "Cell Change Counters", Kind::Dictionary, "CellChangeCounters", {}, {}, {}, false},
+        {"DetectedSet", "Detected Set", Kind::Array, "DetectedSet", {{0x417A, 16}}, {}},
+        {"GSMSet", "GSM Set", Kind::Array, "GSMSet", {{0x4005, 15}}, {"ARFCN", "BSIC", "RSSI", "Ranking Value"}},
+        {"NonRankedGSMSet", "Non-Ranked GSM Set", Kind::Array, "NonRankedGSMSet", {}, {}, {}, false},
+        {"ProcessCO", "Process CO", Kind::Dictionary, "ProcessCS", {{0x7131, 16}, {0x7132, 16}},
+         {"MM State", "MM Service State"}},
+        {"ServingPLMN", "Serving PLMN", Kind::Dictionary, "Serving PLMN", {{0x7135, 32}, {0x7132, 16}, {0xFF0001}},
+         {"PLMN Sel Mod", "Mobile Country Code", "Mobile Network Code", "Location Area Code", "Routing Area Code",
+          "Service Type"}},
+        {"UMTSSet", "UMTS Set", Kind::Array, "UMTSSet", {{0x4005, 15}, {0xFF0001}},
+         {"Scrambling Code", "RSCP", "Energy Per Chip", "Downlink Frequency", "Ranking Value", "Rank Cell RSCP",
+          "UARFCN"}},
+        {"EquivalentPLMNList", "Equivalent PLMN List", Kind::Array, "Equivalent PLMN List", {{0x7150, 17}},
+         {"Mobile Country Code", "Mobile Network Code"}},
+        {"GSMRRInfo", "GSM RR Info", Kind::Dictionary, "GSMRRInfo", {{0x512C, 17}, {0x5137, 29}, {0x5072, 20},
+         {0x51F6, 24}},
+         {"RR State", "RR Sub State", "RR Status", "RR Mode", "Serving Rx Level", "Rx Quality Full", "Rx Quality Sub",
+          "DTX Used", "DRX Used"}},
+        {"MonitoredSet", "Monitored Set", Kind::Array, "MonitoredSet", {{0x417A, 16}}, {}},
+        {"NonRankedUMTSSet", "Non-Ranked UMTS Set", Kind::Array, "NonRankedUMTSSet", {}, {}, {}, false},
+        {"ProcessCS", "Process CS", Kind::Dictionary, "ProcessCS", {{0x7131, 16}, {0x7132, 16}},
+         {"MM State", "MM Sub State", "LU Reject Cause", "MM Service State"}},
+        {"UMTSRRInfo", "UMTS RR Info", Kind::Dictionary, "UMTSRRInfo",
+         {{0x4125, 14}, {0x4031, 16}, {0x4127, 29}, {0x4157, 19}, {0xFF0001}},
+         {"RRC State", "Transmit Power", "Cell ID", "Downlink Frequency", "Uplink Frequency", "URA ID", "Ciphering",
+          "UARFCN", "Scrambling Code"}},
+        {"BLER", "BLER", Kind::Dictionary, "BLER", {{0x4116, 16}},
+         {"Window Size", "Transport Channels"}, {"Transport Channel ID", "CRC Received", "CRC Received in Error"}},
+        {"VirtualActiveSet", "Virtual Active Set", Kind::Array, "VirtualActiveSet", {{0x417A, 16}}, {}},
+        kSimInfo,
+        {"HSDPAInformation", "HSDPA Info", Kind::Dictionary, "HSDPA Info", {{0x4221, 18}},
+         {"Version", "Sub Frames", "Carrier Info", "Primary HARQ Process", "Secondary HARQ Process"},
+         {"Process ID", "No Rx Bits", "New Tx", "Block Errors"}, false},
     });
-    return found;
+    // clang-format on
+    return kTechnology;
 }
 
-constexpr auto kNamed = [](const auto& each) { return std::string(each.param.className); };
-INSTANTIATE_TEST_SUITE_P(GsmAndUmts, EverySection, testing::ValuesIn(kContracts), kNamed);
-INSTANTIATE_TEST_SUITE_P(GsmAndUmts, DecodingSection, testing::ValuesIn(decoding()), kNamed);
+namespace {
 
 class CellMonitorSection : public testing::TestWithParam<const char*> {};
 
 const SectionContract& contractOf(const char* className)
 {
-    return *std::ranges::find(kContracts, std::string_view(className), &SectionContract::className);
+    return *std::ranges::find(technology().sections, std::string_view(className), &SectionContract::className);
 }
 
 TEST_P(CellMonitorSection, LogsARecordThatHoldsNoArrayOfCells)
@@ -145,7 +89,7 @@ TEST_P(CellMonitorSection, LogsARecordThatHoldsNoArrayOfCells)
         run.receive(broken);
         EXPECT_EQ(run.doubles.log.errors(), (std::vector<std::string>{"Cell Info Array data could not be constructed",
                                                                       "Failed to get Cell Array\n"}));
-        EXPECT_TRUE(contractOf(GetParam()).isList ? run.text() == "[]" : run.isUntouched()) << run.text();
+        EXPECT_TRUE(contractOf(GetParam()).isList() ? run.text() == "[]" : run.isUntouched()) << run.text();
     }
 }
 
@@ -156,7 +100,7 @@ TEST_P(CellMonitorSection, LogsNothingForAnArrayWithoutCells)
     run.doubles.propertyLists.parsed[describe(empty.propertyList())] = empty.propertyList();
     run.receive(empty);
     EXPECT_TRUE(run.doubles.log.errors().empty());
-    EXPECT_TRUE(contractOf(GetParam()).isList ? run.text() == "[]" : run.isUntouched()) << run.text();
+    EXPECT_TRUE(contractOf(GetParam()).isList() ? run.text() == "[]" : run.isUntouched()) << run.text();
 }
 
 INSTANTIATE_TEST_SUITE_P(GsmAndUmts, CellMonitorSection,

@@ -1,8 +1,8 @@
 #include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
 
 #include "LogGenerator/ZPH_GSM/SimInfo.h"
-#include "ZPH_GSM/Contracts.h"
-#include "doubles/TechnologyRun.h"
+#include "sections/SectionContracts.h"
+#include "sections/TechnologyRun.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -34,7 +34,7 @@ TEST(ZPH_GSMLogGenerator, IsOfItsTechnology)
 TEST(ZPH_GSMLogGenerator, LogsItsCreationInOrder)
 {
     std::vector<RecordingLog::Line> expected = {{Priority::Error, "Creating ZPH_GSMLogGenerator object"}};
-    for (const auto& contract : kContracts)
+    for (const auto& contract : technology().sections)
         expected.emplace_back(Priority::Warning, "Array Count: " + std::to_string(contract.codes.size()));
     expected.emplace_back(Priority::Error, "Creating ZPHLogGenerator2 object with 0x0");
     expected.emplace_back(Priority::Warning, "Creating Log object: 0x0");
@@ -166,50 +166,6 @@ TEST(ZPH_GSMLogGenerator, ShowsOneCellMonitorRecordInAllItsSections)
     EXPECT_EQ(describe(run.section("Neighboring Cells")), R"([{"ARFCN": "63", "RSSI": "-80 dBm"}])");
     EXPECT_EQ(describe(run.section("UMTS Set")),
               R"([{"UARFCN": "10713", "Scrambling Code": "6", "RSCP": "-95 dBm", "Energy Per Chip": "-7 dB"}])");
-}
-
-class Template : public testing::TestWithParam<SectionContract> {};
-
-TEST_P(Template, HoldsTheSectionInItsShapeAndEmpty)
-{
-    const Value node = nodeNamed(GetParam().name, PropertyListCodec().load(GsmRun::resource("ZPH_GSM")));
-    if (GetParam().isList) {
-        ASSERT_TRUE(node.array());
-        EXPECT_TRUE(node.array()->empty());
-        return;
-    }
-    ASSERT_TRUE(node.dictionary());
-    for (const auto& [key, value] : *node.dictionary()) {
-        EXPECT_EQ(std::ranges::count(GetParam().keys, key), 1) << key << " is no key of the section";
-        EXPECT_TRUE(value == Value("") || (value.array() && value.array()->empty())) << key << " is not empty";
-    }
-}
-
-TEST_P(Template, HasEveryKeyThatARecordSets)
-{
-    GsmRun run;
-    run.receive(record(0x1234, 13).bytes());
-    const auto before = keysOf(run.section(GetParam().name));
-    run.receiveList(0xFF0001,
-                    makeArray({cell("GSM", "Serving", {{"kVoxCell_MCC", 1}, {"kVoxCell_ARFCN", 1}}),
-                               cell("UMTS", "Serving", {{"kVoxCell_UARFCN", 1}, {"kVoxCell_ScramblingCode", 1}})}));
-    for (const auto& each : GetParam().codes)
-        if (each.minimumLength != 0)
-            run.receive(record(each.code, each.minimumLength + 4000).fill(13, 1).bytes());
-    auto after = keysOf(run.section(GetParam().name));
-    if (std::string_view(GetParam().name) == "UMTS RR Info")
-        after.insert("UARFCN"); // the modem's own record removes it
-    EXPECT_EQ(after, before);
-}
-
-INSTANTIATE_TEST_SUITE_P(ZPH_GSM, Template, testing::ValuesIn(kContracts),
-                         [](const auto& each) { return std::string(each.param.className); });
-
-TEST(SimTemplate, ShowsAllFilesFromTheStart)
-{
-    GsmRun run;
-    run.receive(record(0x1234, 13).bytes());
-    EXPECT_EQ(keysOf(run.section("SIM Info")), (std::set<std::string, std::less<>>(kSimKeys.begin(), kSimKeys.end())));
 }
 
 } // namespace

@@ -4,7 +4,7 @@
 #include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
 #include "capture/CaptureReader.h"
 #include "doubles/RecordBuilder.h"
-#include "doubles/TechnologyRun.h"
+#include "sections/TechnologyRun.h"
 
 #include <gtest/gtest.h>
 

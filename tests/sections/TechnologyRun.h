@@ -13,13 +13,6 @@
 
 namespace kestrum {
 
-/// The shape of a section's node: the keys of a dictionary, or of a list's rows.
-struct SectionShape {
-    std::string_view name;
-    Value::Kind kind;
-    std::set<std::string, std::less<>> keys;
-};
-
 inline std::set<std::string, std::less<>> keysOf(const Value& dictionary)
 {
     std::set<std::string, std::less<>> keys;
@@ -46,10 +39,11 @@ inline Value nodeNamed(std::string_view name, const Value& tree)
 template <typename Generator>
 class TechnologyRun {
 public:
-    explicit TechnologyRun(std::string_view templateName)
+    explicit TechnologyRun(std::string_view templateName,
+                           std::unique_ptr<Generator> (*make)(DecodingRoles&) = &Generator::generator)
     {
         doubles.bundle.paths = {resource(templateName)};
-        generator = Generator::generator(roles);
+        generator = make(roles);
     }
 
     static std::string resource(std::string_view templateName)
