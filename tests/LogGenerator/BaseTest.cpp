@@ -2,6 +2,7 @@
 
 #include "doubles/CountedArrayLock.h"
 #include "doubles/DecodingDoubles.h"
+#include "platform/RecordWatch.h"
 
 #include <gmock/gmock.h>
 #include <rapidcheck/gtest.h>
@@ -209,6 +210,20 @@ TEST_F(BaseOf, ShortRecordIsDroppedSilently)
     EXPECT_TRUE(node->empty());
 }
 
+TEST_F(BaseOf, ShortRecordIsCountedOnceAndNoOtherIs)
+{
+    struct Watch : RecordWatch {
+        void tooShort() override { ++count; }
+        int count = 0;
+    } watch;
+    doubles.roles.watch = &watch;
+    section.updateWithData(Record(recordOf(20)), 0x4005);
+    section.updateWithData(Record(recordOf(14)), 0xFF0003);
+    EXPECT_EQ(watch.count, 0);
+    section.updateWithData(Record(recordOf(19)), 0x4005);
+    EXPECT_EQ(watch.count, 1);
+}
+
 TEST_F(BaseOf, ForeignCodeIsReported)
 {
     auto node = makeDictionary();
@@ -225,6 +240,20 @@ TEST_F(BaseOf, SectionMayIgnoreForeignCodes)
     Section deaf(doubles.roles, kDeaf);
     deaf.updateWithData(Record(recordOf(20)), 0xFF0003);
     EXPECT_THAT(doubles.log.lines, ElementsAre(RecordingLog::Line(Priority::Warning, "Serving Cell")));
+}
+
+TEST_F(BaseOf, SectionMayDecodeForeignCodes)
+{
+    static constexpr SectionTraits kAnyCode{
+        .name = "Serving Cell", .layouts = kLayouts, .foreignCode = ForeignCode::Decoded};
+    struct AnyCode : Section {
+        using Section::Section;
+        void decode(Record, const Layout& layout) override { codes.push_back(layout.code); }
+        std::vector<LogCode> codes;
+    } anyCode(doubles.roles, kAnyCode);
+    anyCode.updateWithData(Record(recordOf(14)), 0xFF0003);
+    EXPECT_THAT(anyCode.codes, ElementsAre(0xFF0003u));
+    EXPECT_THAT(doubles.log.errors(), IsEmpty());
 }
 
 TEST_F(BaseOf, EntryLineAndItsPriorityAreTheSections)
