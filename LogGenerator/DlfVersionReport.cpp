@@ -36,8 +36,8 @@ int QrelDLFAddVersionReport(std::byte* output, std::uint32_t capacity, std::uint
         .set(u16(12), firstReport)
         .set(u16(14), secondReport)
         .set(u32(81), static_cast<std::uint32_t>(packedTime))
-        .set(u16(85), packedTime >> 32 & 0xFFFF)
-        .set(u16(87), packedTime >> 48 & 0xFF);
+        .set(u16(85), static_cast<std::uint16_t>(packedTime >> 32))
+        .set(u16(87), static_cast<std::uint8_t>(packedTime >> 48));
     put(version, report, 16, 7);
     put(executable, report, 23, 16);
     put(build, report, 63, 18);
