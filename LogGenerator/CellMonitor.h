@@ -11,12 +11,17 @@ namespace kestrum {
 
 class SystemLog;
 
-/// The quantity `Ordinary`; the number 32767 (INT16_MAX) means "not measured" and has an empty text.
+/// A number of 32767 (INT16_MAX) means "not measured" and has an empty text.
+constexpr bool isNotMeasured(std::uint32_t raw)
+{
+    return signed16(raw) == INT16_MAX;
+}
+constexpr std::string_view emptyText(std::uint32_t)
+{
+    return {};
+}
 template <const Quantity& Ordinary>
-inline constexpr Quantity kWhereMeasured{
-    [](Quantity::Raw raw) { return signed16(fieldOf(raw)) == INT16_MAX ? std::string() : Ordinary.text(raw); },
-    [](Quantity::Raw raw) { return signed16(fieldOf(raw)) == INT16_MAX ? kNotANumber : Ordinary.number(raw); },
-    Ordinary.unit};
+inline constexpr const Quantity& kWhereMeasured = exceptFor<isNotMeasured, emptyText, Ordinary>;
 
 /// One line of a cell's layout: the number's key in the cell, its key in the display, the line logged at error priority
 /// when the cell lacks the number (none for an empty text), and the quantity.

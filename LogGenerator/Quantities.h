@@ -37,6 +37,19 @@ constexpr std::string_view nameIn(const std::string_view (&names)[Count], std::u
     return value < Count ? names[value] : std::string_view("Unknown");
 }
 
+/// Whether a field has the value `Value`.
+template <std::uint32_t Value>
+constexpr bool isValue(std::uint32_t raw)
+{
+    return raw == Value;
+}
+
+/// The quantity `Ordinary`. Fields for which `IsSpecial` holds have the text of `Word` and no number.
+template <bool (*IsSpecial)(std::uint32_t), std::string_view (*Word)(std::uint32_t), const Quantity& Ordinary>
+inline constexpr Quantity exceptFor{
+    [](Quantity::Raw raw) { return IsSpecial(fieldOf(raw)) ? std::string(Word(fieldOf(raw))) : Ordinary.text(raw); },
+    [](Quantity::Raw raw) { return IsSpecial(fieldOf(raw)) ? kNotANumber : Ordinary.number(raw); }, Ordinary.unit};
+
 // Interpretations of a field as an integer.
 constexpr std::int32_t signed32(std::uint32_t raw)
 {

@@ -35,12 +35,13 @@ std::string_view withoutLink(std::uint32_t)
     return "N/A";
 }
 
-constexpr Quantity::Raw kInvalidOffset = 0xFFFF;
-constexpr Quantity kPnOffset{
-    [](Quantity::Raw raw) {
-        return raw == kInvalidOffset ? "Invalid Value" : formatted("%d × 64chips", signed32(fieldOf(raw)));
-    },
-    [](Quantity::Raw raw) { return raw == kInvalidOffset ? kNotANumber : numberOf<signed32>(raw); }, "× 64chips"};
+std::string_view invalidOffset(std::uint32_t)
+{
+    return "Invalid Value";
+}
+
+constexpr Quantity kPnOffset{[](Quantity::Raw raw) { return formatted("%d × 64chips", signed32(fieldOf(raw))); },
+                             numberOf<signed32>, "× 64chips"};
 
 std::string uati(std::uint32_t raw)
 {
@@ -66,7 +67,7 @@ constexpr Row kNoLink[] = {
     {u8(17),               "kTxAGC",              named<withoutLink>},
 };
 constexpr Row kSession[] = {
-    {u16(18),              "kServingPNOffset",    kPnOffset},
+    {u16(18),              "kServingPNOffset",    exceptFor<isValue<0xFFFF>, invalidOffset, kPnOffset>},
     {u8(37),               "kSessionState",       named<sessionState>},
     {u32(38).bits(0, 23),  "kUATI24",             named<uati>},
     {u8(41),               "kColorCode",          decimalSigned32},

@@ -16,11 +16,13 @@ constexpr int threshold(std::uint32_t raw)
     return 2 * static_cast<int>(raw);
 }
 
-/// The quantity `Ordinary`, except for the raw value that means "absent".
+std::string_view notPresent(std::uint32_t)
+{
+    return "Not Present";
+}
+
 template <std::uint32_t Absent, const Quantity& Ordinary>
-constexpr Quantity kOrAbsent{
-    [](Quantity::Raw raw) { return raw == Absent ? std::string("Not Present") : Ordinary.text(raw); },
-    [](Quantity::Raw raw) { return raw == Absent ? kNotANumber : Ordinary.number(raw); }, Ordinary.unit};
+constexpr const Quantity& kOrAbsent = exceptFor<isValue<Absent>, notPresent, Ordinary>;
 
 std::string_view trueOrFalse(std::uint32_t raw)
 {
