@@ -7,6 +7,7 @@
 #include <cstddef>
 #include <optional>
 #include <string>
+#include <tuple>
 #include <utility>
 
 namespace kestrum {
@@ -37,9 +38,12 @@ std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary,
         if (entry.key != kSortedKey && entry.value)
             entries.push_back(&entry);
     // Part by part, because ";" sorts after the digits: "10;" would come before "1;". Kept: parts are compared as
-    // texts, "10" before "2"; field displays show this order.
+    // texts, "10" before "2"; field displays show this order. "1" and "1;" have equal parts.
     if (sorted)
-        std::ranges::sort(entries, {}, [](const auto* entry) { return splitAtOrder(entry->key); });
+        std::ranges::sort(entries, {}, [](const auto* entry) {
+            const auto [first, second] = splitAtOrder(entry->key);
+            return std::tuple(first, second, std::string_view(entry->key));
+        });
     return entries;
 }
 

@@ -110,6 +110,13 @@ TEST(SortedKeys, EqualFirstPartsAreOrderedByTheSecond)
     EXPECT_THAT(rowNames(*tree.root), ElementsAre("1", "a", "b"));
 }
 
+TEST(SortedKeys, EqualPartsAreOrderedByTheWholeKey)
+{
+    for (const auto& display :
+         {sortedDictionary({{"1;", "x"}, {"1", "x"}}), sortedDictionary({{"1", "x"}, {"1;", "x"}})})
+        EXPECT_THAT(rowNames(*Tree(display).root), ElementsAre("1", ""));
+}
+
 TEST(SortedKeys, EqualNamesGiveTwoRowsAndThePathOfTheLast)
 {
     const Tree tree(sortedDictionary({{"1;123", "later"}, {"0;123", "earlier"}}));
