@@ -16,8 +16,8 @@
 
 class QPainter;
 
-/// The views inside a cell. The cell draws them; they are not widgets. So a frame may lie between pixels, and a row
-/// costs one widget whatever it holds.
+/// The views inside a cell. The cell draws them; they are not widgets. So a frame may lie between pixels, and each
+/// row is one widget, however many views it holds.
 namespace kestrum::qt {
 
 /// The drawing target of a view.
