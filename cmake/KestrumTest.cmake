@@ -10,7 +10,7 @@ find_package(rapidcheck REQUIRED)
 
 # The test libraries' headers take most of a test's compile time, so they are compiled once for all tests. The preset
 # sets the optimisation of the product's code. Tests are never optimised: it would double their compile time.
-add_library(test_headers OBJECT EXCLUDE_FROM_ALL ${CMAKE_SOURCE_DIR}/tests/doubles/Headers.cpp)
+add_library(test_headers OBJECT EXCLUDE_FROM_ALL ${CMAKE_SOURCE_DIR}/tests/harness/Headers.cpp)
 target_precompile_headers(test_headers PRIVATE <gmock/gmock.h> <gtest/gtest.h> <rapidcheck.h> <rapidcheck/gtest.h>
     <algorithm> <chrono> <filesystem> <fstream> <functional> <map> <memory> <set> <sstream> <string> <vector>)
 function(kestrum_test_options name)

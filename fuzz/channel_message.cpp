@@ -10,7 +10,7 @@
 #include "LogGenerator/ZPH_GSM/SimInfo.h"
 #include "Require.h"
 #include "core/KestrumModelNode.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "support/Record.h"

@@ -2,8 +2,8 @@
 // alone.
 #include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
 #include "decoding/Messages.h"
-#include "doubles/Places.h"
-#include "doubles/RecordBuilder.h"
+#include "harness/Places.h"
+#include "sections/RecordBuilder.h"
 
 namespace kestrum::bench {
 namespace {

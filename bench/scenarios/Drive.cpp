@@ -1,5 +1,5 @@
 #include "scenarios/Drive.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include "core/KestrumModelNode.h"
 

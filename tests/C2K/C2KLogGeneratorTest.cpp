@@ -1,5 +1,5 @@
 #include "C2K/C2KRun.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"

@@ -2,7 +2,7 @@
 
 #include "LogGenerator/C2K/C2KLogGenerator.h"
 #include "doubles/DecodingDoubles.h"
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 
 #include <gtest/gtest.h>
 

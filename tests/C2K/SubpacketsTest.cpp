@@ -1,7 +1,7 @@
 #include "LogGenerator/C2K/Subpackets.h"
 
-#include "doubles/RecordBuilder.h"
 #include "doubles/RecordingLog.h"
+#include "sections/RecordBuilder.h"
 
 #include <gtest/gtest.h>
 

@@ -2,7 +2,7 @@
 #include "LogGenerator/LTE/DetectedCells.h"
 #include "LogGenerator/LTE/MeasuredNeighborCells.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

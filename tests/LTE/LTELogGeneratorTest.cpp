@@ -1,6 +1,6 @@
 #include "LogGenerator/LTE/LTELogGenerator.h"
 
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 #include "sections/TechnologyRun.h"
 
 #include <gmock/gmock.h>

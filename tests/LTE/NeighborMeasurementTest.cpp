@@ -1,7 +1,7 @@
 #include "LogGenerator/LTE/NeighborCellsList.h"
 #include "LogGenerator/LTE/NeighborMeasurementMisc.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 #include "sections/FieldCase.h"
 
 #include <gmock/gmock.h>

@@ -1,7 +1,7 @@
 #include "LogGenerator/LTE/ReselectionCandidatesList.h"
 #include "LogGenerator/LTE/ReselectionCandidatesMisc.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
 #include "LogGenerator/LTE/ServingCellMeasurement.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 #include "sections/FieldCase.h"
 
 #include <gmock/gmock.h>

@@ -117,13 +117,13 @@ TEST_F(TakeOver, ReplacedDisplayShowsNothingOnceAsEveryNewOneDoes)
 
 TEST_F(TakeOver, DisplayOfUnknownOriginIsReturnedAsItIs)
 {
-    const auto foreign = makeDictionary({{"Whose", "nobody knows"}});
+    const auto foreign = makeDictionary({{"Whose", "unknown"}});
     doubles.state.set("Display", foreign);
     sample::Generator next(doubles.roles);
     EXPECT_FALSE(next.replacesDisplayOf(doubles.state));
     EXPECT_EQ(next.getDisplayFromState(doubles.state).dictionary(), foreign);
     next.updateState(doubles.state, message(1, 0x4001, {8}));
-    EXPECT_EQ(Value(foreign), Value(makeDictionary({{"Whose", "nobody knows"}})));
+    EXPECT_EQ(Value(foreign), Value(makeDictionary({{"Whose", "unknown"}})));
 }
 
 TEST_F(TakeOver, EmptyStateHasNothingToReplace)

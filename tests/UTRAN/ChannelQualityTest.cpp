@@ -1,7 +1,7 @@
 #include "LogGenerator/UTRAN/CCTRCHSIRMeasurement.h"
 #include "LogGenerator/UTRAN/TRCHBLERMeasurement.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

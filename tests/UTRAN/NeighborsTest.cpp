@@ -1,7 +1,7 @@
 #include "LogGenerator/UTRAN/GSMNeighbhorMeasurements.h"
 #include "LogGenerator/UTRAN/UTRANNeighbhorMeasurements.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 #include "sections/FieldCase.h"
 
 #include <gmock/gmock.h>

@@ -1,6 +1,6 @@
 #include "LogGenerator/UTRAN/RRC_State.h"
 
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

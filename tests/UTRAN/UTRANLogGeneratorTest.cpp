@@ -1,7 +1,7 @@
 #include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 
 #include "doubles/DecodingDoubles.h"
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 #include "sections/TechnologyRun.h"
 
 #include <gmock/gmock.h>

@@ -3,7 +3,7 @@
 #include "LogGenerator/ZPH_GSM/GSMServingCell.h"
 #include "LogGenerator/ZPH_GSM/MobileAllocation.h"
 #include "LogGenerator/ZPH_GSM/NeighboringCells.h"
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gtest/gtest.h>
 

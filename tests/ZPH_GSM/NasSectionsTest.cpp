@@ -4,7 +4,7 @@
 #include "LogGenerator/ZPH_GSM/ProcessCS.h"
 #include "LogGenerator/ZPH_GSM/ProcessPS.h"
 #include "LogGenerator/ZPH_GSM/ServingPLMN.h"
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gtest/gtest.h>
 

@@ -6,7 +6,7 @@
 #include "LogGenerator/ZPH_GSM/ProcessPS.h"
 #include "LogGenerator/ZPH_GSM/ServingPLMN.h"
 #include "LogGenerator/ZPH_GSM/UMTSRRInfo.h"
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gtest/gtest.h>
 

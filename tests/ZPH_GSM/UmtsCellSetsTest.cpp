@@ -4,7 +4,7 @@
 #include "LogGenerator/ZPH_GSM/MonitoredSet.h"
 #include "LogGenerator/ZPH_GSM/UMTSSet.h"
 #include "LogGenerator/ZPH_GSM/VirtualActiveSet.h"
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gtest/gtest.h>
 

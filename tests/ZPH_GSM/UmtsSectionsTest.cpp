@@ -2,7 +2,7 @@
 #include "LogGenerator/ZPH_GSM/HSDPAInformation.h"
 #include "LogGenerator/ZPH_GSM/SimInfo.h"
 #include "LogGenerator/ZPH_GSM/UMTSRRInfo.h"
-#include "doubles/DecodedSection.h"
+#include "sections/DecodedSection.h"
 
 #include <gtest/gtest.h>
 

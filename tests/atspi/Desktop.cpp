@@ -1,7 +1,7 @@
 // The main() of tests that need a desktop: an X server, a session bus and the accessibility services on it.
-#include "doubles/QtTestToolkit.h"
-#include "doubles/ScratchDirectory.h"
 #include "frontends/qt/QtToolkit.h"
+#include "harness/QtTestToolkit.h"
+#include "harness/Scratch.h"
 
 #include <QProcess>
 #include <gmock/gmock.h>

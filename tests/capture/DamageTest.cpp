@@ -1,8 +1,8 @@
 #include "capture/KcapReader.h"
 #include "capture/Messages.h"
 #include "capture/RecordReader.h"
-#include "doubles/FileContents.h"
-#include "doubles/Places.h"
+#include "harness/FileContents.h"
+#include "harness/Places.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

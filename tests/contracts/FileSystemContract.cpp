@@ -1,9 +1,9 @@
 #include "contracts/Worlds.h"
 #include "doubles/MemoryFileSystem.h"
 #include "doubles/RecordingPreferences.h"
+#include "harness/Scratch.h"
 #include "platform/posix/LinuxFileSystem.h"
 #include "platform/qt/LinuxPreferences.h"
-#include "posix/Scratch.h"
 
 #include <filesystem>
 #include <fstream>

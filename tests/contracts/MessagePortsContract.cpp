@@ -1,10 +1,10 @@
 #include "contracts/Worlds.h"
 #include "doubles/MemoryPorts.h"
 #include "doubles/RecordingLog.h"
+#include "harness/Scratch.h"
 #include "platform/qt/FrameSocket.h"
 #include "platform/qt/LinuxMessagePorts.h"
 #include "posix/RawSocket.h"
-#include "posix/Scratch.h"
 
 #include <gmock/gmock.h>
 
@@ -243,7 +243,7 @@ TYPED_TEST_SUITE(RemotePortContract, Worlds, DoubleOrAdapter);
 
 TYPED_TEST(RemotePortContract, IsNotCreatedWithoutAListener)
 {
-    EXPECT_FALSE(this->world.ports.createRemote("nobody"));
+    EXPECT_FALSE(this->world.ports.createRemote("unknown"));
     this->world.kill();
     EXPECT_FALSE(this->world.ports.createRemote("command"));
 }

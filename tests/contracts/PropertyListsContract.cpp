@@ -1,7 +1,7 @@
 #include "contracts/Worlds.h"
 #include "doubles/MemoryPropertyLists.h"
+#include "harness/Scratch.h"
 #include "platform/propertylist/PropertyListCodec.h"
-#include "posix/Scratch.h"
 
 #include <fstream>
 

@@ -1,11 +1,11 @@
 #include "contracts/Worlds.h"
 #include "doubles/MemoryPorts.h"
 #include "doubles/RecordingLog.h"
+#include "harness/Scratch.h"
 #include "platform/posix/VoxProtocol.h"
 #include "platform/qt/FrameSocket.h"
 #include "platform/qt/LinuxMessagePorts.h"
 #include "platform/qt/LinuxTelephonyService.h"
-#include "posix/Scratch.h"
 
 #include <gmock/gmock.h>
 

@@ -1,8 +1,8 @@
 #pragma once
 
-#include "doubles/Places.h"
-#include "doubles/QtTestToolkit.h"
-#include "posix/Scratch.h"
+#include "harness/Places.h"
+#include "harness/QtTestToolkit.h"
+#include "harness/Scratch.h"
 #include "qtplatform/EventLoop.h"
 
 #include <QProcess>

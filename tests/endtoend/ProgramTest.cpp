@@ -1,6 +1,6 @@
 #include "EndToEnd.h"
-#include "doubles/FileContents.h"
-#include "doubles/Places.h"
+#include "harness/FileContents.h"
+#include "harness/Places.h"
 
 #include <csignal>
 

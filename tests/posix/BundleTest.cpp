@@ -1,5 +1,5 @@
+#include "harness/Scratch.h"
 #include "platform/posix/LinuxBundle.h"
-#include "posix/Scratch.h"
 
 #include <gmock/gmock.h>
 

@@ -1,6 +1,6 @@
+#include "harness/Scratch.h"
 #include "platform/posix/LinuxFileSystem.h"
 #include "platform/posix/UserDirectories.h"
-#include "posix/Scratch.h"
 
 #include <gtest/gtest.h>
 

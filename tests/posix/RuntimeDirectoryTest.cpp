@@ -1,5 +1,5 @@
 #include "platform/posix/RuntimeDirectory.h"
-#include "posix/Scratch.h"
+#include "harness/Scratch.h"
 
 #include <gmock/gmock.h>
 

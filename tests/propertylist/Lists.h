@@ -1,8 +1,8 @@
 #pragma once
 
-#include "doubles/FileContents.h"
-#include "doubles/Places.h"
-#include "doubles/ScratchDirectory.h"
+#include "harness/FileContents.h"
+#include "harness/Places.h"
+#include "harness/Scratch.h"
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <cstdint>
@@ -18,12 +18,12 @@ namespace kestrum {
 inline std::string peer(const std::string& arguments, const std::string& input)
 {
     const ScratchDirectory scratch;
-    std::ofstream(scratch.file("in"), std::ios::binary) << input;
+    std::ofstream(scratch / "in", std::ios::binary) << input;
     const std::string command = "python3 '" + inCheckout("tests/propertylist/peer.py") + "' " + arguments + " <'" +
-                                scratch.file("in") + "' >'" + scratch.file("out") + "'";
+                                scratch / "in" + "' >'" + scratch / "out" + "'";
     if (std::system(command.c_str()) != 0)
         throw std::runtime_error("Python's plistlib refuses");
-    return contentsOf(scratch.file("out"));
+    return contentsOf(scratch / "out");
 }
 
 inline bool peerIsThere()

@@ -1,8 +1,8 @@
 #include "QtTest.h"
 
-#include "doubles/ScratchDirectory.h"
 #include "frontends/qt/Appearance.h"
 #include "frontends/qt/Motion.h"
+#include "harness/Scratch.h"
 
 #include <QDBusMessage>
 #include <QDBusVirtualObject>
@@ -26,15 +26,15 @@ class PrivateBus {
 public:
     PrivateBus()
     {
-        const QByteArray path = QUrl::toPercentEncoding(QString::fromStdString(_place.file("bus")), "/", "~");
-        std::ofstream(_place.file("bus.conf"))
+        const QByteArray path = QUrl::toPercentEncoding(QString::fromStdString(_place / "bus"), "/", "~");
+        std::ofstream(_place / "bus.conf")
             << R"(<!DOCTYPE busconfig PUBLIC "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
  "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
 <busconfig><type>session</type><auth>EXTERNAL</auth><listen>unix:path=)"
             << path.constData()
             << R"(</listen><policy context="default"><allow send_destination="*"/><allow receive_sender="*"/>
 <allow own="*"/></policy></busconfig>)";
-        _daemon.start("dbus-daemon", {"--config-file=" + QString::fromStdString(_place.file("bus.conf")), "--nofork",
+        _daemon.start("dbus-daemon", {"--config-file=" + QString::fromStdString(_place / "bus.conf"), "--nofork",
                                       "--print-address=1"});
         if (_daemon.waitForReadyRead())
             _address = QString::fromUtf8(_daemon.readLine()).trimmed();

@@ -3,8 +3,8 @@
 #include "core/KestrumModelNode.h"
 #include "doubles/MemoryFileSystem.h"
 #include "doubles/RecordingPreferences.h"
-#include "doubles/ScratchDirectory.h"
 #include "frontends/qt/Motion.h"
+#include "harness/Scratch.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "ui/KestrumApp.h"
 #include "ui/ServedModem.h"
@@ -81,7 +81,7 @@ protected:
         for (const auto& each : std::filesystem::directory_iterator(directory.path()))
             names.push_back(each.path().filename());
         EXPECT_THAT(names, ElementsAre("KestrumSnapshot-1794809142.kestrum"));
-        return names.size() == 1 ? _codec.load(directory.file(names[0])) : Value();
+        return names.size() == 1 ? _codec.load(directory / names[0]) : Value();
     }
 
     ScratchDirectory directory;

@@ -1,6 +1,6 @@
 #include "frontends/qt/Icon.h"
 #include "QtTest.h"
-#include "doubles/ScratchDirectory.h"
+#include "harness/Scratch.h"
 
 #include <fstream>
 
@@ -80,12 +80,12 @@ TEST_F(TheIcon, ComesFromTheProgramWhereNoThemeHasIt)
 
 TEST_F(TheIcon, ComesFromTheThemeThatHasIt)
 {
-    std::filesystem::create_directories(themes.file("hicolor/16x16/apps"));
-    std::ofstream(themes.file("hicolor/index.theme")) << "[Icon Theme]\nName=Hicolor\nDirectories=16x16/apps\n"
-                                                         "[16x16/apps]\nSize=16\n";
+    std::filesystem::create_directories(themes / "hicolor/16x16/apps");
+    std::ofstream(themes / "hicolor/index.theme") << "[Icon Theme]\nName=Hicolor\nDirectories=16x16/apps\n"
+                                                     "[16x16/apps]\nSize=16\n";
     QImage green(16, 16, QImage::Format_ARGB32);
     green.fill(Qt::green);
-    ASSERT_TRUE(green.save(QString::fromStdString(themes.file("hicolor/16x16/apps/kestrum.png"))));
+    ASSERT_TRUE(green.save(QString::fromStdString(themes / "hicolor/16x16/apps/kestrum.png")));
     EXPECT_EQ(pictureOf(windowIcon(), 16).pixelColor(8, 8), QColor(Qt::green));
 }
 

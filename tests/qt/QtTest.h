@@ -1,8 +1,8 @@
 #pragma once
 
-#include "doubles/QtTestToolkit.h"
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/MainWindow.h"
+#include "harness/QtTestToolkit.h"
 #include "platform/NavigationView.h"
 #include "platform/TableScreen.h"
 #include "platform/Toolkit.h"

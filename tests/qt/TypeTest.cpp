@@ -1,8 +1,8 @@
 #include "QtTest.h"
 
-#include "doubles/Places.h"
-#include "doubles/ScratchDirectory.h"
 #include "frontends/qt/Type.h"
+#include "harness/Places.h"
+#include "harness/Scratch.h"
 
 #include <QFontDatabase>
 #include <QFontInfo>
@@ -170,10 +170,10 @@ protected:
     /// The fonts that `tell-fonts` prints on that machine.
     std::string told() const
     {
-        std::ofstream settings(_scratch.file("fonts.conf"));
+        std::ofstream settings(_scratch / "fonts.conf");
         settings << "<fontconfig>";
         for (const auto& [face, family] : GetParam().fonts) {
-            const std::filesystem::path folder = _scratch.file(family);
+            const std::filesystem::path folder = _scratch / family;
             std::filesystem::create_directory(folder);
             std::filesystem::create_symlink(installed(face), folder / "face.ttf");
             settings << "<dir>" << folder.string() << "</dir><match target='scan'><test name='file' compare='contains'>"
@@ -183,11 +183,12 @@ protected:
         if (GetParam().desktops != nullptr)
             settings << "<match target='pattern'><edit name='family' mode='append'><string>" << GetParam().desktops
                      << "</string></edit></match>";
-        settings << "<cachedir>" << _scratch.file("cache") << "</cachedir></fontconfig>";
+        settings << "<cachedir>" << _scratch / "cache"
+                 << "</cachedir></fontconfig>";
         settings.close();
 
         auto environment = QProcessEnvironment::systemEnvironment();
-        environment.insert("FONTCONFIG_FILE", QString::fromStdString(_scratch.file("fonts.conf")));
+        environment.insert("FONTCONFIG_FILE", QString::fromStdString(_scratch / "fonts.conf"));
         QProcess program;
         program.setProcessEnvironment(environment);
         program.start(QString::fromStdString(builtProgram("tell-fonts")), QStringList());

@@ -1,5 +1,5 @@
 #include "platform/qt/LinuxClock.h"
-#include "posix/Scratch.h"
+#include "harness/Scratch.h"
 
 #include <gtest/gtest.h>
 

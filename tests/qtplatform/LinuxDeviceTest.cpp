@@ -1,8 +1,8 @@
 #include "platform/qt/LinuxDevice.h"
+#include "harness/Scratch.h"
 #include "platform/Console.h"
 #include "platform/MainQueue.h"
 #include "platform/qt/TerminationSignals.h"
-#include "posix/Scratch.h"
 #include "qtplatform/EventLoop.h"
 
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
 #include "platform/qt/LinuxPreferences.h"
-#include "doubles/FileContents.h"
-#include "posix/Scratch.h"
+#include "harness/FileContents.h"
+#include "harness/Scratch.h"
 #include "qtplatform/EventLoop.h"
 
 #include <QProcess>

@@ -1,9 +1,9 @@
 #include "doubles/RecordingLog.h"
+#include "harness/Scratch.h"
 #include "platform/qt/FrameSocket.h"
 #include "platform/qt/LinuxMessagePorts.h"
 #include "platform/qt/QtMainQueue.h"
 #include "posix/RawSocket.h"
-#include "posix/Scratch.h"
 #include "qtplatform/EventLoop.h"
 
 #include <gmock/gmock.h>
@@ -315,7 +315,7 @@ protected:
 
 TEST_F(MessagePortsTest, ARemotePortIsNotCreatedWithoutAListener)
 {
-    EXPECT_FALSE(ports.createRemote("nobody"));
+    EXPECT_FALSE(ports.createRemote("unknown"));
     RawSocket::listenAt(directory / "gone").close();
     EXPECT_FALSE(ports.createRemote("gone"));
     EXPECT_FALSE(ports.createRemote("../elsewhere"));

@@ -1,11 +1,11 @@
 // The model on real sockets, with a service that takes the request for a log channel but never answers.
 #include "core/KestrumModel.h"
 #include "doubles/DecodingDoubles.h"
+#include "harness/Scratch.h"
 #include "platform/qt/LinuxMessagePorts.h"
 #include "platform/qt/LinuxTelephonyService.h"
 #include "platform/qt/QtMainQueue.h"
 #include "posix/RawSocket.h"
-#include "posix/Scratch.h"
 #include "qtplatform/EventLoop.h"
 
 #include <gmock/gmock.h>

@@ -1,9 +1,9 @@
 #include "doubles/RecordingLog.h"
+#include "harness/Scratch.h"
 #include "platform/qt/LinuxMessagePorts.h"
 #include "platform/qt/LinuxTelephonyService.h"
 #include "platform/qt/QtMainQueue.h"
 #include "posix/RawSocket.h"
-#include "posix/Scratch.h"
 #include "qtplatform/EventLoop.h"
 
 #include <gmock/gmock.h>

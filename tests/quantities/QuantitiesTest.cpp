@@ -3,7 +3,7 @@
 #include "LogGenerator/UTRAN/UTRANLogGenerator.h"
 #include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
 #include "capture/CaptureReader.h"
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 #include "sections/TechnologyRun.h"
 
 #include <gtest/gtest.h>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 
 #include <cstddef>
 #include <cstdint>

@@ -3,7 +3,7 @@
 #include "LogGenerator/ClassIndex.h"
 #include "LogGenerator/ZPHLogGenerator2.h"
 #include "doubles/DecodingDoubles.h"
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 
 #include <algorithm>
 #include <memory>

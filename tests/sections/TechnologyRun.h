@@ -2,7 +2,7 @@
 
 #include "LogGenerator/ZPHLogGenerator2.h"
 #include "doubles/DecodingDoubles.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 #include "platform/propertylist/PropertyListCodec.h"
 
 #include <memory>

@@ -4,7 +4,7 @@
 #include "LogGenerator/UTRAN/UTRANClassIndex.h"
 #include "LogGenerator/ZPH_GSM/ZPH_GSMClassIndex.h"
 #include "doubles/DecodingDoubles.h"
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 
 #include <gtest/gtest.h>
 

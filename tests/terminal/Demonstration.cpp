@@ -1,5 +1,5 @@
 #include "Demonstration.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include <csignal>
 #include <cstdint>

@@ -1,7 +1,7 @@
 #include "Pseudoterminal.h"
-#include "doubles/FileContents.h"
-#include "doubles/Places.h"
-#include "doubles/ScratchDirectory.h"
+#include "harness/FileContents.h"
+#include "harness/Places.h"
+#include "harness/Scratch.h"
 
 #include <gmock/gmock.h>
 
@@ -32,7 +32,7 @@ public:
     SlowCapture(const SlowCapture&) = delete;
     SlowCapture& operator=(const SlowCapture&) = delete;
 
-    std::string path() const { return _scratch.file("slow.kcap"); }
+    std::string path() const { return _scratch / "slow.kcap"; }
     void send(std::size_t bytes)
     {
         bytes = std::min(bytes, _rest.size());

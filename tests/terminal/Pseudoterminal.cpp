@@ -1,5 +1,5 @@
 #include "Pseudoterminal.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include "support/Utf8.h"
 

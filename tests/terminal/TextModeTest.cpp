@@ -3,7 +3,7 @@
 #include "apps/kestrum-terminal/TextDisplay.h"
 #include "core/KestrumModelNode.h"
 #include "doubles/MonitorDoubles.h"
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include <gmock/gmock.h>
 

@@ -1,7 +1,7 @@
 #include "Tool.h"
 #include "capture/Messages.h"
-#include "doubles/Places.h"
-#include "doubles/ScratchDirectory.h"
+#include "harness/Places.h"
+#include "harness/Scratch.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -38,8 +38,8 @@ protected:
 
     std::string capture(const std::string& contents, const std::string& name = "a.kcap") const
     {
-        writeFile(scratch.file(name), contents);
-        return scratch.file(name);
+        writeFile(scratch / name, contents);
+        return scratch / name;
     }
 
     ScratchDirectory scratch;
@@ -158,10 +158,10 @@ TEST_F(ProgramTest, ForeignCodesDoNotChangeTheTechnology)
 
 TEST_F(ProgramTest, StatisticsHideNothing)
 {
-    const auto ran = run({"--stats", "--technology", "lte",
-                          capture(kcap("fragment") + kcap(antennas(1)) + kcap(message(0xB0C1, "odd type", kStamp, 7)) +
-                                  kcap(message(0xB0C1, "short")) + kcap(message(0xB193, "nobody's")) +
-                                  kcap(antennas(2)) + "#########")});
+    const auto ran = run(
+        {"--stats", "--technology", "lte",
+         capture(kcap("fragment") + kcap(antennas(1)) + kcap(message(0xB0C1, "odd type", kStamp, 7)) +
+                 kcap(message(0xB0C1, "short")) + kcap(message(0xB193, "unknown")) + kcap(antennas(2)) + "#########")});
     EXPECT_EQ(ran.status, 1);
     EXPECT_THAT(ran.remarks, EndsWith("code        messages     decoded   too short  without subscriber     refused\n"
                                       "(none)             1           0           1                   0           0\n"
@@ -297,7 +297,7 @@ TEST_F(ProgramTest, AClosedPipeEndsItQuietly)
 
 TEST_F(ProgramTest, AFullDiskIsReported)
 {
-    const auto file = capture(kcap(antennas(1))), told = scratch.file("told");
+    const auto file = capture(kcap(antennas(1))), told = scratch / "told";
     const auto command = "'" + builtProgram("kestrum-decode") + "' '" + file + "' >/dev/full 2>'" + told + "'";
     EXPECT_EQ(WEXITSTATUS(std::system(command.c_str())), 1);
     EXPECT_EQ(contentsOf(told), "kestrum-decode: standard output: No space left on device\n");
@@ -381,7 +381,7 @@ TEST_F(ProgramTest, CsvGuardsFormulasAndLeavesNumbersAlone)
 
 TEST_F(ProgramTest, NamesOfFilesDoNothingToATerminal)
 {
-    const auto ran = run({scratch.file("\x1b[31m\u202Eno.kcap")});
+    const auto ran = run({scratch / "\x1b[31m\u202Eno.kcap"});
     EXPECT_THAT(ran.remarks, HasSubstr("\\x1b[31m\\xe2\\x80\\xaeno.kcap: cannot be opened"));
 }
 
@@ -389,7 +389,7 @@ TEST_F(ProgramTest, ATerminalIsShownNoControlCharacters)
 {
     const auto file = capture(kcap(ifx("a\u0085\u202E\x7F")));
     for (const auto* format : {"csv", "json", "jsonl", "tree"}) {
-        const auto shown = scratch.file("shown");
+        const auto shown = scratch / "shown";
         const auto command = "script -qec \"'" + builtProgram("kestrum-decode") + "' --format " + format + " '" + file +
                              "'\" /dev/null </dev/null >'" + shown + "'";
         ASSERT_EQ(std::system(command.c_str()), 0);

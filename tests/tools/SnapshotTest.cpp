@@ -2,7 +2,7 @@
 #include "Tool.h"
 #include "capture/Messages.h"
 #include "doubles/DecodingDoubles.h"
-#include "doubles/ScratchDirectory.h"
+#include "harness/Scratch.h"
 #include "platform/posix/LinuxBundle.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "tools/Decoding.h"
@@ -90,8 +90,8 @@ protected:
     /// As the program reads it from disk.
     Value reread(const DictionaryRef& snapshot) const
     {
-        EXPECT_EQ(codec.write(*snapshot, scratch.file("a.kestrum")), PropertyLists::Stored::Written);
-        return codec.load(scratch.file("a.kestrum"));
+        EXPECT_EQ(codec.write(*snapshot, scratch / "a.kestrum"), PropertyLists::Stored::Written);
+        return codec.load(scratch / "a.kestrum");
     }
 
     PropertyListCodec codec;
@@ -104,7 +104,7 @@ TEST_P(RoundTrip, LiveDisplaySavedAndDecodedOfflineIsTheSameDisplay)
     const auto offline = recovered(reread(live.saved()));
     EXPECT_THAT(offline.faults, IsEmpty());
     EXPECT_EQ(offline.display, live.display());
-    const auto ran = run({"--format", "json", scratch.file("a.kestrum")});
+    const auto ran = run({"--format", "json", scratch / "a.kestrum"});
     EXPECT_EQ(ran.status, 0) << ran.remarks;
 }
 
@@ -186,8 +186,8 @@ class SnapshotFile : public testing::Test {
 protected:
     std::string write(const DictionaryRef& snapshot)
     {
-        EXPECT_EQ(codec.write(*snapshot, scratch.file("Saved.kestrum")), PropertyLists::Stored::Written);
-        return scratch.file("Saved.kestrum");
+        EXPECT_EQ(codec.write(*snapshot, scratch / "Saved.kestrum"), PropertyLists::Stored::Written);
+        return scratch / "Saved.kestrum";
     }
 
     PropertyListCodec codec;
@@ -216,17 +216,17 @@ TEST_F(SnapshotFile, IsExtracted)
 {
     const LiveRun live("lte");
     const auto file = write(live.saved());
-    const auto ran = run({"--extract", scratch.file("out"), "--format", "json", "--stats", file});
+    const auto ran = run({"--extract", scratch / "out", "--format", "json", "--stats", file});
     EXPECT_EQ(ran.status, 0);
     EXPECT_THAT(ran.remarks, HasSubstr("that are no ordinary records stand in the extracted .kcap alone"));
     const auto dlf = live.saved()->at("Data").array()->back().dictionary()->at("DLF");
-    EXPECT_EQ(contentsOf(scratch.file("out/Saved-written.dlf")), textOf(dlf.data()->bytes()));
+    EXPECT_EQ(contentsOf(scratch / "out/Saved-written.dlf"), textOf(dlf.data()->bytes()));
 
     std::string kcaps;
     for (const auto& each : live.messages)
         kcaps += kcap(each);
-    EXPECT_EQ(contentsOf(scratch.file("out/Saved.kcap")), kcaps);
-    const auto clean = run({"--stats", scratch.file("out/Saved.dlf")});
+    EXPECT_EQ(contentsOf(scratch / "out/Saved.kcap"), kcaps);
+    const auto clean = run({"--stats", scratch / "out/Saved.dlf"});
     EXPECT_EQ(clean.status, 0) << clean.remarks;
     EXPECT_THAT(clean.remarks, HasSubstr("bytes skipped: 0"));
 }
@@ -235,32 +235,32 @@ TEST_F(SnapshotFile, IsExtractedIntoNewFilesAlone)
 {
     const LiveRun live("lte");
     const auto file = write(live.saved());
-    std::filesystem::create_directory(scratch.file("out"));
-    writeFile(scratch.file("out/Saved.dlf"), "a recording");
-    writeFile(scratch.file("somebody's"), "here");
-    std::filesystem::create_symlink(scratch.file("somebody's"), scratch.file("out/Saved.kcap"));
-    const auto ran = run({"--extract", scratch.file("out"), file});
+    std::filesystem::create_directory(scratch / "out");
+    writeFile(scratch / "out/Saved.dlf", "a recording");
+    writeFile(scratch / "somebody's", "here");
+    std::filesystem::create_symlink(scratch / "somebody's", scratch / "out/Saved.kcap");
+    const auto ran = run({"--extract", scratch / "out", file});
     EXPECT_EQ(ran.status, 1);
     EXPECT_THAT(ran.remarks,
-                HasSubstr("there is already " + scratch.file("out/Saved.kcap") + ", " + scratch.file("out/Saved.dlf")));
-    EXPECT_EQ(contentsOf(scratch.file("out/Saved.dlf")), "a recording");
-    EXPECT_FALSE(std::filesystem::exists(scratch.file("out/Saved-written.dlf")));
+                HasSubstr("there is already " + scratch / "out/Saved.kcap" + ", " + scratch / "out/Saved.dlf"));
+    EXPECT_EQ(contentsOf(scratch / "out/Saved.dlf"), "a recording");
+    EXPECT_FALSE(std::filesystem::exists(scratch / "out/Saved-written.dlf"));
 
-    EXPECT_EQ(run({"--extract", scratch.file("out"), "--force", file}).status, 0);
-    EXPECT_NE(contentsOf(scratch.file("out/Saved.dlf")), "a recording");
-    EXPECT_EQ(contentsOf(scratch.file("somebody's")), "here");
-    EXPECT_TRUE(std::filesystem::is_regular_file(std::filesystem::symlink_status(scratch.file("out/Saved.kcap"))));
+    EXPECT_EQ(run({"--extract", scratch / "out", "--force", file}).status, 0);
+    EXPECT_NE(contentsOf(scratch / "out/Saved.dlf"), "a recording");
+    EXPECT_EQ(contentsOf(scratch / "somebody's"), "here");
+    EXPECT_TRUE(std::filesystem::is_regular_file(std::filesystem::symlink_status(scratch / "out/Saved.kcap")));
 }
 
 TEST_F(SnapshotFile, OfTwoNamesakesTheFirstIsExtracted)
 {
     const LiveRun live("lte");
     const auto first = write(live.saved());
-    std::filesystem::create_directory(scratch.file("other"));
-    const auto second = scratch.file("other/Saved.kestrum");
+    std::filesystem::create_directory(scratch / "other");
+    const auto second = scratch / "other/Saved.kestrum";
     std::filesystem::copy_file(first, second);
-    EXPECT_EQ(run({"--extract", scratch.file("out"), first, second}).status, 1);
-    EXPECT_EQ(run({"--extract", scratch.file("out"), "--force", first, second}).status, 1) << "not each other";
+    EXPECT_EQ(run({"--extract", scratch / "out", first, second}).status, 1);
+    EXPECT_EQ(run({"--extract", scratch / "out", "--force", first, second}).status, 1) << "not each other";
 }
 
 TEST_F(SnapshotFile, CutOffIsBadInputWithItsOffset)

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include <csignal>
 #include <cstdlib>

@@ -1,7 +1,7 @@
 #include "ui/KestrumSaveViewController.h"
 
 #include "doubles/ApplicationDoubles.h"
-#include "doubles/ScratchDirectory.h"
+#include "harness/Scratch.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "ui/Panes.h"
 
@@ -295,8 +295,8 @@ protected:
 
 TEST_F(SnapshotFile, ReadsBackFromADirectoryThatDidNotExist)
 {
-    save(scratch.file("new/logs"));
-    const Value read = codec.load(scratch.file("new/logs/KestrumSnapshot-1794809142.kestrum"));
+    save(scratch / "new/logs");
+    const Value read = codec.load(scratch / "new/logs/KestrumSnapshot-1794809142.kestrum");
     EXPECT_EQ(read, Value(makeDictionary({{"Timestamp", "2026-11-16 06:05:42 +0000"},
                                           {"Data", makeArray({makeDictionary({{"Description", "DLF binary (3 bytes)"},
                                                                               {"DLF", Data(bytesOf("abc"))},
@@ -307,17 +307,17 @@ TEST_F(SnapshotFile, ReadsBackFromADirectoryThatDidNotExist)
 
 TEST_F(SnapshotFile, FailureToCreateTheDirectoryIsReported)
 {
-    std::ofstream(scratch.file("file")) << "in the way";
-    save(scratch.file("file/logs"));
+    std::ofstream(scratch / "file") << "in the way";
+    save(scratch / "file/logs");
     EXPECT_EQ(doubles.toolkit.alerts.size(), 1u);
-    EXPECT_THAT(doubles.log.errors(), ElementsAre("Unable to write snapshot to " +
-                                                  scratch.file("file/logs/KestrumSnapshot-1794809142.kestrum")));
+    EXPECT_THAT(doubles.log.errors(),
+                ElementsAre("Unable to write snapshot to " + scratch / "file/logs/KestrumSnapshot-1794809142.kestrum"));
 }
 
 TEST_F(SnapshotFile, LargerThanWhatIsReadIsRefusedWithTheAlert)
 {
     save(scratch.path());
-    const auto path = scratch.file("KestrumSnapshot-1794809142.kestrum");
+    const auto path = scratch / "KestrumSnapshot-1794809142.kestrum";
     PropertyListCodec small(std::filesystem::file_size(path) - 1);
     ApplicationRoles withSmall = rolesWith(small);
     std::filesystem::remove(path);
@@ -333,8 +333,8 @@ TEST_F(SnapshotFile, OfTwoDisplaysInOneSecondThereAreTwo)
     PropertyListCodec another;
     ApplicationRoles second = rolesWith(another);
     KestrumSaveViewController(second, application, makeArray()).savePressed();
-    EXPECT_TRUE(codec.load(scratch.file("KestrumSnapshot-1794809142.kestrum")));
-    EXPECT_TRUE(codec.load(scratch.file("KestrumSnapshot-1794809143.kestrum")));
+    EXPECT_TRUE(codec.load(scratch / "KestrumSnapshot-1794809142.kestrum"));
+    EXPECT_TRUE(codec.load(scratch / "KestrumSnapshot-1794809143.kestrum"));
 }
 
 } // namespace

@@ -1,7 +1,8 @@
 #include "capture/CaptureReader.h"
-#include "doubles/FileContents.h"
-#include "doubles/Places.h"
 #include "doubles/RecordingLog.h"
+#include "harness/FileContents.h"
+#include "harness/Places.h"
+#include "harness/Scratch.h"
 #include "platform/TelephonyService.h"
 #include "platform/posix/Frame.h"
 #include "platform/propertylist/PropertyListCodec.h"
@@ -9,7 +10,6 @@
 #include "platform/qt/LinuxTelephonyService.h"
 #include "platform/qt/QtMainQueue.h"
 #include "posix/RawSocket.h"
-#include "posix/Scratch.h"
 #include "qtplatform/EventLoop.h"
 #include "support/Record.h"
 
@@ -482,7 +482,7 @@ TEST_F(ServiceTest, RefusesALogChannelToAPortWithoutAListener)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
     const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
-    server.send(frame(kRequest, 1, 1, "nobody"));
+    server.send(frame(kRequest, 1, 1, "absent"));
     EXPECT_EQ(server.receive(kRefusalSize), refusal(1, 3));
     server.send(frame(kRequest, 1, 2, "../../etc/passwd"));
     EXPECT_EQ(server.receive(kRefusalSize), refusal(2, 1));
@@ -514,18 +514,18 @@ TEST_F(ServiceTest, LogsARefusalOnceUntilSomethingChanges)
 {
     ASSERT_TRUE(voxd.start({"--scenario", "ifx"}));
     const auto server = RawSocket::connectTo(directory / "org.kestrum.vox");
-    const auto askForNobody = [&](std::uint32_t serial) {
-        server.send(frame(kRequest, 1, serial, "nobody." + std::to_string(serial)));
+    const auto askForAbsent = [&](std::uint32_t serial) {
+        server.send(frame(kRequest, 1, serial, "absent." + std::to_string(serial)));
         EXPECT_EQ(server.receive(kRefusalSize), refusal(serial, 3));
     };
     for (std::uint32_t serial = 1; serial <= 50; ++serial)
-        askForNobody(serial);
-    EXPECT_TRUE(voxd.logs("refused a log channel to \"nobody.1\": no process listens there"));
+        askForAbsent(serial);
+    EXPECT_TRUE(voxd.logs("refused a log channel to \"absent.1\": no process listens there"));
     Client client{*this, "log"};
     EXPECT_EQ(client.open().errorCode, 0);
-    askForNobody(51);
-    EXPECT_TRUE(voxd.logs("refused a log channel to \"nobody.51\""));
-    EXPECT_EQ(voxd.log().find("nobody.2"), std::string::npos);
+    askForAbsent(51);
+    EXPECT_TRUE(voxd.logs("refused a log channel to \"absent.51\""));
+    EXPECT_EQ(voxd.log().find("absent.2"), std::string::npos);
 }
 
 TEST_F(ServiceTest, RepliesThatAreNotReadCostBoundedMemory)

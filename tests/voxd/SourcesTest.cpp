@@ -1,6 +1,6 @@
+#include "harness/Scratch.h"
 #include "platform/TelephonyService.h"
 #include "platform/propertylist/PropertyListCodec.h"
-#include "posix/Scratch.h"
 #include "voxd/ReplaySource.h"
 #include "voxd/scenarios/Scenario.h"
 

@@ -2,8 +2,8 @@
 
 #include "LogGenerator/LogGenerator.h"
 #include "doubles/MemoryBundle.h"
-#include "doubles/Places.h"
 #include "doubles/VirtualClock.h"
+#include "harness/Places.h"
 #include "platform/ChannelMessage.h"
 #include "platform/Console.h"
 #include "platform/Roles.h"

@@ -1,6 +1,6 @@
 // The environment of every test program and of the programs that it starts: free of settings of the machine, the user
 // and the shell. It is linked into each test program, and runs before main() and before other objects' constructors.
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 #include <csignal>
 #include <cstdlib>
@@ -38,7 +38,7 @@ bool isKept(std::string_view variable)
     ::setenv("HOME", "/nonexistent", 1);
     ::setenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/nonexistent/session", 1);
     ::setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/nonexistent/system", 1);
-    ::setenv("FONTCONFIG_FILE", kestrum::inCheckout("tests/doubles/fonts.conf").c_str(), 1);
+    ::setenv("FONTCONFIG_FILE", kestrum::inCheckout("tests/harness/fonts.conf").c_str(), 1);
     ::umask(022);
 
     // A shell's background jobs and nohup start with some signals ignored. Child processes would inherit that.

@@ -1,6 +1,6 @@
 // The main() of tests with real widgets. It needs no display.
-#include "doubles/QtTestToolkit.h"
 #include "frontends/qt/QtToolkit.h"
+#include "harness/QtTestToolkit.h"
 
 #include <gmock/gmock.h>
 

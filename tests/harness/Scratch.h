@@ -4,18 +4,20 @@
 #include <filesystem>
 #include <fstream>
 #include <optional>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 
 namespace kestrum {
 
-/// A directory that is removed together with this object.
+/// An empty directory for the test. It is removed with its contents, together with this object.
 class ScratchDirectory {
 public:
     ScratchDirectory()
     {
-        std::string name = (std::filesystem::temp_directory_path() / "kestrum-test-XXXXXX").string();
-        _path = ::mkdtemp(name.data());
+        _path = (std::filesystem::temp_directory_path() / "kestrum-test-XXXXXX").string();
+        if (::mkdtemp(_path.data()) == nullptr)
+            throw std::runtime_error("no scratch directory");
     }
     ScratchDirectory(const ScratchDirectory&) = delete;
     ScratchDirectory& operator=(const ScratchDirectory&) = delete;

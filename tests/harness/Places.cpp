@@ -1,4 +1,4 @@
-#include "doubles/Places.h"
+#include "harness/Places.h"
 
 // The only file that is compiled with paths of the machine, so a compiler cache can serve all others in any checkout.
 std::string kestrum::inCheckout(std::string_view path)

@@ -2,7 +2,7 @@
 
 #include "LogGenerator/Base.h"
 #include "doubles/DecodingDoubles.h"
-#include "doubles/RecordBuilder.h"
+#include "sections/RecordBuilder.h"
 
 #include <stdexcept>
 #include <string>
