@@ -149,11 +149,12 @@ CaptureReader::Found KcapReader::found(const Look& look)
     const auto [sound, size] = look;
     const std::size_t here = _window.peek(kLengthSize).size();
     if (sound == Sound::No)
-        return {.reason = formatted("a message of %lu bytes, allowed are %lu", size, kLongestMessage)};
+        return {.reason = formatted("a message of %lu bytes, longer than the limit of %lu", size, kLongestMessage)};
     if (sound == Sound::Incomplete && size == 0)
         return {.incomplete = true, .reason = formatted("the length has only %lu of its 4 bytes", here)};
     if (sound == Sound::Incomplete)
-        return {.incomplete = true, .reason = formatted("the last message ends %lu bytes short", size - here)};
+        return {.incomplete = true,
+                .reason = formatted("the last message is cut off (%lu bytes missing)", size - here)};
     return {.size = size, .gap = gapIn(_window.peek(kKcapGapSize))};
 }
 
@@ -170,7 +171,7 @@ CaptureReader::Found KcapReader::inOrder()
     // Damage follows: the length is true unless another message begins inside it.
     for (std::size_t at = 1; at < here.size; ++at)
         if (proof(at) == Sound::Yes)
-            return {.reason = formatted("no message follows the one of %lu bytes", here.size - kLengthSize)};
+            return {.reason = formatted("no message follows after a message of %lu bytes", here.size - kLengthSize)};
     return found(here);
 }
 

@@ -249,9 +249,10 @@ CaptureReader::Found RecordReader::byLength()
     if (!length)
         return {.incomplete = true, .reason = "the length has only 1 of its 2 bytes"};
     if (*length < kHead)
-        return {.reason = formatted("a record of %u bytes, less than its header's %lu", *length, kHead)};
+        return {.reason = formatted("a record of %u bytes, shorter than its header of %lu", *length, kHead)};
     if (const auto there = _window.peek(*length).size(); there < *length)
-        return {.incomplete = true, .reason = formatted("the last message ends %lu bytes short", *length - there)};
+        return {.incomplete = true,
+                .reason = formatted("the last message is cut off (%lu bytes missing)", *length - there)};
     return accept(*headAt(0, kPreambles[kNoPreamble]), *length);
 }
 
@@ -278,13 +279,14 @@ CaptureReader::Found RecordReader::inOrder()
     const std::size_t there = std::min(_window.peek(said + kBeyond).size(), said + kBeyond);
     for (std::size_t at = found.head->preamble->size + kHead; at < there; ++at)
         if (look(at, Evidence::TimeStamp).size != 0)
-            return {.size = at, .reason = formatted("the record says that it is %lu bytes long, and is %lu", said, at)};
+            return {.size = at,
+                    .reason = formatted("the record's length field says %lu bytes, but the record has %lu", said, at)};
     if (said <= there)
         return {.size = said};
     if (_origin == Origin::Interval)
         return {.size = there,
-                .reason = formatted("the record says that it is %lu bytes long, and is %lu", said, there)};
-    return {.incomplete = true, .reason = formatted("the last record ends %lu bytes short", said - there)};
+                .reason = formatted("the record's length field says %lu bytes, but the record has %lu", said, there)};
+    return {.incomplete = true, .reason = formatted("the last record is cut off (%lu bytes missing)", said - there)};
 }
 
 CaptureReader::Found RecordReader::behindDamage()

@@ -86,7 +86,7 @@ TEST(KcapSearch, FindsTheNextMessageBehindADamagedLength)
     ASSERT_THAT(got.faults, SizeIs(1));
     EXPECT_EQ(got.faults[0].offset, kcap(kFirst).size());
     EXPECT_EQ(got.faults[0].size, kcap(kSecond).size());
-    EXPECT_EQ(got.faults[0].reason, "a message of 2147483647 bytes, allowed are 16777216");
+    EXPECT_EQ(got.faults[0].reason, "a message of 2147483647 bytes, longer than the limit of 16777216");
 }
 
 TEST(KcapSearch, DoesNotTrustALengthBehindWhichNothingBegins)
@@ -102,7 +102,7 @@ TEST(KcapSearch, TellsOfALastMessageThatIsCutShort)
     const auto got = scanKcap(whole.substr(0, whole.size() - 3));
     EXPECT_THAT(got.messages, ElementsAre(kFirst));
     ASSERT_THAT(got.faults, SizeIs(1));
-    EXPECT_EQ(got.faults[0].reason, "the last message ends 3 bytes short");
+    EXPECT_EQ(got.faults[0].reason, "the last message is cut off (3 bytes missing)");
     EXPECT_EQ(got.faults[0].size, kcap(kSecond).size() - 3);
 }
 
@@ -180,7 +180,7 @@ TEST(DlfSearch, TellsOfALastRecordThatIsCutShort)
     const auto got = scanDlf(whole.substr(0, whole.size() - 2));
     EXPECT_THAT(got.messages, ElementsAre(kFirst));
     ASSERT_THAT(got.faults, SizeIs(1));
-    EXPECT_EQ(got.faults[0].reason, "the last record ends 2 bytes short");
+    EXPECT_EQ(got.faults[0].reason, "the last record is cut off (2 bytes missing)");
     EXPECT_EQ(got.faults[0].offset, kFirst.size() - 1);
 }
 

@@ -52,7 +52,7 @@ TEST(Kcap, TellsWhereATruncatedMessageBegins)
 {
     const auto read = readAll("\x03\0\0\0abc\x09\0\0\0shor"s, CaptureFormat::Kcap);
     EXPECT_THAT(read.messages, ElementsAre("abc"));
-    EXPECT_EQ(read.fault, "the last message ends 5 bytes short");
+    EXPECT_EQ(read.fault, "the last message is cut off (5 bytes missing)");
     EXPECT_EQ(read.offset, 7u);
 }
 
@@ -66,7 +66,7 @@ TEST(Kcap, TellsOfATruncatedLength)
 TEST(Kcap, RefusesALengthBeyondReason)
 {
     const auto read = readAll("\xFF\xFF\xFF\xFF...."s, CaptureFormat::Kcap);
-    EXPECT_EQ(read.fault, "a message of 4294967295 bytes, allowed are 16777216");
+    EXPECT_EQ(read.fault, "a message of 4294967295 bytes, longer than the limit of 16777216");
 }
 
 TEST(Kcap, PassesOverNotesOfMissingMessages)
@@ -84,7 +84,7 @@ TEST(Kcap, PassesOverNotesOfMissingMessages)
 TEST(Kcap, TellsOfANoteThatIsCutOff)
 {
     const auto read = readAll(note(7).substr(0, 11), CaptureFormat::Kcap);
-    EXPECT_EQ(read.fault, "the last message ends 1 bytes short");
+    EXPECT_EQ(read.fault, "the last message is cut off (1 bytes missing)");
     EXPECT_EQ(read.offset, 0u);
     EXPECT_EQ(read.missing, 0u);
 }
@@ -112,7 +112,7 @@ TEST(Dlf, RefusesALengthBelowItsHeader)
                               "abcdefgh\x0B\0..........."s,
                               CaptureFormat::Dlf);
     EXPECT_EQ(read.messages.size(), 1u);
-    EXPECT_EQ(read.fault, "a record of 11 bytes, less than its header's 12");
+    EXPECT_EQ(read.fault, "a record of 11 bytes, shorter than its header of 12");
     EXPECT_EQ(read.offset, 12u);
 }
 
@@ -122,7 +122,7 @@ TEST(Dlf, TellsWhereATruncatedRecordBegins)
                       "abcdefgh"s,
                       CaptureFormat::Dlf)
                   .fault,
-              "the last message ends 20 bytes short");
+              "the last message is cut off (20 bytes missing)");
     EXPECT_EQ(readAll("\x20"s, CaptureFormat::Dlf).fault, "the length has only 1 of its 2 bytes");
 }
 

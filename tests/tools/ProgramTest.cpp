@@ -113,9 +113,10 @@ TEST_F(ProgramTest, BadInputIsNamedWithFileAndOffsetAndTheRestIsShown)
     const auto file = capture(kcap(antennas(1)) + "\xFF\xFF\xFF\xFF" + kcap(antennas(2)));
     const auto ran = run({file});
     EXPECT_EQ(ran.status, 1);
-    EXPECT_EQ(ran.remarks,
-              "kestrum-decode: " + file +
-                  ": at offset 26: a message of 4294967295 bytes, allowed are 16777216; 4 bytes skipped\n");
+    EXPECT_EQ(
+        ran.remarks,
+        "kestrum-decode: " + file +
+            ": at offset 26: a message of 4294967295 bytes, longer than the limit of 16777216; 4 bytes skipped\n");
     EXPECT_THAT(ran.output, HasSubstr("Num Tx Antennas: 2\n"));
 }
 

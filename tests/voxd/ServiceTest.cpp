@@ -754,7 +754,7 @@ TEST_F(ServiceTest, LogsWhereADamagedCaptureEnds)
     client.open();
     client.startStreaming();
     ASSERT_TRUE(client.hasReceived(1));
-    EXPECT_TRUE(voxd.logs(path + ": at offset 21: the last message ends 59 bytes short"));
+    EXPECT_TRUE(voxd.logs(path + ": at offset 21: the last message is cut off (59 bytes missing)"));
 }
 
 } // namespace

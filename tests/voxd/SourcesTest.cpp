@@ -141,7 +141,8 @@ TEST_F(ReplaySourceTest, EndsAtDamageAndReportsItsPlace)
     ReplaySource source(path, true);
     EXPECT_TRUE(source.next());
     EXPECT_FALSE(source.next()) << "no loop over damage";
-    EXPECT_EQ(source.fault(), path + ": at offset 17: a message of 4294967295 bytes, allowed are 16777216");
+    EXPECT_EQ(source.fault(),
+              path + ": at offset 17: a message of 4294967295 bytes, longer than the limit of 16777216");
 }
 
 TEST_F(ReplaySourceTest, RefusesWhatCannotBeReplayed)
@@ -152,7 +153,8 @@ TEST_F(ReplaySourceTest, RefusesWhatCannotBeReplayed)
     EXPECT_THAT(whatIsWrong(file("", "a.txt")), HasSubstr("neither .kcap nor .dlf"));
     EXPECT_THAT(whatIsWrong(file("")), HasSubstr("holds no message"));
     EXPECT_THAT(whatIsWrong(file(kcap({"noise"}))), HasSubstr("no message tells its technology"));
-    EXPECT_THAT(whatIsWrong(file("\x10\0\0\0short"s)), HasSubstr("at offset 0: the last message ends 11 bytes short"));
+    EXPECT_THAT(whatIsWrong(file("\x10\0\0\0short"s)),
+                HasSubstr("at offset 0: the last message is cut off (11 bytes missing)"));
 }
 
 PropertyListCodec kLists;
