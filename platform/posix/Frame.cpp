@@ -50,13 +50,13 @@ std::optional<Frame> FrameReader::next()
         return std::nullopt;
     // Checked before the payload arrives: the reader does not wait for the rest of a malformed frame.
     if (length < kFrameHeader - kLengthSize || length > kFrameHeader - kLengthSize + kMaximumPayload) {
-        _fault = formatted("a frame of %lu bytes, allowed are %lu to %lu", length, kFrameHeader - kLengthSize,
+        _fault = formatted("a frame of %lu bytes, outside the limits of %lu to %lu", length, kFrameHeader - kLengthSize,
                            kFrameHeader - kLengthSize + kMaximumPayload);
         return std::nullopt;
     }
     const auto kind = rest.read(kKind);
     if (kind && (*kind < 1 || *kind > 3)) {
-        _fault = formatted("a frame of the unknown kind %u", *kind);
+        _fault = formatted("a frame of unknown kind %u", *kind);
         return std::nullopt;
     }
     const auto frame = rest.slice(0, kLengthSize + length);

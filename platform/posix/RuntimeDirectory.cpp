@@ -44,8 +44,8 @@ std::optional<Problem> secureRuntimeDirectory(const std::string& named)
     if (!directory.starts_with('/'))
         return Problem{formatted("the runtime directory %s is not an absolute path", named)};
     if (directory.size() > longestDirectory())
-        return Problem{formatted("the runtime directory %s is too long: %lu bytes, sockets in it leave room for %lu",
-                                 directory, directory.size(), longestDirectory())};
+        return Problem{formatted("the runtime directory %s is too long: %lu bytes, the limit is %lu", directory,
+                                 directory.size(), longestDirectory())};
     std::error_code ignored; // mkdir below reports a parent that could not be created
     std::filesystem::create_directories(std::filesystem::path(directory).parent_path(), ignored);
     const bool made = ::mkdir(directory.c_str(), 0700) == 0;
@@ -54,9 +54,9 @@ std::optional<Problem> secureRuntimeDirectory(const std::string& named)
     struct stat found {};
     // lstat: another user may have placed a symbolic link in a shared directory such as /tmp.
     if (::lstat(directory.c_str(), &found) != 0)
-        return Problem{formatted("cannot look at %s: %s", directory, std::strerror(errno))};
+        return Problem{formatted("cannot read the status of %s: %s", directory, std::strerror(errno))};
     if (!S_ISDIR(found.st_mode))
-        return Problem{formatted("%s is no directory", directory)};
+        return Problem{formatted("%s is not a directory", directory)};
     if (found.st_uid != ::geteuid())
         return Problem{formatted("%s belongs to another user", directory)};
     if (made && ::chmod(directory.c_str(), 0700) == 0) // the umask may have removed bits

@@ -28,7 +28,7 @@ void note(int signal)
 SignalPipe::SignalPipe(std::vector<int> signals) : _signals(std::move(signals)), _before(_signals.size())
 {
     if (::pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0)
-        throw std::system_error(errno, std::generic_category(), "no pipe for signals");
+        throw std::system_error(errno, std::generic_category(), "cannot create a pipe for signals");
     struct sigaction action {};
     action.sa_handler = note;
     action.sa_flags = SA_RESTART;

@@ -239,7 +239,7 @@ std::optional<Problem> FrameListener::listen(const std::string& path)
     const auto directory = std::filesystem::path(path).parent_path().string();
     const DirectoryLock lock(directory, kLockTimeout);
     if (!lock.isHeld())
-        return Problem{formatted("another process keeps %s locked", directory)};
+        return Problem{formatted("another process holds the lock of %s", directory)};
     if (isStaleSocket(path))
         ::unlink(path.c_str());
     QObject::connect(&_server, &QLocalServer::newConnection, &_server, [this] { accept(); });

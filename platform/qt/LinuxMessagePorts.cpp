@@ -276,7 +276,7 @@ std::unique_ptr<LocalPort> LinuxMessagePorts::createLocal(std::string_view name,
         return nullptr;
     };
     if (!isPortName(name))
-        return failed({"not a name for a port"});
+        return failed({"not a valid port name"});
     if (auto problem = secureRuntimeDirectory(_directory))
         return failed(*std::move(problem));
     removeStaleSockets(_directory, std::string(name) + ".");

@@ -99,7 +99,7 @@ std::string inWords(const LogChannelAnswer& answer)
     case vox::kNoReceiver:
         return "The telephony service cannot reach this display.";
     default:
-        return formatted("The telephony service refuses, error %d.", answer.errorCode);
+        return formatted("The telephony service refuses the request: error %d.", answer.errorCode);
     }
 }
 

@@ -76,15 +76,16 @@ TEST_P(MalformedFrame, IsAFaultAtOnceAndForGood)
 
 INSTANTIATE_TEST_SUITE_P(
     FrameReader, MalformedFrame,
-    testing::Values(
-        Malformed{"LengthBelowTheHeader", std::string("\x08\0\0\0", 4),
-                  "a frame of 8 bytes, allowed are 9 to 16777225"},
-        Malformed{"LengthZero", std::string("\0\0\0\0", 4), "a frame of 0 bytes, allowed are 9 to 16777225"},
-        Malformed{"OneByteTooLong", std::string("\x0A\0\0\x01", 4),
-                  "a frame of 16777226 bytes, allowed are 9 to 16777225"},
-        Malformed{"LargestLength", "\xFF\xFF\xFF\xFF", "a frame of 4294967295 bytes, allowed are 9 to 16777225"},
-        Malformed{"KindZero", std::string("\x09\0\0\0\0", 5), "a frame of the unknown kind 0"},
-        Malformed{"KindFour", std::string("\x09\0\0\0\x04", 5), "a frame of the unknown kind 4"}),
+    testing::Values(Malformed{"LengthBelowTheHeader", std::string("\x08\0\0\0", 4),
+                              "a frame of 8 bytes, outside the limits of 9 to 16777225"},
+                    Malformed{"LengthZero", std::string("\0\0\0\0", 4),
+                              "a frame of 0 bytes, outside the limits of 9 to 16777225"},
+                    Malformed{"OneByteTooLong", std::string("\x0A\0\0\x01", 4),
+                              "a frame of 16777226 bytes, outside the limits of 9 to 16777225"},
+                    Malformed{"LargestLength", "\xFF\xFF\xFF\xFF",
+                              "a frame of 4294967295 bytes, outside the limits of 9 to 16777225"},
+                    Malformed{"KindZero", std::string("\x09\0\0\0\0", 5), "a frame of unknown kind 0"},
+                    Malformed{"KindFour", std::string("\x09\0\0\0\x04", 5), "a frame of unknown kind 4"}),
     [](const auto& each) { return std::string(each.param.name); });
 
 TEST(FrameReader, TakesThePayloadOfTheLargestSize)

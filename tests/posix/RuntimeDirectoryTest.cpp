@@ -44,7 +44,7 @@ TEST(RuntimeDirectory, ReportsWhyItCannotBeCreated)
     const ScratchDirectory scratch;
     writeFile(scratch / "file", "");
     EXPECT_THAT(problemOf(scratch / "file/inside"), HasSubstr("cannot create"));
-    EXPECT_THAT(problemOf(scratch / "file"), HasSubstr("is no directory"));
+    EXPECT_THAT(problemOf(scratch / "file"), HasSubstr("is not a directory"));
 }
 
 TEST(RuntimeDirectory, MayNotBeRelative)
@@ -61,7 +61,7 @@ TEST(RuntimeDirectory, LeavesRoomForTheLongestSocketOfADisplay)
     };
     // "/org.kestrum.vox.baseband-state-report.log.4194304" and the terminating zero, of 108 bytes.
     EXPECT_EQ(problemOf(ofLength(57)), "");
-    EXPECT_THAT(problemOf(ofLength(58)), HasSubstr("too long: 58 bytes, sockets in it leave room for 57"));
+    EXPECT_THAT(problemOf(ofLength(58)), HasSubstr("too long: 58 bytes, the limit is 57"));
     EXPECT_FALSE(std::filesystem::exists(ofLength(58)));
 }
 

@@ -92,7 +92,7 @@ TEST_F(LocalPortTest, IsNotMadeBehindALink)
         log.lines.clear();
         LinuxMessagePorts linked(directory / name, queue, log);
         EXPECT_FALSE(linked.createLocal("log", [](auto, auto) {})) << name;
-        EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("is no directory")));
+        EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("is not a directory")));
     }
 }
 
@@ -114,7 +114,7 @@ TEST_F(LocalPortTest, GivesUpOnALockThatAnotherProcessKeeps)
     const int kept = ::open(directory.path().c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
     ASSERT_EQ(::flock(kept, LOCK_EX), 0);
     EXPECT_FALSE(makeLocal()); // would block here
-    EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("keeps " + directory.path() + " locked")));
+    EXPECT_THAT(log.errors(), ElementsAre(HasSubstr("another process holds the lock of " + directory.path())));
     ::close(kept);
     EXPECT_TRUE(makeLocal());
 }

@@ -306,7 +306,7 @@ TEST_F(TelephonyServiceTest, SaysWhyThereIsNoChannel)
     };
     EXPECT_EQ(refusedWith(2), "The telephony service has no channel left for this display.");
     EXPECT_EQ(refusedWith(3), "The telephony service cannot reach this display.");
-    EXPECT_EQ(refusedWith(77), "The telephony service refuses, error 77.");
+    EXPECT_EQ(refusedWith(77), "The telephony service refuses the request: error 77.");
     EXPECT_EQ(refusedWith(0), "");
     listening.close();
     telephony.connect({});
