@@ -78,7 +78,7 @@ private:
         if (table < kBinaryMagic.size() || table > trailer || objects > (trailer - table) / _offsetWidth)
             throw Refusal{"the offset table does not lie inside the file"};
         if (root >= objects)
-            throw Refusal{"the root is no object of the file"};
+            throw Refusal{"the root is not an object of the file"};
         _table = static_cast<std::size_t>(table);
         _inside.resize(static_cast<std::size_t>(objects));
         return static_cast<std::size_t>(root);
@@ -110,7 +110,7 @@ private:
         _at = open.references + index * _referenceWidth;
         const std::uint64_t object = number(_at, _referenceWidth);
         if (object >= _inside.size())
-            throw Refusal{"a reference to no object of the file"};
+            throw Refusal{"a reference to an object that is not in the file"};
         return static_cast<std::size_t>(object);
     }
 
@@ -119,7 +119,7 @@ private:
         moveTo(object);
         const unsigned marker = takeMarker();
         if (marker >> 4 != 0x5 && marker >> 4 != 0x6)
-            throw Refusal{"a key that is no string"};
+            throw Refusal{"a key that is not a string"};
         return text(marker);
     }
 
@@ -229,7 +229,7 @@ private:
             return marker & 0xF;
         const unsigned size = takeMarker();
         if (size >> 4 != 0x1 || (size & 0xF) > 3)
-            throw Refusal{"a count that is no integer"};
+            throw Refusal{"a count that is not an integer"};
         return static_cast<std::size_t>(takeNumber(std::size_t{1} << (size & 0xF)));
     }
 
@@ -263,7 +263,7 @@ private:
     void checkRoom(std::size_t count, std::size_t width) const
     {
         if (count > (_table - _at) / width)
-            throw Refusal{"an object runs over its end"};
+            throw Refusal{"an object that extends into the offset table"};
     }
 
     /// The caller has checked that the bytes lie inside the file.

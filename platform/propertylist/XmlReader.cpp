@@ -210,7 +210,7 @@ private:
     {
         const Element element = elementNamed(name);
         if (element == Element::Plist ? !_open.empty() : !mayHold(element))
-            throw Refusal{formatted("<%s> is out of place", name)};
+            throw Refusal{formatted("<%s> is not allowed here", name)};
         if (element != Element::Plist && element != Element::Key)
             _budget.takeNode();
         if (element == Element::Dict || element == Element::Array)
@@ -242,7 +242,7 @@ private:
         if (_leaf)
             _text += text;
         else if (!std::ranges::all_of(text, isBlank))
-            throw Refusal{"text out of place"};
+            throw Refusal{"text is not allowed here"};
     }
 
     void end()
@@ -312,7 +312,7 @@ private:
             throw Refusal{"a DOCTYPE with declarations"};
     }
 
-    void refuseEntity() { throw Refusal{"entities other than the standard ones are not read"}; }
+    void refuseEntity() { throw Refusal{"entities other than the standard ones are not supported"}; }
 
     Bytes _bytes;
     Parser _parser;

@@ -123,11 +123,12 @@ BinaryList laughs(unsigned levels, unsigned width)
     return list;
 }
 
-constexpr auto kOverEnd = "an object runs over its end", kTable = "the offset table does not lie inside the file",
-               kInteger = "not an integer of 64 bits", kWidth = "a width that is not 1 to 8 bytes",
-               kItself = "a container inside itself", kDate = "a date outside the years 0 to 9999",
-               kSurrogate = "half of a surrogate pair", kCount = "a count that is no integer",
-               kReference = "a reference to no object of the file";
+constexpr auto kOverEnd = "an object that extends into the offset table",
+               kTable = "the offset table does not lie inside the file", kInteger = "not an integer of 64 bits",
+               kWidth = "a width that is not 1 to 8 bytes", kItself = "a container inside itself",
+               kDate = "a date outside the years 0 to 9999", kSurrogate = "half of a surrogate pair",
+               kCount = "a count that is not an integer",
+               kReference = "a reference to an object that is not in the file";
 
 const BinaryList kTrue{{hex("09")}};
 
@@ -145,8 +146,8 @@ INSTANTIATE_TEST_SUITE_P(
         NamedCase<const char*>{"OtherVersion", "bplist15" + kTrue.bytes().substr(8), "syntax error"},
         NamedCase<const char*>{"CutOff", kTrue.bytes().substr(0, 41), kWidth},
         NamedCase<const char*>{"TrailerOfZeros", "bplist00" + std::string(32, '\0'), kWidth},
-        refused("NoObjects", BinaryList{}, "the root is no object of the file"),
-        refused("RootBeyondTheObjects", BinaryList{{hex("09")}, 1}, "the root is no object of the file"),
+        refused("NoObjects", BinaryList{}, "the root is not an object of the file"),
+        refused("RootBeyondTheObjects", BinaryList{{hex("09")}, 1}, "the root is not an object of the file"),
         refused("MoreObjectsThanOffsets", changed([](auto& list) { list.moreObjects = 1; }), kTable),
         refused("ObjectsWithoutNumber", changed([](auto& list) { list.moreObjects = -2; }), kTable),
         refused("TableBehindTheFile", changed([](auto& list) { list.moreTableOffset = 1000; }), kTable),
@@ -187,8 +188,8 @@ INSTANTIATE_TEST_SUITE_P(
         refused("DictionaryOfAllMemory", BinaryList{{hex("df138000000000000000")}}, kOverEnd),
         refused("DictionaryWithoutValues", BinaryList{{hex("d101")}}, kOverEnd),
         refused("ReferenceBeyondTheObjects", BinaryList{{hex("a101")}}, kReference),
-        refused("KeyThatIsANumber", BinaryList{{hex("d10102"), hex("1001"), hex("09")}}, "a key that is no string"),
-        refused("KeyThatIsTheDictionary", BinaryList{{hex("d10001"), hex("09")}}, "a key that is no string"),
+        refused("KeyThatIsANumber", BinaryList{{hex("d10102"), hex("1001"), hex("09")}}, "a key that is not a string"),
+        refused("KeyThatIsTheDictionary", BinaryList{{hex("d10001"), hex("09")}}, "a key that is not a string"),
         refused("ArrayInsideItself", BinaryList{{hex("a100")}}, kItself),
         refused("ArrayInsideItselfManyTimes", BinaryList{{hex("af10ff") + std::string(255, '\0')}}, kItself),
         refused("ArraysInsideEachOther", BinaryList{{hex("a101"), hex("a100")}}, kItself),
