@@ -37,7 +37,8 @@ ReplaySource::ReplaySource(const std::string& path, bool loop)
     if (_technology.empty() && !_fault.empty())
         throw std::runtime_error(_fault);
     if (_technology.empty())
-        throw std::runtime_error(path + (empty ? ": holds no message" : ": no message tells its technology"));
+        throw std::runtime_error(path +
+                                 (empty ? ": contains no message" : ": its messages do not show the technology"));
     rewind();
 }
 

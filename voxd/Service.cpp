@@ -68,7 +68,7 @@ std::optional<Problem> Service::start()
 void Service::acceptConnection(std::unique_ptr<FrameConnection> connection)
 {
     if (_clients.size() == kMaximumConnections) {
-        _log.write(Priority::Error, "refused a server connection: %lu stand already", _clients.size());
+        _log.write(Priority::Error, "refused a server connection: there are already %lu", _clients.size());
         return;
     }
     const auto client = _clients.insert(_clients.end(), Client{std::move(connection), nullptr});

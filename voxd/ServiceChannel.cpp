@@ -27,7 +27,7 @@ ServiceChannel::ServiceChannel(const Host& host, std::unique_ptr<FrameConnection
     _listener.accepted = [this](auto connection) { accept(std::move(connection)); };
     _commandTimeout.setSingleShot(true);
     QObject::connect(&_commandTimeout, &QTimer::timeout, &_commandTimeout, [this] {
-        _host.log.write(Priority::Warning, "Channel %s: nobody came to its command port", _name);
+        _host.log.write(Priority::Warning, "Channel %s: no client connected to its command port", _name);
         end();
     });
 }
@@ -80,7 +80,7 @@ void ServiceChannel::obey(const Frame& frame)
         return;
     const auto command = _host.lists.parse(frame.payload).dictionary();
     if (!command) {
-        _host.log.write(Priority::Error, "Channel %s: a command that is no dictionary (%lu bytes)", _name,
+        _host.log.write(Priority::Error, "Channel %s: a command that is not a dictionary (%lu bytes)", _name,
                         frame.payload.size());
         return;
     }
@@ -105,7 +105,8 @@ void ServiceChannel::stream(const Data& message)
     const std::size_t before = _outbox.dropped();
     _outbox.add(message);
     if (_outbox.dropped() > before && !std::exchange(_dropping, true))
-        _host.log.write(Priority::Warning, "Channel %s: its client does not read, the oldest messages go", _name);
+        _host.log.write(Priority::Warning, "Channel %s: its client does not read, the oldest messages are dropped",
+                        _name);
     flush();
 }
 

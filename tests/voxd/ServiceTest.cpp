@@ -461,9 +461,9 @@ TEST_F(ServiceTest, CommandsThatAreNoDictionaryAreLoggedAndTheNextOneIsServed)
     for (const auto& each : {"noise"s, "<plist version=\"1.0\"><string>text</string></plist>"s, ""s, deep})
         client.remote->sendRequest(0, bytesOf(each), 1s, 0ms, RemotePort::Reply::None);
     EXPECT_EQ(client.technology(), "kVoxLogChannelTechnology_IFX");
-    EXPECT_TRUE(voxd.logs("a command that is no dictionary (5 bytes)"));
-    EXPECT_TRUE(voxd.logs("a command that is no dictionary (0 bytes)"));
-    EXPECT_TRUE(voxd.logs("a command that is no dictionary (" + std::to_string(deep.size()) + " bytes)"));
+    EXPECT_TRUE(voxd.logs("a command that is not a dictionary (5 bytes)"));
+    EXPECT_TRUE(voxd.logs("a command that is not a dictionary (0 bytes)"));
+    EXPECT_TRUE(voxd.logs("a command that is not a dictionary (" + std::to_string(deep.size()) + " bytes)"));
 }
 
 TEST_F(ServiceTest, IgnoresOtherMessageIds)
@@ -590,7 +590,7 @@ TEST_F(ServiceTest, BoundsItsConnectionsAndItsChannels)
     std::vector<RawSocket> many;
     for (int i = 0; i < 70; ++i)
         many.push_back(RawSocket::connectTo(directory / "org.kestrum.vox"));
-    EXPECT_TRUE(voxd.logs("refused a server connection: 64 stand already"));
+    EXPECT_TRUE(voxd.logs("refused a server connection: there are already 64"));
 }
 
 TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndDelaysNoOther)
@@ -604,7 +604,7 @@ TEST_F(ServiceTest, AClientThatReadsNothingCostsBoundedMemoryAndDelaysNoOther)
     const auto command = openChannel("deaf.1", 1);
     const auto start = lists.toXml(makeDictionary({{"SetState", Value("Streaming")}}));
     command.send(frame(kMessage, 0, 0, textOf(start->bytes())));
-    ASSERT_TRUE(voxd.logs("its client does not read, the oldest messages go"));
+    ASSERT_TRUE(voxd.logs("its client does not read, the oldest messages are dropped"));
 
     Client client{*this, "log"};
     client.open();
@@ -654,7 +654,7 @@ TEST_F(ServiceTest, ItsRecordingHoldsAllAndNotesWhatAClientMissed)
         command.send(frame(kMessage, 0, 0, textOf(list->bytes())));
     };
     order("Streaming");
-    ASSERT_TRUE(voxd.logs("its client does not read, the oldest messages go"));
+    ASSERT_TRUE(voxd.logs("its client does not read, the oldest messages are dropped"));
     order("Idle");
     const auto deaf = receiving.accept();
     ASSERT_TRUE(eventually([&] {

@@ -151,8 +151,8 @@ TEST_F(ReplaySourceTest, RefusesWhatCannotBeReplayed)
     std::filesystem::create_directory(directory / "folder.kcap");
     EXPECT_THAT(whatIsWrong(directory / "folder.kcap"), HasSubstr("cannot be read"));
     EXPECT_THAT(whatIsWrong(file("", "a.txt")), HasSubstr("neither .kcap nor .dlf"));
-    EXPECT_THAT(whatIsWrong(file("")), HasSubstr("holds no message"));
-    EXPECT_THAT(whatIsWrong(file(kcap({"noise"}))), HasSubstr("no message tells its technology"));
+    EXPECT_THAT(whatIsWrong(file("")), HasSubstr("contains no message"));
+    EXPECT_THAT(whatIsWrong(file(kcap({"noise"}))), HasSubstr("its messages do not show the technology"));
     EXPECT_THAT(whatIsWrong(file("\x10\0\0\0short"s)),
                 HasSubstr("at offset 0: the last message is cut off (11 bytes missing)"));
 }
