@@ -182,15 +182,15 @@ const std::vector<Faults::Fault>& Faults::all()
          [](Connection& to, const Frame& frame) { sendLate(to, frame, milliseconds(900)); }},
         {"reply-1100ms", "both replies 1.1 s late", 1, 1, 0,
          [](Connection& to, const Frame& frame) { sendLate(to, frame, milliseconds(1100)); }},
-        {"reply-never", "neither reply comes", 1, 1, 0, [](Connection&, const Frame&) {}},
-        {"wrong-ids", "both replies and a message with ids that are not theirs", 1, 1, 1,
+        {"reply-never", "both replies are not sent", 1, 1, 0, [](Connection&, const Frame&) {}},
+        {"wrong-ids", "both replies and a message with wrong ids", 1, 1, 1,
          [](Connection& to, const Frame& frame) { sendWithWrongIds(to, frame); }},
-        {"half-frame", "half a message, and the connection's end", 0, 0, 1,
+        {"half-frame", "half a message, then the end of the connection", 0, 0, 1,
          [](Connection& to, const Frame& frame) { sendHalf(to, frame, endConnection); }},
         {"byte-by-byte", "both replies and a message in single bytes", 1, 1, 1, sendByteByByte},
-        {"garbage", "4,096 random bytes for a message", 0, 0, 1, sendGarbage},
+        {"garbage", "4,096 random bytes instead of a message", 0, 0, 1, sendGarbage},
         {"oversized", "a message with a length of 2 GiB", 0, 0, 1, sendOversized},
-        {"flood", "3 s of invalid records, as fast as they are taken", 0, 0, 1, sendBehindRecords},
+        {"flood", "3 s of invalid records, as fast as the display accepts them", 0, 0, 1, sendBehindRecords},
         {"notifications", "3 s of notifications before the first reply", 1, 0, 0, sendBehindNotifications},
         {"technology", "another technology and back, twice, after 20 messages each time", 0, 0, 0, nullptr},
         {"stop", "SIGSTOP in the middle of a message", 0, 0, 1,
@@ -203,9 +203,10 @@ const std::vector<Faults::Fault>& Faults::all()
 
 std::string Faults::help()
 {
-    std::string lines = "A testing aid: misbehave, then serve as ever. Both replies are the first\n"
-                        "about a channel and the first about the technology, a message is the\n"
-                        "20th of the log behind a reply about the technology. Each fault once:";
+    std::string lines = "Simulate faults of a service, to test displays. Each fault occurs once.\n"
+                        "\"Both replies\" are the first reply to a request for a log channel and\n"
+                        "the first reply to GetTechnology; \"a message\" is the 20th log message\n"
+                        "after a reply to GetTechnology. The faults:";
     for (const auto& each : all())
         lines += formatted("\n%s: %s", each.name, each.summary);
     return lines;

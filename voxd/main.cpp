@@ -61,7 +61,7 @@ std::ofstream openForWriting(const std::string& path)
 // Needed because CLI11's ranges accept not-a-number.
 std::string notFinite(const std::string& text)
 {
-    return std::isfinite(std::strtod(text.c_str(), nullptr)) ? std::string() : text + " is no finite number";
+    return std::isfinite(std::strtod(text.c_str(), nullptr)) ? std::string() : text + " is not a finite number";
 }
 
 // Writes the source's first seconds to a file, without pacing and without a service.
@@ -73,7 +73,7 @@ void writeCapture(Source& source, const Options& options)
     for (auto message = source.next(); message && message->at < end; message = source.next())
         writeKcap(sink, message->bytes);
     if (!file.flush())
-        throw std::runtime_error(options.write + ": cannot be written to its end");
+        throw std::runtime_error(options.write + ": cannot be written completely");
 }
 
 int serve(QCoreApplication& application, const Options& options)
@@ -126,23 +126,26 @@ int main(int argc, char** argv)
     commands.set_version_flag("--version", std::string("voxd ") + KESTRUM_VERSION);
     auto* const scenario = commands.add_option("--scenario", options.scenario, scenarioNames());
     auto* const replay = commands.add_option("--replay", options.replay, "A capture, .kcap or .dlf");
-    commands.add_flag("--loop", options.loop, "Begin the capture again at its end")->needs(replay);
-    commands.add_option("--speed", options.speed, "Times real time")
+    commands.add_flag("--loop", options.loop, "Start the capture again when it ends")->needs(replay);
+    commands.add_option("--speed", options.speed, "Speed relative to real time")
         ->check(notFinite)
         ->check(CLI::Range(0.001, 1e6))
         ->capture_default_str();
-    commands.add_option("--seed", options.seed, "Equal seeds give equal scenarios")
+    commands.add_option("--seed", options.seed, "Seed of the scenario; equal seeds give equal scenarios")
         ->needs(scenario)
         ->capture_default_str();
     commands
         .add_option("--start", options.start,
-                    "Moment at which the scenario begins, 2026-11-16T06:05:42Z (default: now)")
+                    "Time at which the scenario begins, such as 2026-11-16T06:05:42Z (default: now)")
         ->needs(scenario)
-        ->check([](const std::string& text) { return dateFromIso(text) ? "" : text + " is no date of that form"; });
-    auto* const record = commands.add_option("--record", options.record, "Write what is streamed to FILE.kcap");
+        ->check([](const std::string& text) {
+            return dateFromIso(text) ? "" : text + " is not a date such as 2026-11-16T06:05:42Z";
+        });
+    auto* const record =
+        commands.add_option("--record", options.record, "Write all streamed messages to a capture (.kcap)");
     auto* const write =
-        commands.add_option("--write", options.write, "Write a capture at once, without serving, and end");
-    commands.add_option("--seconds", options.seconds, "How much of the source --write writes")
+        commands.add_option("--write", options.write, "Write a capture without waiting and without serving, then end");
+    commands.add_option("--seconds", options.seconds, "Length in seconds of the capture that --write writes")
         ->needs(write)
         ->check(notFinite)
         ->check(CLI::Range(0.001, 1e9))

@@ -24,7 +24,7 @@ constexpr Scenario kScenarios[] = {
     {"gsm", kVoxLogChannelTechnology_Zephra_GSM, "GSM and UMTS: reselection, calls, data", drive<makeGsmModem>},
     {"cdma", kVoxLogChannelTechnology_Zephra_CDMA, "CDMA2000: calls over 1x, data over EV-DO", drive<makeCdmaModem>},
     {"utran", kVoxLogChannelTechnology_Zephra_UTRAN2, "UTRA TDD: reselection, data", drive<makeUtranModem>},
-    {"drive", kVoxLogChannelTechnology_Zephra_LTE, "half a minute of LTE, of GSM/UMTS, and so on",
+    {"drive", kVoxLogChannelTechnology_Zephra_LTE, "half a minute of LTE, half a minute of GSM/UMTS, and so on",
      drive<makeLteModem, makeGsmModem>},
     {"ifx", kVoxLogChannelTechnology_IFX, "trees of an IFX modem: GSM cells, calls, packet data", makeIfxScenario},
 };
