@@ -115,14 +115,14 @@ void Decoding::take(Bytes message)
     _earlyBytes += message.size();
     if (_earlyBytes > kMostEarlyBytes)
         throw std::runtime_error(formatted(
-            "the first %lu messages do not tell their technology: name it with --technology", _early.size() + 1));
+            "the first %lu messages do not show the technology: set it with --technology", _early.size() + 1));
     _early.emplace_back(message.begin(), message.end());
 }
 
 void Decoding::finish()
 {
     if (!_early.empty())
-        throw std::runtime_error("no message tells the technology: name it with --technology");
+        throw std::runtime_error("the messages do not show the technology: set it with --technology");
     if (_generator)
         endInterval();
 }

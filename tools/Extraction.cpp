@@ -37,7 +37,7 @@ Extraction::Extraction(const std::string& directory, const Snapshot& snapshot, W
         if ((ending == kKcap || snapshot.dlf()) && isThere(_stem + ending))
             there += (there.empty() ? "" : ", ") + _stem + ending;
     if (existing == WholeFile::Existing::Kept && !there.empty())
-        throw std::runtime_error("nothing is extracted, for there is already " + there + " (--force replaces it)");
+        throw std::runtime_error("nothing is extracted, existing files would be replaced (see --force): " + there);
     _kcap = &create(kKcap);
     if (!snapshot.dlf())
         return;
@@ -62,7 +62,7 @@ void Extraction::finish()
 {
     for (const auto& [path, file] : _files)
         if (!file->finish(_existing))
-            throw std::runtime_error("not extracted, for there is already " + path);
+            throw std::runtime_error("not extracted, this file exists: " + path);
 }
 
 } // namespace kestrum::tools

@@ -81,7 +81,7 @@ public:
         } catch (const ClosedPipe&) {
             return 0; // The reader wants no more.
         } catch (const WrongUsage&) {
-            complain(_file + ": a snapshot does not grow, and cannot be followed");
+            complain(_file + ": cannot be followed, because a snapshot does not grow");
             return kUsageError;
         }
         return _isBad ? kBadInput : 0;
@@ -114,7 +114,7 @@ private:
         }
         _window = nullptr;
         if (_faults.lines > kMostFaultLines)
-            complain(formatted("%s: %lu more places like these; %lu bytes skipped in them", _file,
+            complain(formatted("%s: %lu more errors, with %lu bytes skipped", _file,
                                _faults.lines - kMostFaultLines, _faults.unreported));
     }
 
@@ -164,7 +164,7 @@ private:
             if (_isRestarted)
                 remark(_file + " was replaced or emptied: it is read from its start");
             if (woken == Input::Woken::Gone)
-                remark(_file + " was deleted: a new one is waited for");
+                remark(_file + " was deleted: waiting for a new file");
             else if (woken != Input::Woken::TimedOut)
                 return woken != Input::Woken::Ended;
         }
@@ -181,7 +181,7 @@ private:
             const auto reason = formatted("at offset %lu: %s", parsed.offset, parsed.reason);
             if (!list)
                 throw std::runtime_error(reason);
-            complain(formatted("%s: %s; what raw records are left are shown", _file, reason));
+            complain(formatted("%s: %s; the remaining raw records are shown", _file, reason));
         }
         const Snapshot snapshot(file, list, [this](const CaptureFault& fault) { report(fault); });
         _output->snapshot(snapshot.listing());
@@ -204,7 +204,7 @@ private:
             return;
         extraction->finish();
         if (extraction->inKcapAlone() != 0 && snapshot.dlf())
-            remark(formatted("%s: %lu messages that are no ordinary records stand in the extracted .kcap alone", _file,
+            remark(formatted("%s: %lu messages that are not ordinary records are only in the extracted .kcap", _file,
                              extraction->inKcapAlone()));
     }
 

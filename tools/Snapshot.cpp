@@ -75,9 +75,9 @@ Snapshot::Snapshot(std::string file, const Value& propertyList, CaptureReader::O
 {
     const auto root = propertyList.dictionary();
     if (!root || (!root->contains("Timestamp") && !root->contains("Data")))
-        throw std::runtime_error("the property list is no snapshot");
+        throw std::runtime_error("the property list is not a snapshot");
     const auto wrong = [this](const std::string& what, const Value& held, std::string_view expected) {
-        _onFault({0, 0, formatted("%s is of type %@ where %s is due", what, nameOf(held.kind()), expected)});
+        _onFault({0, 0, formatted("%s has the type %@, but it must be %s", what, nameOf(held.kind()), expected)});
     };
     _listing = {std::move(file), textAt(*root, "Timestamp"), textAt(*root, "Description"), {}};
     for (const auto key : {"Timestamp", "Description"})
@@ -150,8 +150,9 @@ void Snapshot::recover(PropertyLists& lists, const std::function<void(Bytes)>& t
     }
     if (!_intervals.empty())
         _onFault({0, 0,
-                  formatted("the DLF stream has %lu bytes, of which the other entries account for %lu: it is taken",
-                            _dlf->size(), accounted)});
+                  formatted(
+                      "the DLF stream has %lu bytes, but the other entries account for only %lu: the stream is decoded",
+                      _dlf->size(), accounted)});
     read(_dlf->bytes().subspan(versionReport().size()), versionReport().size(), RecordReader::Origin::Dlf,
          formatted("entry %lu", _dlfEntry), take);
 }

@@ -124,7 +124,7 @@ TEST_F(ProgramTest, MessagesThatTellNoTechnologyNeedItNamed)
 {
     const auto file = capture(kcap(message(1, "no list", kStamp, 0xFF)));
     EXPECT_EQ(run({file}).status, 1);
-    EXPECT_THAT(run({file}).remarks, HasSubstr("no message tells the technology: name it with --technology"));
+    EXPECT_THAT(run({file}).remarks, HasSubstr("the messages do not show the technology: set it with --technology"));
     EXPECT_EQ(run({"--technology", "lte", file}).status, 0);
 }
 
@@ -365,7 +365,7 @@ TEST_F(ProgramTest, AFollowedFileThatIsDeletedMayComeAgain)
     Tool tool({"--follow", "--format", "jsonl", file});
     tool.line();
     std::filesystem::remove(file);
-    EXPECT_EQ(tool.remark(), "kestrum-decode: " + file + " was deleted: a new one is waited for");
+    EXPECT_EQ(tool.remark(), "kestrum-decode: " + file + " was deleted: waiting for a new file");
     std::filesystem::rename(capture(kcap(ifx("b")), "other"), file);
     EXPECT_THAT(tool.line(), HasSubstr("\"b\""));
 }

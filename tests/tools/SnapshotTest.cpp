@@ -218,7 +218,7 @@ TEST_F(SnapshotFile, IsExtracted)
     const auto file = write(live.saved());
     const auto ran = run({"--extract", scratch / "out", "--format", "json", "--stats", file});
     EXPECT_EQ(ran.status, 0);
-    EXPECT_THAT(ran.remarks, HasSubstr("that are no ordinary records stand in the extracted .kcap alone"));
+    EXPECT_THAT(ran.remarks, HasSubstr("that are not ordinary records are only in the extracted .kcap"));
     const auto dlf = live.saved()->at("Data").array()->back().dictionary()->at("DLF");
     EXPECT_EQ(contentsOf(scratch / "out/Saved-written.dlf"), textOf(dlf.data()->bytes()));
 
@@ -241,8 +241,8 @@ TEST_F(SnapshotFile, IsExtractedIntoNewFilesAlone)
     std::filesystem::create_symlink(scratch / "somebody's", scratch / "out/Saved.kcap");
     const auto ran = run({"--extract", scratch / "out", file});
     EXPECT_EQ(ran.status, 1);
-    EXPECT_THAT(ran.remarks,
-                HasSubstr("there is already " + scratch / "out/Saved.kcap" + ", " + scratch / "out/Saved.dlf"));
+    EXPECT_THAT(ran.remarks, HasSubstr("existing files would be replaced (see --force): " + scratch / "out/Saved.kcap" +
+                                       ", " + scratch / "out/Saved.dlf"));
     EXPECT_EQ(contentsOf(scratch / "out/Saved.dlf"), "a recording");
     EXPECT_FALSE(std::filesystem::exists(scratch / "out/Saved-written.dlf"));
 
@@ -281,7 +281,7 @@ TEST_F(SnapshotFile, CutOffGivesTheRecordsBeforeTheCut)
     writeFile(file, text.substr(0, text.rfind("</data>") - 10));
     const auto ran = run({"--format", "json", file});
     EXPECT_EQ(ran.status, 1);
-    EXPECT_THAT(ran.remarks, HasSubstr("; what raw records are left are shown\n"));
+    EXPECT_THAT(ran.remarks, HasSubstr("; the remaining raw records are shown\n"));
     EXPECT_THAT(ran.output, HasSubstr("\"Num Tx Antennas\": \"4\""));
     EXPECT_THAT(ran.output, HasSubstr("\"messages\": 6"));
 }
