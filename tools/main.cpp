@@ -31,19 +31,19 @@ const std::map<std::string, OutputFormat> kFormats = {{"tree", OutputFormat::Tre
 constexpr const char* kFooter = R"(Formats:
   tree   what the panes show after the last message
   json   one object: technology, messages, dropped, display, and (with --log) log
-  jsonl  one object for each message that changed the display: time, code, changes by path; with --numbers, a value
-         that measures something is an object: text, number, unit
-  csv    the same changes as rows: time, code, path, value, number, unit (the last two are empty where a value measures
-         nothing); a value that a spreadsheet would take for a formula (it
-         begins with = + - @, a tab or a return, and is no number) stands behind an apostrophe
+  jsonl  one object for each message that changed the display: time, code, changes by path; with --numbers, a
+         measurement is an object: text, number, unit
+  csv    the same changes as rows: time, code, path, value, number, unit (number and unit are empty if the value is not
+         a measurement). A value that a spreadsheet would read as a formula (it begins with = + - @, a tab or a return,
+         and is not a number) gets an apostrophe before it
 
-Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum); other names are told by their content.
-Several files are read one after the other, as parts of one log. "dropped" counts messages of an invalid type, too short
-for their decoder, or no property list where one is due.
+Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum). Files with other names are recognised by their
+content. Several files are read one after the other, as parts of one log. "dropped" counts messages of an invalid type,
+messages too short for their decoder, and messages that lack the expected property list.
 
 The display goes to standard output, everything else to standard error. Control characters are shown as \xnn on a
-terminal. Files that are extracted replace none, unless --force is given.
-Exit status: 0 all was read, 1 there was bad input (the rest is shown), 2 wrong usage.)";
+terminal. Extracted files replace existing files only with --force.
+Exit status: 0 all input was read, 1 there was bad input (the rest is shown), 2 wrong usage.)";
 
 } // namespace
 
@@ -56,29 +56,31 @@ int main(int argc, char** argv)
     commands.set_version_flag("--version", std::string("kestrum-decode ") + KESTRUM_VERSION);
     commands.add_option("FILE", options.files, "Captures and snapshots; - is standard input")->required();
     std::string technology, format = "tree";
-    commands.add_option("--technology", technology, "ifx, gsm, cdma, lte or utran (default: told from the messages)")
+    commands.add_option("--technology", technology, "ifx, gsm, cdma, lte or utran (default: as the messages show)")
         ->check(CLI::IsMember(&kTechnologies));
     commands.add_option("--format", format, "tree, json, jsonl or csv")
         ->check(CLI::IsMember(&kFormats))
         ->capture_default_str();
-    commands.add_flag("--log", options.log, "The system log too: in the object of json, else on standard error");
+    commands.add_flag("--log", options.log,
+                      "Show the system log too: with json in the object, otherwise on standard error");
     commands.add_flag("--numbers", options.numbers,
-                      "With jsonl: the number and the unit too of each value that measures something");
+                      "With jsonl: write each measurement as an object of text, number and unit");
     commands.add_flag("--stats", options.stats, "Count the messages of each log code, on standard error");
-    commands.add_flag("--follow", options.follow, "Go on as the last file grows, until interrupted");
+    commands.add_flag("--follow", options.follow,
+                      "Wait for more messages at the end of the last file, until interrupted");
     commands.add_option("--extract", options.extract,
                         "Write a snapshot's DLF stream, and the recovered records as .dlf and .kcap, into a directory");
-    commands.add_flag("--force", options.force, "Let what is extracted replace files of the same name");
+    commands.add_flag("--force", options.force, "Allow --extract to replace files of the same name");
     try {
         commands.parse(argc, argv);
         if (!options.extract.empty())
             for (const auto& file : options.files)
                 if (file.ends_with(".kcap") || file.ends_with(".dlf"))
-                    throw CLI::ValidationError("--extract", file + " is no snapshot");
+                    throw CLI::ValidationError("--extract", file + " is not a snapshot");
         if (options.numbers && format != "jsonl")
-            throw CLI::ValidationError("--numbers", "goes with --format jsonl alone");
+            throw CLI::ValidationError("--numbers", "needs --format jsonl");
         if (options.follow && options.files.back().ends_with(".kestrum"))
-            throw CLI::ValidationError("--follow", options.files.back() + " is a snapshot: it does not grow");
+            throw CLI::ValidationError("--follow", options.files.back() + " is a snapshot, which does not grow");
     } catch (const CLI::ParseError& error) {
         return commands.exit(error) == 0 ? 0 : kUsageError;
     }

@@ -263,7 +263,7 @@ TEST_F(ProgramTest, NumbersGoWithJsonlAlone)
 {
     const auto ran = run({"--format", "csv", "--numbers", capture(kcap(servingCell()))});
     EXPECT_EQ(ran.status, 2);
-    EXPECT_THAT(ran.remarks, HasSubstr("--numbers: goes with --format jsonl alone"));
+    EXPECT_THAT(ran.remarks, HasSubstr("--numbers: needs --format jsonl"));
 }
 
 TEST_F(ProgramTest, StandardInputIsReadAsWhatItHolds)
