@@ -51,7 +51,7 @@ int main(int argc, char** argv)
     const auto charset = terminal::chooseLocale();
     const QCoreApplication loop(argc, argv);
 
-    CLI::App arguments("Cellular field test in a terminal. Keys: ? shows them.");
+    CLI::App arguments("Cellular field test in a terminal. The key ? shows all keys.");
     constexpr int kRefreshes = 3;
     int refreshes = 0; // stays 0 when --text has no number
     arguments.set_version_flag("--version", "kestrum-terminal " KESTRUM_VERSION);
@@ -67,7 +67,7 @@ int main(int argc, char** argv)
 
     const auto problem = terminal::TerminalToolkit::problem();
     if (!*text && problem) {
-        std::cerr << "kestrum-terminal: " << problem->text << "; --text prints without one\n";
+        std::cerr << "kestrum-terminal: " << problem->text << "; --text needs no terminal\n";
         return 1;
     }
 

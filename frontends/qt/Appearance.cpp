@@ -44,7 +44,7 @@ Appearance::Appearance(const QDBusConnection& bus) : _bus(bus)
     qRegisterMetaType<QDBusVariant>();
     if (!_bus.connect(kPortal, kPath, kSettings, QStringLiteral("SettingChanged"), this,
                       SLOT(settingChanged(QString, QString, QDBusVariant))))
-        qWarning("kestrum: changes of the desktop's settings are not followed: %s",
+        qWarning("kestrum: cannot follow changes of the desktop's settings: %s",
                  qPrintable(_bus.lastError().message()));
     // A portal that starts later, or restarts, may give another value.
     auto* portal = new QDBusServiceWatcher(kPortal, _bus, QDBusServiceWatcher::WatchForRegistration, this);

@@ -22,10 +22,10 @@ constexpr std::array kHelp = {
     HelpLine{"PgUp PgDn", "a screen up, down"},
     HelpLine{"Right Enter l", "open the row"},
     HelpLine{"Left Esc h", "back"},
-    HelpLine{"< >", "move a row sideways"},
-    HelpLine{"/  n", "jump to a name, again"},
+    HelpLine{"< >", "scroll a row sideways"},
+    HelpLine{"/  n", "jump to a name, next"},
     HelpLine{"s", "save, where offered"},
-    HelpLine{"Ctrl-L", "draw anew"},
+    HelpLine{"Ctrl-L", "redraw"},
     HelpLine{"q", "quit"},
     HelpLine{"mouse", "click, wheel"},
 };

@@ -317,9 +317,9 @@ TEST_F(Terminal, ShowsItsKeysAndHidesThemAtTheNextOne)
 {
     startAndWait();
     terminal.type("?");
-    expectShown("jump to a name, again");
+    expectShown("jump to a name, next");
     terminal.type("q");
-    expectGone("jump to a name, again");
+    expectGone("jump to a name, next");
     expectShown("Serving Cell");
 }
 
@@ -332,7 +332,7 @@ TEST_F(Terminal, FitsFortyColumnsAndTwentyLines)
     expectRow(19, StartsWith(" Updated "));
     expectRow(19, EndsWith("? help"));
     terminal.type("?");
-    expectShown("jump to a name, again │");
+    expectShown("scroll a row sideways │");
 }
 
 TEST_F(Terminal, KeepsSaveInSightOnFortyColumns)
@@ -814,7 +814,7 @@ TEST_F(Terminal, NamesAnUnknownKindOfTerminal)
     start({{"TERM", "no-such-terminal"}});
     ASSERT_TRUE(terminal.waitForEnd());
     EXPECT_EQ(terminal.exitStatus(), 1);
-    EXPECT_TRUE(terminal.shows("kestrum-terminal: the terminal \"no-such-terminal\" is not known here"))
+    EXPECT_TRUE(terminal.shows("kestrum-terminal: the terminal \"no-such-terminal\" is unknown on this system"))
         << terminal.text();
 }
 

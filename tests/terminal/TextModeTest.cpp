@@ -97,7 +97,7 @@ TEST(TextMode, IsNamedWhereThereIsNoTerminal)
     const auto outcome = run(Demonstration(), "");
     EXPECT_EQ(outcome.status, 1);
     EXPECT_EQ(outcome.errors,
-              "kestrum-terminal: standard input and output are no terminal; --text prints without one\n");
+              "kestrum-terminal: standard input and output are not a terminal; --text needs no terminal\n");
 }
 
 TEST(TextMode, RefusesWhatItDoesNotKnowByItsName)
