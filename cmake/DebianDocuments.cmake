@@ -9,7 +9,7 @@ string(TIMESTAMP date "%a, %d %b %Y %H:%M:%S +0000" UTC)
 file(WRITE ${documents}/changelog
 "${CPACK_PACKAGE_NAME} (${CPACK_PACKAGE_VERSION}) unstable; urgency=medium
 
-  * Version ${CPACK_PACKAGE_VERSION}. CHANGELOG.md.gz beside this file tells what is new.
+  * Version ${CPACK_PACKAGE_VERSION}. CHANGELOG.md.gz in this folder lists the changes.
 
  -- ${CPACK_PACKAGE_CONTACT}  ${date}
 ")

@@ -57,9 +57,9 @@ explain_apt() {
     elif grep -qE 'Unable to locate|no installation candidate' "$log" && ! grep -q 'Failed to fetch' "$log"; then
         fail "this system's package source lacks what Kestrum needs; it is set up for Debian 12 and 13"
     elif grep -qE 'Failed to fetch|Unable to locate' "$log"; then
-        fail "the package source cannot be reached: look at the network, then start again"
+        fail "the package source cannot be reached: check the network, then start again"
     fi
-    fail "the packages could not be installed: put right what apt says above, then start again (its output: $log)"
+    fail "the packages could not be installed: correct the errors of apt above, then start again (its output: $log)"
 }
 
 # Installs the given packages that are missing. When none is missing, it needs neither network nor root.
@@ -67,7 +67,7 @@ ensure_packages() {
     [ -z "${KESTRUM_SKIP_INSTALL:-}" ] || return 0
     if ! command -v apt-get >/dev/null; then
         printf '  %s\n' "$@" >&2
-        fail "Kestrum is set up for Debian 12 and 13. Here, please install what the packages above hold, then start" \
+        fail "Kestrum is set up for Debian 12 and 13. Here, please install the software of the packages above, then start" \
              "again with KESTRUM_SKIP_INSTALL=1"
     fi
     local missing as_root=() log
@@ -77,7 +77,7 @@ ensure_packages() {
         as_root=(sudo)
         if ! command -v sudo >/dev/null || ! sudo true; then
             echo "  apt-get install --no-install-recommends ${missing[*]}" >&2
-            fail "packages are missing, and installing them needs root: have root run the line above, then start again"
+            fail "packages are missing, and installing them needs root: run the line above as root, then start again"
         fi
     fi
     echo "Installing ${#missing[@]} packages and what they need: ${missing[*]}" >&2
