@@ -700,7 +700,7 @@ INSTANTIATE_TEST_SUITE_P(
                     BadUse{"TwoSources", {"--scenario", "ifx", "--replay", "a.kcap"}, 2, "excludes"},
                     BadUse{"SpeedZero", {"--scenario", "ifx", "--speed", "0"}, 2, "--speed"},
                     BadUse{"SpeedNoNumber", {"--scenario", "ifx", "--speed", "fast"}, 2, "--speed"},
-                    BadUse{"StartNoDate", {"--scenario", "ifx", "--start", "yesterday"}, 2, "yesterday is no date"},
+                    BadUse{"StartNoDate", {"--scenario", "ifx", "--start", "yesterday"}, 2, "yesterday is not a date"},
                     BadUse{"LoopWithoutReplay", {"--scenario", "ifx", "--loop"}, 2, "--replay"},
                     BadUse{"UnknownFault", {"--scenario", "ifx", "--fault", "flood,moon"}, 2, "there is no fault moon"},
                     BadUse{"NoSuchCapture", {"--replay", "/nowhere/a.kcap"}, 1, "/nowhere/a.kcap: cannot be read"},
