@@ -72,7 +72,7 @@ TEST(LTEServingCellInfo, Of0xB0C2With37BytesChangesNothingNorRemovesTheUarfcn)
 
 class LTEServingCellField : public testing::TestWithParam<FieldCase> {};
 
-TEST_P(LTEServingCellField, IsShownWhateverStandsBesideIt)
+TEST_P(LTEServingCellField, IsShownIndependentlyOfOtherFields)
 {
     for (const bool ones : {false, true}) {
         const auto display =

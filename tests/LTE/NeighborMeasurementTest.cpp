@@ -22,7 +22,7 @@ TEST(NeighborMeasurementMisc, ShowsWhatTheCellsHaveInCommonInOrder)
 
 class NeighborMeasurementField : public testing::TestWithParam<FieldCase> {};
 
-TEST_P(NeighborMeasurementField, IsShownWhateverStandsBesideIt)
+TEST_P(NeighborMeasurementField, IsShownIndependentlyOfOtherFields)
 {
     for (const bool amidOnes : {false, true})
         EXPECT_EQ(decoded<NeighborMeasurementMisc>(GetParam().in(record(0xB180, 21), amidOnes)).at(GetParam().key),
@@ -42,7 +42,7 @@ INSTANTIATE_TEST_SUITE_P(NeighborMeasurementMisc, NeighborMeasurementField, test
 class NeighborCellField : public testing::TestWithParam<FieldCase> {};
 
 // Offsets count from the cell's first byte. The test reads the second cell.
-TEST_P(NeighborCellField, IsShownWhateverStandsBesideIt)
+TEST_P(NeighborCellField, IsShownIndependentlyOfOtherFields)
 {
     auto inSecondCell = GetParam();
     inSecondCell.offset += 21 + 20;
@@ -93,7 +93,7 @@ TEST(NeighborCellsList, ShowsTheKeysInOrder)
               R"("Ant 0 Sample Offset": "6", "Ant 1 Frame Offset": "5", "Ant 1 Sample Offset": "6"}])");
 }
 
-TEST(NeighborCellsList, ShowsAntenna0AsAntenna1WhateverTheBytesBehindSay)
+TEST(NeighborCellsList, ShowsAntenna0AsAntenna1AndIgnoresTheBytesAfterIt)
 {
     const auto display = decodedList<NeighborCellsList>(record(0xB180, 41).u32(33, 0x2345'6789).u32(37, 0xFFFF'FFFF));
     EXPECT_EQ(display.row(0)->at("Ant 1 Frame Offset"), display.row(0)->at("Ant 0 Frame Offset"));

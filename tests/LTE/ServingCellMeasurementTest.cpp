@@ -52,7 +52,7 @@ TEST(ServingCellMeasurement, ReportsAForeignCode)
 
 class ServingCellField : public testing::TestWithParam<FieldCase> {};
 
-TEST_P(ServingCellField, IsShownWhateverStandsBesideIt)
+TEST_P(ServingCellField, IsShownIndependentlyOfOtherFields)
 {
     for (const bool amidOnes : {false, true}) {
         const auto display = decoded<ServingCellMeasurement>(GetParam().in(record(0xB17F, 33), amidOnes));

@@ -95,7 +95,7 @@ TEST_F(History, EntryWithoutExtraInfoEndsBeforeIt)
     EXPECT_THAT(keysOf(entry(0)), ElementsAre("DisplayState", "Display"));
 }
 
-TEST_F(History, DisplayIsCopiedAtItsTopLevelAlone)
+TEST_F(History, DisplayIsCopiedAtItsTopLevelOnly)
 {
     auto cell = makeDictionary({{"RSSI", "-80 dBm"}});
     auto display = makeDictionary({{"RAT", "GSM"}, {"Cell", cell}});

@@ -22,7 +22,7 @@ RecordBuilder neighbors(unsigned count)
 class UTRANNeighborField : public testing::TestWithParam<FieldCase> {};
 
 // Offsets count from the cell's first byte. The test reads the second cell.
-TEST_P(UTRANNeighborField, IsShownWhateverStandsBesideIt)
+TEST_P(UTRANNeighborField, IsShownIndependentlyOfOtherFields)
 {
     auto inSecondCell = GetParam();
     inSecondCell.offset += 168 + 16;

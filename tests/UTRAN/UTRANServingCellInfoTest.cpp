@@ -47,7 +47,7 @@ TEST(UTRANServingCellInfo, Of25BytesChangesNothing)
 
 class UTRANServingCellField : public testing::TestWithParam<FieldCase> {};
 
-TEST_P(UTRANServingCellField, IsShownWhateverStandsBesideIt)
+TEST_P(UTRANServingCellField, IsShownIndependentlyOfOtherFields)
 {
     for (const bool ones : {false, true})
         EXPECT_EQ(decoded<UTRANServingCellInfo>(GetParam().in(record(0xD0E2, 26).fill(13, ones ? 0xFF : 0), ones))
@@ -122,7 +122,7 @@ TEST(UTRANServingCellInfo, OfNoCellsChangesNothing)
     EXPECT_THAT(display.log().errors(), ElementsAre());
 }
 
-TEST(UTRANServingCellInfo, LeavesItToTheHolderToSayThatACellMonitorRecordCannotBeParsed)
+TEST(UTRANServingCellInfo, LogsACellMonitorRecordThatCannotBeParsedOnce)
 {
     const auto display = decoded<UTRANServingCellInfo>(record(0xFF0001, 30));
     EXPECT_EQ(display.text(), "{}");

@@ -109,7 +109,7 @@ TEST(ZPH_GSMLogGenerator, CallsTheOneSectionOfACode)
         EXPECT_THAT(calledBy(code), ElementsAre(word)) << code;
 }
 
-TEST(ZPH_GSMLogGenerator, LetsOutWhatTheSimSectionThrows)
+TEST(ZPH_GSMLogGenerator, PassesOnTheExceptionsOfTheSimSection)
 {
     GsmRun run;
     EXPECT_THROW(run.receive(record(0xFF0000, 40).bytes()), LogCode_0xFF0000::UnknownDataException);

@@ -29,7 +29,7 @@ TEST(ChannelRecords, AreReadBehindAPrefix)
     EXPECT_EQ(channelRecord(bytesOf("\x81\xAA\x01\x0C\0\xC2\xB0........"s))->code, 0xB0C2u);
 }
 
-TEST(ChannelRecords, AreNotWhatIsTooShortOrOfAnotherType)
+TEST(ChannelRecords, ExcludeShortMessagesAndOtherTypes)
 {
     EXPECT_FALSE(channelRecord({}));
     EXPECT_FALSE(channelRecord(bytesOf("\x81"s)));

@@ -89,7 +89,7 @@ TEST(KcapSearch, FindsTheNextMessageBehindADamagedLength)
     EXPECT_EQ(got.faults[0].reason, "a message of 2147483647 bytes, longer than the limit of 16777216");
 }
 
-TEST(KcapSearch, DoesNotTrustALengthBehindWhichNothingBegins)
+TEST(KcapSearch, DoesNotTrustALengthAfterWhichNoMessageBegins)
 {
     const auto got = scanKcap(littleEndian(kSecond.size() + 9, 4) + kSecond + kcap(kThird) + kcap(kFirst));
     EXPECT_THAT(got.messages, ElementsAre(kThird, kFirst));
@@ -327,7 +327,7 @@ TEST(DlfSearch, TakesARecordOf1980AmongOthers)
     EXPECT_THAT(got.faults, IsEmpty());
 }
 
-TEST(DlfSearch, ReadsAnIntervalOfAModemThatHasNotHeardOfTheTime)
+TEST(DlfSearch, ReadsAnIntervalOfAModemWithoutNetworkTime)
 {
     const auto interval = records(40, kSwitchedOn, true);
     const auto got = scanDlf(interval.substr(1) + interval.substr(1));

@@ -97,7 +97,7 @@ TYPED_TEST(MainQueueContract, DropsTasksAndTimersAndWhatTheyHold)
     this->loop.wait(5ms);
 }
 
-TYPED_TEST(MainQueueContract, DropsWhatItsTasksPostAsTheyGo)
+TYPED_TEST(MainQueueContract, DropsTasksThatArePostedWhileItDrops)
 {
     struct PostsAtItsEnd {
         MainQueue& queue;

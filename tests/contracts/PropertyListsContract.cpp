@@ -67,7 +67,7 @@ TYPED_TEST(PropertyListsContract, LeavesNullsOut)
     EXPECT_EQ(this->lists.load(this->world.path("a")), without);
 }
 
-TYPED_TEST(PropertyListsContract, WhatIsWrittenIsLoadedEachTimeAnew)
+TYPED_TEST(PropertyListsContract, EachLoadGivesANewCopyOfTheFile)
 {
     ASSERT_EQ(this->lists.write(this->snapshot, this->world.path("a")), Stored::Written);
     const Value value = std::make_shared<Dictionary>(this->snapshot);

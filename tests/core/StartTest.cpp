@@ -252,7 +252,7 @@ TEST_F(Start, StartCommandThatCannotBeSerialisedFails)
     EXPECT_TRUE(model->isConnected());
 }
 
-TEST_F(Start, ThatAnExceptionLeavesIsNotInTheWayOfTheNext)
+TEST_F(Start, ThatFailsWithAnExceptionDoesNotBlockTheNext)
 {
     whileAsked = [] { throw std::runtime_error("thrown"); };
     EXPECT_THROW(model->startMonitor(), std::runtime_error);

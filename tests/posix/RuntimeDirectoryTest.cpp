@@ -10,7 +10,7 @@ namespace {
 
 using testing::HasSubstr;
 
-TEST(RuntimeDirectory, IsTheOneNamedElseTheSessionsElseOneInTmp)
+TEST(RuntimeDirectory, IsTheNamedOneOrTheSessionsOrOneInTmp)
 {
     const ScopedVariable session("XDG_RUNTIME_DIR", "/run/user/7");
     {

@@ -73,7 +73,7 @@ TEST(SignalPipe, IgnoresSignalsOfAnEarlierOne)
 #endif
 #endif
 #ifndef KESTRUM_NEEDS_DESCRIPTORS
-TEST(SignalPipe, FailsAloudWhereNoDescriptorIsLeft)
+TEST(SignalPipe, ReportsThatNoDescriptorIsLeft)
 {
     rlimit before{};
     ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);

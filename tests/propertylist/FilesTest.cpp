@@ -156,7 +156,7 @@ TEST_F(Files, WhatIsNoPropertyListIsNotLoaded)
     EXPECT_TRUE(codec.load(scratch / "text").isNull());
 }
 
-TEST_F(Files, TheLongestThatIsWrittenIsLoadedAndNothingLongerIsEither)
+TEST_F(Files, ReadingAndWritingHaveTheSameLimitOfSize)
 {
     ASSERT_EQ(codec.write(snapshot, scratch / "a"), Stored::Written);
     const auto size = std::filesystem::file_size(scratch / "a");

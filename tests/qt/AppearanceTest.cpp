@@ -183,7 +183,7 @@ TEST_F(ADesktop, WithoutAPortalIsAskedOnceThereIsOne)
     EXPECT_TRUE(turns(kDarkRow));
 }
 
-TEST_F(ADesktop, WhosePortalDiesKeepsItsLookUntilTheNextOneSays)
+TEST_F(ADesktop, KeepsItsAppearanceUntilANewPortalSetsIt)
 {
     const qt::Appearance appearance(bus.connect("display"));
     {

@@ -245,7 +245,7 @@ TEST_F(ANavigationView, ComesBackToAPaneWhereItWasLeft)
     EXPECT_TRUE(table().hasFocus());
 }
 
-TEST_F(ANavigationView, BringsNoRingBackThatAMouseTookAway)
+TEST_F(ANavigationView, DoesNotShowTheRingAgainAfterAMousePress)
 {
     makeVisible();
     QTest::keyClick(&table(), Qt::Key_Down);

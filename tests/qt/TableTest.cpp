@@ -268,7 +268,7 @@ TEST_F(ATable, KeepsItsRowsToAReadableColumnOnAWideScreen)
     EXPECT_EQ(cell(0).geometry(), QRect(280, 0, 720, 44));
 }
 
-TEST_F(ATable, LeavesTheContentAreaTheRowLessItsAccessory)
+TEST_F(ATable, GivesTheContentAreaTheRowWithoutItsAccessory)
 {
     Rows rows = Rows::leaves(2);
     rows.rows[1].value.reset();
@@ -491,7 +491,7 @@ TEST_F(ATable, BringsAMovedRowBackByADoubleTap)
     EXPECT_EQ(cell(2).sideways(), 0);
 }
 
-TEST_F(ATable, TellsOfAValueOnlyWhileSomeOfItIsOutOfSight)
+TEST_F(ATable, MarksALongValueOnlyWhileItsEndIsHidden)
 {
     Rows rows = Rows::leaves(3);
     rows.rows[1].value = std::string(60, '7');
@@ -538,7 +538,7 @@ TEST_F(ATable, TellsANameThatIsCutInAToolTip)
     EXPECT_FALSE(cell(0).isCut());
 }
 
-TEST_F(ATable, SaysInPlaceOfRowsWhatIsWaitedFor)
+TEST_F(ATable, ShowsAHintInPlaceOfRows)
 {
     Rows rows;
     show(rows);

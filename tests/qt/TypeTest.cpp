@@ -77,7 +77,7 @@ INSTANTIATE_TEST_SUITE_P(Toolkit, Measure,
                                          Text{"Accents", "Zürich ÄÖÜ µW", systemFont(14)}),
                          [](const auto& each) { return std::string(each.param.name); });
 
-TEST(Measure, OfNothingIsNoWidthAndALinesHeight)
+TEST(Measure, OfAnEmptyTextIsZeroWideAndOneLineHigh)
 {
     const Size size = toolkit().measure("", systemFont(15));
     EXPECT_EQ(size.width, 0);

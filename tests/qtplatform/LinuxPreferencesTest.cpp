@@ -22,7 +22,7 @@ TEST(LinuxPreferences, WriteABooleanWithoutABus)
     preferences.postChanged("org.kestrum.homescreen", "HXShowGSMRSSI");
 }
 
-TEST(LinuxPreferences, KeepWhatElseStandsInTheDomain)
+TEST(LinuxPreferences, KeepTheOtherEntriesOfTheDomain)
 {
     const ScratchDirectory home;
     const ScopedVariable config("XDG_CONFIG_HOME", home.path());

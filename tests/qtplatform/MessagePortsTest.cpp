@@ -85,7 +85,7 @@ TEST_F(LocalPortTest, LeavesADirectoryThatIsOpenToOthersAsItIsAndRefusesIt)
     ::chmod(directory.path().c_str(), 0700);
 }
 
-TEST_F(LocalPortTest, IsNotMadeBehindALink)
+TEST_F(LocalPortTest, IsNotCreatedInALinkedDirectory)
 {
     std::filesystem::create_directory_symlink(scratch.path(), directory / "link");
     for (const auto* name : {"link", "link/", "link//"}) {

@@ -68,7 +68,7 @@ TEST_F(SilentService, MayLoseTheModelsOwnerInTheWait)
     EXPECT_FALSE(ports.isListening(kLogPort));
 }
 
-TEST_F(SilentService, MayLoseTheOwnerOfAModelThatOpensItsChannelAlone)
+TEST_F(SilentService, MayLoseTheOwnerOfAModelThatOnlyCreatesPorts)
 {
     const std::weak_ptr<KestrumModel> watched = model;
     queue.post([&] { model.reset(); });

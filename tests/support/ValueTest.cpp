@@ -326,7 +326,7 @@ TEST(Reading, HasTextNumberAndUnit)
     EXPECT_EQ(level.unit(), "dBm");
 }
 
-TEST(Reading, OfANameHasATextAlone)
+TEST(Reading, OfANameHasOnlyAText)
 {
     const Reading name(kOnOff, 1);
     EXPECT_EQ(name.text(), "on");
@@ -350,7 +350,7 @@ TEST(Reading, OfAComputedNumberKeepsAllOfIt)
     EXPECT_EQ(share.unit(), "%");
 }
 
-TEST(Reading, OfANumberThatIsNoneHasATextAlone)
+TEST(Reading, WithoutAFiniteNumberHasOnlyAText)
 {
     for (const double none : {0.0 / 0.0, HUGE_VAL, -HUGE_VAL})
         EXPECT_EQ(Reading::computed(kShare, none).number(), std::nullopt);

@@ -359,7 +359,7 @@ TEST_F(Terminal, FollowsTheTerminalsSize)
     EXPECT_TRUE(terminal.waitUntil([&] { return terminal.chosen().size() == 79; })) << terminal.text();
 }
 
-TEST_F(Terminal, BearsTheSmallestSizes)
+TEST_F(Terminal, WorksAtTheSmallestSizes)
 {
     startAndWait();
     for (const auto& [rows, columns] : {std::pair{1, 1}, {2, 3}, {3, 10}, {1, 80}, {24, 1}}) {
@@ -495,7 +495,7 @@ TEST_F(TerminalRows, KeepTheirPlaceSideways)
     expectRow(3, StartsWith(" Other"));
 }
 
-TEST_F(Terminal, IsNotHeldUpByValuesOfMegabytes)
+TEST_F(Terminal, StaysFastWithValuesOfMegabytes)
 {
     const std::string huge(7 << 20, 'h');
     device.serve({propertyList(text("Huge", huge) + text("Other", "1"))});
@@ -795,7 +795,7 @@ TEST_F(Terminal, LosesNothingOnAMonochromeTerminal)
     expectShown("›");
 }
 
-TEST_F(Terminal, SpeaksAsciiWhereTheLocaleDoes)
+TEST_F(Terminal, DrawsInAsciiInAnAsciiLocale)
 {
     startAndWait({{"LC_ALL", "POSIX"}});
     expectRow(1, " Serving Cell" + std::string(65, ' ') + ">");
@@ -803,7 +803,7 @@ TEST_F(Terminal, SpeaksAsciiWhereTheLocaleDoes)
     expectRow(7, EndsWith("~"));
 }
 
-TEST_F(Terminal, TakesUnicodeForGrantedWhereNoLocaleIsNamed)
+TEST_F(Terminal, AssumesUnicodeIfNoLocaleIsSet)
 {
     startAndWait({{"LC_ALL", ""}, {"LC_CTYPE", ""}, {"LANG", ""}});
     expectRow(1, EndsWith("›"));

@@ -100,7 +100,7 @@ TEST_F(TerminalText, IsLookedAtOnlyAsFarAsItIsShown)
     EXPECT_EQ(glyphs.read(), 1000u);
 }
 
-TEST_F(TerminalText, IsKeptOnlyAsFarAsAnybodyScrolls)
+TEST_F(TerminalText, IsKeptUpTo16KiB)
 {
     EXPECT_EQ(beginning("RSRP"), "RSRP");
     const std::string most(16 << 10, 'a');

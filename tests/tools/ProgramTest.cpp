@@ -259,7 +259,7 @@ TEST_F(ProgramTest, JsonlHasNumbersAndUnitsWhenAsked)
                       HasSubstr(R"(/Version":{"text":"0","number":0,"unit":""})")));
 }
 
-TEST_F(ProgramTest, NumbersGoWithJsonlAlone)
+TEST_F(ProgramTest, NumbersNeedJsonl)
 {
     const auto ran = run({"--format", "csv", "--numbers", capture(kcap(servingCell()))});
     EXPECT_EQ(ran.status, 2);
@@ -399,7 +399,7 @@ TEST_F(ProgramTest, ATerminalIsShownNoControlCharacters)
 }
 
 // Ten times as many keys may take more than ten times as long, but much less than a hundred times.
-TEST_F(ProgramTest, KeysThatVanishCostNoMoreThanTheyAreMany)
+TEST_F(ProgramTest, TheCostOfRemovedKeysIsNotQuadratic)
 {
     const auto seconds = [&](int keys, const char* format) {
         std::string list = "<plist version=\"1.0\"><dict>";

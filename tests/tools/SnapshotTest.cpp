@@ -252,7 +252,7 @@ TEST_F(SnapshotFile, IsExtractedIntoNewFilesAlone)
     EXPECT_TRUE(std::filesystem::is_regular_file(std::filesystem::symlink_status(scratch / "out/Saved.kcap")));
 }
 
-TEST_F(SnapshotFile, OfTwoNamesakesTheFirstIsExtracted)
+TEST_F(SnapshotFile, OnlyTheFirstOfTwoFilesOfOneNameIsExtracted)
 {
     const LiveRun live("lte");
     const auto first = write(live.saved());

@@ -327,7 +327,7 @@ TEST_F(SnapshotFile, LargerThanWhatIsReadIsRefusedWithTheAlert)
                 ElementsAre(RecordingToolkit::Alert{"File Error", "Unable to write file to disk", "Close"}));
 }
 
-TEST_F(SnapshotFile, OfTwoDisplaysInOneSecondThereAreTwo)
+TEST_F(SnapshotFile, TwoDisplaysInOneSecondSaveTwoFiles)
 {
     save(scratch.path());
     PropertyListCodec another;
