@@ -18,13 +18,16 @@ public:
     /// Logs one line. Never blocks for long and never fails: lines that do not fit the queue are counted. The text is
     /// borrowed for the call.
     virtual void write(Priority priority, std::string_view text) = 0;
-    /// Formats a line and logs it. A line of up to 128 bytes is formatted without allocating.
+    /// Whether lines of this priority are kept. Ask it before work that only a line needs.
+    virtual bool passes(Priority) const { return true; }
+    /// Formats a line that passes and logs it. A line of up to 128 bytes is formatted without allocating.
     template <typename... Arguments>
         requires(sizeof...(Arguments) > 0)
     void write(Priority priority, FormatString<std::type_identity_t<Arguments>...> format,
                const Arguments&... arguments)
     {
-        write(priority, formatting::formatted(format, arguments...).text());
+        if (passes(priority))
+            write(priority, formatting::formatted(format, arguments...).text());
     }
 
     /// The address to print for an object. An offline decoder prints null, so that two runs give equal logs.

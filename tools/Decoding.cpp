@@ -69,6 +69,7 @@ public:
         if (_line)
             _line(priority, text);
     }
+    bool passes(Priority) const override { return static_cast<bool>(_line); }
     const void* shownAddress(const void*) const override { return nullptr; }
 
 private:

@@ -81,7 +81,7 @@ int serve(QCoreApplication& application, const Options& options)
     // A closed log or output must not end the service.
     std::signal(SIGPIPE, SIG_IGN);
     const TerminationSignals termination([&] { application.quit(); });
-    LinuxSystemLog log(standardErrorSink("voxd"));
+    LinuxSystemLog log(standardErrorSink("voxd"), logLevel("voxd", LOG_INFO));
     PropertyListCodec lists;
     const auto source = makeSource(options, lists);
     std::ofstream record;

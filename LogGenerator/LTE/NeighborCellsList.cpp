@@ -74,6 +74,8 @@ void NeighborCellsList::decode(Record data, const Layout&)
 
 void NeighborCellsList::logMeasurements(Record cell) const
 {
+    if (!roles.log.passes(Priority::Warning))
+        return;
     const auto raw = [cell](Field field) { return cell.read(field).value_or(0); };
     roles.log.write(Priority::Warning, "Physical Cell ID: %d\n", static_cast<std::int32_t>(raw(kPhysicalCellId)));
     // Kept: the line has the same label for RSSI, RSRP and RSRQ.

@@ -29,6 +29,7 @@ struct LinuxWorld {
     std::unique_ptr<LinuxSystemLog> log = std::make_unique<LinuxSystemLog>([this](int, const std::string& text) {
         const std::lock_guard lock(mutex);
         written.push_back(text);
+        return true;
     });
 
     std::vector<std::string> texts()

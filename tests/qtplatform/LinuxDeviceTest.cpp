@@ -2,6 +2,7 @@
 #include "harness/Scratch.h"
 #include "platform/Console.h"
 #include "platform/MainQueue.h"
+#include "platform/SystemLog.h"
 #include "platform/qt/TerminationSignals.h"
 #include "qtplatform/EventLoop.h"
 
@@ -42,6 +43,23 @@ TEST(LinuxDevice, YieldsTheRolesAndDropsWhatIsQueued)
     bool ran = false;
     roles.queue.post([&] { ran = true; });
     EXPECT_TRUE(eventually([&] { return ran; }));
+}
+
+TEST(LinuxDevice, LogsErrorsAloneUnlessKestrumLogAllowsMore)
+{
+    const ScratchDirectory directory;
+    const ScopedVariable runtime("KESTRUM_RUNTIME_DIR", directory.path());
+    const auto passes = [](Priority priority, std::optional<std::string> level) {
+        const ScopedVariable variable("KESTRUM_LOG", std::move(level));
+        LinuxDevice device("tests", LinuxDevice::Output::Quiet);
+        return device.monitorRoles().log.passes(priority);
+    };
+    EXPECT_TRUE(passes(Priority::Error, std::nullopt));
+    EXPECT_FALSE(passes(Priority::Warning, std::nullopt));
+    EXPECT_FALSE(passes(Priority::Raw16, std::nullopt));
+    EXPECT_TRUE(passes(Priority::Warning, "warning"));
+    EXPECT_FALSE(passes(Priority::Raw16, "warning"));
+    EXPECT_TRUE(passes(Priority::Raw16, "notice"));
 }
 
 } // namespace

@@ -745,6 +745,22 @@ TEST_F(ServiceTest, GoesOnServingWhenTheCaptureEnds)
     EXPECT_TRUE(client.remote->isValid());
 }
 
+TEST_F(ServiceTest, LogsWhatKestrumLogAllows)
+{
+    auto environment = voxd.process.processEnvironment();
+    environment.insert("KESTRUM_LOG", "error");
+    voxd.process.setProcessEnvironment(environment);
+    ASSERT_TRUE(voxd.start(replay(capture({record(0xB0C2, "only")}), {"--speed", "1000"})));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    ASSERT_TRUE(client.hasReceived(1));
+    client.technology(); // the end of the log has been noticed before this is answered
+    voxd.process.terminate();
+    EXPECT_EQ(voxd.finish(), 0);
+    EXPECT_EQ(voxd.log(), "") << "a notice";
+}
+
 TEST_F(ServiceTest, LogsWhereADamagedCaptureEnds)
 {
     const auto path = files / "damaged.kcap";
