@@ -128,10 +128,7 @@ KestrumModelNodeRef KestrumModel::nodeAtPath(const std::string& path)
 {
     if (!_nodesByPath)
         topLevelNodes();
-    if (!_nodesByPath)
-        return nullptr;
-    const auto found = _nodesByPath->find(path);
-    return found == _nodesByPath->end() ? nullptr : found->second;
+    return _nodesByPath ? _nodesByPath->find(path) : nullptr;
 }
 
 std::string KestrumModel::lossNotice() const

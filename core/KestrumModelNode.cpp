@@ -5,7 +5,7 @@
 
 #include <algorithm>
 #include <cstddef>
-#include <optional>
+#include <ranges>
 #include <string>
 #include <tuple>
 #include <utility>
@@ -47,90 +47,94 @@ std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary,
     return entries;
 }
 
-/// The limit of all paths of a tree, in bytes. Real displays need a thousandth of it, but nested long names would need
-/// thousands of times the size of their message. Nodes beyond the limit are in the tree without a path.
-constexpr std::size_t kPathBytes = std::size_t{64} << 20;
+KestrumModelNodeRef makeNode(std::string name, const Value& object);
 
-/// Builds one tree. A node gets no path when earlier paths have reached the limit.
-class Builder {
-public:
-    using Path = std::optional<std::string>;
+KestrumModelNodes childrenOf(const Dictionary& dictionary)
+{
+    const Value* marker = dictionary.find(kSortedKey);
+    const bool sorted = marker != nullptr && !marker->isNull();
+    const auto entries = shownEntries(dictionary, sorted);
+    KestrumModelNodes children;
+    children.reserve(entries.size());
+    for (const auto* entry : entries)
+        children.push_back(makeNode(std::string(sorted ? nameInSortedMode(entry->key) : entry->key), entry->value));
+    return children;
+}
 
-    explicit Builder(PathDictionary& paths) : _paths(paths) {}
+KestrumModelNodes childrenOf(const Array& array)
+{
+    const ArrayLocked locked; // for the whole walk: no section may rewrite the array meanwhile
+    KestrumModelNodes children;
+    children.reserve(array.size());
+    for (const auto& element : array)
+        children.push_back(makeNode(std::to_string(children.size()), element));
+    return children;
+}
 
-    KestrumModelNodeRef build(std::string name, const Value& object, const Path& path)
-    {
-        auto node = make(std::move(name), object, path);
-        if (path)
-            _paths.insert_or_assign(*path, node);
-        return node;
+KestrumModelNodeRef makeNode(std::string name, const Value& object)
+{
+    if (auto text = object.text())
+        return std::make_shared<KestrumModelLeafNode>(std::move(name), *std::move(text));
+    if (const auto dictionary = object.dictionary())
+        return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*dictionary));
+    if (const auto array = object.array())
+        return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*array));
+    return std::make_shared<KestrumModelLeafNode>(std::move(name), "(unknown)");
+}
+
+/// A name as it stands in a path.
+std::string_view componentOf(std::string_view name)
+{
+    const auto first = std::min(name.find_first_not_of('/'), name.size());
+    const auto component = name.substr(first, name.find_last_not_of('/') + 1 - first);
+    return component.empty() ? "(empty)" : component;
+}
+
+/// The node below `parent` at the rest of a path. Several children may match: a name may hold a "/".
+KestrumModelNodeRef nodeBelow(const KestrumModelNode& parent, std::string_view rest)
+{
+    if (parent.childNodes() == nullptr)
+        return nullptr;
+    for (const auto& child : *parent.childNodes() | std::views::reverse) {
+        const auto component = componentOf(child->displayName());
+        if (rest == component)
+            return child;
+        if (rest.size() > component.size() && rest[component.size()] == '/' && rest.starts_with(component))
+            if (auto found = nodeBelow(*child, rest.substr(component.size() + 1)))
+                return found;
     }
+    return nullptr;
+}
 
-private:
-    KestrumModelNodeRef make(std::string name, const Value& object, const Path& path)
-    {
-        if (auto text = object.text())
-            return std::make_shared<KestrumModelLeafNode>(std::move(name), *std::move(text));
-        if (const auto dictionary = object.dictionary())
-            return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*dictionary, path));
-        if (const auto array = object.array())
-            return std::make_shared<KestrumModelTreeNode>(std::move(name), childrenOf(*array, path));
-        return std::make_shared<KestrumModelLeafNode>(std::move(name), "(unknown)");
-    }
-
-    KestrumModelNodes childrenOf(const Dictionary& dictionary, const Path& path)
-    {
-        const Value* marker = dictionary.find(kSortedKey);
-        const bool sorted = marker != nullptr && !marker->isNull();
-        const auto entries = shownEntries(dictionary, sorted);
-        KestrumModelNodes children;
-        children.reserve(entries.size());
-        for (const auto* entry : entries)
-            children.push_back(
-                child(std::string(sorted ? nameInSortedMode(entry->key) : entry->key), entry->value, path));
-        return children;
-    }
-
-    KestrumModelNodes childrenOf(const Array& array, const Path& path)
-    {
-        const ArrayLocked locked; // for the whole walk: no section may rewrite the array meanwhile
-        KestrumModelNodes children;
-        children.reserve(array.size());
-        for (const auto& element : array)
-            children.push_back(child(std::to_string(children.size()), element, path));
-        return children;
-    }
-
-    KestrumModelNodeRef child(std::string name, const Value& object, const Path& parent)
-    {
-        Path path;
-        if (parent && parent->size() + name.size() < _left) {
-            path = joinPath(*parent, name);
-            _left -= std::min(_left, path->size());
-        }
-        return build(std::move(name), object, path);
-    }
-
-    PathDictionary& _paths;
-    std::size_t _left = kPathBytes;
-};
+/// A path and the "/" that ends it.
+std::string withSlash(std::string_view path)
+{
+    std::string ended(path);
+    if (!ended.ends_with('/'))
+        ended += '/';
+    return ended;
+}
 
 } // namespace
 
 std::string joinPath(std::string_view path, std::string_view name)
 {
-    const auto first = std::min(name.find_first_not_of('/'), name.size());
-    const auto component = name.substr(first, name.find_last_not_of('/') + 1 - first);
-    std::string joined(path);
-    if (!joined.ends_with('/'))
-        joined += '/';
-    return joined += component.empty() ? "(empty)" : component;
+    return withSlash(path).append(componentOf(name));
 }
 
-KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary,
-                              const std::string& path)
+KestrumModelNodeRef PathDictionary::find(std::string_view path) const
 {
-    return Builder(pathDictionary).build(std::move(name), object, path);
+    if (!_node || path == _path)
+        return _node;
+    const auto start = withSlash(_path);
+    return path.starts_with(start) ? nodeBelow(*_node, path.substr(start.size())) : nullptr;
+}
+
+KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary, std::string path)
+{
+    auto node = makeNode(std::move(name), object);
+    pathDictionary = PathDictionary(std::move(path), node);
+    return node;
 }
 
 KestrumModelNodeRef KestrumModelNode::makeTreeFromObject(const Value& object, PathDictionary& withPathDictionary)

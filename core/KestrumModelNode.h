@@ -2,7 +2,6 @@
 
 #include "support/Value.h"
 
-#include <map>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -15,14 +14,28 @@ class KestrumModelNode;
 /// Nodes are immutable: a reference stays valid after the tree is rebuilt.
 using KestrumModelNodeRef = std::shared_ptr<const KestrumModelNode>;
 using KestrumModelNodes = std::vector<KestrumModelNodeRef>;
-/// Maps a path to its node. A sorted map, because a hash can be attacked with colliding paths.
-using PathDictionary = std::map<std::string, KestrumModelNodeRef>;
 
 inline constexpr std::string_view kRootPath = "/";
 
 /// The path of a child: the parent's path, one "/" and the child's display name. Leading and trailing slashes of the
 /// name are removed; "(empty)" replaces a name without other characters.
 std::string joinPath(std::string_view path, std::string_view name);
+
+/// Maps paths to the nodes of a tree; of nodes with the same path it finds the one built last. Stores no paths but
+/// descends from the root: each refresh builds a tree of thousands of nodes, and a screen asks for the few it shows.
+class PathDictionary {
+public:
+    PathDictionary() = default;
+    /// A node and the nodes below it.
+    PathDictionary(std::string path, KestrumModelNodeRef node) : _path(std::move(path)), _node(std::move(node)) {}
+
+    /// Null when no node has the path. Visits a node at most once, whatever the names are.
+    KestrumModelNodeRef find(std::string_view path) const;
+
+private:
+    std::string _path;
+    KestrumModelNodeRef _node;
+};
 
 /// A row of the display and the rows below it.
 class KestrumModelNode {
@@ -37,9 +50,8 @@ public:
     /// The text of a leaf; null for an inner node.
     virtual const std::string* value() const { return nullptr; }
 
-    /// Builds the tree of a display; the root is named "Kestrum" and has the path "/". Never null. Fills the empty
-    /// dictionary with a node for each path; of nodes with the same path the last one. Paths beyond 64 MiB of text in
-    /// all are left out.
+    /// Builds the tree of a display; the root is named "Kestrum" and has the path "/". Never null. The dictionary then
+    /// has the paths of its nodes.
     ///
     /// Recursive: at most as deep as property lists may be (512 levels).
     static KestrumModelNodeRef makeTreeFromObject(const Value& object, PathDictionary& withPathDictionary);
@@ -75,8 +87,7 @@ private:
     KestrumModelNodes _childNodes;
 };
 
-/// Builds the node of a value, and registers first its children, then the node itself in the dictionary.
-KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary,
-                              const std::string& path);
+/// Builds the node of a value. The dictionary then has its path and those of the nodes below it.
+KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary, std::string path);
 
 } // namespace kestrum

@@ -108,7 +108,7 @@ public:
 
         PathDictionary paths;
         const auto tree = KestrumModelNode::makeTreeFromObject(state.at("Display"), paths);
-        require(tree != nullptr && paths.contains(std::string(kRootPath)), "no tree");
+        require(tree != nullptr && paths.find(kRootPath) == tree, "no tree");
         const auto contents = _generator->getSaveContentsFromState(state);
         require(contents && contents->size() >= state.at("History").array()->size(), "the history cannot be saved");
     }

@@ -66,15 +66,20 @@ private:
     std::unique_ptr<LogGenerator> _generator;
 };
 
+void checkPaths(const KestrumModelNode& node, const std::string& path, const PathDictionary& paths)
+{
+    require(paths.find(path) != nullptr, "a path that leads nowhere");
+    if (node.childNodes() != nullptr)
+        for (const auto& child : *node.childNodes())
+            checkPaths(*child, joinPath(path, child->displayName()), paths);
+}
+
 void checkTree(const Value& display)
 {
     PathDictionary paths;
     const auto tree = KestrumModelNode::makeTreeFromObject(display, paths);
-    if (!tree)
-        return;
-    require(paths.contains(std::string(kRootPath)), "a tree without a root");
-    for (const auto& [path, node] : paths)
-        require(node != nullptr, "a path that leads nowhere");
+    require(paths.find(kRootPath) == tree, "a tree without a root");
+    checkPaths(*tree, std::string(kRootPath), paths);
 }
 
 void show(Bytes input)

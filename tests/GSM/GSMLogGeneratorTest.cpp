@@ -228,8 +228,11 @@ TEST_F(ObjectStream, DeepestListThatIsReadIsShown)
         nested = makeArray({"first", nested});
     receive(nested);
     PathDictionary paths;
-    KestrumModelNode::makeTreeFromObject(generator->generateLogUsingState(state), paths);
-    EXPECT_EQ(paths.size(), PropertyListCodec::kMaxDepth + 1);
+    auto node = KestrumModelNode::makeTreeFromObject(generator->generateLogUsingState(state), paths);
+    std::size_t levels = 1;
+    for (; node->childNodes() != nullptr; node = node->childNodes()->front())
+        ++levels;
+    EXPECT_EQ(levels, PropertyListCodec::kMaxDepth + 1);
 }
 
 // The other roles of a generator.

@@ -4,8 +4,8 @@
 
 #include <gmock/gmock.h>
 
-#include <functional>
-#include <type_traits>
+#include <set>
+#include <string>
 
 namespace kestrum {
 namespace {
@@ -16,17 +16,28 @@ using testing::UnorderedElementsAre;
 struct Tree {
     explicit Tree(const Value& object) : root(KestrumModelNode::makeTreeFromObject(object, paths)) {}
 
-    const KestrumModelNode& at(const std::string& path) const { return *paths.at(path); }
-    std::vector<std::string> allPaths() const
+    const KestrumModelNode& at(const std::string& path) const { return *paths.find(path); }
+    /// The paths of all rows; each leads to a node.
+    std::set<std::string> allPaths() const
     {
-        std::vector<std::string> found;
-        for (const auto& [path, node] : paths)
-            found.push_back(path);
+        std::set<std::string> found;
+        collect(*root, "/", found);
+        for (const auto& path : found)
+            EXPECT_NE(paths.find(path), nullptr) << path;
         return found;
     }
 
     PathDictionary paths;
     KestrumModelNodeRef root;
+
+private:
+    static void collect(const KestrumModelNode& node, const std::string& path, std::set<std::string>& into)
+    {
+        into.insert(path);
+        if (node.childNodes() != nullptr)
+            for (const auto& child : *node.childNodes())
+                collect(*child, joinPath(path, child->displayName()), into);
+    }
 };
 
 std::vector<std::string> rowNames(const KestrumModelNode& node)
@@ -237,7 +248,7 @@ TEST(DisplayTree, NodesOutliveTheirTree)
 {
     auto display = makeDictionary({{"Cell", makeDictionary({{"RSSI", "-71 dBm"}})}});
     auto tree = std::make_unique<Tree>(display);
-    const KestrumModelNodeRef cell = tree->paths.at("/Cell");
+    const KestrumModelNodeRef cell = tree->paths.find("/Cell");
     tree.reset();
     display->clear();
     EXPECT_EQ(*cell->childNodes()->at(0)->value(), "-71 dBm");
@@ -249,29 +260,43 @@ TEST(DisplayTree, DeepestPropertyListIsBuilt)
     for (int level = 0; level < 512; ++level)
         nested = level % 2 == 0 ? Value(makeArray({nested})) : Value(makeDictionary({{"x", nested}}));
     const Tree tree(nested);
-    EXPECT_EQ(tree.paths.size(), 513u);
+    EXPECT_EQ(tree.allPaths().size(), 513u);
 }
 
-TEST(DisplayTree, LongNamesInsideEachOtherCostNoMoreThanTheirBound)
+TEST(DisplayTree, LongNamesInsideEachOtherCostNoMoreThanOnce)
 {
     // 16 levels with names of 1 MB, then a thousand rows: their full paths would take 16 GB.
     auto rows = makeArray();
     for (int i = 0; i < 1000; ++i)
         rows->append("x");
+    const std::string name(1'000'000, 'a');
     Value nested = rows;
-    for (int level = 0; level < 16; ++level)
-        nested = makeDictionary({{std::string(1'000'000, 'a'), nested}});
+    std::string path;
+    for (int level = 0; level < 16; ++level) {
+        nested = makeDictionary({{name, nested}});
+        path.append("/").append(name);
+    }
     const Tree tree(nested);
-    std::size_t bytes = 0;
-    for (const auto& [path, node] : tree.paths)
-        bytes += path.size();
-    EXPECT_LE(bytes, std::size_t{64} << 20);
+    EXPECT_EQ(tree.at(path).childNodes()->size(), 1000u);
+    EXPECT_EQ(tree.paths.find(path + "/999"), tree.at(path).childNodes()->back());
+}
 
-    const auto* level = tree.root.get();
-    while (level->childNodes()->size() == 1)
-        level = level->childNodes()->front().get();
-    EXPECT_EQ(level->childNodes()->size(), 1000u); // no row is missing
-    EXPECT_EQ(&tree.at("/"), tree.root.get());
+TEST(DisplayTree, PathOfNoNodeLeadsNowhere)
+{
+    const Tree tree(makeDictionary({{"Cell", makeDictionary({{"RSSI", "x"}})}, {"Cells", "y"}}));
+    for (const char* path : {"", "Cell", "//", "//Cell", "/Cell/", "/Cell/RSSI/x", "/Cel", "/Cellular", "/Cells/"})
+        EXPECT_EQ(tree.paths.find(path), nullptr) << path;
+    EXPECT_EQ(PathDictionary().find("/"), nullptr);
+}
+
+TEST(DisplayTree, NodeIsBuiltUnderAnyPath)
+{
+    PathDictionary paths;
+    const auto node = buildNode("Cells", makeArray({makeDictionary({{"RSSI", "x"}})}), paths, "/LTE/Cells");
+    EXPECT_EQ(paths.find("/LTE/Cells"), node);
+    EXPECT_EQ(*paths.find("/LTE/Cells/0/RSSI")->value(), "x");
+    EXPECT_EQ(paths.find("/LTE/Cells0"), nullptr);
+    EXPECT_EQ(paths.find("/"), nullptr);
 }
 
 // The array lock while arrays are walked.
@@ -300,9 +325,6 @@ TEST_F(WalkedArrays, DictionariesAreNotLocked)
     const Tree tree(makeDictionary({{"a", makeDictionary({{"b", "x"}})}}));
     EXPECT_EQ(counts.locked, 0);
 }
-
-// Names come from outside. In an ordered container no choice of names makes look-ups slow, unlike in a hash table.
-static_assert(std::is_same_v<PathDictionary::key_compare, std::less<std::string>>);
 
 } // namespace
 } // namespace kestrum

@@ -4,7 +4,8 @@
 #include <gtest/gtest.h>
 #include <rapidcheck/gtest.h>
 
-#include <set>
+#include <map>
+#include <string>
 
 namespace kestrum {
 namespace {
@@ -40,39 +41,38 @@ rc::Gen<Value> displays()
     return rc::gen::resize(6, values(3));
 }
 
-void collect(const KestrumModelNodeRef& node, const std::string& path, std::set<std::string>& paths,
-             std::set<const KestrumModelNode*>& nodes)
+using Nodes = std::map<std::string, KestrumModelNodeRef>;
+
+/// Of nodes with the same path the last one built: children come before their parent.
+void collect(const KestrumModelNodeRef& node, const std::string& path, Nodes& nodes)
 {
-    paths.insert(path);
-    nodes.insert(node.get());
     RC_ASSERT((node->value() == nullptr) != (node->childNodes() == nullptr));
     if (node->childNodes() != nullptr)
         for (const auto& child : *node->childNodes())
-            collect(child, joinPath(path, child->displayName()), paths, nodes);
+            collect(child, joinPath(path, child->displayName()), nodes);
+    nodes[path] = node;
 }
 
-RC_GTEST_PROP(AnyDisplay, HasOneEntryForEachPathOfItsTree, ())
+RC_GTEST_PROP(AnyDisplay, IsFoundNodeByNodeUnderItsPaths, ())
 {
     PathDictionary dictionary;
     const auto root = KestrumModelNode::makeTreeFromObject(*displays(), dictionary);
-    std::set<std::string> paths;
-    std::set<const KestrumModelNode*> nodes;
-    collect(root, "/", paths, nodes);
-    RC_ASSERT(dictionary.size() == paths.size());
-    for (const auto& [path, node] : dictionary) {
-        RC_ASSERT(paths.contains(path));
-        RC_ASSERT(nodes.contains(node.get()));
-    }
-    RC_ASSERT(dictionary.at("/") == root);
+    Nodes nodes;
+    collect(root, "/", nodes);
+    for (const auto& [path, node] : nodes)
+        RC_ASSERT(dictionary.find(path) == node);
+    const auto other = joinPath("/", *names());
+    RC_ASSERT((dictionary.find(other) != nullptr) == nodes.contains(other));
 }
 
 RC_GTEST_PROP(AnyDisplay, GivesTheSameTreeTwice, ())
 {
     const Value display = *displays();
     const Value before = deepCopy(display);
-    PathDictionary first, second;
-    KestrumModelNode::makeTreeFromObject(display, first);
-    KestrumModelNode::makeTreeFromObject(display, second);
+    PathDictionary dictionary;
+    Nodes first, second;
+    collect(KestrumModelNode::makeTreeFromObject(display, dictionary), "/", first);
+    collect(KestrumModelNode::makeTreeFromObject(display, dictionary), "/", second);
     RC_ASSERT(display == before);
     RC_ASSERT(first.size() == second.size());
     for (const auto& [path, node] : first) {
