@@ -42,7 +42,8 @@ void Base::updateWithData(Record data, LogCode logCode)
         return reportUnknown(logCode);
     if (known == _traits.layouts.end() && _traits.foreignCode == ForeignCode::Ignored)
         return;
-    const Layout layout = known == _traits.layouts.end() ? Layout{logCode} : *known;
+    const Layout foreign{logCode};
+    const Layout& layout = known == _traits.layouts.end() ? foreign : *known;
     if (data.size() >= layout.minimumLength)
         decode(data, layout);
     else if (roles.watch != nullptr)

@@ -14,7 +14,8 @@ constexpr std::string_view kOrigin = "DisplayOrigin";
 
 bool isSameContainer(const Value& left, const Value& right)
 {
-    return left.kind() == right.kind() && left.dictionary() == right.dictionary() && left.array() == right.array();
+    return left.kind() == right.kind() && left.borrowedDictionary() == right.borrowedDictionary() &&
+           left.borrowedArray() == right.borrowedArray();
 }
 
 } // namespace
@@ -47,10 +48,13 @@ LogGenerator::Origin LogGenerator::originOfDisplay(const State& state) const
     const Value* display = state.find(StateKey::kDisplay);
     if (display == nullptr || display->isNull())
         return Origin::None;
-    const auto origin = state.at(kOrigin).dictionary();
-    if (!origin || !isSameContainer(origin->at(StateKey::kDisplay), *display))
+    const Value* origin = state.find(kOrigin);
+    const Dictionary* built = origin != nullptr ? origin->borrowedDictionary() : nullptr;
+    const Value* shown = built != nullptr ? built->find(StateKey::kDisplay) : nullptr;
+    if (shown == nullptr || !isSameContainer(*shown, *display))
         return Origin::Unknown;
-    return origin->at("Technology") == Value(technology()) ? Origin::Own : Origin::Other;
+    const Value* builder = built->find("Technology");
+    return builder != nullptr && *builder == technology() ? Origin::Own : Origin::Other;
 }
 
 void LogGenerator::setDisplay(State& state, Value display) const

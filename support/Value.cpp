@@ -92,7 +92,13 @@ DictionaryRef Value::dictionary() const
     return held ? *held : nullptr;
 }
 
-const Dictionary* Value::borrowedDictionary() const
+Array* Value::borrowedArray() const
+{
+    const auto* held = std::get_if<ArrayRef>(&_held);
+    return held ? held->get() : nullptr;
+}
+
+Dictionary* Value::borrowedDictionary() const
 {
     const auto* held = std::get_if<DictionaryRef>(&_held);
     return held ? held->get() : nullptr;
@@ -178,7 +184,7 @@ bool operator==(const Value& left, const Value& right)
     case Value::Kind::String:
         if (const auto reading = left.reading(); reading && reading == right.reading())
             return true;
-        return left == std::string_view(right.reading() ? right.reading()->text() : std::get<std::string>(right._held));
+        return right.borrowedString() != nullptr ? left.is(*right.borrowedString()) : left.is(right.reading()->text());
     case Value::Kind::Integer:
         return left.integer() == right.integer() && left.unsignedInteger() == right.unsignedInteger();
     case Value::Kind::Real:

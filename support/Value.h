@@ -75,7 +75,8 @@ public:
     ArrayRef array() const;
     DictionaryRef dictionary() const;
     /// Borrowed: valid until the value changes.
-    const Dictionary* borrowedDictionary() const;
+    Array* borrowedArray() const;
+    Dictionary* borrowedDictionary() const;
     const std::string* borrowedString() const { return std::get_if<std::string>(&_held); } ///< null for a reading
 
     /// A 32-bit number: an integer in range, or a real in range without a fraction. Nothing for a boolean.

@@ -51,15 +51,15 @@ template <std::invocable<Dictionary&, const std::string&> Set>
 void C2KContext::atPlacesOf(std::string_view identifier, Set set) const
 {
     const Value* found = _lookup ? _lookup->find(identifier) : nullptr;
-    const auto places = found != nullptr ? found->array() : nullptr;
-    if (!places)
+    const Array* places = found != nullptr ? found->borrowedArray() : nullptr;
+    if (places == nullptr)
         return;
     for (const auto& place : *places) {
-        const auto entry = place.dictionary();
-        const Value* node = entry ? entry->find("dict") : nullptr;
-        const Value* key = entry ? entry->find("key") : nullptr;
-        const auto dictionary = node != nullptr ? node->dictionary() : nullptr;
-        if (!dictionary || key == nullptr || key->borrowedString() == nullptr)
+        const Dictionary* entry = place.borrowedDictionary();
+        const Value* node = entry != nullptr ? entry->find("dict") : nullptr;
+        const Value* key = entry != nullptr ? entry->find("key") : nullptr;
+        Dictionary* dictionary = node != nullptr ? node->borrowedDictionary() : nullptr;
+        if (dictionary == nullptr || key == nullptr || key->borrowedString() == nullptr)
             return;
         set(*dictionary, *key->borrowedString());
     }

@@ -220,6 +220,19 @@ INSTANTIATE_TEST_SUITE_P(UTRAN, UtranListSection,
                          testing::Values(Subscription{"Neighbor Cell List", 0xD00A}, Subscription{"TRCH BLER", 0xD00C}),
                          nameOf);
 
+/// Two pilots in a status of 1x; see OneXStatusTest.
+RecordBuilder oneXStatus(unsigned firstPilot)
+{
+    return record(0x119C, 115)
+        .u8(14, 4)
+        .bytes(17, {1, 0, 6})
+        .bytes(23, {2, 0, 14})
+        .bytes(37, {3, 0, 70, 0, 1, 0, 1, 1, 2, 1})
+        .u16(49, firstPilot)
+        .u16(69, 5)
+        .bytes(107, {4, 0, 8});
+}
+
 struct CdmaRecords {
     std::string_view name;
     std::vector<RecordBuilder> records;
@@ -254,8 +267,28 @@ INSTANTIATE_TEST_SUITE_P(
         CdmaRecords{
             "ForwardLinkRate", {record(0x1192, 241), record(0x1192, 241).fill(13, 0xFF)}, decodeForwardLinkRate},
         CdmaRecords{
-            "ReverseLinkRate", {record(0x127E, 1750), record(0x127E, 1750).fill(13, 0xFF)}, decodeReverseLinkRate}),
+            "ReverseLinkRate", {record(0x127E, 1750), record(0x127E, 1750).fill(13, 0xFF)}, decodeReverseLinkRate},
+        CdmaRecords{"ActiveSetPilots",
+                    {record(0x12B6, 61).u8(15, 3).u16(37, 12), record(0x12B6, 49).u8(15, 2).u16(37, 300)},
+                    decodeActiveSetPilots},
+        CdmaRecords{"Fingers",
+                    {record(0x108A, 65).u8(22, 3).u16(37, 12), record(0x108A, 51).u8(22, 2).u16(37, 300)},
+                    decodeFingers},
+        CdmaRecords{"OneXStatus", {oneXStatus(12), oneXStatus(300)}, decodeOneXStatus}),
     [](const auto& each) { return std::string(each.param.name); });
+
+// The way to the decoder: header, display, lookup, raw records.
+TEST(CdmaGenerator, AllocatesNothingInTheSteadyState)
+{
+    C2KRun run;
+    SilentLog log;
+    UnwatchedConsole console;
+    DecodingRoles roles{log, console, run.doubles.clock, run.doubles.bundle, run.doubles.propertyLists};
+    run.generator = C2KLogGenerator::generator(roles);
+    run.receive(oneXStatus(12)).receive(oneXStatus(300)).receive(oneXStatus(12));
+    run.generator->generateLogUsingState(run.state); // the next interval may be as long as this one
+    expectNoAllocation({oneXStatus(12)}, [&](Record each) { run.generator->updateState(run.state, each.bytes()); });
+}
 
 } // namespace
 } // namespace kestrum
