@@ -13,11 +13,14 @@ readonly test_packages=(
     libgtest-dev libgmock-dev librapidcheck-dev
     python3 dbus libvterm-dev xvfb at-spi2-core
 )
+# For scripts/bench.
+# shellcheck disable=SC2034
+readonly bench_packages=(libbenchmark-dev valgrind xvfb python3 git)
 # For making and checking the package.
 # shellcheck disable=SC2034
 readonly package_packages=(dpkg-dev file lintian desktop-file-utils appstream mandoc systemd)
 # shellcheck disable=SC2034
-readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev libbenchmark-dev git debootstrap valgrind)
+readonly ci_packages=(clang-16 clang-format-16 clang-tidy-16 libclang-rt-16-dev git debootstrap valgrind)
 
 fail() { echo "${0##*/}: $*" >&2; exit 1; }
 

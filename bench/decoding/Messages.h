@@ -37,9 +37,6 @@ inline std::vector<std::byte> copied(Bytes bytes)
     return {bytes.begin(), bytes.end()};
 }
 
-/// The binary form of a list of dictionaries, arrays and ASCII strings, with up to 250 different objects.
-std::vector<std::byte> binaryPropertyList(const Value& root);
-
 /// Measures `work` on one message: messages and bytes per second, heap allocations per message. Compare it with
 /// `plainCopy` of as many bytes.
 template <typename Work>

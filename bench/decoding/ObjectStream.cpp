@@ -2,6 +2,7 @@
 #include "LogGenerator/GSM/GSMLogGenerator.h"
 #include "core/KestrumModelNode.h"
 #include "decoding/Messages.h"
+#include "propertylist/Lists.h"
 #include "support/Format.h"
 
 namespace kestrum::bench {
@@ -27,6 +28,31 @@ Value display()
                            {"RR State", wrapped("Dedicated")}});
 }
 
+/// Adds the value after its parts, and returns its number. For strings of ASCII and less than 256 objects.
+std::size_t add(BinaryList& list, const Value& value)
+{
+    const auto marked = [](unsigned marker, std::size_t count, const std::string& content) {
+        const auto small = count < 15 ? count : 15;
+        return bigEndian(marker | small, 1) + (count < 15 ? "" : bigEndian(0x10, 1) + bigEndian(count, 1)) + content;
+    };
+    std::string parts;
+    const auto part = [&](const Value& each) { parts += bigEndian(add(list, each), 1); };
+    if (const auto dictionary = value.dictionary()) {
+        for (const auto& entry : *dictionary)
+            part(entry.key);
+        for (const auto& entry : *dictionary)
+            part(entry.value);
+        list.objects.push_back(marked(0xD0, dictionary->size(), parts));
+    } else if (const auto array = value.array()) {
+        for (const auto& element : *array)
+            part(element);
+        list.objects.push_back(marked(0xA0, array->size(), parts));
+    } else {
+        list.objects.push_back(marked(0x50, value.text()->size(), std::string(*value.text())));
+    }
+    return list.objects.size() - 1;
+}
+
 void updateFrom(benchmark::State& run, const std::vector<std::byte>& message)
 {
     Surroundings surroundings;
@@ -43,7 +69,9 @@ BENCHMARK(objectStreamXml);
 
 void objectStreamBinary(benchmark::State& run)
 {
-    updateFrom(run, binaryPropertyList(display()));
+    BinaryList list;
+    list.root = add(list, display());
+    updateFrom(run, copied(bytesOf(list.bytes())));
 }
 BENCHMARK(objectStreamBinary);
 

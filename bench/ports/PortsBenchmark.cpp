@@ -1,4 +1,5 @@
 // Messages through the message ports between two processes, which both run this program.
+#include "decoding/Main.h"
 #include "platform/SystemLog.h"
 #include "platform/qt/FrameSocket.h"
 #include "platform/qt/LinuxMessagePorts.h"
@@ -163,7 +164,6 @@ int main(int argc, char** argv)
     QCoreApplication application(argc, argv);
     if (argc == 4 && std::string_view(argv[1]) == "--send")
         return kestrum::bench::sendAll(argv[2], argv[3]);
-    benchmark::Initialize(&argc, argv);
     kestrum::bench::registerAll();
-    benchmark::RunSpecifiedBenchmarks();
+    return kestrum::bench::runAll(argc, argv);
 }

@@ -1,12 +1,14 @@
 #pragma once
 
 #include "LogGenerator/LogGenerator.h"
+#include "core/KestrumModelNode.h"
 #include "decoding/Messages.h"
 #include "voxd/scenarios/Scenario.h"
 
 #include <chrono>
-#include <cstdint>
 #include <memory>
+#include <span>
+#include <string_view>
 #include <vector>
 
 namespace kestrum::bench {
@@ -16,37 +18,36 @@ using std::chrono::microseconds;
 /// The application refreshes the display each time this much of a drive has passed.
 inline constexpr microseconds kRefresh = std::chrono::seconds(2);
 
-/// The messages of a scenario's first technology, generated on request.
-class Drive {
-public:
-    explicit Drive(const Scenario& scenario);
+/// A scenario from its beginning. Always the same messages. `lists` is borrowed.
+std::unique_ptr<Source> begin(const Scenario& scenario, PropertyLists& lists);
 
-    /// Empty at the end, and where the technology changes.
-    std::optional<Source::Message> next();
-
-private:
-    PropertyListCodec _lists;
-    std::unique_ptr<Source> _source;
-    std::string_view _technology;
-};
-
-/// The first `time` of a scenario, in memory, so that only the decoding is measured.
+/// The first `time` of a scenario, in memory, so that only the decoding is measured. Ends where the technology changes.
 std::vector<Source::Message> driven(const Scenario& scenario, std::chrono::minutes time);
+
+/// The same messages in parts of `kRefresh` each.
+std::vector<std::span<const Source::Message>> betweenRefreshes(const std::vector<Source::Message>& messages);
 
 /// The real generator with its shipped template.
 class Decoding {
 public:
     explicit Decoding(std::string_view technology);
 
-    void receive(Bytes message) { _generator->updateState(state, message); }
-    /// Updates the display and its tree.
+    /// Continues on the same state with another generator.
+    void changeTo(std::string_view technology);
+
+    void receive(Bytes message) { _generator->updateState(_state, message); }
+    /// Updates the display and makes its tree.
+    KestrumModelNodeRef refresh(PathDictionary& paths);
     void refresh();
 
-    State state;
+    /// Makes every list of the display as long, and every row as wide, as they can get. The readings depend on
+    /// `round`, so that each round changes every text.
+    void fill(unsigned round);
 
 private:
     Surroundings _surroundings;
     std::unique_ptr<LogGenerator> _generator;
+    State _state;
 };
 
 } // namespace kestrum::bench

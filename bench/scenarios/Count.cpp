@@ -1,0 +1,41 @@
+// For callgrind, which counts the instructions inside `counted` alone: two minutes of a scenario, after the same two
+// minutes have created the display's values.
+//
+//   valgrind --tool=callgrind --toggle-collect='kestrum::bench::counted*' bench_count lte
+#include "decoding/Counting.h"
+#include "scenarios/Drive.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <string_view>
+
+namespace kestrum::bench {
+
+[[gnu::noinline]] void counted(Decoding& decoding, std::span<const Source::Message> messages)
+{
+    for (const auto& message : messages)
+        decoding.receive(message.bytes);
+}
+
+} // namespace kestrum::bench
+
+int main(int argc, char** argv)
+{
+    using namespace kestrum;
+    const auto scenario = std::ranges::find(scenarios(), std::string_view(argc == 2 ? argv[1] : ""), &Scenario::name);
+    if (scenario == scenarios().end()) {
+        std::fputs("Usage: bench_count SCENARIO\n", stderr);
+        return 2;
+    }
+    const auto messages = bench::driven(*scenario, std::chrono::minutes(2));
+    const auto parts = bench::betweenRefreshes(messages);
+    bench::Decoding decoding(scenario->technology);
+    for (const auto& message : messages)
+        decoding.receive(message.bytes);
+    decoding.refresh();
+    for (const auto part : parts) {
+        bench::counted(decoding, part);
+        decoding.refresh();
+    }
+    std::printf("messages\t%zu\t\n", messages.size());
+}
