@@ -1,5 +1,6 @@
 #include "frontends/qt/MainWindow.h"
 
+#include "frontends/qt/Icon.h"
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Shortcuts.h"
 #include "frontends/qt/Type.h"
@@ -7,6 +8,8 @@
 #include <QGuiApplication>
 #include <QInputDevice>
 #include <QScreen>
+#include <QTimer>
+#include <QWindow>
 #include <algorithm>
 
 namespace kestrum::qt {
@@ -102,10 +105,21 @@ void MainWindow::makeKeyAndVisible()
     } else {
         show();
     }
+    windowHandle()->installEventFilter(this);
     activateWindow();
     if (_root)
         _root->takeFocus();
     showNextAlert();
+}
+
+bool MainWindow::eventFilter(QObject* watched, QEvent* event)
+{
+    // Searching the desktop's icon themes takes a quarter of the start, and the first picture does not need the icon.
+    if (event->type() == QEvent::Expose) {
+        watched->removeEventFilter(this);
+        QTimer::singleShot(0, this, [this] { setWindowIcon(qt::windowIcon()); });
+    }
+    return QWidget::eventFilter(watched, event);
 }
 
 void MainWindow::resizeEvent(QResizeEvent*)

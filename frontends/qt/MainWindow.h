@@ -13,6 +13,7 @@ public:
     ~MainWindow() override;
 
     void setRoot(NavigationView& root) override;
+    /// The icon follows once the window has its first picture.
     void makeKeyAndVisible() override;
     void orderOut() override
     {
@@ -25,6 +26,8 @@ public:
     void showAlert(std::string_view title, std::string_view message, std::string_view button);
     Alert* alert() const { return _alert; }
     Navigation* root() const { return _root; }
+
+    bool eventFilter(QObject* watched, QEvent* event) override;
 
 protected:
     void resizeEvent(QResizeEvent*) override;

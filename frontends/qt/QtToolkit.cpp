@@ -3,7 +3,6 @@
 #include "frontends/qt/Accessibility.h"
 #include "frontends/qt/Appearance.h"
 #include "frontends/qt/FocusRing.h"
-#include "frontends/qt/Icon.h"
 #include "frontends/qt/MainWindow.h"
 #include "frontends/qt/Type.h"
 #include "platform/ApplicationDelegate.h"
@@ -62,7 +61,6 @@ public:
         QApplication::setApplicationName(QStringLiteral("kestrum"));
         QApplication::setApplicationDisplayName(QStringLiteral("Kestrum"));
         QGuiApplication::setDesktopFileName(QStringLiteral("kestrum"));
-        QApplication::setWindowIcon(windowIcon());
         installAccessibility();
         chooseSansSerif();
         FocusRing::instance();
