@@ -206,7 +206,7 @@ void decode(Bytes input)
     require(once.log.lines == again.log.lines, "equal bytes, other log");
     require(describe(templateNode) == templateBefore, "the template was changed");
     if (const Value display = once.state.at("Display"); templateNode && display)
-        require(hasShapeOf(technology, templateNode, display), "a key that nobody announced");
+        require(hasShapeOf(technology, templateNode, display), "a key that is not in the template");
 }
 
 } // namespace

@@ -114,8 +114,8 @@ private:
         }
         _window = nullptr;
         if (_faults.lines > kMostFaultLines)
-            complain(formatted("%s: %lu more errors, with %lu bytes skipped", _file,
-                               _faults.lines - kMostFaultLines, _faults.unreported));
+            complain(formatted("%s: %lu more errors, with %lu bytes skipped", _file, _faults.lines - kMostFaultLines,
+                               _faults.unreported));
     }
 
     void decode(const std::string& file, Input& input, ByteWindow& window)
