@@ -19,6 +19,9 @@ using namespace std::chrono;
 
 // The maximum time for sending messages before the sockets are served again.
 constexpr milliseconds kBatch{10};
+// The messages of this much time are sent together, at most this late, so that the service and its clients wake up 20
+// times a second at any rate of messages.
+constexpr milliseconds kSlice{50};
 constexpr milliseconds kConnectTimeout{1000};
 constexpr hours kLongestWait{1};
 constexpr std::size_t kUnsentReplies = 256 << 10;
@@ -171,7 +174,8 @@ void Service::pace()
         fetch();
     if (!_next)
         return;
-    const duration<double, std::milli> wait = (_next->at - position(now)) / _settings.speed;
+    const duration<double, std::milli> untilDue = (_next->at - position(now)) / _settings.speed;
+    const auto wait = std::max<duration<double, std::milli>>(untilDue, _nextSlice - now);
     const duration<double, std::milli> longest = kLongestWait;
     _due.start(milliseconds(static_cast<std::int64_t>(std::ceil(std::clamp(wait.count(), 0.0, longest.count())))));
 }
@@ -189,10 +193,18 @@ void Service::fetch()
 
 void Service::streamDue()
 {
-    for (const Moment end = steady_clock::now() + kBatch; _next;) {
+    const Moment begin = steady_clock::now();
+    // Shorter in a fast replay, so that the clients do not get its messages in large bursts.
+    const duration<double, std::milli> slice = kSlice / std::max(_settings.speed, 1.0);
+    _nextSlice = begin + round<Moment::duration>(slice);
+    while (_next) {
         const Moment now = steady_clock::now();
-        if (now >= end || _next->at > position(now))
+        if (_next->at > position(now))
             break;
+        if (now >= begin + kBatch) {
+            _nextSlice = now; // more is due already
+            break;
+        }
         if (_nextTechnology != _technology) {
             changeTechnology();
             break;

@@ -89,6 +89,7 @@ private:
     std::chrono::microseconds _position{0}; // the source's time at `_since`, or while it stands still
     std::optional<Moment> _since;           // when the source's time started to run; empty while it stands still
     bool _sourceEnded = false;
+    Moment _nextSlice; // no message is sent before it
     QTimer _due;
 };
 
