@@ -13,7 +13,8 @@ namespace kestrum {
 
 /// The system's log, written by a second thread, so that a daemon that stops reading never stops the program. When the
 /// queue is full, lines are dropped and their count is logged, also during a long flood; lines of error priority replace
-/// others. A line longer than `kLongestLine` is cut and ends in an ellipsis: a peer chooses some of the texts.
+/// others. A line longer than `kLongestLine` is cut and ends in an ellipsis: a peer chooses some of the texts. Priority 16
+/// counts as notice.
 class LinuxSystemLog final : public SystemLog {
 public:
     /// Writes a line, called by the thread. `level` is syslog's, 0 to 7. False when the line is lost.
