@@ -58,7 +58,7 @@ std::optional<Data> ZPHLogGenerator::generateDlfFromState(const State& state) co
             }
             // Without the type byte of the interval's first record. The other records keep theirs.
             const Bytes raw = recorded.data()->bytes();
-            if (raw.size() >= 2)
+            if (!raw.empty())
                 stream.insert(stream.end(), raw.begin() + 1, raw.end());
         }
     }

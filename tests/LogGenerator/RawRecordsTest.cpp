@@ -36,6 +36,16 @@ TEST(RawRecords, KeepsAllUpToTheCapacity)
     EXPECT_EQ(interval.dropped, 0u);
 }
 
+TEST(RawRecords, HaveTheirWholeCapacityInEachInterval)
+{
+    RawRecords records(kCapacity);
+    for (int interval = 0; interval < 3; ++interval) {
+        for (int i = 0; i < 16; ++i)
+            records.append(bytesOf("word"));
+        EXPECT_EQ(records.take().dropped, 0u);
+    }
+}
+
 TEST(RawRecords, DropsTheOldestWholeMessagesAndCountsThem)
 {
     RawRecords records(kCapacity);

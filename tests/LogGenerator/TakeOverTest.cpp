@@ -100,6 +100,16 @@ TEST_F(TakeOver, DisplayOfAnotherTechnologyIsPutAside)
     EXPECT_FALSE(other.replacesDisplayOf(doubles.state));
 }
 
+TEST_F(TakeOver, PutAsideDisplayIsReleased)
+{
+    const std::weak_ptr<Dictionary> watched = std::exchange(built, nullptr);
+    doubles.state.remove("History");
+    doubles.propertyLists.files.clear();
+    sample::Generator other(doubles.roles, "another");
+    other.getDisplayFromState(doubles.state);
+    EXPECT_TRUE(watched.expired());
+}
+
 TEST_F(TakeOver, PutAsideDisplayTakesItsRawRecordsAlong)
 {
     ASSERT_TRUE(doubles.state.contains("DisplayState"));
@@ -117,13 +127,13 @@ TEST_F(TakeOver, ReplacedDisplayShowsNothingOnceAsEveryNewOneDoes)
 
 TEST_F(TakeOver, DisplayOfUnknownOriginIsReturnedAsItIs)
 {
-    const auto foreign = makeDictionary({{"Whose", "unknown"}});
+    const Value foreign = deepCopy(built);
     doubles.state.set("Display", foreign);
     sample::Generator next(doubles.roles);
     EXPECT_FALSE(next.replacesDisplayOf(doubles.state));
-    EXPECT_EQ(next.getDisplayFromState(doubles.state).dictionary(), foreign);
+    EXPECT_EQ(next.getDisplayFromState(doubles.state).dictionary(), foreign.dictionary());
     next.updateState(doubles.state, message(1, 0x4001, {8}));
-    EXPECT_EQ(Value(foreign), Value(makeDictionary({{"Whose", "unknown"}})));
+    EXPECT_EQ(foreign, Value(built)) << "no section writes into it";
 }
 
 TEST_F(TakeOver, EmptyStateHasNothingToReplace)

@@ -64,13 +64,13 @@ TEST_F(TemplateGenerator, LinesNameTheIndexAndTheGeneratorInTheirPlaces)
 
 TEST_F(TemplateGenerator, KeepsABoundedIntervalOfRawRecordsAndLogsWhatItDrops)
 {
-    const std::vector<std::byte> invalid(1 << 20, std::byte{7});
-    for (int i = 0; i < 80; ++i)
+    const std::vector<std::byte> invalid(4 << 20, std::byte{7});
+    for (int i = 0; i < 17; ++i)
         generator->updateState(doubles.state, invalid);
     generator->generateLogUsingState(doubles.state);
     EXPECT_EQ(rawOfLastInterval().size(), 64u << 20);
     EXPECT_EQ(doubles.log.texts(Priority::Warning).back(),
-              "Too many raw records for one interval: the oldest 16 were dropped");
+              "Too many raw records for one interval: the oldest 1 were dropped");
 
     doubles.log.lines.clear();
     generator->updateState(doubles.state, message(1, 0x4001, {7}));

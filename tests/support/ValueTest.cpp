@@ -133,6 +133,7 @@ TEST(Value, ComparesContents)
     EXPECT_NE(Value(makeArray({1, 2})), Value(makeArray({2, 1})));
     EXPECT_NE(Value(makeArray({1})), Value(makeArray({1, 2})));
     EXPECT_EQ(Value(Data(bytesOf("a"))), Value(Data(bytesOf("a"))));
+    EXPECT_NE(Value(-1), Value(-2));
     EXPECT_NE(Value(1), Value(1.0));
     EXPECT_NE(Value(true), Value(1));
     EXPECT_NE(Value(""), Value());
