@@ -120,6 +120,8 @@ public:
     virtual void updateWithData(Record data, LogCode logCode);
 
     void updateSectionRef(const Value& node);
+    /// Its node in the display; null when it has none.
+    Value node() const { return sectionRef.node(); }
     void updateLogCodeDict(CodeDictionary& codeDict);
 
     /// Empty or replace an array under ArrayLock. They do nothing when the node is no array.

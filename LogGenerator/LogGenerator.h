@@ -3,9 +3,12 @@
 #include "LogGenerator/State.h"
 #include "platform/Roles.h"
 #include "support/Bytes.h"
+#include "support/Record.h"
 
 #include <memory>
+#include <optional>
 #include <string_view>
+#include <vector>
 
 namespace kestrum {
 
@@ -28,6 +31,8 @@ public:
 
     /// Decodes one channel message. May throw for an invalid one; the next message can be decoded.
     virtual void updateState(State& state, Bytes withData) = 0;
+    /// The nodes of the display that a message of the code may change, and no other. Nothing when it may change any.
+    virtual std::optional<std::vector<Value>> nodesOf(LogCode) const { return std::nullopt; }
     /// The display dictionary, null when there is none yet. Also appends the display to the history.
     virtual Value generateLogUsingState(State& state) = 0;
     /// The command that starts the modem's log.

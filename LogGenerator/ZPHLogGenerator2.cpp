@@ -59,6 +59,16 @@ void ZPHLogGenerator2::updateWithData(Bytes message)
             section->updateWithData(read->record, read->logCode);
 }
 
+std::optional<std::vector<Value>> ZPHLogGenerator2::nodesOf(LogCode code) const
+{
+    std::vector<Value> nodes;
+    if (const auto* subscribers = _cIndex ? _cIndex->getSubscribers(code) : nullptr)
+        for (const Base* section : *subscribers)
+            if (Value node = section->node())
+                nodes.push_back(std::move(node));
+    return nodes;
+}
+
 Value ZPHLogGenerator2::processTemplate(const Value& node) const
 {
     if (node.isText())

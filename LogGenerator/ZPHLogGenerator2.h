@@ -19,6 +19,9 @@ public:
     /// Decodes one channel message and passes it to the sections of its code.
     void updateWithData(Bytes message);
 
+    /// The nodes of the sections that take the code.
+    std::optional<std::vector<Value>> nodesOf(LogCode code) const override;
+
     /// Copies a template node. A section whose name is a key gets the copied value as its node. Null for a value other
     /// than a dictionary, an array or a string.
     Value processTemplate(const Value& node) const;

@@ -92,18 +92,6 @@ DictionaryRef Value::dictionary() const
     return held ? *held : nullptr;
 }
 
-Array* Value::borrowedArray() const
-{
-    const auto* held = std::get_if<ArrayRef>(&_held);
-    return held ? held->get() : nullptr;
-}
-
-Dictionary* Value::borrowedDictionary() const
-{
-    const auto* held = std::get_if<DictionaryRef>(&_held);
-    return held ? held->get() : nullptr;
-}
-
 std::optional<std::int32_t> Value::int32() const
 {
     if (const auto whole = integer(); whole && *whole >= INT32_MIN && *whole <= INT32_MAX)

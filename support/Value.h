@@ -59,7 +59,7 @@ public:
     }
 
     Kind kind() const;
-    bool isNull() const { return kind() == Kind::Null; }
+    bool isNull() const { return std::holds_alternative<std::monostate>(_held); }
     bool isText() const { return kind() == Kind::String; }
     explicit operator bool() const { return !isNull(); }
 
@@ -75,8 +75,9 @@ public:
     ArrayRef array() const;
     DictionaryRef dictionary() const;
     /// Borrowed: valid until the value changes.
-    Array* borrowedArray() const;
-    Dictionary* borrowedDictionary() const;
+    Dictionary* borrowedDictionary() const { return borrowed<DictionaryRef>(); }
+    Array* borrowedArray() const { return borrowed<ArrayRef>(); }
+    const Reading* borrowedReading() const { return std::get_if<Reading>(&_held); }
     const std::string* borrowedString() const { return std::get_if<std::string>(&_held); } ///< null for a reading
 
     /// A 32-bit number: an integer in range, or a real in range without a fraction. Nothing for a boolean.
@@ -110,6 +111,12 @@ public:
 private:
     template <typename Container>
     Container& become();
+    template <typename Reference>
+    typename Reference::element_type* borrowed() const
+    {
+        const auto* held = std::get_if<Reference>(&_held);
+        return held != nullptr ? held->get() : nullptr;
+    }
 
     std::variant<std::monostate, std::string, Reading, std::int64_t, std::uint64_t, double, bool, Date, Data, ArrayRef,
                  DictionaryRef>

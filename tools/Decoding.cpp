@@ -39,10 +39,13 @@ std::set<LogCode> codesIn(const LogGenerator& generator)
 
 std::string codeText(LogCode code)
 {
-    auto digits = formatted("%04x", code);
-    std::ranges::transform(digits, digits.begin(),
-                           [](char c) { return c >= 'a' ? static_cast<char>(c - 'a' + 'A') : c; });
-    return "0x" + digits;
+    int digits = 4;
+    while (digits < 8 && code >> (4 * digits) != 0)
+        ++digits;
+    std::string text = "0x";
+    for (int at = digits; at-- > 0;)
+        text += "0123456789ABCDEF"[code >> (4 * at) & 0xF];
+    return text;
 }
 
 Tally& Tally::operator+=(const Tally& other)

@@ -66,6 +66,8 @@ public:
     const std::string& technology() const { return _technology; }
     /// The display dictionary; null when there is none.
     Value display() const { return _state.at(StateKey::kDisplay); }
+    /// The nodes of the display that a message of the code may change. Nothing when it may change any node.
+    std::optional<std::vector<Value>> nodesOf(LogCode code) const { return _generator->nodesOf(code); }
     const Statistics& statistics() const { return _statistics; }
     Tally total() const;
 

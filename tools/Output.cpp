@@ -10,6 +10,8 @@
 
 #include <algorithm>
 #include <charconv>
+#include <chrono>
+#include <cmath>
 #include <cstdio>
 #include <utility>
 
@@ -66,8 +68,7 @@ Json jsonOf(const Value& value)
 /// Appends a text as JSON. Nearly all texts are plain and need only quotes.
 void appendJson(std::string& to, std::string_view raw)
 {
-    const auto isPlain = [](char c) { return c >= 0x20 && c < 0x7F && c != '"' && c != '\\'; };
-    if (!std::ranges::all_of(raw, isPlain)) {
+    if (!Changes::isPlain(raw)) {
         to += text(Json(raw));
         return;
     }
@@ -76,19 +77,55 @@ void appendJson(std::string& to, std::string_view raw)
     to += '"';
 }
 
-/// The shortest decimal text that reads back as the number.
-std::string numberText(double number)
+/// Up to here a short number is not written with an exponent.
+constexpr double kMostShort = 1e5;
+
+/// Appends the shortest decimal text that reads back as the number.
+void appendNumber(std::string& to, double number)
 {
     char digits[32];
-    return {digits, std::to_chars(std::begin(digits), std::end(digits), number).ptr};
+    char* end = digits;
+    const auto hundredths = std::abs(number) < kMostShort ? static_cast<int>(std::abs(number) * 100 + 0.5) : -1;
+    if (static_cast<double>(hundredths) / 100 == std::abs(number)) {
+        if (std::signbit(number))
+            *end++ = '-';
+        end = std::to_chars(end, std::end(digits), hundredths / 100).ptr;
+        if (const auto fraction = hundredths % 100; fraction != 0) {
+            *end++ = '.';
+            *end++ = static_cast<char>('0' + fraction / 10);
+            if (fraction % 10 != 0)
+                *end++ = static_cast<char>('0' + fraction % 10);
+        }
+    } else {
+        end = std::to_chars(digits, std::end(digits), number).ptr;
+    }
+    to.append(digits, end);
 }
 
-/// A value as plain text, for a table's cell or a line of a tree.
-std::string plainText(const Value& value)
+/// The text of a time stamp. Most messages come in the second of the one before them.
+class StampText {
+public:
+    void append(std::string& to, Date stamp)
+    {
+        const auto second = std::chrono::floor<std::chrono::seconds>(stamp);
+        if (_text.empty() || second != _second) {
+            _second = second;
+            _text = isoText(second, kFraction);
+        }
+        auto fraction = (stamp - second).count();
+        for (auto at = _text.size() - 2; _text[at] != '.'; --at, fraction /= 10)
+            _text[at] = static_cast<char>('0' + fraction % 10);
+        to += _text;
+    }
+
+private:
+    Date _second{};
+    std::string _text;
+};
+
+std::string jsonText(const Value& value)
 {
-    if (auto words = value.text())
-        return *std::move(words);
-    return value.isNull() ? std::string() : text(jsonOf(value));
+    return text(jsonOf(value));
 }
 
 Json jsonOf(const SnapshotListing& listing)
@@ -244,70 +281,144 @@ private:
     Json _snapshots = Json::array();
 };
 
-class JsonlOutput final : public RemarkingOutput {
-public:
-    JsonlOutput(Contents contents, OutputFile& data, OutputFile& remarks)
-        : RemarkingOutput(contents, data, remarks), _withNumbers(contents.numbers)
-    {}
-
-    void message(const Decoding& decoding, const Decoding::Decoded& decoded) override
-    {
-        _changed.clear();
-        _changes.look(decoding.display());
-        if (_changed.empty())
-            return;
-        _data.write("{\"time\":");
-        _data.write(decoded.time ? '"' + isoText(*decoded.time, kFraction) + '"' : "null");
-        _data.write(",\"code\":");
-        _data.write(decoded.code ? '"' + codeText(*decoded.code) + '"' : "null");
-        _data.write(",\"changes\":{");
-        _data.write(_changed);
-        _data.write("}}\n");
-    }
-
-private:
-    const bool _withNumbers;
-    std::string _changed;
-    Changes _changes{[this](std::string_view path, const Value& value) {
-        if (!_changed.empty())
-            _changed += ',';
-        appendJson(_changed, path);
-        _changed += ':';
-        const auto reading = value.reading();
-        const auto number = _withNumbers && reading ? reading->number() : std::nullopt;
-        if (number)
-            _changed += "{\"text\":";
-        if (const auto words = value.text())
-            appendJson(_changed, *words);
-        else
-            _changed += text(jsonOf(value));
-        if (number) {
-            _changed += ",\"number\":" + numberText(*number) + ",\"unit\":";
-            appendJson(_changed, reading->unit());
-            _changed += '}';
-        }
-    }};
+/// A number and a unit, for a value that measures something.
+struct Measure {
+    double number;
+    std::string_view unit;
 };
 
-/// A CSV cell (RFC 4180). A cell with a quote, a comma or a line end is put in quotes, and quotes inside it are
-/// doubled. Lines end with CR LF.
-std::string cell(std::string_view raw)
+std::optional<Measure> measureIn(const Value& value)
 {
-    if (raw.find_first_of("\",\r\n") == raw.npos)
-        return std::string(raw);
-    std::string quoted = "\"";
+    const auto* reading = value.borrowedReading();
+    const auto number = reading != nullptr ? reading->number() : std::nullopt;
+    return number ? std::optional(Measure{*number, reading->unit()}) : std::nullopt;
+}
+
+/// Writes the changes of each message that changed the display.
+class ChangesOutput : public RemarkingOutput {
+public:
+    using RemarkingOutput::RemarkingOutput;
+
+    void message(const Decoding& decoding, const Decoding::Decoded& decoded) final
+    {
+        _decoded = &decoded;
+        _isChanged = false;
+        if (decoded.code)
+            _changes.look(decoding.display(), *decoded.code,
+                          [&decoding](LogCode code) { return decoding.nodesOf(code); });
+        else
+            _changes.look(decoding.display());
+        if (!_isChanged)
+            return;
+        end(_text);
+        write();
+    }
+
+protected:
+    /// What is written before the first change of a message, for each change, and behind the last one.
+    virtual void begin(std::string& text, const Decoding::Decoded& decoded) = 0;
+    virtual void append(std::string& text, const Changes::Change& change, bool isFirst) = 0;
+    virtual void end(std::string&) {}
+
+private:
+    void changed(const Changes::Change& change)
+    {
+        const bool isFirst = !std::exchange(_isChanged, true);
+        if (isFirst)
+            begin(_text, *_decoded);
+        append(_text, change, isFirst);
+        if (_text.size() >= kPiece)
+            write();
+    }
+    void write()
+    {
+        _data.write(_text);
+        _text.clear();
+    }
+
+    static constexpr std::size_t kPiece = 64 << 10; ///< bytes; a message may change any number of values
+
+    const Decoding::Decoded* _decoded = nullptr; ///< the message that is looked at
+    bool _isChanged = false;
+    std::string _text;
+    Changes _changes{[this](const Changes::Change& change) { changed(change); }};
+};
+
+class JsonlOutput final : public ChangesOutput {
+public:
+    JsonlOutput(Contents contents, OutputFile& data, OutputFile& remarks)
+        : ChangesOutput(contents, data, remarks), _withNumbers(contents.numbers)
+    {}
+
+private:
+    void append(std::string& text, const Changes::Change& change, bool isFirst) override
+    {
+        if (change.isPathPlain) {
+            text += isFirst ? "\"" : ",\"";
+            text += change.path;
+            text += "\":";
+        } else {
+            text += isFirst ? "" : ",";
+            appendJson(text, change.path);
+            text += ':';
+        }
+        const auto measure = _withNumbers ? measureIn(change.value) : std::nullopt;
+        if (measure)
+            text += "{\"text\":";
+        if (change.value.isText())
+            appendJson(text, change.text);
+        else
+            text += jsonText(change.value);
+        if (measure) {
+            text += ",\"number\":";
+            appendNumber(text, measure->number);
+            text += ",\"unit\":";
+            appendJson(text, measure->unit);
+            text += '}';
+        }
+    }
+    void begin(std::string& text, const Decoding::Decoded& decoded) override
+    {
+        text += "{\"time\":";
+        if (decoded.time) {
+            text += '"';
+            _stamp.append(text, *decoded.time);
+            text += '"';
+        } else {
+            text += "null";
+        }
+        text += ",\"code\":";
+        text += decoded.code ? '"' + codeText(*decoded.code) + '"' : "null";
+        text += ",\"changes\":{";
+    }
+    void end(std::string& text) override { text += "}}\n"; }
+
+    const bool _withNumbers;
+    StampText _stamp;
+};
+
+/// Appends a CSV cell (RFC 4180). A cell with a quote, a comma or a line end is put in quotes, and quotes inside it are
+/// doubled. Lines end with CR LF.
+void appendCell(std::string& to, std::string_view raw)
+{
+    if (Changes::isPlain(raw) || raw.find_first_of("\",\r\n") == raw.npos) {
+        to += raw;
+        return;
+    }
+    to += '"';
     for (const char each : raw)
-        quoted.append(each == '"' ? 2 : 1, each);
-    return quoted + '"';
+        to.append(each == '"' ? 2 : 1, each);
+    to += '"';
 }
 
 /// "-98.25 dBm": a sign, a number, and optionally a blank and a unit.
 bool isNumber(std::string_view raw)
 {
-    const auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
     raw.remove_prefix(raw.starts_with('+') || raw.starts_with('-') ? 1 : 0);
-    const auto digits = std::min(raw.find_first_not_of("0123456789."), raw.size());
-    if (std::ranges::none_of(raw.substr(0, digits), isDigit) || std::ranges::count(raw.substr(0, digits), '.') > 1)
+    std::size_t digits = 0, points = 0;
+    for (; digits < raw.size() && (raw[digits] == '.' || (raw[digits] >= '0' && raw[digits] <= '9')); ++digits)
+        points += raw[digits] == '.' ? 1u : 0u;
+    if (digits == points || points > 1)
         return false;
     const auto unit = raw.substr(digits);
     return unit.empty() || (unit.front() == ' ' && std::ranges::all_of(unit, [](char c) {
@@ -316,54 +427,59 @@ bool isNumber(std::string_view raw)
                             }));
 }
 
-/// An apostrophe makes a spreadsheet treat a formula as text.
-std::string guarded(std::string text)
+/// Appends a cell that no spreadsheet takes for a formula: an apostrophe makes it a text.
+void appendGuardedCell(std::string& to, std::string_view raw)
 {
-    const bool isFormula =
-        !text.empty() && std::string_view("=+-@\t\r").find(text.front()) != std::string_view::npos && !isNumber(text);
-    return isFormula ? "'" + text : text;
+    const auto begins = [](char c) { return c == '=' || c == '+' || c == '-' || c == '@' || c == '\t' || c == '\r'; };
+    if (!raw.empty() && begins(raw.front()) && !isNumber(raw))
+        appendCell(to, formatted("'%@", raw));
+    else
+        appendCell(to, raw);
 }
 
-class CsvOutput final : public RemarkingOutput {
+class CsvOutput final : public ChangesOutput {
 public:
-    CsvOutput(Contents contents, OutputFile& data, OutputFile& remarks) : RemarkingOutput(contents, data, remarks)
+    CsvOutput(Contents contents, OutputFile& data, OutputFile& remarks) : ChangesOutput(contents, data, remarks)
     {
         _data.write("time,code,path,value,number,unit\r\n");
     }
 
-    void message(const Decoding& decoding, const Decoding::Decoded& decoded) override
-    {
-        _decoded = &decoded;
-        _begin.clear();
-        _changes.look(decoding.display());
-    }
-
 private:
-    const std::string& begin()
+    void append(std::string& text, const Changes::Change& change, bool) override
     {
-        if (_begin.empty()) {
-            _begin = _decoded->time ? isoText(*_decoded->time, kFraction) : std::string();
-            _begin += ',';
-            if (_decoded->code)
-                _begin += codeText(*_decoded->code);
-            _begin += ',';
+        text += _begin;
+        if (change.isPathPlain)
+            text += change.path;
+        else
+            appendCell(text, change.path);
+        text += ',';
+        if (change.value.isText())
+            appendGuardedCell(text, change.text);
+        else if (!change.value.isNull())
+            appendGuardedCell(text, jsonText(change.value));
+        if (const auto measure = measureIn(change.value)) {
+            text += ',';
+            appendNumber(text, measure->number);
+            text += ',';
+            appendCell(text, measure->unit);
+            text += "\r\n";
+        } else {
+            text += ",,\r\n";
         }
-        return _begin;
+    }
+    void begin(std::string&, const Decoding::Decoded& decoded) override
+    {
+        _begin.clear();
+        if (decoded.time)
+            _stamp.append(_begin, *decoded.time);
+        _begin += ',';
+        if (decoded.code)
+            _begin += codeText(*decoded.code);
+        _begin += ',';
     }
 
-    const Decoding::Decoded* _decoded = nullptr;
-    std::string _begin; ///< the first cells of the message's rows; empty until the first row
-    Changes _changes{[this](std::string_view path, const Value& value) {
-        _data.write(begin());
-        _data.write(cell(path));
-        _data.write(",");
-        _data.write(cell(guarded(plainText(value))));
-        const auto reading = value.reading();
-        const auto number = reading ? reading->number() : std::nullopt;
-        _data.write("," + (number ? numberText(*number) : "") + ',');
-        _data.write(number ? cell(reading->unit()) : "");
-        _data.write("\r\n");
-    }};
+    StampText _stamp;
+    std::string _begin; ///< the first cells of the message's rows
 };
 
 } // namespace
