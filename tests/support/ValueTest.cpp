@@ -270,6 +270,25 @@ TEST(Array, ReleasesItsElementsWhenItIsCleared)
     EXPECT_EQ(held.use_count(), 1);
 }
 
+TEST(Dictionary, TellsKeysApartThatDifferInOneByte)
+{
+    for (std::size_t size = 1; size <= 33; ++size)
+        for (std::size_t at = 0; at < size; ++at) {
+            const std::string key(size, 'a');
+            std::string other = key;
+            other[at] = 'b';
+            Dictionary dictionary{{key, "left behind"}};
+            dictionary.startOver();
+            dictionary.setText(other, "new"); // the spare has the other key
+            EXPECT_EQ(describe(makeDictionary({{other, "new"}})), describe(std::make_shared<Dictionary>(dictionary)))
+                << size << " " << at;
+            dictionary.startOver();
+            dictionary.setText(other, "again");
+            EXPECT_EQ(dictionary.size(), 1u);
+            EXPECT_EQ(dictionary.at(other), "again");
+        }
+}
+
 TEST(Array, DropsItsSparesAndNothingElse)
 {
     const auto kept = makeDictionary(), spare = makeDictionary();
