@@ -344,6 +344,7 @@ TEST_F(Channel, CountsTheMessagesThatTheServiceDroppedAndTellsOnceForSeveral)
     ports.send(kLogPort, 1, "\xFF\xFF\xFF\xFF\xFF\xFF\xFF\xFF"sv);
     queue.run();
     EXPECT_EQ(model->lostMessages(), std::numeric_limits<std::uint64_t>::max()) << "does not wrap";
+    EXPECT_THAT(told, ElementsAre("lost 4294967303", "lost 18446744073709551615"));
 }
 
 TEST_F(Channel, IgnoresInvalidLossReportsAndMessagesOfOtherIds)

@@ -317,7 +317,11 @@ public:
         path = std::move(titles);
         transitions.emplace_back(transition, animated);
     }
-    void setTitles(std::vector<std::string> titles) override { path = std::move(titles); }
+    void setTitles(std::vector<std::string> titles) override
+    {
+        path = std::move(titles);
+        ++titleChanges;
+    }
     void setToolbarHidden(bool hidden) override { toolbarHidden = hidden; }
     void setNotice(std::string_view text) override { notice = text; }
     void present(SaveInterface& screen, bool animated) override
@@ -338,6 +342,7 @@ public:
 
     RecordingScreen* shown = nullptr;
     std::vector<std::string> path; ///< the titles, root first
+    int titleChanges = 0;          ///< while the shown pane stayed
     std::vector<std::pair<Transition, bool>> transitions;
     bool toolbarHidden = true;
     std::string notice;

@@ -254,6 +254,7 @@ TEST(ConnectionHintTest, SaysWhatIsMissingAndHowToStartIt)
 TEST_F(KestrumAppTest, NoticeDisappearsAfterItsTime)
 {
     launch();
+    const auto timers = doubles.queue.timers();
     app->showNotice("first");
     doubles.queue.advance(5s);
     app->showNotice("second");
@@ -261,6 +262,7 @@ TEST_F(KestrumAppTest, NoticeDisappearsAfterItsTime)
     EXPECT_EQ(doubles.toolkit.navigation->notice, "second") << "each has its own time";
     doubles.queue.advance(1ms);
     EXPECT_EQ(doubles.toolkit.navigation->notice, "");
+    EXPECT_EQ(doubles.queue.timers(), timers);
 }
 
 TEST_F(KestrumAppTest, ApplicationCanEndWhileANoticeIsShown)
@@ -268,6 +270,7 @@ TEST_F(KestrumAppTest, ApplicationCanEndWhileANoticeIsShown)
     launch();
     app->showNotice("first");
     app->applicationWillTerminate();
+    EXPECT_EQ(doubles.queue.timers(), 0u);
     app.reset();
     doubles.queue.advance(10s);
     EXPECT_EQ(doubles.toolkit.record.windows, 0);

@@ -193,6 +193,9 @@ TEST_F(KestrumPaneControllerTest, NewNodeReplacesTitleAndRows)
     EXPECT_THAT(toolkit.navigation->path, ElementsAre("Field Test"));
     EXPECT_THAT(top().rows.texts(), ElementsAre("State: Idle"));
 
+    stack->topViewController().reloadWithNode(inner("Field Test", {leaf("State", "Active")}));
+    EXPECT_EQ(toolkit.navigation->titleChanges, 1) << "the title did not change";
+
     stack->topViewController().reloadWithNode(nullptr);
     EXPECT_EQ(top().title(), "Kestrum");
     EXPECT_THAT(top().rows.texts(), IsEmpty());

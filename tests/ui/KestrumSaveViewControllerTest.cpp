@@ -167,6 +167,19 @@ TEST_F(KestrumSaveViewControllerTest, ANameThatAnotherDisplayTookIsLeftToIt)
     EXPECT_THAT(doubles.toolkit.alerts, IsEmpty());
 }
 
+TEST_F(KestrumSaveViewControllerTest, TriesTheNamesOfAMinute)
+{
+    for (const bool isOneFree : {true, false}) {
+        for (int second = 0; second < (isOneFree ? 59 : 60); ++second)
+            doubles.propertyLists.taken.insert(formatted("/logs/KestrumSnapshot-%d.kestrum", 1794809142 + second));
+        open(makeArray());
+        controller->savePressed();
+        EXPECT_EQ(doubles.toolkit.alerts.empty(), isOneFree);
+        doubles.queue.run();
+    }
+    EXPECT_THAT(doubles.propertyLists.files, ElementsAre(testing::Pair("/logs/KestrumSnapshot-1794809201.kestrum", testing::_)));
+}
+
 TEST_F(KestrumSaveViewControllerTest, SavesTheContentsThatItListed)
 {
     const auto display = makeDictionary({{"State", "Idle"}});

@@ -104,6 +104,12 @@ TEST_F(NavigationStackTest, PopToRootLeavesTheRootAlone)
     EXPECT_EQ(toolkit.navigation->transitions.size(), 5u);
 }
 
+TEST_F(NavigationStackTest, DismissWithoutASaveScreenDoesNothing)
+{
+    stack->dismissViewController(true);
+    EXPECT_FALSE(toolkit.navigation->presentedAnimated);
+}
+
 TEST_F(NavigationStackTest, PoppedPaneWithAnotherOwnerTakesNoTaps)
 {
     open(1);
