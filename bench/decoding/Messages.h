@@ -19,6 +19,10 @@ namespace kestrum::bench {
 struct Surroundings {
     class Log final : public SystemLog {
         void write(Priority, std::string_view) override {}
+        bool passes(Priority priority) const override { return everything || priority == Priority::Error; }
+
+    public:
+        bool everything = false; ///< the programs pass errors alone, unless the user asks for more
     } log;
     class Nowhere final : public Console {
         void printLine(std::string_view) override {}

@@ -2,6 +2,8 @@
 // minutes have created the display's values.
 //
 //   valgrind --tool=callgrind --toggle-collect='kestrum::bench::counted*' bench_count lte
+//
+// With the argument "logged" every line of the system log is formatted, not the errors alone.
 #include "decoding/Counting.h"
 #include "scenarios/Drive.h"
 
@@ -22,14 +24,17 @@ namespace kestrum::bench {
 int main(int argc, char** argv)
 {
     using namespace kestrum;
-    const auto scenario = std::ranges::find(scenarios(), std::string_view(argc == 2 ? argv[1] : ""), &Scenario::name);
-    if (scenario == scenarios().end()) {
-        std::fputs("Usage: bench_count SCENARIO\n", stderr);
+    const auto argument = [&](int index) { return std::string_view(index < argc ? argv[index] : ""); };
+    const auto scenario = std::ranges::find(scenarios(), argument(1), &Scenario::name);
+    if (scenario == scenarios().end() || (argc > 2 && argument(2) != "logged")) {
+        std::fputs("Usage: bench_count SCENARIO [logged]\n", stderr);
         return 2;
     }
     const auto messages = bench::driven(*scenario, std::chrono::minutes(2));
     const auto parts = bench::betweenRefreshes(messages);
     bench::Decoding decoding(scenario->technology);
+    if (argc > 2)
+        decoding.logEverything();
     for (const auto& message : messages)
         decoding.receive(message.bytes);
     decoding.refresh();

@@ -32,6 +32,8 @@ class Decoding {
 public:
     explicit Decoding(std::string_view technology);
 
+    /// Lets every line of the system log be formatted, not the errors alone.
+    void logEverything() { _surroundings.log.everything = true; }
     /// Continues on the same state with another generator.
     void changeTo(std::string_view technology);
 

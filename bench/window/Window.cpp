@@ -109,15 +109,23 @@ void print(const std::string& name, std::vector<double> times)
     print(name, "worst", times.back());
 }
 
-/// The path of the pane with the most values.
-std::string widest(const PathDictionary& paths)
-{
-    const auto values = [](const PathDictionary::value_type& each) {
-        const auto* rows = each.second->childNodes();
-        return rows ? std::ranges::count_if(*rows, [](const auto& row) { return row->value() != nullptr; }) : 0;
-    };
-    return std::ranges::max_element(paths, {}, values)->first;
-}
+/// The pane with the most values.
+struct Widest {
+    std::string path;
+    std::ptrdiff_t values = -1;
+
+    void find(const KestrumModelNode& node, const std::string& at)
+    {
+        const auto* rows = node.childNodes();
+        if (!rows)
+            return;
+        const auto found = std::ranges::count_if(*rows, [](const auto& row) { return row->value() != nullptr; });
+        if (found > values)
+            *this = {at, found};
+        for (const auto& row : *rows)
+            find(*row, joinPath(at, row->displayName()));
+    }
+};
 
 void refreshes(Toolkit& toolkit, const Scenario& scenario)
 {
@@ -127,11 +135,11 @@ void refreshes(Toolkit& toolkit, const Scenario& scenario)
         decoding.receive(message.bytes);
     decoding.fill(0);
     PathDictionary paths;
-    decoding.refresh(paths);
+    Widest widest;
+    widest.find(*decoding.refresh(paths), std::string(kRootPath));
 
     Shown shown(toolkit);
-    const std::string path = widest(paths);
-    const auto pane = shown.pane(paths.at(path), path);
+    const auto pane = shown.pane(paths.find(widest.path), widest.path);
     shown.frame([&] { shown.push(pane); });
     std::vector<double> times;
     for (unsigned round = 1; round <= kRefreshes; ++round) {
@@ -140,8 +148,8 @@ void refreshes(Toolkit& toolkit, const Scenario& scenario)
             PathDictionary fresh;
             const auto tree = decoding.refresh(fresh);
             shown.root().reloadWithNode(tree);
-            pane->reloadWithNode(fresh.at(path));
-            paths = std::move(fresh); // the tree before it goes, as in the model
+            pane->reloadWithNode(fresh.find(widest.path));
+            paths = std::move(fresh); // frees the tree before it, as the model does
         }));
     }
     print("refresh and pane/" + std::string(scenario.name), std::move(times));
