@@ -273,13 +273,21 @@ Value& Dictionary::reuseElsewhere(std::string_view key)
 {
     if (const std::size_t at = advanceTo(key); at != kNotThere)
         return _entries[at].value;
-    dropSpares(); // one of them may have this key
-    if (_entries.empty())
-        _entries.reserve(kKeysOfARow);
-    _entries.push_back({std::string(key), Value()});
+    if (_entries.size() > kIndexFrom)
+        dropSpares(); // a search would take long
+    // The spare with this key, or the next one under its new key: rows take turns with other keys.
+    if (const auto spare = std::ranges::find(end(), _entries.end(), key, &Entry::key); spare != _entries.end()) {
+        std::iter_swap(end(), spare);
+    } else if (_size < _entries.size()) {
+        end()->key = key;
+    } else {
+        if (_entries.empty())
+            _entries.reserve(kKeysOfARow);
+        _entries.push_back({std::string(key), Value()});
+    }
     takeSpare();
     _next = _size;
-    return _entries.back().value;
+    return _entries[_size - 1].value;
 }
 
 void Dictionary::index()

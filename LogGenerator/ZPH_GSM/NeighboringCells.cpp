@@ -3,6 +3,9 @@
 #include "LogGenerator/CellMonitor.h"
 #include "platform/TelephonyService.h"
 
+#include <algorithm>
+#include <ranges>
+
 namespace kestrum {
 namespace {
 
@@ -73,7 +76,7 @@ void NeighboringCells::learnColourCodes(Record data)
         const auto entry = elementOf(data, kColoured, i);
         if (!entry)
             break;
-        arfcnToBsic[entry->read(kArfcn).value_or(0)] = entry->read(kBsic).value_or(0);
+        arfcnToBsic.push_back({entry->read(kArfcn).value_or(0), entry->read(kBsic).value_or(0)});
     }
 }
 
@@ -81,8 +84,11 @@ void NeighboringCells::listMeasurements(Record data) const
 {
     const auto measured = [this](Record cell, Dictionary& row) {
         show(cell, kMeasuredCell, row);
-        if (const auto known = arfcnToBsic.find(cell.read(kArfcn).value_or(0)); known != arfcnToBsic.end())
-            row.set("BSIC", Reading(decimalSigned32, known->second));
+        // From the last on: a later colour code of a frequency replaces an earlier one.
+        const auto codes = arfcnToBsic | std::views::reverse;
+        if (const auto known = std::ranges::find(codes, cell.read(kArfcn).value_or(0), &ColourCode::arfcn);
+            known != codes.end())
+            row.set("BSIC", Reading(decimalSigned32, known->bsic));
     };
     replaceArray(sectionRef, listed(data, kMeasured, data.read(kMeasurementCount).value_or(0), measured));
 }

@@ -2,7 +2,7 @@
 
 #include "LogGenerator/Base.h"
 
-#include <unordered_map>
+#include <vector>
 
 namespace kestrum {
 
@@ -18,7 +18,10 @@ private:
     void learnColourCodes(Record data);
     void listMeasurements(Record data) const;
 
-    std::unordered_map<std::uint32_t, std::uint32_t> arfcnToBsic;
+    struct ColourCode {
+        std::uint32_t arfcn, bsic;
+    };
+    std::vector<ColourCode> arfcnToBsic; ///< at most 255; a map would allocate for each record
 };
 
 } // namespace kestrum

@@ -82,7 +82,7 @@ void expectNoAllocation(const std::vector<RecordBuilder>& records, Decode decode
 }
 
 template <typename Index>
-void expectNoAllocation(const Subscription& subscription, const Value& node)
+void expectNoAllocation(const Subscription& subscription, const Value& node, const std::vector<RecordBuilder>& records)
 {
     DecodingDoubles doubles;
     SilentLog log;
@@ -91,8 +91,14 @@ void expectNoAllocation(const Subscription& subscription, const Value& node)
     const Index index(roles);
     Base& section = *index.getClass(subscription.section);
     section.updateSectionRef(node);
-    expectNoAllocation({record(subscription.code, 256), record(subscription.code, 256).fill(13, 0xFF)},
-                       [&](Record each) { section.updateWithData(each, subscription.code); });
+    expectNoAllocation(records, [&](Record each) { section.updateWithData(each, subscription.code); });
+}
+
+template <typename Index>
+void expectNoAllocation(const Subscription& subscription, const Value& node)
+{
+    expectNoAllocation<Index>(subscription, node,
+                              {record(subscription.code, 256), record(subscription.code, 256).fill(13, 0xFF)});
 }
 
 std::string nameOf(const testing::TestParamInfo<Subscription>& each)
@@ -208,6 +214,32 @@ INSTANTIATE_TEST_SUITE_P(LTE, LteListSection,
                                          Subscription{"Neighbor Cells List", 0xB180},
                                          Subscription{"Reselection Candidates List", 0xB186}),
                          nameOf);
+
+TEST(GsmList, AllocatesNothingForColourCodes)
+{
+    expectNoAllocation<ZPH_GSMClassIndex>(
+        {"Neighboring Cells", 0x51FF}, makeArray(),
+        {record(0x51FF, 27).u8(14, 3).u16(15, 62).u16(19, 63), record(0x51FF, 23).u8(14, 2).u16(15, 871)});
+}
+
+// As the cells of a property list do: serving cells and neighbours have other numbers.
+TEST(Rows, AllocateNothingWhenTheyTakeTurnsWithOtherKeys)
+{
+    Dictionary row;
+    const auto fill = [&row](std::initializer_list<std::string_view> keys) {
+        row.startOver();
+        for (const auto key : keys)
+            row.setText(key, "text");
+    };
+    const auto both = [&fill] {
+        fill({"kVoxCell_Technology", "kVoxCell_PhysicalCellId", "kVoxCell_UARFCN"});
+        fill({"kVoxCell_Technology", "kVoxCell_ScramblingCode"});
+    };
+    both();
+    const long before = allocations;
+    both();
+    EXPECT_EQ(allocations - before, 0);
+}
 
 class UtranListSection : public testing::TestWithParam<Subscription> {};
 

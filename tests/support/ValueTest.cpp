@@ -289,6 +289,16 @@ TEST(Dictionary, TellsKeysApartThatDifferInOneByte)
         }
 }
 
+TEST(Dictionary, ReusesSparesInAnyOrderAndUnderOtherKeys)
+{
+    Dictionary dictionary{{"a", "1"}, {"b", "2"}, {"c", "3"}};
+    dictionary.startOver();
+    for (const char* key : {"c", "d", "a", "b", "c"})
+        dictionary.setText(key, std::string("new ") + key);
+    EXPECT_EQ(describe(std::make_shared<Dictionary>(dictionary)),
+              R"({"c": "new c", "d": "new d", "a": "new a", "b": "new b"})");
+}
+
 TEST(Array, DropsItsSparesAndNothingElse)
 {
     const auto kept = makeDictionary(), spare = makeDictionary();
