@@ -26,6 +26,7 @@ Input::Input(const std::string& path, bool follow)
 {
     if (_file < 0)
         fail("cannot be opened");
+    _isSeekable = path != "-" && size();
     // A pipe is not watched: it ends when its writer closes it.
     if (!follow || !size() || path == "-")
         return;
@@ -59,7 +60,9 @@ Input::~Input()
 std::size_t Input::read(std::span<std::byte> into)
 {
     for (;;) {
-        const auto got = ::read(_file, into.data(), into.size());
+        // At its own position: forked processes share that of the file.
+        const auto got = _isSeekable ? ::pread(_file, into.data(), into.size(), static_cast<::off_t>(_read))
+                                     : ::read(_file, into.data(), into.size());
         if (got >= 0) {
             _read += static_cast<std::size_t>(got);
             return static_cast<std::size_t>(got);
@@ -105,7 +108,6 @@ Input::Woken Input::whatChanged()
     if (there > _read)
         return Woken::Changed;
     if (there < _read) {
-        ::lseek(_file, 0, SEEK_SET);
         _read = 0;
         return Woken::Restarted;
     }

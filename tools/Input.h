@@ -36,7 +36,7 @@ private:
     Woken whatChanged();
 
     std::string _path;
-    bool _isGone = false;
+    bool _isGone = false, _isSeekable = false;
     int _file = -1, _changes = -1, _signals = -1;
     std::uint64_t _read = 0;
 };

@@ -314,6 +314,13 @@ public:
         write();
     }
 
+    void resume(const Decoding& decoding) final
+    {
+        _isResuming = true;
+        _changes.look(decoding.display());
+        _isResuming = false;
+    }
+
 protected:
     /// What is written before the first change of a message, for each change, and behind the last one.
     virtual void begin(std::string& text, const Decoding::Decoded& decoded) = 0;
@@ -323,6 +330,8 @@ protected:
 private:
     void changed(const Changes::Change& change)
     {
+        if (_isResuming)
+            return;
         const bool isFirst = !std::exchange(_isChanged, true);
         if (isFirst)
             begin(_text, *_decoded);
@@ -339,7 +348,7 @@ private:
     static constexpr std::size_t kPiece = 64 << 10; ///< bytes; a message may change any number of values
 
     const Decoding::Decoded* _decoded = nullptr; ///< the message that is looked at
-    bool _isChanged = false;
+    bool _isChanged = false, _isResuming = false;
     std::string _text;
     Changes _changes{[this](const Changes::Change& change) { changed(change); }};
 };

@@ -21,6 +21,8 @@ public:
 
     /// Called after each decoded message.
     virtual void message(const Decoding&, const Decoding::Decoded&) {}
+    /// Takes the display as seen: writes nothing about the changes since the last message.
+    virtual void resume(const Decoding&) {}
     virtual void logLine(Priority priority, std::string_view text) = 0;
     virtual void snapshot(const SnapshotListing& listing) = 0;
     /// Called with the current display at the end, and whenever the end of a followed file is reached.

@@ -32,6 +32,12 @@ void OutputFile::control(std::string_view text)
         flush();
 }
 
+void OutputFile::redirect(int descriptor)
+{
+    _descriptor = descriptor;
+    _name = "a temporary file";
+}
+
 void OutputFile::flush()
 {
     std::string_view rest = _held;
@@ -44,7 +50,7 @@ void OutputFile::flush()
         else if (errno == EPIPE)
             throw ClosedPipe{};
         else if (errno != EINTR)
-            throw OutputFailure(std::system_error(errno, std::generic_category(), "standard output").what());
+            throw OutputFailure(std::system_error(errno, std::generic_category(), _name).what());
     }
     _held.clear();
 }

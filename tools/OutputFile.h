@@ -26,11 +26,14 @@ public:
     /// Writes our own text, which may contain control sequences.
     void control(std::string_view text);
     void flush();
+    /// Writes to a temporary file from now on. Nothing is held.
+    void redirect(int descriptor);
 
 private:
     int _descriptor;
     Loss _loss;
     bool _isTerminal;
+    const char* _name = "standard output";
     std::string _held;
 };
 

@@ -6,6 +6,7 @@
 #include "tools/Extraction.h"
 #include "tools/Harmless.h"
 #include "tools/Input.h"
+#include "tools/PieceWriters.h"
 #include "tools/Snapshot.h"
 
 #include <algorithm>
@@ -29,6 +30,24 @@ struct WrongUsage {};
 constexpr std::uint64_t kMostFaultLines = 100;
 /// The shortest interval between two displays of a followed file, as in the panes.
 constexpr std::chrono::milliseconds kRefresh{2000};
+
+/// A process has written its piece of the log.
+struct PieceWritten {};
+/// The messages of one piece, in bytes: some tenths of a second of work.
+constexpr std::size_t kPiece = 1 << 20;
+
+/// Whether pieces of the log can be written by several processes: each of them reads the files by itself.
+bool mayShare(const DecodeOptions& options)
+{
+    const auto isReadTwice = [](const std::string& file) {
+        std::error_code none;
+        const auto type = std::filesystem::status(file, none).type();
+        return file != "-" && (type == std::filesystem::file_type::regular ||
+                               type == std::filesystem::file_type::not_found);
+    };
+    return options.jobs > 1 && (options.format == OutputFormat::Jsonl || options.format == OutputFormat::Csv) &&
+           !options.follow && options.extract.empty() && std::ranges::all_of(options.files, isReadTwice);
+}
 
 /// Shows the progress of a long run on a terminal.
 class Progress {
@@ -67,17 +86,33 @@ public:
         : _options(options),
           _output(Output::make(options.format, {.log = options.log, .numbers = options.numbers}, _data, _remarks)),
           _decoding(options.technology, bundle, _lists,
-                    options.log ? [this](Priority priority, std::string_view text) { _output->logLine(priority, text); }
+                    options.log ? [this](Priority priority, std::string_view text) {
+                                if (!_isSilent)
+                                    _output->logLine(priority, text);
+                            }
                                 : Decoding::LogLine(),
-                    [this](const Decoding::Decoded& decoded) { _output->message(_decoding, decoded); })
-    {}
+                    [this](const Decoding::Decoded& decoded) {
+                        if (!_isSilent)
+                            _output->message(_decoding, decoded);
+                    })
+    {
+        if (mayShare(options))
+            _writers.emplace(options.jobs, _data, _remarks);
+    }
 
     int run()
     {
         try {
             for (const auto& file : _options.files)
                 decode(file, &file == &_options.files.back());
+            endPiece();
             finish();
+        } catch (const PieceWritten&) {
+            _data.flush();
+            _remarks.flush();
+            return 0;
+        } catch (const WriterFailure&) {
+            return kBadInput;
         } catch (const ClosedPipe&) {
             return 0; // The reader wants no more.
         } catch (const WrongUsage&) {
@@ -88,6 +123,32 @@ public:
     }
 
 private:
+    // After the first piece this process only decodes, so that each writer begins with the display of its piece.
+    void take(Bytes message)
+    {
+        if (_writers && _inPiece >= kPiece) {
+            if (_isWriter)
+                throw PieceWritten();
+            _inPiece = 0;
+            _progress.clear();
+            _isWriter = _writers->start();
+            _isSilent = !_isWriter;
+            if (_isWriter)
+                _output->resume(_decoding);
+        }
+        _inPiece += message.size();
+        _decoding.take(message);
+    }
+
+    void endPiece()
+    {
+        if (_isWriter)
+            throw PieceWritten();
+        if (_writers)
+            _writers->finish();
+        _isSilent = false;
+    }
+
     void decode(const std::string& file, bool isLast)
     {
         _file = file == "-" ? "standard input" : file;
@@ -99,7 +160,8 @@ private:
                 ByteWindow window([&](std::span<std::byte> into) {
                     _data.flush();
                     _remarks.flush();
-                    _progress.show(_file, _window == nullptr ? 0 : _window->offset(), input.size());
+                    if (!_isWriter)
+                        _progress.show(_file, _window == nullptr ? 0 : _window->offset(), input.size());
                     return input.read(into);
                 });
                 _window = &window;
@@ -134,14 +196,14 @@ private:
     {
         for (bool mayGrow = input.mayGrow(); mayGrow;) {
             while (const auto message = reader.next(true))
-                _decoding.take(*message);
+                take(*message);
             mayGrow = waitForMore(input);
             if (_isRestarted)
                 break;
             window.resume();
         }
         while (const auto message = _isRestarted ? std::nullopt : reader.next())
-            _decoding.take(*message);
+            take(*message);
         _missing += reader.missing();
     }
 
@@ -184,7 +246,8 @@ private:
             complain(formatted("%s: %s; the remaining raw records are shown", _file, reason));
         }
         const Snapshot snapshot(file, list, [this](const CaptureFault& fault) { report(fault); });
-        _output->snapshot(snapshot.listing());
+        if (!_isSilent)
+            _output->snapshot(snapshot.listing());
         std::optional<Extraction> extraction;
         if (!_options.extract.empty())
             try {
@@ -198,7 +261,7 @@ private:
         snapshot.recover(_lists, [&](Bytes message) {
             if (extraction)
                 extraction->take(message);
-            _decoding.take(message);
+            take(message);
         });
         if (!extraction)
             return;
@@ -266,6 +329,8 @@ private:
     }
     void remark(const std::string& line)
     {
+        if (_isSilent)
+            return;
         _progress.clear();
         _remarks.write("kestrum-decode: " + onOneLine(line) + '\n');
         _remarks.flush();
@@ -277,6 +342,9 @@ private:
     Progress _progress{_remarks,
                        !_options.follow && (_options.format == OutputFormat::Tree ||
                                             _options.format == OutputFormat::Json || ::isatty(STDOUT_FILENO) == 0)};
+    std::optional<PieceWriters> _writers; ///< empty: this process writes everything
+    std::size_t _inPiece = 0; ///< bytes
+    bool _isWriter = false, _isSilent = false;
     PropertyListCodec _lists;
     std::unique_ptr<Output> _output;
     Decoding _decoding;

@@ -17,8 +17,9 @@ struct DecodeOptions {
     std::string technology;         ///< an identifier; empty: found in the messages
     OutputFormat format = OutputFormat::Tree;
     bool log = false, numbers = false, stats = false, follow = false;
-    std::string extract; ///< a directory; empty: nothing is extracted
-    bool force = false;  ///< extracted files replace existing ones
+    std::string extract;  ///< a directory; empty: nothing is extracted
+    bool force = false;   ///< extracted files replace existing ones
+    std::size_t jobs = 1; ///< processes that write jsonl and csv at a time
 };
 
 /// Decodes the files, as parts of one log, to standard output. Everything else goes to standard error. Returns the

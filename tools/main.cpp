@@ -5,9 +5,11 @@
 
 #include <CLI/CLI.hpp>
 
+#include <algorithm>
 #include <exception>
 #include <iostream>
 #include <map>
+#include <thread>
 
 namespace {
 
@@ -71,6 +73,11 @@ int main(int argc, char** argv)
     commands.add_option("--extract", options.extract,
                         "Write a snapshot's DLF stream, and the recovered records as .dlf and .kcap, into a directory");
     commands.add_flag("--force", options.force, "Allow --extract to replace files of the same name");
+    options.jobs = std::max(1u, std::thread::hardware_concurrency());
+    commands
+        .add_option("-j,--jobs", options.jobs,
+                    "Processes that write jsonl and csv at a time (default: as many as there are processors)")
+        ->check(CLI::Range(1, 256));
     try {
         commands.parse(argc, argv);
         if (!options.extract.empty())

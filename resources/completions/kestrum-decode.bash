@@ -13,7 +13,7 @@ _kestrum_decode() {
         *)
             if [[ $current == -* ]]; then
                 mapfile -t COMPREPLY < <(compgen -W '-h --help --version --technology --format --log --numbers --stats
-                    --follow --extract --force' -- "$current")
+                    --follow --extract --force -j --jobs' -- "$current")
             else
                 compopt -o filenames 2>/dev/null
                 mapfile -t COMPREPLY < <(compgen -f -- "$current")

@@ -50,7 +50,7 @@ TEST_F(ProgramTest, HelpNamesEveryOptionAndStatus)
     const auto ran = run({"--help"});
     EXPECT_EQ(ran.status, 0);
     for (const auto* each : {"--technology", "--format", "--log", "--stats", "--follow", "--extract", "--force",
-                             "--version", "standard input", "Exit status"})
+                             "--jobs", "--version", "standard input", "Exit status"})
         EXPECT_THAT(ran.output, HasSubstr(each));
 }
 
@@ -281,6 +281,47 @@ TEST_F(ProgramTest, SeveralFilesArePartsOfOneLog)
     const auto ran = run({"--format", "json", first, "/no/such.kcap", second});
     EXPECT_EQ(ran.status, 1) << "one of them is bad";
     EXPECT_THAT(ran.output, AllOf(HasSubstr("\"messages\": 2"), HasSubstr("\"Num Tx Antennas\": \"4\"")));
+}
+
+// Damage, a missing file and a change of technology lie between the pieces of several processes.
+TEST_F(ProgramTest, SeveralProcessesWriteTheSameAsOne)
+{
+    const auto repeated = [&](const std::string& name) {
+        std::string all;
+        while (all.size() < (3 << 20))
+            all += contentsOf(inCheckout("captures/" + name + ".kcap"));
+        return all;
+    };
+    const auto damaged = repeated("lte") + "\xFF\xFF\xFF\xFF" + kcap(antennas(2));
+    const auto first = capture(damaged, "1.kcap"), second = capture(repeated("gsm"), "2.kcap");
+    for (const auto* format : {"jsonl", "csv"}) {
+        const auto decoded = [&](const char* jobs) {
+            const auto told = scratch / "told", shown = scratch / "shown";
+            const auto command = "'" + builtProgram("kestrum-decode") + "' --stats -j " + jobs + " --format " + format +
+                                 " '" + first + "' /no/such.kcap '" + second + "' '" + first + "' >'" + shown +
+                                 "' 2>'" + told + "'";
+            const int status = WEXITSTATUS(std::system(command.c_str()));
+            return Ran{status, contentsOf(shown), contentsOf(told)};
+        };
+        const auto alone = decoded("1"), many = decoded("8");
+        EXPECT_EQ(alone.status, 1);
+        EXPECT_EQ(many.status, 1);
+        EXPECT_TRUE(alone.output == many.output) << format;
+        EXPECT_EQ(alone.remarks, many.remarks) << format;
+        EXPECT_THAT(many.remarks, AllOf(HasSubstr("cannot be opened"), HasSubstr("4 bytes skipped")));
+    }
+}
+
+TEST_F(ProgramTest, AClosedPipeEndsAllProcesses)
+{
+    std::string all;
+    while (all.size() < (8 << 20))
+        all += contentsOf(inCheckout("captures/lte.kcap"));
+    Tool tool({"-j", "2", "--format", "csv", capture(all)});
+    tool.line();
+    tool.closeOutput();
+    EXPECT_EQ(tool.remarks(), "") << "which ends when no process has standard error any more";
+    EXPECT_EQ(tool.status(), 0);
 }
 
 TEST_F(ProgramTest, AClosedPipeEndsItQuietly)
