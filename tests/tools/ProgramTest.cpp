@@ -288,35 +288,32 @@ TEST_F(ProgramTest, SeveralProcessesWriteTheSameAsOne)
 {
     const auto repeated = [&](const std::string& name) {
         std::string all;
-        while (all.size() < (3 << 20))
+        while (all.size() < (5 << 18))
             all += contentsOf(inCheckout("captures/" + name + ".kcap"));
         return all;
     };
-    const auto damaged = repeated("lte") + "\xFF\xFF\xFF\xFF" + kcap(antennas(2));
-    const auto first = capture(damaged, "1.kcap"), second = capture(repeated("gsm"), "2.kcap");
-    for (const auto* format : {"jsonl", "csv"}) {
-        const auto decoded = [&](const char* jobs) {
-            const auto told = scratch / "told", shown = scratch / "shown";
+    const auto gsm = capture(repeated("gsm") + "\xFF\xFF\xFF\xFF" + kcap(antennas(2)), "1.kcap");
+    const auto cdma = capture(repeated("cdma"), "2.kcap");
+    for (const std::string format : {"jsonl", "csv"}) {
+        const auto remarks = [&](const std::string& jobs) {
             const auto command = "'" + builtProgram("kestrum-decode") + "' --stats -j " + jobs + " --format " + format +
-                                 " '" + first + "' /no/such.kcap '" + second + "' '" + first + "' >'" + shown +
-                                 "' 2>'" + told + "'";
-            const int status = WEXITSTATUS(std::system(command.c_str()));
-            return Ran{status, contentsOf(shown), contentsOf(told)};
+                                 " '" + gsm + "' /no/such.kcap '" + cdma + "' >'" + (scratch / jobs) + "' 2>'" +
+                                 (scratch / "told") + "'";
+            EXPECT_EQ(WEXITSTATUS(std::system(command.c_str())), 1);
+            return contentsOf(scratch / "told");
         };
-        const auto alone = decoded("1"), many = decoded("8");
-        EXPECT_EQ(alone.status, 1);
-        EXPECT_EQ(many.status, 1);
-        EXPECT_TRUE(alone.output == many.output) << format;
-        EXPECT_EQ(alone.remarks, many.remarks) << format;
-        EXPECT_THAT(many.remarks, AllOf(HasSubstr("cannot be opened"), HasSubstr("4 bytes skipped")));
+        const auto alone = remarks("1");
+        EXPECT_EQ(remarks("8"), alone);
+        EXPECT_THAT(alone, AllOf(HasSubstr("cannot be opened"), HasSubstr("4 bytes skipped")));
+        EXPECT_EQ(std::system(("cmp '" + (scratch / "1") + "' '" + (scratch / "8") + "'").c_str()), 0) << format;
     }
 }
 
 TEST_F(ProgramTest, AClosedPipeEndsAllProcesses)
 {
     std::string all;
-    while (all.size() < (8 << 20))
-        all += contentsOf(inCheckout("captures/lte.kcap"));
+    while (all.size() < (4 << 20))
+        all += contentsOf(inCheckout("captures/gsm.kcap"));
     Tool tool({"-j", "2", "--format", "csv", capture(all)});
     tool.line();
     tool.closeOutput();
