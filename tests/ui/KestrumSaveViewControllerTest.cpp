@@ -177,7 +177,8 @@ TEST_F(KestrumSaveViewControllerTest, TriesTheNamesOfAMinute)
         EXPECT_EQ(doubles.toolkit.alerts.empty(), isOneFree);
         doubles.queue.run();
     }
-    EXPECT_THAT(doubles.propertyLists.files, ElementsAre(testing::Pair("/logs/KestrumSnapshot-1794809201.kestrum", testing::_)));
+    EXPECT_THAT(doubles.propertyLists.files,
+                ElementsAre(testing::Pair("/logs/KestrumSnapshot-1794809201.kestrum", testing::_)));
 }
 
 TEST_F(KestrumSaveViewControllerTest, SavesTheContentsThatItListed)
