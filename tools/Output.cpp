@@ -85,7 +85,7 @@ void appendNumber(std::string& to, double number)
 {
     char digits[32];
     char* end = digits;
-    const auto hundredths = std::abs(number) < kMostShort ? static_cast<int>(std::abs(number) * 100 + 0.5) : -1;
+    const auto hundredths = std::abs(number) < kMostShort ? static_cast<int>(std::lround(std::abs(number) * 100)) : -1;
     if (static_cast<double>(hundredths) / 100 == std::abs(number)) {
         if (std::signbit(number))
             *end++ = '-';

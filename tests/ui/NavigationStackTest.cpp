@@ -43,6 +43,7 @@ TEST_F(NavigationStackTest, PushShowsThePaneAndTellsTheDelegateFirst)
 {
     open(1);
     EXPECT_EQ(top().title(), "a");
+    EXPECT_EQ(toolkit.navigation->titleChanges, 0) << "the titles come with the pane";
     EXPECT_THAT(delegate.told, ElementsAre("/a animated"));
     EXPECT_EQ(toolkit.navigation->transitions.back(), std::pair(Transition::Push, true));
 }
@@ -117,6 +118,8 @@ TEST_F(NavigationStackTest, PoppedPaneWithAnotherOwnerTakesNoTaps)
     toolkit.navigation->pressBack();
     held->didSelectRowAtIndexPath(held->screen().table(), IndexPath{0, 0});
     EXPECT_THAT(paths(), ElementsAre("/"));
+    stack.reset();
+    held->didSelectRowAtIndexPath(held->screen().table(), IndexPath{0, 0}); // a use after free for the sanitizer
 }
 
 TEST_F(NavigationStackTest, PaneWithAnotherOwnerSurvivesItsStack)
