@@ -42,8 +42,8 @@ bool mayShare(const DecodeOptions& options)
     const auto isReadTwice = [](const std::string& file) {
         std::error_code none;
         const auto type = std::filesystem::status(file, none).type();
-        return file != "-" && (type == std::filesystem::file_type::regular ||
-                               type == std::filesystem::file_type::not_found);
+        return file != "-" &&
+               (type == std::filesystem::file_type::regular || type == std::filesystem::file_type::not_found);
     };
     return options.jobs > 1 && (options.format == OutputFormat::Jsonl || options.format == OutputFormat::Csv) &&
            !options.follow && options.extract.empty() && std::ranges::all_of(options.files, isReadTwice);
@@ -343,7 +343,7 @@ private:
                        !_options.follow && (_options.format == OutputFormat::Tree ||
                                             _options.format == OutputFormat::Json || ::isatty(STDOUT_FILENO) == 0)};
     std::optional<PieceWriters> _writers; ///< empty: this process writes everything
-    std::size_t _inPiece = 0; ///< bytes
+    std::size_t _inPiece = 0;             ///< bytes
     bool _isWriter = false, _isSilent = false;
     PropertyListCodec _lists;
     std::unique_ptr<Output> _output;
