@@ -5,6 +5,7 @@
 #include "support/Format.h"
 #include "tools/Changes.h"
 #include "tools/Harmless.h"
+#include "tools/TemporaryFile.h"
 
 #include <nlohmann/json.hpp>
 
@@ -12,7 +13,7 @@
 #include <charconv>
 #include <chrono>
 #include <cmath>
-#include <cstdio>
+#include <optional>
 #include <utility>
 
 namespace kestrum::tools {
@@ -226,21 +227,17 @@ private:
 /// before it, is complete.
 class JsonOutput final : public Output {
 public:
-    JsonOutput(Contents contents, OutputFile& data)
-        : _data(data), _log(contents.log ? std::tmpfile() : nullptr, std::fclose)
+    JsonOutput(Contents contents, OutputFile& data) : _data(data)
     {
-        if (contents.log && !_log)
-            throw OutputFailure(std::system_error(errno, std::generic_category(), "a temporary file").what());
+        if (contents.log)
+            _log.emplace();
     }
 
     void logLine(Priority priority, std::string_view line) override
     {
         if (!_log)
             return;
-        const auto entry =
-            (_lines++ == 0 ? "\n    " : ",\n    ") + text(Json::array({static_cast<int>(priority), line}));
-        if (std::fwrite(entry.data(), 1, entry.size(), _log.get()) != entry.size())
-            throw OutputFailure(std::system_error(errno, std::generic_category(), "a temporary file").what());
+        _log->append((_lines++ == 0 ? "\n    " : ",\n    ") + text(Json::array({static_cast<int>(priority), line})));
     }
     void snapshot(const SnapshotListing& listing) override { _snapshots.push_back(jsonOf(listing)); }
 
@@ -260,23 +257,14 @@ public:
         }
         written.resize(written.size() - 2); // the closing brace and its line
         _data.write(written + ",\n  \"log\": [");
-        copyLog();
+        _log->read([this](std::string_view piece) { _data.write(piece); });
         _data.write(_lines == 0 ? "]\n}\n" : "\n  ]\n}\n");
         _data.flush();
     }
 
 private:
-    void copyLog()
-    {
-        std::rewind(_log.get());
-        char piece[1 << 14];
-        for (std::size_t got; (got = std::fread(piece, 1, sizeof piece, _log.get())) > 0;)
-            _data.write({piece, got});
-        std::fseek(_log.get(), 0, SEEK_END);
-    }
-
     OutputFile& _data;
-    std::unique_ptr<std::FILE, int (*)(std::FILE*)> _log;
+    std::optional<TemporaryFile> _log;
     std::uint64_t _lines = 0;
     Json _snapshots = Json::array();
 };

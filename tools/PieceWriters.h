@@ -1,10 +1,9 @@
 #pragma once
 
 #include "tools/OutputFile.h"
+#include "tools/TemporaryFile.h"
 
-#include <cstdio>
 #include <deque>
-#include <memory>
 #include <sys/types.h>
 
 namespace kestrum::tools {
@@ -22,16 +21,16 @@ public:
     PieceWriters& operator=(const PieceWriters&) = delete;
 
     /// Starts the writer of the next piece; waits for the oldest one when there are too many. True in the new process,
-    /// whose output files are redirected. Throws WriterFailure and what writing throws.
+    /// whose output files are redirected. Throws WriterFailure, and OutputFailure also when a process cannot be started or
+    /// was ended by a signal.
     bool start();
     /// Waits for all of them.
     void finish();
 
 private:
-    using File = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
     struct Writer {
-        ::pid_t process;
-        File data, remarks;
+        ::pid_t process = 0;
+        TemporaryFile data = {}, remarks = {};
     };
 
     void copyOldest();

@@ -309,6 +309,20 @@ TEST_F(ProgramTest, SeveralProcessesWriteTheSameAsOne)
     }
 }
 
+TEST_F(ProgramTest, TellsThatAProcessHasEnded)
+{
+    std::string all;
+    while (all.size() < (3 << 20))
+        all += contentsOf(inCheckout("captures/lte.kcap"));
+    const auto told = scratch / "told", status = scratch / "status";
+    // A file beyond the limit ends the process that writes it.
+    const auto command = "(ulimit -f 8; '" + builtProgram("kestrum-decode") + "' -j 2 --format csv '" + capture(all) +
+                         "' 2>'" + told + "'; echo $? >'" + status + "') | cat >/dev/null";
+    EXPECT_EQ(std::system(command.c_str()), 0);
+    EXPECT_EQ(contentsOf(status), "1\n");
+    EXPECT_THAT(contentsOf(told), HasSubstr("a process that writes was ended by signal"));
+}
+
 TEST_F(ProgramTest, AClosedPipeEndsAllProcesses)
 {
     std::string all;
