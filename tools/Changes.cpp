@@ -8,7 +8,6 @@
 namespace kestrum::tools {
 namespace {
 
-constexpr std::string_view kSorted = kSortedKey;
 constexpr std::size_t kMostSpares = 4096;
 
 std::string stepTo(std::string_view key)
@@ -145,7 +144,7 @@ void Changes::compare(const Dictionary& now, Seen& seen)
     std::size_t count = 0, next = 0;
     std::map<std::string_view, std::size_t> places; // used when keys come in another order than before
     for (const auto& [key, value] : now) {
-        if (value.isNull() || key == kSorted)
+        if (value.isNull() || key == kSortedKey)
             continue;
         ++count;
         if (next == children.size() || children[next]->key != key) {
