@@ -73,10 +73,13 @@ int main(int argc, char** argv)
     commands.add_option("--extract", options.extract,
                         "Write a snapshot's DLF stream, and the recovered records as .dlf and .kcap, into a directory");
     commands.add_flag("--force", options.force, "Allow --extract to replace files of the same name");
-    options.jobs = std::max(1u, std::thread::hardware_concurrency());
+    // Every piece is decoded twice, so two processors gain nothing.
+    const auto processors = std::thread::hardware_concurrency();
+    options.jobs = processors < 3 ? 1 : processors;
     commands
         .add_option("-j,--jobs", options.jobs,
-                    "Processes that write jsonl and csv at a time (default: as many as there are processors)")
+                    "Processes that write jsonl and csv at a time (default: as many as there are processors, or\n"
+                    "1 on a machine with fewer than 3)")
         ->check(CLI::Range(1, 256));
     try {
         commands.parse(argc, argv);
