@@ -1,5 +1,6 @@
 #include "tools/Decoding.h"
 
+#include "capture/MessageTime.h"
 #include "capture/Technology.h"
 #include "platform/ChannelMessage.h"
 #include "platform/Clock.h"
@@ -182,6 +183,9 @@ void Decoding::decode(Bytes message)
         _generator->updateState(_state, message);
         if (reaches)
             ++(_watch->wasTooShort ? tally.tooShort : tally.decoded);
+        // The generator of IFX keeps the tree that it has received.
+        if (_technology == kVoxLogChannelTechnology_IFX)
+            decoded.time = timeOf(_state.at(StateKey::kDisplayState));
     } catch (const std::exception& failure) {
         if (reaches)
             ++tally.refused;
@@ -208,9 +212,9 @@ Tally& Decoding::classified(Bytes message, Decoded& decoded, bool& reaches)
         return tally;
     }
     decoded.code = read->logCode;
-    // A stamp of 0 means no time.
-    if (const auto stamp = read->timeStamp().value_or(0); stamp != 0)
-        _quiet->moment = *(decoded.time = dateFromTimeStamp(stamp));
+    decoded.time = timeOf(*read);
+    if (decoded.time)
+        _quiet->moment = *decoded.time;
     Tally& tally = _statistics[read->logCode];
     if (!read->isOfKnownType() && _technology != kVoxLogChannelTechnology_Zephra_CDMA)
         ++tally.refused;

@@ -46,7 +46,7 @@ public:
 
     /// The facts about a decoded message.
     struct Decoded {
-        std::optional<Date> time; ///< from the record's time stamp
+        std::optional<Date> time; ///< of the record or the tree, see timeOf
         std::optional<LogCode> code;
     };
     using Then = std::function<void(const Decoded&)>;

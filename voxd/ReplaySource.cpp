@@ -1,8 +1,7 @@
 #include "voxd/ReplaySource.h"
 
+#include "capture/MessageTime.h"
 #include "capture/Technology.h"
-#include "platform/ChannelMessage.h"
-#include "support/Date.h"
 #include "support/Format.h"
 
 #include <stdexcept>
@@ -19,8 +18,8 @@ CaptureFormat formatOf(const std::string& path)
 
 } // namespace
 
-ReplaySource::ReplaySource(const std::string& path, bool loop)
-    : _path(path), _format(formatOf(path)), _file(path, std::ios::binary), _loop(loop)
+ReplaySource::ReplaySource(const std::string& path, bool loop, PropertyLists& lists)
+    : _lists(lists), _path(path), _format(formatOf(path)), _file(path, std::ios::binary), _loop(loop)
 {
     // A directory can be opened but not read.
     if (!_file || (_file.peek(), _file.bad()))
@@ -65,23 +64,18 @@ void ReplaySource::rewind()
     _reader = CaptureReader::make(_format, *_window, OnDamage::Stop, [this](const CaptureFault& fault) {
         _fault = formatted("%s: at offset %lu: %s", _path, fault.offset, fault.reason);
     });
-    _lastStamp.reset();
+    _lastTime.reset();
 }
 
 std::chrono::microseconds ReplaySource::gapBefore(Bytes message)
 {
-    if (!_last) {
-        if (const auto record = channelRecord(message); record && record->timeStamp != 0)
-            _lastStamp = record->timeStamp;
+    const auto time = timeOf(message, _lists);
+    const auto before = time ? std::exchange(_lastTime, time) : std::nullopt;
+    if (!_last)
         return std::chrono::microseconds(0);
-    }
-    const auto record = channelRecord(message);
-    if (!record || record->timeStamp == 0)
-        return kNominalSpacing;
-    const auto before = std::exchange(_lastStamp, record->timeStamp);
     if (!before)
         return kNominalSpacing;
-    const auto gap = dateFromTimeStamp(record->timeStamp) - dateFromTimeStamp(*before);
+    const auto gap = *time - *before;
     return gap < gap.zero() || gap > kLongestGap ? gap.zero() : gap;
 }
 

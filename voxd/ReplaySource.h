@@ -1,6 +1,7 @@
 #pragma once
 
 #include "capture/CaptureReader.h"
+#include "support/Date.h"
 #include "voxd/Source.h"
 
 #include <fstream>
@@ -9,17 +10,19 @@
 
 namespace kestrum {
 
-/// A capture as a source. Messages follow their time stamps; messages without one follow at the nominal spacing.
+class PropertyLists;
+
+/// A capture as a source. Messages follow their times; messages without one follow at the nominal spacing.
 class ReplaySource final : public Source {
 public:
-    /// The interval between messages without a time stamp.
+    /// The interval before a message without a time.
     static constexpr std::chrono::milliseconds kNominalSpacing{500};
-    /// A longer gap between two time stamps means that the clock was set. It counts as no gap.
+    /// A longer gap between two times means that the clock was set. It counts as no gap.
     static constexpr std::chrono::hours kLongestGap{1};
 
     /// Opens the capture and detects its technology. Throws std::runtime_error with the reason when the capture
-    /// cannot be read, is empty, or has no message that shows its technology.
-    ReplaySource(const std::string& path, bool loop);
+    /// cannot be read, is empty, or has no message that shows its technology. `lists` must outlive the source.
+    ReplaySource(const std::string& path, bool loop, PropertyLists& lists);
     ReplaySource(const ReplaySource&) = delete;
     ReplaySource& operator=(const ReplaySource&) = delete;
 
@@ -33,6 +36,7 @@ private:
     void rewind();
     std::chrono::microseconds gapBefore(Bytes message);
 
+    PropertyLists& _lists;
     std::string _path;
     CaptureFormat _format;
     std::ifstream _file;
@@ -42,7 +46,7 @@ private:
     bool _loop;
     std::string_view _technology;
     std::optional<std::chrono::microseconds> _last; // offset of the last message given
-    std::optional<std::uint64_t> _lastStamp;
+    std::optional<Date> _lastTime;
 };
 
 } // namespace kestrum

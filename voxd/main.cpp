@@ -45,7 +45,7 @@ std::string scenarioNames()
 std::unique_ptr<Source> makeSource(const Options& options, PropertyLists& lists)
 {
     if (!options.replay.empty())
-        return std::make_unique<ReplaySource>(options.replay, options.loop);
+        return std::make_unique<ReplaySource>(options.replay, options.loop, lists);
     const Date start = options.start.empty() ? LinuxClock().now() : *dateFromIso(options.start);
     return makeScenario(options.scenario, {options.seed, start, lists});
 }

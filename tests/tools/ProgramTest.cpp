@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <sstream>
 #include <sys/resource.h>
 
 namespace kestrum::tools {
@@ -219,6 +220,53 @@ TEST_F(ProgramTest, JsonlHasNoTimeWhereAMessageHasNone)
               "{\"time\":null,\"code\":null,\"changes\":{\"/Cell\":\"b\"}}\n");
     EXPECT_THAT(run({"--format", "jsonl", capture(kcap(antennas(1, 0)))}).output,
                 StartsWith("{\"time\":null,\"code\":\"0xB0C1\""));
+}
+
+std::string timedTree(const std::string& time, const std::string& value)
+{
+    return "<plist><dict><key>Time</key>" + time + "<key>Cell</key><string>" + value + "</string></dict></plist>";
+}
+
+TEST_F(ProgramTest, JsonlAndCsvHaveTheTimesOfTrees)
+{
+    const auto file = capture(kcap(timedTree("<string>2026-11-16T06:05:42.125Z</string>", "a")) +
+                              kcap(timedTree("<string>2026-11-16 06:05:43 +0000</string>", "b")));
+    EXPECT_EQ(
+        run({"--format", "jsonl", file}).output,
+        R"({"time":"2026-11-16T06:05:42.125000Z","code":null,"changes":{"/Time":"2026-11-16T06:05:42.125Z","/Cell":"a"}})"
+        "\n"
+        R"({"time":"2026-11-16T06:05:43.000000Z","code":null,"changes":{"/Time":"2026-11-16 06:05:43 +0000","/Cell":"b"}})"
+        "\n");
+    EXPECT_THAT(run({"--format", "csv", file}).output,
+                AllOf(HasSubstr("\n2026-11-16T06:05:42.125000Z,,/Cell,a,,\r\n"),
+                      HasSubstr("\n2026-11-16T06:05:43.000000Z,,/Cell,b,,\r\n")));
+}
+
+TEST_F(ProgramTest, EveryRowOfATreesCaptureHasATime)
+{
+    const auto csv = run({"--format", "csv", inCheckout("captures/ifx.kcap")}).output;
+    std::istringstream rows(csv);
+    std::string row;
+    std::getline(rows, row);
+    while (std::getline(rows, row))
+        ASSERT_THAT(row, StartsWith("2026-11-16T06:05:"));
+    EXPECT_THAT(csv, HasSubstr("\n2026-11-16T06:05:51.000000Z,,/Serving Cell/RSSI,-53 dBm,,\r\n"));
+}
+
+TEST_F(ProgramTest, ATreeWithoutAUsableTimeHasNone)
+{
+    for (const auto* bad :
+         {"<string>soon</string>", "<string>9999-12-31T23:59:59Z</string>", "<array><string>1</string></array>",
+          "<dict><key>Time</key><string>2026-11-16T06:05:42Z</string></dict>"}) {
+        const auto ran = run({"--format", "jsonl", capture(kcap(timedTree(bad, "a")))});
+        EXPECT_THAT(ran.output, StartsWith("{\"time\":null,")) << bad;
+        EXPECT_EQ(ran.status, 0);
+    }
+    // A tree that cannot be shown changes nothing, also not the time of the next one.
+    const auto ran = run({"--format", "jsonl",
+                          capture(kcap(timedTree("<string>2026-11-16T06:05:42Z</string>", "a")) +
+                                  kcap(timedTree("<integer>1</integer>", "b")) + kcap(ifx("c")))});
+    EXPECT_THAT(ran.output, HasSubstr("\n{\"time\":null,\"code\":null,"));
 }
 
 TEST_F(ProgramTest, CsvQuotesAsRfc4180)

@@ -17,6 +17,8 @@ using namespace std::string_literals;
 using testing::ElementsAre;
 using testing::HasSubstr;
 
+constexpr Date kStart = std::chrono::sys_days(std::chrono::year{2026} / 11 / 16) + std::chrono::hours{6};
+
 std::string little(std::uint64_t value, int bytes)
 {
     std::string text;
@@ -29,6 +31,11 @@ std::string little(std::uint64_t value, int bytes)
 std::string stampedRecord(std::uint64_t milliseconds, std::uint16_t code = 0xB0C2)
 {
     return "\x01" + little(12, 2) + little(code, 2) + little((1'000'000 + milliseconds * 4 / 5) << 16, 8);
+}
+
+std::string tree(const std::string& time)
+{
+    return "<plist><dict><key>Time</key>" + time + "</dict></plist>";
 }
 
 std::string kcap(const std::vector<std::string>& messages)
@@ -47,10 +54,10 @@ protected:
         std::ofstream(path, std::ios::binary) << bytes;
         return path;
     }
-    static std::string whatIsWrong(const std::string& path)
+    std::string whatIsWrong(const std::string& path)
     {
         try {
-            ReplaySource(path, false);
+            ReplaySource(path, false, lists);
         } catch (const std::runtime_error& error) {
             return error.what();
         }
@@ -68,12 +75,13 @@ protected:
     }
 
     ScratchDirectory directory;
+    PropertyListCodec lists;
 };
 
 TEST_F(ReplaySourceTest, GivesMessagesAsTheyTravelled)
 {
     const auto first = stampedRecord(0), second = "\x81\x07" + stampedRecord(5);
-    ReplaySource source(file(kcap({first, second})), false);
+    ReplaySource source(file(kcap({first, second})), false, lists);
     EXPECT_EQ(source.technology(), kVoxLogChannelTechnology_Zephra_LTE);
     EXPECT_EQ(textOf(source.next()->bytes), first);
     EXPECT_EQ(textOf(source.next()->bytes), second);
@@ -84,41 +92,92 @@ TEST_F(ReplaySourceTest, GivesMessagesAsTheyTravelled)
 
 TEST_F(ReplaySourceTest, KeepsTheRhythmOfTheTimeStamps)
 {
-    ReplaySource source(file(kcap({stampedRecord(0), stampedRecord(250), stampedRecord(1000)})), false);
+    ReplaySource source(file(kcap({stampedRecord(0), stampedRecord(250), stampedRecord(1000)})), false, lists);
     EXPECT_THAT(times(source), ElementsAre(0ms, 250ms, 1000ms));
 }
 
 TEST_F(ReplaySourceTest, TakesAClockThatWasSetForNoGap)
 {
     ReplaySource source(
-        file(kcap({stampedRecord(5000), stampedRecord(1000), stampedRecord(1500), stampedRecord(90'000'000)})), false);
+        file(kcap({stampedRecord(5000), stampedRecord(1000), stampedRecord(1500), stampedRecord(90'000'000)})), false,
+        lists);
     EXPECT_THAT(times(source), ElementsAre(0ms, 0ms, 500ms, 500ms));
 }
 
 TEST_F(ReplaySourceTest, SpacesMessagesWithoutTimeStampsByHalfASecond)
 {
-    ReplaySource source(file(kcap({"<plist/>", "<plist/>", "<plist/>"})), false);
+    ReplaySource source(file(kcap({"<plist/>", "<plist/>", "<plist/>"})), false, lists);
     EXPECT_EQ(source.technology(), kVoxLogChannelTechnology_IFX);
     EXPECT_THAT(times(source), ElementsAre(0ms, 500ms, 1000ms));
 }
 
+TEST_F(ReplaySourceTest, KeepsTheRhythmOfTheTimesInTrees)
+{
+    ReplaySource source(
+        file(kcap({tree("<string>2026-11-16T06:05:42Z</string>"), tree("<string>2026-11-16T06:05:42.250Z</string>"),
+                   tree("<string>2026-11-16 06:05:45 +0000</string>"), stampedRecord(0)})),
+        false, lists);
+    EXPECT_THAT(times(source), ElementsAre(0ms, 250ms, 3000ms, 3000ms));
+}
+
+TEST_F(ReplaySourceTest, TakesAClockInTreesThatWasSetForNoGap)
+{
+    ReplaySource source(
+        file(kcap({tree("<string>2026-11-16T06:05:42Z</string>"), tree("<string>2026-11-16T06:05:40Z</string>"),
+                   tree("<string>2026-11-16T06:05:41Z</string>"), tree("<string>2099-12-31T23:59:59Z</string>")})),
+        false, lists);
+    EXPECT_THAT(times(source), ElementsAre(0ms, 0ms, 1000ms, 1000ms));
+}
+
+TEST_F(ReplaySourceTest, SpacesTreesWithoutAUsableTimeByHalfASecond)
+{
+    const auto timed = tree("<string>2026-11-16T06:05:42Z</string>");
+    for (const auto& bad :
+         {tree("<string>yesterday</string>"), tree("<string></string>"), tree("<integer>1794809142</integer>"),
+          tree("<date>2026-11-16T06:05:43Z</date>"), tree("<string>9999-12-31T23:59:59Z</string>"),
+          tree("<array><string>1</string><string>2026-11-16T06:05:43Z</string></array>"),
+          tree("<dict><key>Time</key><string>2026-11-16T06:05:43Z</string></dict>"),
+          "<plist><string>2026</string></plist>"s, "<plist><dict>"s, "<"s}) {
+        ReplaySource source(file(kcap({timed, bad, timed})), false, lists);
+        EXPECT_THAT(times(source), ElementsAre(0ms, 500ms, 500ms)) << bad;
+    }
+}
+
+// Twelve hundred trees, two a second.
+TEST_F(ReplaySourceTest, ReplaysTenMinutesOfTreesInTenMinutes)
+{
+    const auto scenario = makeScenario("ifx", {7, kStart, lists});
+    std::string capture;
+    for (int i = 0; i < 1200; ++i) {
+        const auto message = scenario->next();
+        // Two trees come together now and then, as from a modem that reports at its own pace.
+        capture += kcap({std::string(textOf(message->bytes))});
+        if (i % 100 == 0)
+            capture += kcap({std::string(textOf(message->bytes))});
+    }
+    ReplaySource source(file(capture), false, lists);
+    const auto all = times(source, 2000);
+    EXPECT_EQ(all.size(), 1212u);
+    EXPECT_NEAR(std::chrono::duration<double>(all.back()).count(), 600, 2);
+}
+
 TEST_F(ReplaySourceTest, LoopsWithTimesThatGoOn)
 {
-    ReplaySource source(file(kcap({stampedRecord(0), stampedRecord(200)})), true);
+    ReplaySource source(file(kcap({stampedRecord(0), stampedRecord(200)})), true, lists);
     EXPECT_THAT(times(source, 5), ElementsAre(0ms, 200ms, 700ms, 900ms, 1400ms));
 }
 
 TEST_F(ReplaySourceTest, FindsTheTechnologyInALaterMessage)
 {
     const auto monitor = "\xFF"s + little(12, 2) + little(1, 2) + "........";
-    ReplaySource source(file(kcap({monitor, stampedRecord(0, 0x417A)})), false);
+    ReplaySource source(file(kcap({monitor, stampedRecord(0, 0x417A)})), false, lists);
     EXPECT_EQ(source.technology(), kVoxLogChannelTechnology_Zephra_GSM);
     EXPECT_EQ(textOf(source.next()->bytes), monitor);
 }
 
 TEST_F(ReplaySourceTest, ChangesItsTechnologyWithTheMessages)
 {
-    ReplaySource source(file(kcap({stampedRecord(0), stampedRecord(1, 0x417A)})), false);
+    ReplaySource source(file(kcap({stampedRecord(0), stampedRecord(1, 0x417A)})), false, lists);
     EXPECT_EQ(source.technology(), kVoxLogChannelTechnology_Zephra_LTE);
     source.next();
     EXPECT_EQ(source.technology(), kVoxLogChannelTechnology_Zephra_LTE);
@@ -128,7 +187,7 @@ TEST_F(ReplaySourceTest, ChangesItsTechnologyWithTheMessages)
 
 TEST_F(ReplaySourceTest, ReadsDlf)
 {
-    ReplaySource source(file(stampedRecord(0).substr(1) + stampedRecord(100).substr(1), "a.dlf"), false);
+    ReplaySource source(file(stampedRecord(0).substr(1) + stampedRecord(100).substr(1), "a.dlf"), false, lists);
     EXPECT_EQ(textOf(source.next()->bytes), stampedRecord(0));
     const auto second = source.next();
     EXPECT_EQ(textOf(second->bytes), stampedRecord(100));
@@ -138,7 +197,7 @@ TEST_F(ReplaySourceTest, ReadsDlf)
 TEST_F(ReplaySourceTest, EndsAtDamageAndReportsItsPlace)
 {
     const auto path = file(kcap({stampedRecord(0)}) + "\xFF\xFF\xFF\xFF");
-    ReplaySource source(path, true);
+    ReplaySource source(path, true, lists);
     EXPECT_TRUE(source.next());
     EXPECT_FALSE(source.next()) << "no loop over damage";
     EXPECT_EQ(source.fault(),
@@ -158,7 +217,6 @@ TEST_F(ReplaySourceTest, RefusesWhatCannotBeReplayed)
 }
 
 PropertyListCodec kLists;
-constexpr Date kStart = std::chrono::sys_days(std::chrono::year{2026} / 11 / 16) + std::chrono::hours{6};
 
 class AnyScenario : public testing::TestWithParam<Scenario> {};
 

@@ -16,6 +16,7 @@ namespace {
 
 constexpr std::chrono::milliseconds kStep{500};
 constexpr double kStepSeconds = 0.5;
+constexpr int kFraction = 3; // digits of the second in "Time"
 constexpr int kCells = 12;
 constexpr std::size_t kShownNeighbors = 6;
 constexpr double kSpacing = 900;         // metres of road between two sites
@@ -144,7 +145,7 @@ private:
 
     Value tree()
     {
-        return makeDictionary({{"Time", Value(dateText(_start + kStep * _steps))},
+        return makeDictionary({{"Time", Value(isoText(_start + kStep * _steps, kFraction))},
                                {"Serving Cell", wrapped("GSM Cell", servingCell())},
                                {"Neighbor Cells", neighbors()},
                                {"Radio Resource", radioResource()},
