@@ -198,6 +198,8 @@ struct ModemRefusal {
 };
 
 struct ModemState {
+    /// 1, 2, ... in the order in which the service first saw the modems. A modem that comes back has its number again.
+    std::uint32_t number = 0;
     std::string identifier; ///< DeviceIdentifier: stays the same when the modem comes back
     std::string manufacturer, model, revision;
     std::string equipmentIdentifier; ///< IMEI; an identity
