@@ -1,142 +1,11 @@
-#include "LogGenerator/C2K/C2KLogGenerator.h"
-#include "LogGenerator/LTE/LTELogGenerator.h"
-#include "LogGenerator/UTRAN/UTRANLogGenerator.h"
-#include "LogGenerator/ZPH_GSM/ZPH_GSMLogGenerator.h"
-#include "capture/CaptureReader.h"
-#include "sections/RecordBuilder.h"
-#include "sections/TechnologyRun.h"
-
-#include <gtest/gtest.h>
-
-#include <fstream>
-#include <map>
-#include <set>
+#include "sections/Measured.h"
 
 namespace kestrum {
 namespace {
 
-/// The units of a display's readings: a line "Section/Key: unit" for each key, "a number" without a unit, "a text"
-/// without a number.
-class Measured {
-public:
-    void look(const Value& display) { look(display, "", ""); }
-
-    std::string lines() const
-    {
-        std::string all = "\n";
-        for (const auto& [key, units] : _units) {
-            all += key + ':';
-            for (const auto& unit : units)
-                all += (unit == *units.begin() ? " " : ", ") + unit;
-            all += '\n';
-        }
-        return all;
-    }
-
-private:
-    void look(const Value& node, const std::string& section, const std::string& key)
-    {
-        if (const auto dictionary = node.dictionary())
-            for (const auto& entry : *dictionary)
-                look(entry.value, key.empty() ? section : key, entry.key);
-        else if (const auto array = node.array())
-            for (const auto& element : *array)
-                look(element, element.dictionary() ? key : section, element.dictionary() ? "" : key);
-        else if (const auto reading = node.reading())
-            note(section + '/' + key, *reading);
-    }
-
-    void note(const std::string& key, const Reading& reading)
-    {
-        std::set<std::string>& units = _units[key];
-        if (!reading.number()) {
-            if (units.empty())
-                units.insert("a text");
-            return;
-        }
-        units.erase("a text");
-        units.insert(reading.unit().empty() ? "a number" : std::string(reading.unit()));
-        // The unit is the one in the text, and the number the one before it.
-        const std::string text = reading.text();
-        EXPECT_NE(text.find(reading.unit()), std::string::npos) << key << ": " << text;
-        const auto digits = text.find_first_of("-+0123456789");
-        ASSERT_NE(digits, std::string::npos) << key << ": " << text;
-        EXPECT_NEAR(std::stod(text.substr(digits)), *reading.number(), 0.0051) << key << ": " << text;
-    }
-
-    std::map<std::string, std::set<std::string>> _units;
-};
-
-/// Cells of every technology, serving and neighbour, with all numbers that the service sends.
-Value everyCell()
-{
-    auto cells = makeArray();
-    for (const char* technology : {"GSM", "UMTS", "LTE", "UTRAN2"})
-        for (const char* type : {"Serving", "Neighbor"}) {
-            auto cell = makeDictionary({{"kVoxCell_Technology", std::string("kVoxCellTechnology_") + technology},
-                                        {"kVoxCell_Type", std::string("kVoxCellType_") + type}});
-            for (const char* number : {"MCC", "MNC", "LAC", "TAC", "CellId", "PhysicalCellId", "BandInfo", "ARFCN",
-                                       "UARFCN", "ScramblingCode", "RSCP", "EcNo", "RSSI"})
-                cell->set(std::string("kVoxCell_") + number, 7);
-            cells->append(cell);
-        }
-    return cells;
-}
-
-/// Reads the display after each record that the generator requests, with several contents, and after a list of cells.
-template <typename Generator>
-std::string measuredBy(std::string_view templateName, const std::vector<RecordBuilder>& others = {})
-{
-    TechnologyRun<Generator> run(templateName);
-    Measured measured;
-    const auto receive = [&](Bytes message) {
-        run.receive(message);
-        measured.look(run.display());
-    };
-    const auto codes = run.generator->getStartCommand()->at("SetZephraLogCodes").array();
-    for (const auto& code : *codes)
-        for (const unsigned content : {0x00u, 0x01u, 0x02u, 0x19u, 0x21u})
-            receive(record(static_cast<LogCode>(*code.integer()), 1000).fill(13, content).bytes());
-    for (const auto& other : others)
-        receive(other.bytes());
-    const auto built = record(0xFF0001, RecordBuilder::kHeaderSize);
-    std::vector<std::byte> bytes(built.bytes().begin(), built.bytes().end());
-    const auto list = run.codec.toXml(everyCell());
-    bytes.insert(bytes.end(), list->bytes().begin(), list->bytes().end());
-    receive(bytes);
-    return measured.lines();
-}
-
-/// A reselection candidate of each radio access technology.
-std::vector<RecordBuilder> candidates()
-{
-    std::vector<RecordBuilder> all;
-    for (const int technology : {0, 1, 2, 3, 4})
-        all.push_back(record(0xB186, 40).u8(19, 1).u16(23, technology));
-    return all;
-}
-
-/// The same for the messages of the sample capture, and for records that occur only in traffic.
-std::string measuredInTheCdmaCapture()
-{
-    TechnologyRun<C2KLogGenerator> run("C2KTemplate");
-    Measured measured;
-    std::ifstream file(inCheckout("captures/cdma.kcap"), std::ios::binary);
-    ByteWindow window(file);
-    const auto reader = CaptureReader::make(CaptureFormat::Kcap, window, OnDamage::Stop, [](const CaptureFault&) {});
-    while (const auto message = reader->next()) {
-        run.receive(*message);
-        measured.look(run.display());
-    }
-    run.receive(record(0x1183, 50).u8(36, 5).bytes());                                  // connected
-    run.receive(record(0x119D, 60).u8(14, 1).u8(17, 11).u16(19, 40).u8(41, 1).bytes()); // a bad frame
-    measured.look(run.display());
-    return measured.lines();
-}
-
 TEST(Quantities, OfLte)
 {
-    EXPECT_EQ(measuredBy<LTELogGenerator>("LTE", candidates()), R"(
+    EXPECT_EQ(measuredBy<LTELogGenerator>("LTE", candidates()).lines(), R"(
 Connected mode LTE Intra-frequency Measurement/E-ARFCN: a number
 Connected mode LTE Intra-frequency Measurement/Serving Filtered RSRP: dBm
 Connected mode LTE Intra-frequency Measurement/Serving Filtered RSRQ: dB
@@ -208,7 +77,7 @@ Serving Cell Measurements/Version: a number
 
 TEST(Quantities, OfUtran)
 {
-    EXPECT_EQ(measuredBy<UTRANLogGenerator>("UTRAN"), R"(
+    EXPECT_EQ(measuredBy<UTRANLogGenerator>("UTRAN").lines(), R"(
 CCTRCH SIR/CCTRCH ID: a number
 CCTRCH SIR/SIR: a number
 CCTRCH SIR/TSNUM: a number
@@ -234,7 +103,7 @@ TRCH BLER/TRCH ID: a number
 
 TEST(Quantities, OfGsmAndUmts)
 {
-    EXPECT_EQ(measuredBy<ZPH_GSMLogGenerator>("ZPH_GSM"), R"(
+    EXPECT_EQ(measuredBy<ZPH_GSMLogGenerator>("ZPH_GSM").lines(), R"(
 Active Set/Energy Per Chip: dB
 Active Set/RSCP: dB
 Active Set/Scrambling Code: a number
@@ -332,7 +201,7 @@ UMTS Set/UARFCN: a number
 
 TEST(Quantities, OfCdma)
 {
-    EXPECT_EQ(measuredInTheCdmaCapture(), R"(
+    EXPECT_EQ(measuredInTheCdmaCapture().lines(), R"(
 0;EV-DO/4;Forward Link Rate: kbps
 0;EV-DO/5;Reverse Link Rate: kbps
 0;State/0;Device State: a text
