@@ -325,7 +325,7 @@ std::string_view nameOf(ModemService service)
     case ModemService::Location:
         return "Location";
     case ModemService::CellInformation:
-        return "Cell Information";
+        return "Cell Info";
     case ModemService::Sim:
         return "SIM";
     case ModemService::Data:

@@ -657,7 +657,7 @@ INSTANTIATE_TEST_SUITE_P(
                                 "Location: not permitted; see voxd(1)"},
                     RefusalCase{"CellInformation",
                                 {ModemService::CellInformation, RefusalReason::NotSupported, {}},
-                                "Cell Information: not supported by this modem; see voxd(1)"},
+                                "Cell Info: not supported by this modem; see voxd(1)"},
                     RefusalCase{"Sim", {ModemService::Sim, RefusalReason::NoAnswer, {}}, "SIM: no answer; see voxd(1)"},
                     RefusalCase{"Data",
                                 {ModemService::Data, RefusalReason::Failed, "Wrong state"},
