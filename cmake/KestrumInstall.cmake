@@ -29,3 +29,7 @@ foreach(program kestrum-terminal voxd kestrum-decode)
     install(FILES resources/completions/_${program} DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/site-functions)
     install(FILES resources/completions/${program}.fish DESTINATION ${CMAKE_INSTALL_DATADIR}/fish/vendor_completions.d)
 endforeach()
+
+# Examples for administrators: in use they would change the machine's policies.
+install(FILES resources/modem/kestrum-modem.conf resources/modem/50-kestrum-modem.rules
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/kestrum/examples)

@@ -135,6 +135,14 @@ class Installation(unittest.TestCase):
         unit = (self.scratch / "usr/lib/systemd/user/voxd.service").read_text(encoding="utf-8")
         self.assertIn('ExecStart="/usr/bin/voxd" $VOXD_OPTIONS\n', unit)
 
+    def test_examples_of_policies_are_documents_and_not_in_use(self):
+        self.install("/usr", DESTDIR=str(self.scratch))
+        examples = {path.name for path in SOURCE.glob("resources/modem/*")}
+        self.assertIn("kestrum-modem.conf", examples)
+        self.assertEqual({path.name for path in self.scratch.glob("usr/share/doc/kestrum/examples/*")}, examples)
+        installed = [str(path.relative_to(self.scratch)) for path in self.scratch.rglob("*")]
+        self.assertEqual([path for path in installed if re.search("dbus-1|polkit-1|^etc", path)], [])
+
     def test_icons_stand_in_every_size_under_the_name_that_the_desktop_file_has(self):
         self.install(self.scratch)
         share = self.scratch / "share"
