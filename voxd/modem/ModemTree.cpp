@@ -1,6 +1,5 @@
 #include "voxd/modem/ModemTree.h"
 
-#include "capture/PositionRecord.h"
 #include "support/Format.h"
 #include "support/Utf8.h"
 
@@ -730,8 +729,7 @@ std::string nodeName(const ModemState& modem, std::size_t index)
 
 } // namespace
 
-DictionaryRef makeModemTree(const ModemStates& states, Date time, const std::optional<Position>& position,
-                            const ModemTreeSetting& setting)
+DictionaryRef makeModemTree(const ModemStates& states, Date time, const ModemTreeSetting& setting)
 {
     Group root;
     if (states.daemon != ModemDaemon::Present || states.modems.empty())
@@ -746,9 +744,7 @@ DictionaryRef makeModemTree(const ModemStates& states, Date time, const std::opt
         }
     if (setting.everyModem && states.modems.size() > kMostModems)
         root.add("More Modems", std::to_string(states.modems.size() - kMostModems));
-    // Readers look for these two keys. They are shown after the numbered ones.
-    if (setting.position)
-        root.rows()->set(kPositionNode, positionNode(position));
+    // Readers look for this key. It is shown after the numbered ones.
     root.rows()->set("Time", isoText(time, 3));
     return root.rows();
 }

@@ -51,7 +51,7 @@ const Date kTime = *dateFromIso("2026-11-16T06:05:42Z") + std::chrono::milliseco
 
 std::string rowsOf(const ModemStates& states, const ModemTreeSetting& setting = {})
 {
-    return rowsOf(makeModemTree(states, kTime, std::nullopt, setting));
+    return rowsOf(makeModemTree(states, kTime, setting));
 }
 
 ModemStates statesOf(ModemState modem)
@@ -355,8 +355,8 @@ TEST(ModemTree, HasNoRowForWhatIsUnknown)
 // Replay, decoders and recordings look for this key.
 TEST(ModemTree, HasItsTimeUnderTheKeyTime)
 {
-    EXPECT_EQ(makeModemTree(statesOf(lteModem()), kTime, {}, {})->at("Time"), "2026-11-16T06:05:42.250Z");
-    EXPECT_EQ(makeModemTree({}, kTime, {}, {})->at("Time"), "2026-11-16T06:05:42.250Z");
+    EXPECT_EQ(makeModemTree(statesOf(lteModem()), kTime, {})->at("Time"), "2026-11-16T06:05:42.250Z");
+    EXPECT_EQ(makeModemTree({}, kTime, {})->at("Time"), "2026-11-16T06:05:42.250Z");
 }
 
 // Cells.
@@ -548,7 +548,7 @@ TEST(ModemTreeCells, OfManyNeighborsTheStrongestAreShownAndTheRestCounted)
     auto modem = umtsModem();
     for (unsigned i = 0; i < 10'000; ++i)
         modem.cells.push_back(umtsCell(false, 100 + i, -120 + i * 0.005));
-    const auto tree = makeModemTree(statesOf(modem), kTime, {}, {});
+    const auto tree = makeModemTree(statesOf(modem), kTime, {});
     const auto rows = rowsOf(tree);
     EXPECT_THAT(rows, HasSubstr("  63\n    Technology: UMTS\n"));
     EXPECT_THAT(rows, HasSubstr("  64: 9936 more cells\nRegistration\n"));
@@ -609,7 +609,7 @@ TEST(ModemTreeIdentities, AreShownWhenTheyAreAskedFor)
 
 TEST(ModemTreeIdentities, AreNowhereInTheMessageOtherwise)
 {
-    const auto data = *PropertyListCodec().toXml(makeModemTree(statesOf(lteModem()), kTime, {}, {.everyModem = true}));
+    const auto data = *PropertyListCodec().toXml(makeModemTree(statesOf(lteModem()), kTime, {.everyModem = true}));
     const std::string message(reinterpret_cast<const char*>(data.bytes().data()), data.bytes().size());
     for (const char* part : {"0123456789", "123456", "678905", "5f1ac09d", "c0a86e43"})
         EXPECT_THAT(message, Not(HasSubstr(part)));
@@ -770,13 +770,11 @@ TEST(ModemTree, OfAModemNamesTheDaemonsVersion)
     EXPECT_THAT(rowsOf(states), HasSubstr("  Lock: None\n  Daemon: ModemManager 1.20.4\n"));
 }
 
-// Position.
-
-TEST(ModemTreePosition, IsANodeAtTheRoot)
+// The service adds this node, whatever its source is.
+TEST(ModemTree, PositionStandsBeforeTheTime)
 {
-    const Position position{3, 60.1699, 24.9384, 13.5, kTime};
-    const auto tree = makeModemTree(statesOf(lteModem()), kTime, position, {.position = true});
-    EXPECT_EQ(positionIn(tree->at("Position")), position);
+    const auto tree = makeModemTree(statesOf(lteModem()), kTime, {});
+    tree->set(kPositionNode, positionNode(Position{3, 60.1699, 24.9384, 13.5, kTime}));
     EXPECT_THAT(rowsOf(tree), testing::EndsWith("  Lock: None\n"
                                                 "Position\n"
                                                 "  Fix: 3D\n"
@@ -785,25 +783,6 @@ TEST(ModemTreePosition, IsANodeAtTheRoot)
                                                 "  Speed: 13.50 m/s\n"
                                                 "  Time: 2026-11-16T06:05:42.250Z\n"
                                                 "Time: 2026-11-16T06:05:42.250Z\n"));
-}
-
-TEST(ModemTreePosition, WithoutAFixHasEmptyTexts)
-{
-    const auto rows = rowsOf(makeModemTree({}, kTime, {}, {.position = true}));
-    EXPECT_THAT(rows, HasSubstr("Position\n  Fix: \n  Latitude: \n  Longitude: \n  Speed: \n  Time: \nTime: 2026"));
-}
-
-TEST(ModemTreePosition, IsNotShownUnlessItIsAskedFor)
-{
-    const Position position{2, 0, 0, {}, {}};
-    EXPECT_THAT(rowsOf(makeModemTree({}, kTime, position, {})), Not(HasSubstr("Position")));
-}
-
-// It is that of the machine, not of a modem.
-TEST(ModemTreePosition, StandsOnceBesideEveryModem)
-{
-    const auto tree = makeModemTree(statesOf(lteModem()), kTime, {}, {.everyModem = true, .position = true});
-    EXPECT_THAT(rowsOf(tree), HasSubstr("    Lock: None\nPosition\n"));
 }
 
 // Several modems.
@@ -1010,7 +989,7 @@ private:
 
 RC_GTEST_PROP(ModemTreeNonsense, MakesATreeOfLimitedSizeThatDisplaysShow, (unsigned seed, bool everyModem))
 {
-    const auto tree = makeModemTree(Hostile(seed).states(), kTime, {},
+    const auto tree = makeModemTree(Hostile(seed).states(), kTime,
                                     {.everyModem = everyModem, .identities = seed % 2 == 0, .wanted = "\xFF;"});
     const auto rows = rowsOf(tree);
     RC_ASSERT(PropertyListCodec().toXml(tree)->bytes().size() < (1u << 20));
