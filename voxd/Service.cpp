@@ -209,14 +209,22 @@ void Service::streamDue()
             changeTechnology();
             break;
         }
-        const Data message(std::move(_next->bytes));
-        _witness.streamed(message.bytes());
-        for (const auto& channel : _channels)
-            channel->stream(message);
+        if (_settings.accompany)
+            if (auto companion = _settings.accompany(*_next))
+                stream(std::move(*companion));
+        stream(std::move(_next->bytes));
         _next.reset();
         fetch();
     }
     pace();
+}
+
+void Service::stream(std::vector<std::byte> message)
+{
+    const Data shared(std::move(message));
+    _witness.streamed(shared.bytes());
+    for (const auto& channel : _channels)
+        channel->stream(shared);
 }
 
 // Clients ask for the technology once, when they connect. They have to reconnect to learn the new one.

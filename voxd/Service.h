@@ -15,6 +15,7 @@
 #include <optional>
 #include <set>
 #include <string>
+#include <vector>
 
 namespace kestrum {
 
@@ -29,6 +30,8 @@ public:
         double speed = 1; ///< source time per real time, above 0
         /// Sends every frame.
         FrameSender send = [](FrameConnection& connection, const Frame& frame) { return connection.send(frame); };
+        /// Gets each message when it is due. May change it, and may give a message that is sent before it.
+        std::function<std::optional<std::vector<std::byte>>(Source::Message& due)> accompany = {};
     };
     static constexpr std::size_t kMaximumChannels = 16, kMaximumConnections = 64;
 
@@ -68,6 +71,7 @@ private:
     void pace();
     void fetch();
     void streamDue();
+    void stream(std::vector<std::byte> message);
     void changeTechnology();
     void retire(Channels::iterator first, Channels::iterator last);
     std::chrono::microseconds position(Moment now) const;

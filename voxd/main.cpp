@@ -6,6 +6,8 @@
 #include "platform/qt/TerminationSignals.h"
 #include "support/Format.h"
 #include "voxd/Faults.h"
+#include "voxd/Gpsd.h"
+#include "voxd/PositionTrack.h"
 #include "voxd/ReplaySource.h"
 #include "voxd/Service.h"
 #include "voxd/scenarios/Scenario.h"
@@ -32,6 +34,7 @@ struct Options {
     bool loop = false;
     std::uint64_t seed = 1;
     std::vector<std::string> faults;
+    std::optional<std::string> position;
 };
 
 std::string scenarioNames()
@@ -92,6 +95,13 @@ int serve(QCoreApplication& application, const Options& options)
     Service::Settings settings{runtimeDirectory(), options.speed};
     if (!options.faults.empty())
         settings.send = [&](FrameConnection& connection, const Frame& frame) { return faults.send(connection, frame); };
+    std::optional<Gpsd> gpsd;
+    std::optional<PositionTrack> track;
+    if (options.position) {
+        gpsd.emplace(*Gpsd::addressFrom(*options.position), log);
+        track.emplace([&] { return gpsd->current(); }, lists);
+        settings.accompany = [&](Source::Message& message) { return track->accompany(message); };
+    }
     const auto recorded = [&](const auto& write) {
         if (!record.is_open())
             return;
@@ -150,6 +160,15 @@ int main(int argc, char** argv)
         ->check(notFinite)
         ->check(CLI::Range(0.001, 1e9))
         ->capture_default_str();
+    commands
+        .add_option("--position", options.position,
+                    "Add this machine's position to the log, from gpsd (default: localhost:2947)")
+        ->type_name("[HOST:PORT]")
+        ->expected(0, 1)
+        ->excludes(write)
+        ->check([](const std::string& text) {
+            return Gpsd::addressFrom(text) ? "" : text + " is not an address such as localhost:2947";
+        });
     commands.add_option("--fault", options.faults, Faults::help())
         ->type_name("NAME[,NAME...]")
         ->delimiter(',')

@@ -14,6 +14,6 @@ _voxd() {
         --speed | --seed | --start | --seconds) ;;
         *)
             mapfile -t COMPREPLY < <(compgen -W '-h --help --version --scenario --replay --loop --speed --seed --start
-                --record --write --seconds --fault' -- "$current") ;;
+                --record --position --write --seconds --fault' -- "$current") ;;
     esac
 } && complete -F _voxd voxd

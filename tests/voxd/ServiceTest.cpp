@@ -1,4 +1,5 @@
 #include "capture/CaptureReader.h"
+#include "capture/PositionRecord.h"
 #include "doubles/RecordingLog.h"
 #include "harness/FileContents.h"
 #include "harness/Places.h"
@@ -14,6 +15,8 @@
 #include "support/Record.h"
 
 #include <QProcess>
+#include <QTcpServer>
+#include <QTcpSocket>
 #include <gmock/gmock.h>
 
 #include <csignal>
@@ -673,6 +676,86 @@ TEST_F(ServiceTest, ItsRecordingHoldsAllAndNotesWhatAClientMissed)
                 HasSubstr("its client reads again, " + std::to_string(recorded->missing()) + " messages were dropped"));
 }
 
+/// A gpsd that reports one position, ten times a second.
+class OneReceiver {
+public:
+    OneReceiver()
+    {
+        _server.listen(QHostAddress::LocalHost);
+        QObject::connect(&_timer, &QTimer::timeout, &_server, [this] {
+            if (auto* const peer = _server.nextPendingConnection())
+                _peers.push_back(peer);
+            for (auto* const peer : _peers)
+                peer->write("{\"class\":\"TPV\",\"device\":\"/dev/a\",\"mode\":2,\"lat\":52.52,\"lon\":13.4}\n");
+        });
+        _timer.start(100ms);
+    }
+    QString address() const { return "127.0.0.1:" + QString::number(_server.serverPort()); }
+
+private:
+    QTcpServer _server;
+    std::vector<QTcpSocket*> _peers;
+    QTimer _timer;
+};
+
+bool isPosition(std::string_view message)
+{
+    const auto record = channelRecord(bytesOf(message));
+    return record && record->code == kPositionRecord;
+}
+
+TEST_F(ServiceTest, PositionsAreRecordedAndReachNoDisplayThatDoesNotAskForThem)
+{
+    const OneReceiver receiver;
+    const auto recording = files / "recording.kcap";
+    ASSERT_TRUE(voxd.start({"--scenario", "lte", "--speed", "5", "--position", receiver.address(), "--record",
+                            QString::fromStdString(recording)}));
+    Client all{*this, "all"}, display{*this, "display"};
+    all.open();
+    display.open();
+    display.send(makeDictionary({{"SetState", "Streaming"},
+                                 {"SetZephraLogCodes", makeArray({Value(0xB0C1), Value(0xB17F)})},
+                                 {"SetVoxExtraCodes", makeArray({Value(0), Value(1), Value(2)})}}));
+    all.startStreaming();
+    ASSERT_TRUE(eventually([&] { return std::ranges::count_if(all.received, isPosition) >= 3; }));
+    const auto sent = static_cast<std::size_t>(std::ranges::count_if(all.received, isPosition));
+    EXPECT_FALSE(display.received.empty());
+    EXPECT_EQ(std::ranges::count_if(display.received, isPosition), 0);
+    voxd.process.terminate();
+    EXPECT_EQ(voxd.finish(), 0);
+
+    std::ifstream file(recording, std::ios::binary);
+    ByteWindow window(file);
+    const auto recorded = CaptureReader::make(CaptureFormat::Kcap, window, OnDamage::Stop,
+                                              [](const CaptureFault& fault) { ADD_FAILURE() << fault.reason; });
+    std::size_t positions = 0;
+    std::optional<std::uint64_t> stamp;
+    while (const auto message = recorded->next()) {
+        const auto read = channelRecord(*message);
+        ASSERT_TRUE(read);
+        if (stamp) {
+            EXPECT_EQ(read->timeStamp, stamp) << "of the record behind it";
+        }
+        stamp = isPosition(textOf(*message)) ? std::optional(read->timeStamp) : std::nullopt;
+        positions += stamp.has_value();
+    }
+    EXPECT_GE(positions, sent);
+}
+
+TEST_F(ServiceTest, TreesGetThePosition)
+{
+    const OneReceiver receiver;
+    ASSERT_TRUE(voxd.start({"--scenario", "ifx", "--speed", "5", "--position", receiver.address()}));
+    Client client{*this, "log"};
+    client.open();
+    client.startStreaming();
+    EXPECT_TRUE(eventually([&] {
+        return !client.received.empty() &&
+               positionIn(lists.parse(bytesOf(client.received.back())).dictionary()->at("Position")) ==
+                   Position{2, 52.52, 13.4, {}, {}};
+    }));
+}
+
 struct BadUse {
     const char* name;
     QStringList arguments;
@@ -703,6 +786,11 @@ INSTANTIATE_TEST_SUITE_P(
                     BadUse{"StartNoDate", {"--scenario", "ifx", "--start", "yesterday"}, 2, "yesterday is not a date"},
                     BadUse{"LoopWithoutReplay", {"--scenario", "ifx", "--loop"}, 2, "--replay"},
                     BadUse{"UnknownFault", {"--scenario", "ifx", "--fault", "flood,moon"}, 2, "there is no fault moon"},
+                    BadUse{"PositionOfNoAddress",
+                           {"--scenario", "ifx", "--position", "host:0"},
+                           2,
+                           "host:0 is not an address such as localhost:2947"},
+                    BadUse{"PositionOfNoTime", {"--scenario", "ifx", "--position", "--write", "a.kcap"}, 2, "excludes"},
                     BadUse{"NoSuchCapture", {"--replay", "/nowhere/a.kcap"}, 1, "/nowhere/a.kcap: cannot be read"},
                     BadUse{"RecordNowhere",
                            {"--scenario", "ifx", "--record", "/nowhere/a.kcap"},
@@ -720,7 +808,7 @@ TEST_F(ServiceTest, PrintsItsVersionAndItsHelp)
     EXPECT_EQ(help.finish(), 0);
     const auto text = help.process.readAllStandardOutput().toStdString();
     for (const char* each :
-         {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx", "--fault", "flood"})
+         {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx", "--fault", "flood", "--position"})
         EXPECT_THAT(text, HasSubstr(each));
 }
 
