@@ -141,16 +141,29 @@ public:
           _log(log),
           _other(source.technology() == kVoxLogChannelTechnology_IFX ? kVoxLogChannelTechnology_Zephra_LTE
                                                                      : kVoxLogChannelTechnology_IFX)
-    {}
+    {
+        _source.available = [this] { available(); };
+    }
+    UnsteadySource(const UnsteadySource&) = delete;
+    UnsteadySource& operator=(const UnsteadySource&) = delete;
+    ~UnsteadySource() override
+    {
+        _source.available = [] {};
+    }
 
     std::optional<Message> next() override
     {
+        auto message = _source.next();
+        if (!message)
+            return message;
         if (++_given == kStruckMessage)
             _log.write(Priority::Notice, "fault technology: now");
         else if (_given == kChanges * kStruckMessage)
             _log.write(Priority::Notice, "fault technology: over");
-        return _source.next();
+        return message;
     }
+    bool isLive() const override { return _source.isLive(); }
+    void streamedTo(std::size_t clients) override { _source.streamedTo(clients); }
     std::string_view technology() const override
     {
         const auto change = std::min(_given / kStruckMessage, kChanges);

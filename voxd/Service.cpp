@@ -54,9 +54,13 @@ Service::Service(Settings settings, Source& source, PropertyLists& lists, System
     _due.setSingleShot(true);
     _due.setTimerType(Qt::PreciseTimer);
     QObject::connect(&_due, &QTimer::timeout, &_due, [this] { streamDue(); });
+    _source.available = [this] { pace(); };
 }
 
-Service::~Service() = default;
+Service::~Service()
+{
+    _source.available = [] {};
+}
 
 std::optional<Problem> Service::start()
 {
@@ -144,9 +148,12 @@ LogChannelAnswer Service::refuse(std::string_view address, std::int32_t code, st
     return {vox::kServiceErrors, code, std::nullopt};
 }
 
-bool Service::isStreamed() const
+void Service::countStreams()
 {
-    return std::ranges::any_of(_channels, [](const auto& each) { return each->isStreaming(); });
+    const auto streams = static_cast<std::size_t>(
+        std::ranges::count_if(_channels, [](const auto& each) { return each->isStreaming(); }));
+    if (std::exchange(_streams, streams) != streams)
+        _source.streamedTo(streams);
 }
 
 microseconds Service::position(Moment now) const
@@ -162,10 +169,13 @@ microseconds Service::position(Moment now) const
 void Service::pace()
 {
     const Moment now = steady_clock::now();
-    if (!isStreamed()) {
+    countStreams();
+    if (_streams == 0) {
         _position = position(now);
         _since.reset();
         _due.stop();
+        if (_source.isLive())
+            _next.reset();
         return;
     }
     if (!_since)
@@ -186,7 +196,7 @@ void Service::fetch()
         return;
     _next = _source.next();
     _nextTechnology = _source.technology();
-    _sourceEnded = !_next;
+    _sourceEnded = !_next && !_source.isLive();
     if (_sourceEnded && sourceEnded)
         sourceEnded();
 }

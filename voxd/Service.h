@@ -67,7 +67,7 @@ private:
     LogChannelAnswer openChannel(std::string_view address, std::unique_ptr<FrameConnection> logPort);
     LogChannelAnswer refuse(std::string_view address, std::int32_t code, std::string_view why);
 
-    bool isStreamed() const;
+    void countStreams();
     void pace();
     void fetch();
     void streamDue();
@@ -92,6 +92,7 @@ private:
     std::string _nextTechnology;
     std::chrono::microseconds _position{0}; // the source's time at `_since`, or while it stands still
     std::optional<Moment> _since;           // when the source's time started to run; empty while it stands still
+    std::size_t _streams = 0;               ///< clients that stream
     bool _sourceEnded = false;
     Moment _nextSlice; // no message is sent before it
     QTimer _due;

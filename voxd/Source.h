@@ -2,6 +2,7 @@
 
 #include <chrono>
 #include <cstddef>
+#include <functional>
 #include <optional>
 #include <string_view>
 #include <vector>
@@ -10,6 +11,9 @@ namespace kestrum {
 
 /// The origin of the service's log: a simulated drive, a capture, a modem. The service reads it at the pace of the
 /// messages' times while at least one client streams. All clients get the same log.
+///
+/// A source is made of messages that exist already, or it is live. A live source waits for its messages, and they are
+/// of the moment: one that was not sent before the last client left is dropped.
 class Source {
 public:
     virtual ~Source() = default;
@@ -19,8 +23,17 @@ public:
         std::vector<std::byte> bytes;    ///< one channel message in its wire format
     };
 
-    /// The next message; empty at the end, and in every later call.
+    /// The next message. Empty at the end, and in every later call; of a live source: empty until `available`.
     virtual std::optional<Message> next() = 0;
+
+    /// A live source has no end. Its messages are due at once.
+    virtual bool isLive() const { return false; }
+
+    /// A live source calls this when `next` has a message again; never within a call from the service.
+    std::function<void()> available = [] {};
+
+    /// The number of clients that stream has changed. A live source has a message at once when it has grown.
+    virtual void streamedTo(std::size_t /*clients*/) {}
 
     /// The identifier (kVoxLogChannelTechnology_...) of the last message that `next` gave; before the first, that of
     /// the first. When it changes, the service closes its channels, so that the clients ask again. It sends the

@@ -1,0 +1,73 @@
+#include "voxd/modem/BusCalls.h"
+
+#include "voxd/modem/BusNames.h"
+
+#include <QDBusError>
+#include <QDBusPendingCallWatcher>
+
+#include <utility>
+
+namespace kestrum {
+namespace {
+
+// The bus library has a limit too, which must not come before the owner's.
+constexpr std::chrono::seconds kSpare{2};
+
+} // namespace
+
+struct BusCalls::Call {
+    struct Later {
+        void operator()(QDBusPendingCallWatcher* watcher) const { watcher->deleteLater(); }
+    };
+
+    std::unique_ptr<QDBusPendingCallWatcher, Later> watcher;
+    std::chrono::seconds left;
+    Done done;
+};
+
+BusCalls::BusCalls(QDBusConnection bus) : _bus(std::move(bus)) {}
+
+BusCalls::~BusCalls()
+{
+    for (const auto& each : _calls)
+        each.watcher->disconnect();
+}
+
+void BusCalls::call(const QString& path, const QString& interface, const QString& method, const QVariantList& arguments,
+                    std::chrono::seconds limit, Done done)
+{
+    auto message = QDBusMessage::createMethodCall(bus::kService, path, interface, method);
+    message.setArguments(arguments);
+    message.setAutoStartService(false);
+    const auto milliseconds = static_cast<int>(std::chrono::milliseconds(limit + kSpare).count());
+    const auto call = _calls.insert(_calls.end(), Call{});
+    call->left = limit;
+    call->done = std::move(done);
+    call->watcher.reset(new QDBusPendingCallWatcher(_bus.asyncCall(message, milliseconds)));
+    QObject::connect(call->watcher.get(), &QDBusPendingCallWatcher::finished, call->watcher.get(),
+                     [this, call](QDBusPendingCallWatcher* watcher) { finish(call, watcher->reply()); });
+}
+
+void BusCalls::tick()
+{
+    Calls late;
+    for (auto each = _calls.begin(); each != _calls.end();) {
+        const auto call = each++;
+        if ((call->left -= std::chrono::seconds(1)) > std::chrono::seconds(0))
+            continue;
+        call->watcher->disconnect();
+        late.splice(late.end(), _calls, call);
+    }
+    for (const auto& each : late)
+        each.done(QDBusMessage::createError(bus::kNoReply, QString()));
+}
+
+// Taken out first: `done` may make the next call.
+void BusCalls::finish(Calls::iterator call, const QDBusMessage& reply)
+{
+    const Call finished = std::move(*call);
+    _calls.erase(call);
+    finished.done(reply);
+}
+
+} // namespace kestrum
