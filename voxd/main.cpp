@@ -3,6 +3,7 @@
 #include "platform/posix/RuntimeDirectory.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "platform/qt/LinuxClock.h"
+#include "platform/qt/QtMainQueue.h"
 #include "platform/qt/TerminationSignals.h"
 #include "support/Format.h"
 #include "voxd/Faults.h"
@@ -10,6 +11,8 @@
 #include "voxd/PositionTrack.h"
 #include "voxd/ReplaySource.h"
 #include "voxd/Service.h"
+#include "voxd/modem/ModemManager.h"
+#include "voxd/modem/ModemSource.h"
 #include "voxd/scenarios/Scenario.h"
 
 #include <CLI/CLI.hpp>
@@ -27,11 +30,14 @@ namespace {
 using namespace kestrum;
 
 constexpr int kRunTimeError = 1, kUsageError = 2;
+// The maximum time for putting the modem's settings back when the service ends.
+constexpr std::chrono::seconds kPutBackLimit{3};
+constexpr std::string_view kFirstModem = "first", kEveryModem = "all";
 
 struct Options {
-    std::string scenario, replay, record, write, start;
+    std::string scenario, replay, modem, record, write, start;
     double speed = 1, seconds = 60;
-    bool loop = false;
+    bool loop = false, identities = false;
     std::uint64_t seed = 1;
     std::vector<std::string> faults;
     std::optional<std::string> position;
@@ -61,6 +67,14 @@ std::ofstream openForWriting(const std::string& path)
     return file;
 }
 
+ModemTreeSetting treeSetting(const Options& options)
+{
+    ModemTreeSetting setting{.everyModem = options.modem == kEveryModem, .identities = options.identities};
+    if (options.modem != kFirstModem && options.modem != kEveryModem)
+        setting.wanted = options.modem;
+    return setting;
+}
+
 // Needed because CLI11's ranges accept not-a-number.
 std::string notFinite(const std::string& text)
 {
@@ -83,10 +97,24 @@ int serve(QCoreApplication& application, const Options& options)
 {
     // A closed log or output must not end the service.
     std::signal(SIGPIPE, SIG_IGN);
-    const TerminationSignals termination([&] { application.quit(); });
+    std::unique_ptr<ModemManager> modems;
+    const TerminationSignals termination([&, ending = false]() mutable {
+        if (modems && !std::exchange(ending, true))
+            modems->end(kPutBackLimit, [] { QCoreApplication::quit(); });
+        else
+            application.quit();
+    });
     LinuxSystemLog log(standardErrorSink("voxd"), logLevel("voxd", LOG_INFO));
     PropertyListCodec lists;
-    const auto source = makeSource(options, lists);
+    const LinuxClock clock;
+    QtMainQueue queue;
+    std::unique_ptr<Source> source;
+    if (options.modem.empty()) {
+        source = makeSource(options, lists);
+    } else {
+        modems = std::make_unique<ModemManager>(ModemManager::systemBus, options.modem, queue, log);
+        source = std::make_unique<ModemSource>(*modems, treeSetting(options), queue, clock, lists);
+    }
     std::ofstream record;
     if (!options.record.empty())
         record = openForWriting(options.record);
@@ -137,10 +165,24 @@ int main(int argc, char** argv)
     auto* const scenario = commands.add_option("--scenario", options.scenario, scenarioNames());
     auto* const replay = commands.add_option("--replay", options.replay, "A capture, .kcap or .dlf");
     commands.add_flag("--loop", options.loop, "Start the capture again when it ends")->needs(replay);
-    commands.add_option("--speed", options.speed, "Speed relative to real time")
-        ->check(notFinite)
-        ->check(CLI::Range(0.001, 1e6))
-        ->capture_default_str();
+    auto* const modem =
+        commands
+            .add_option("--modem", options.modem,
+                        "The machine's own modem, live, of ModemManager: the first, all of them, or the one "
+                        "whose device identifier begins with ID")
+            ->type_name("[ID|first|all]")
+            ->expected(0, 1)
+            ->excludes(scenario)
+            ->excludes(replay);
+    commands
+        .add_flag("--identities", options.identities,
+                  "Show the identities of the SIM and the modem in full, not masked")
+        ->needs(modem);
+    auto* const speed = commands.add_option("--speed", options.speed, "Speed relative to real time")
+                            ->check(notFinite)
+                            ->check(CLI::Range(0.001, 1e6))
+                            ->capture_default_str();
+    modem->excludes(speed);
     commands.add_option("--seed", options.seed, "Seed of the scenario; equal seeds give equal scenarios")
         ->needs(scenario)
         ->capture_default_str();
@@ -182,10 +224,13 @@ int main(int argc, char** argv)
         return "there is no scenario " + name;
     });
     record->excludes(write);
+    modem->excludes(write);
     try {
         commands.parse(argc, argv);
-        if (options.scenario.empty() && options.replay.empty())
-            throw CLI::RequiredError("--scenario or --replay");
+        if (modem->count() > 0 && options.modem.empty())
+            options.modem = kFirstModem;
+        if (options.scenario.empty() && options.replay.empty() && options.modem.empty())
+            throw CLI::RequiredError("--scenario, --replay or --modem");
     } catch (const CLI::ParseError& error) {
         return commands.exit(error) == 0 ? 0 : kUsageError;
     }

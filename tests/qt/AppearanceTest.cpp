@@ -2,14 +2,11 @@
 
 #include "frontends/qt/Appearance.h"
 #include "frontends/qt/Motion.h"
-#include "harness/Scratch.h"
+#include "qtplatform/PrivateBus.h"
 
 #include <QDBusMessage>
 #include <QDBusVirtualObject>
-#include <QProcess>
-#include <QUrl>
 
-#include <fstream>
 #include <map>
 
 namespace kestrum {
@@ -20,39 +17,6 @@ const QString kSettings = QStringLiteral("org.freedesktop.portal.Settings");
 const QString kScheme = QStringLiteral("org.freedesktop.appearance color-scheme");
 const QString kAnimations = QStringLiteral("org.gnome.desktop.interface enable-animations");
 constexpr uint kDark = 1, kLight = 2;
-
-/// A separate session bus.
-class PrivateBus {
-public:
-    PrivateBus()
-    {
-        const QByteArray path = QUrl::toPercentEncoding(QString::fromStdString(_place / "bus"), "/", "~");
-        std::ofstream(_place / "bus.conf")
-            << R"(<!DOCTYPE busconfig PUBLIC "-//freedesktop//DTD D-Bus Bus Configuration 1.0//EN"
- "http://www.freedesktop.org/standards/dbus/1.0/busconfig.dtd">
-<busconfig><type>session</type><auth>EXTERNAL</auth><listen>unix:path=)"
-            << path.constData()
-            << R"(</listen><policy context="default"><allow send_destination="*"/><allow receive_sender="*"/>
-<allow own="*"/></policy></busconfig>)";
-        _daemon.start("dbus-daemon", {"--config-file=" + QString::fromStdString(_place / "bus.conf"), "--nofork",
-                                      "--print-address=1"});
-        if (_daemon.waitForReadyRead())
-            _address = QString::fromUtf8(_daemon.readLine()).trimmed();
-    }
-    ~PrivateBus()
-    {
-        _daemon.terminate();
-        _daemon.waitForFinished();
-    }
-
-    /// A named connection of this process. It lasts until it is disconnected by that name.
-    QDBusConnection connect(const QString& name) const { return QDBusConnection::connectToBus(_address, name); }
-
-private:
-    ScratchDirectory _place;
-    QProcess _daemon;
-    QString _address;
-};
 
 /// The settings part of the desktop's portal. It ends with its connection.
 class Portal final : public QDBusVirtualObject {

@@ -777,13 +777,21 @@ TEST_P(BadUses, AreReportedWithTheirReason)
 
 INSTANTIATE_TEST_SUITE_P(
     CommandLine, BadUses,
-    testing::Values(BadUse{"NoSource", {}, 2, "--scenario or --replay is required"},
+    testing::Values(BadUse{"NoSource", {}, 2, "--scenario, --replay or --modem is required"},
                     BadUse{"UnknownScenario", {"--scenario", "moon"}, 2, "there is no scenario moon"},
                     BadUse{"UnknownOption", {"--frobnicate"}, 2, "--frobnicate"},
                     BadUse{"TwoSources", {"--scenario", "ifx", "--replay", "a.kcap"}, 2, "excludes"},
                     BadUse{"SpeedZero", {"--scenario", "ifx", "--speed", "0"}, 2, "--speed"},
                     BadUse{"SpeedNoNumber", {"--scenario", "ifx", "--speed", "fast"}, 2, "--speed"},
                     BadUse{"StartNoDate", {"--scenario", "ifx", "--start", "yesterday"}, 2, "yesterday is not a date"},
+                    BadUse{"AModemAndAScenario", {"--scenario", "ifx", "--modem"}, 2, "excludes"},
+                    BadUse{"AModemAndACapture", {"--replay", "a.kcap", "--modem"}, 2, "excludes"},
+                    BadUse{"AModemAtAnotherSpeed", {"--modem", "all", "--speed", "2"}, 2, "excludes"},
+                    BadUse{"AModemOfASeed", {"--modem", "--seed", "2"}, 2, "--scenario"},
+                    BadUse{"AModemFromAStart", {"--modem", "--start", "2026-11-16T06:05:42Z"}, 2, "--scenario"},
+                    BadUse{"AModemAgain", {"--modem", "--loop"}, 2, "--replay"},
+                    BadUse{"AModemWritten", {"--modem", "--write", "a.kcap"}, 2, "excludes"},
+                    BadUse{"IdentitiesOfNoModem", {"--scenario", "ifx", "--identities"}, 2, "--modem"},
                     BadUse{"LoopWithoutReplay", {"--scenario", "ifx", "--loop"}, 2, "--replay"},
                     BadUse{"UnknownFault", {"--scenario", "ifx", "--fault", "flood,moon"}, 2, "there is no fault moon"},
                     BadUse{"PositionOfNoAddress",
@@ -807,8 +815,8 @@ TEST_F(ServiceTest, PrintsItsVersionAndItsHelp)
     help.launch({"--help"});
     EXPECT_EQ(help.finish(), 0);
     const auto text = help.process.readAllStandardOutput().toStdString();
-    for (const char* each :
-         {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx", "--fault", "flood", "--position"})
+    for (const char* each : {"--scenario", "--replay", "--speed", "--loop", "--record", "--seed", "ifx", "--fault",
+                             "flood", "--position", "--modem", "--identities"})
         EXPECT_THAT(text, HasSubstr(each));
 }
 

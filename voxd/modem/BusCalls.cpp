@@ -39,11 +39,16 @@ void BusCalls::call(const QString& path, const QString& interface, const QString
     auto message = QDBusMessage::createMethodCall(bus::kService, path, interface, method);
     message.setArguments(arguments);
     message.setAutoStartService(false);
+    call(message, limit, std::move(done));
+}
+
+void BusCalls::call(const QDBusMessage& method, std::chrono::seconds limit, Done done)
+{
     const auto milliseconds = static_cast<int>(std::chrono::milliseconds(limit + kSpare).count());
     const auto call = _calls.insert(_calls.end(), Call{});
     call->left = limit;
     call->done = std::move(done);
-    call->watcher.reset(new QDBusPendingCallWatcher(_bus.asyncCall(message, milliseconds)));
+    call->watcher.reset(new QDBusPendingCallWatcher(_bus.asyncCall(method, milliseconds)));
     QObject::connect(call->watcher.get(), &QDBusPendingCallWatcher::finished, call->watcher.get(),
                      [this, call](QDBusPendingCallWatcher* watcher) { finish(call, watcher->reply()); });
 }

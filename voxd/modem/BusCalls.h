@@ -30,6 +30,8 @@ public:
     /// not destroy this object.
     void call(const QString& path, const QString& interface, const QString& method, const QVariantList& arguments,
               std::chrono::seconds limit, Done done);
+    /// A method of any program on the bus.
+    void call(const QDBusMessage& method, std::chrono::seconds limit, Done done);
     void tick();
 
     bool isEmpty() const { return _calls.empty(); }

@@ -19,6 +19,7 @@ inline const QString kBearer = QStringLiteral("org.freedesktop.ModemManager1.Bea
 inline const QString kObjectManager = QStringLiteral("org.freedesktop.DBus.ObjectManager");
 inline const QString kProperties = QStringLiteral("org.freedesktop.DBus.Properties");
 
+inline const QString kAccessDenied = QStringLiteral("org.freedesktop.DBus.Error.AccessDenied");
 inline const QString kNoReply = QStringLiteral("org.freedesktop.DBus.Error.NoReply");
 
 } // namespace kestrum::bus

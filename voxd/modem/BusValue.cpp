@@ -1,13 +1,11 @@
 #include "voxd/modem/BusValue.h"
 
-#include <QDBusArgument>
 #include <QMetaType>
 
 #include <cfloat>
 #include <charconv>
 #include <cmath>
-#include <limits>
-#include <string_view>
+#include <utility>
 
 namespace kestrum {
 namespace {
@@ -49,17 +47,6 @@ std::optional<Number> wholeFrom(const QVariant& value)
     return std::in_range<Number>(number) ? std::optional(static_cast<Number>(number)) : std::nullopt;
 }
 
-// The value as an argument to read from; nothing when its signature is another one.
-std::optional<QDBusArgument> argumentFrom(const QVariant& value, std::string_view signature)
-{
-    if (value.metaType() != QMetaType::fromType<QDBusArgument>())
-        return std::nullopt;
-    const auto argument = value.value<QDBusArgument>();
-    if (argument.currentSignature().toStdString() != signature)
-        return std::nullopt;
-    return argument;
-}
-
 template <typename Element>
 QList<Element> elementsFrom(const QVariant& value, std::string_view signature, qsizetype most)
 {
@@ -78,6 +65,16 @@ QList<Element> elementsFrom(const QVariant& value, std::string_view signature, q
 }
 
 } // namespace
+
+std::optional<QDBusArgument> argumentFrom(const QVariant& value, std::string_view signature)
+{
+    if (value.metaType() != QMetaType::fromType<QDBusArgument>())
+        return std::nullopt;
+    const auto argument = value.value<QDBusArgument>();
+    if (argument.currentSignature().toStdString() != signature)
+        return std::nullopt;
+    return argument;
+}
 
 std::string textFrom(const QString& text)
 {

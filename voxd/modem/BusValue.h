@@ -1,5 +1,6 @@
 #pragma once
 
+#include <QDBusArgument>
 #include <QDBusObjectPath>
 #include <QList>
 #include <QMap>
@@ -9,6 +10,7 @@
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <string_view>
 
 /// Values of another program on the bus. They can have any type, number and size: what is not of the expected kind is
 /// nothing.
@@ -36,6 +38,8 @@ std::optional<double> levelFrom(const QVariant& value);
 std::optional<std::uint64_t> longHexadecimalFrom(const QVariant& value);
 std::optional<std::uint32_t> hexadecimalFrom(const QVariant& value);
 
+/// A container to read from; nothing when its signature is another one.
+std::optional<QDBusArgument> argumentFrom(const QVariant& value, std::string_view signature);
 /// Empty for a value that is no "a{sv}".
 QVariantMap mapFrom(const QVariant& value);
 /// At most `most` elements of an "aa{sv}".

@@ -12,7 +12,7 @@
 #include <functional>
 #include <map>
 #include <optional>
-#include <string_view>
+#include <vector>
 
 namespace kestrum {
 
@@ -48,39 +48,65 @@ public:
     void tick();
 
 private:
-    /// A setting of the daemon: as it was before, ours while it is needed, and put back then.
+    /// A setting of the daemon: theirs, ours while it is needed, and then theirs again.
     struct Setting {
         enum class Phase { Theirs, Taking, Ours, Returning };
+
+        ModemService service;
+        QString interface;
         Phase phase = Phase::Theirs;
-
-        bool isOurs() const { return phase == Phase::Taking || phase == Phase::Ours; }
     };
-    using Properties = QVariantMap;
+    /// An object that belongs to the modem, and what is known of it.
+    template <typename Known>
+    struct Part {
+        QString path;
+        std::optional<Known> known = {};
+        bool isAsked = false;
+    };
+    /// Properties of an interface: all of them, or those that have changed.
+    struct Properties {
+        const QVariantMap& values;
+        bool all;
 
+        /// Calls `use` with the value, unless it has not changed.
+        template <typename Use>
+        void with(const char* name, Use use) const;
+        template <typename Target, typename Reader>
+        void read(const char* name, Target& target, Reader reader) const;
+    };
+
+    void readInterface(const QString& interface, const Properties& properties);
     void readModem(const Properties& properties);
+    void readQuality(const QVariant& value);
     void read3gpp(const Properties& properties);
     void readSignal(const Properties& properties);
     void readLocationSettings(const Properties& properties);
-    void readSim(const Properties& properties);
+    static void readSim(const Properties& properties, ModemSim& sim);
+    static void readBearer(const Properties& properties, ModemBearer& bearer);
+
     void followSim(const QString& path);
     void followBearers(const QList<QDBusObjectPath>& paths);
-    void fetch(const QString& path, const QString& interface, ModemService service,
-               std::function<void(const Properties&)> read);
+    void fetchParts();
+    template <typename Known>
+    void fetch(Part<Known>* (WatchedModem::*find)(const QString&), Part<Known>& part, const QString& interface,
+               ModemService service, void (*read)(const Properties&, Known&));
+    Part<ModemSim>* findSim(const QString& path);
+    Part<ModemBearer>* findBearer(const QString& path);
+    void publishParts();
 
     bool isMeasurable() const;
     void settle();
     void settleRate();
     void settleLocation();
-    void change(Setting& setting, ModemService service, const QString& interface, const QVariantList& arguments,
-                std::function<void()> taken);
-    void putBack(Setting& setting, const QString& interface, const QVariantList& arguments);
+    void take(Setting& setting, const QVariantList& arguments, std::function<void()> taken);
+    void putBack(Setting& setting, const QVariantList& arguments, std::function<void()> returned);
     void askLocation();
     void askCells();
-    void readCells(const QDBusMessage& reply);
+    void takeCells(const QDBusMessage& reply);
 
     bool mayAsk(ModemService service) const;
     void refuse(ModemService service, const QDBusMessage& error);
-    void refuse(ModemRefusal refusal);
+    void refuse(const ModemRefusal& refusal);
     void permit(ModemService service);
 
     QString _path;
@@ -90,20 +116,20 @@ private:
     BusCalls _calls;
     ModemState _state;
 
-    BusInterfaces _interfaces; ///< the names; the properties are empty
-    QString _simPath;
-    std::map<QString, std::optional<ModemBearer>> _bearers; ///< by path; empty until it has been read
+    QStringList _interfaces;
+    Part<ModemSim> _sim;
+    std::vector<Part<ModemBearer>> _bearers;
 
     bool _measuring = false;
     Setting _rateSetting, _locationSetting;
-    std::uint32_t _rate = 0, _rateBefore = 0;
+    std::uint32_t _rate = 0, _rateBefore = 0; ///< seconds; 0: levels are not measured
     std::uint32_t _locationSources = 0, _locationCapabilities = 0;
     bool _signalsLocation = false;
-    bool _locationAsked = false;
-    std::optional<std::chrono::seconds> _cellsAskedFor; ///< how long the reply has been awaited
-    std::chrono::seconds _now{0};                       ///< ticks
+    bool _locationIsAsked = false;
+    std::optional<std::chrono::seconds> _cellsAwaited; ///< for so long
+    std::chrono::seconds _now{0};                      ///< ticks
     std::chrono::seconds _nextLocation{0}, _nextCells{0};
-    std::map<ModemService, std::chrono::seconds> _askAgain; ///< not before; for those that were refused
+    std::map<ModemService, std::chrono::seconds> _askAgain; ///< the refused, and when they are asked again
 };
 
 } // namespace kestrum
