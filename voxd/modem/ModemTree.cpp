@@ -493,23 +493,30 @@ bool areSameCell(const ModemCell& left, const ModemCell& right)
             (areEqual(left.channel, right.channel) && areEqual(codeOf(left), codeOf(right))));
 }
 
+/// Without what says "none". Where nothing is known the daemon gives a cell identity of 0, and no area.
+ModemLocation knownPart(ModemLocation location)
+{
+    location.lac = area(location.lac);
+    location.tac = area(location.tac);
+    if (location.ci == 0U && !location.lac && !location.tac)
+        location.ci.reset();
+    return location;
+}
+
 /// Whether the modem has left the cell since GetCellInfo answered. The location is always newer.
 bool isLeft(const ModemCell& cell, const ModemLocation& location)
 {
-    return differ(cell.ci, location.ci) || differ(area(cell.tac), area(location.tac)) ||
-           differ(area(cell.lac), area(location.lac));
+    return differ(cell.ci, location.ci) || differ(area(cell.tac), location.tac) || differ(area(cell.lac), location.lac);
 }
 
 void locate(ModemCell& cell, const ModemLocation& location)
 {
-    // Where nothing is known the daemon gives a cell identity of 0, and no area.
-    const auto tac = area(location.tac), lac = area(location.lac);
-    if (location.ci && (*location.ci != 0 || tac || lac))
+    if (location.ci)
         cell.ci = location.ci;
-    if (tac)
-        cell.tac = tac;
-    if (lac)
-        cell.lac = lac;
+    if (location.tac)
+        cell.tac = location.tac;
+    if (location.lac)
+        cell.lac = location.lac;
     if (!location.mcc.empty() && !location.mnc.empty())
         cell.operatorCode = location.mcc + location.mnc;
 }
@@ -526,7 +533,7 @@ std::vector<ModemCell> servingCells(const ModemState& modem)
         registered = cells.front().type;
     std::ranges::stable_partition(cells, [registered](const ModemCell& each) { return each.type == registered; });
 
-    const ModemLocation location = modem.location.value_or(ModemLocation());
+    const ModemLocation location = knownPart(modem.location.value_or(ModemLocation()));
     if (cells.empty() || cells.front().type != registered)
         cells.emplace(cells.begin());
     else if (isLeft(cells.front(), location))

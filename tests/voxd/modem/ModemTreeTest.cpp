@@ -522,6 +522,13 @@ TEST(ModemTreeCells, LocationWithoutAreaAndIdentityIsNone)
                                          "Registration\n"));
 }
 
+TEST(ModemTreeCells, LocationThatIsNoneDoesNotContradictTheServingCell)
+{
+    auto modem = lteModem();
+    modem.location = ModemLocation{"", "", 0, 0, 0};
+    EXPECT_THAT(rowsOf(modem), HasSubstr("  Physical Cell ID: 76\n"));
+}
+
 TEST(ModemTreeCells, SecondCarriersAreNumbered)
 {
     auto modem = lteModem();
