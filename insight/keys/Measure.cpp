@@ -12,11 +12,11 @@ std::span<const MeasureTraits> measures()
         {Measure::Rscp,                  "RSCP",    "dBm", -140,   0},
         {Measure::EcNo,                  "Ec/No",   "dB",   -40,  10},
         {Measure::RxLev,                 "RxLev",   "dBm", -120,   0},
-        {Measure::RxQual,                "RxQual",  "",       0,   7},
+        {Measure::RxQual,                "RxQual",  "",       0,   7, true},
         {Measure::PilotStrength,         "Ec/Io",   "dB",   -50,  10},
         {Measure::CarrierToInterference, "C/I",     "dB",   -50,  40},
         {Measure::CdmaPower,             "RxAGC",   "dBm", -120,   0},
-        {Measure::FrameErrors,           "FER",     "%",      0, 100},
+        {Measure::FrameErrors,           "FER",     "%",      0, 100, true},
     };
     // clang-format on
     return kMeasures;

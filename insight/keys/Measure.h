@@ -27,6 +27,7 @@ struct MeasureTraits {
     std::string_view name; ///< in a file of thresholds
     std::string_view unit;
     double least, greatest; ///< that a threshold can have
+    bool lessIsBetter = false;
 };
 
 /// All measures except None.

@@ -1,0 +1,95 @@
+#include "insight/Explanation.h"
+
+#include "support/Format.h"
+
+#include <algorithm>
+
+namespace kestrum {
+namespace {
+
+/// The usual level of RXLEV n, in dBm: the upper end of its step (3GPP TS 45.008, 8.1.4).
+double levelOfRxLev(double index)
+{
+    return index - 110;
+}
+
+struct Measured {
+    double number;
+    std::string_view unit; ///< refers to the text, or to a constant
+};
+
+std::optional<Measured> measuredIn(const Value& value)
+{
+    if (const auto* reading = value.borrowedReading()) {
+        const auto number = reading->number();
+        return number ? std::optional(Measured{*number, reading->unit()}) : std::nullopt;
+    }
+    if (const auto* text = value.borrowedString()) {
+        Measured measured{};
+        if (const auto number = leadingNumber(*text, measured.unit)) {
+            measured.number = *number;
+            return measured;
+        }
+    }
+    return std::nullopt;
+}
+
+/// In a tree of several technologies RSSI is a received level only for GSM.
+bool isOtherThanGsm(const Dictionary* beside)
+{
+    if (beside == nullptr)
+        return false;
+    const auto found =
+        std::ranges::find_if(*beside, [](const auto& entry) { return shownName(entry.key) == "Technology"; });
+    return found != beside->end() && found->value.isText() && found->value != "GSM";
+}
+
+} // namespace
+
+std::optional<double> numberOf(const KeyEntry& entry, const Value& value)
+{
+    const auto measured = measuredIn(value);
+    if (!measured)
+        return std::nullopt;
+    const auto& [number, unit] = *measured;
+    if (unit == entry.in.unit)
+        return number;
+    if (unit != entry.in.secondUnit)
+        return std::nullopt;
+    return unit.empty() && entry.in.measure == Measure::RxLev ? levelOfRxLev(number) : number;
+}
+
+std::optional<Verdict> verdictOf(const KeyEntry& entry, const Value& value, const Dictionary* beside,
+                                 const Thresholds& thresholds)
+{
+    const auto number = numberOf(entry, value);
+    if (!number)
+        return std::nullopt;
+    if (entry.in.measure != Measure::RxLev)
+        return thresholds.grade(entry.in.measure, *number);
+    if (isOtherThanGsm(beside))
+        return std::nullopt;
+    return thresholds.grade(Measure::RxLev, entry.in.unit.empty() ? levelOfRxLev(*number) : *number);
+}
+
+Explanation explain(const KeyEntry& entry, const Value& value, const Dictionary* beside, const Thresholds& thresholds)
+{
+    return {entry.key, entry.meaning, entry.standard,
+            entry.derive != nullptr ? entry.derive(Given{value, beside}) : DerivedValues(),
+            verdictOf(entry, value, beside, thresholds)};
+}
+
+std::vector<std::string> linesOf(const Explanation& explanation)
+{
+    std::vector<std::string> lines{std::string(explanation.meaning)};
+    for (const auto& [name, text] : explanation.derived)
+        lines.push_back(formatted("%s: %s", name, text));
+    if (const auto& verdict = explanation.verdict)
+        lines.push_back(formatted("This value: %s, by profile %s (%s)", word(verdict->grade), verdict->profile,
+                                  verdict->source.substr(0, verdict->source.find_last_not_of('.') + 1)));
+    if (!explanation.standard.empty())
+        lines.push_back(formatted("Standard: %s", explanation.standard));
+    return lines;
+}
+
+} // namespace kestrum
