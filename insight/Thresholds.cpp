@@ -65,7 +65,7 @@ const MeasureTraits* traitsOf(std::string_view name)
 }
 
 /// For an error's text: a part of the file, short and printable.
-std::string quoted(std::string_view text)
+std::string inQuotes(std::string_view text)
 {
     constexpr std::size_t kLongest = 40;
     std::string shown = "\"";
@@ -142,7 +142,7 @@ public:
         if (const auto wrong = endProfile(); !wrong.empty())
             return at(_profileLine, wrong);
         if (_useLine != 0 && std::ranges::find(_profiles, _used, &ThresholdProfile::name) == _profiles.end())
-            return at(_useLine, "there is no profile " + quoted(_used));
+            return at(_useLine, "there is no profile " + inQuotes(_used));
         return std::nullopt;
     }
 
@@ -167,7 +167,7 @@ private:
             return readSource(trimmed(line));
         const auto* measure = traitsOf(word);
         if (measure == nullptr)
-            return quoted(word) + " is neither use, profile, source nor a measure such as RSRP";
+            return inQuotes(word) + " is neither use, profile, source nor a measure such as RSRP";
         return readLimits(*measure, line);
     }
 
@@ -193,7 +193,7 @@ private:
             return formatted("after profile comes a name of at most %lu small letters, digits and hyphens",
                              kLongestName);
         if (std::ranges::find(_profiles, name, &ThresholdProfile::name) != _profiles.end())
-            return "there is already a profile " + quoted(name);
+            return "there is already a profile " + inQuotes(name);
         if (_profiles.size() == kMostProfiles)
             return formatted("there are more than %lu profiles", kMostProfiles);
         _profiles.push_back({std::string(name), {}, {}});
@@ -207,7 +207,7 @@ private:
             return "source stands before the first profile";
         auto& profile = _profiles.back();
         if (!profile.source.empty())
-            return "the profile " + quoted(profile.name) + " already has a source";
+            return "the profile " + inQuotes(profile.name) + " already has a source";
         if (source.empty() || source.size() > kLongestSource)
             return formatted("after source comes a text of at most %lu bytes", kLongestSource);
         if (!isPrintable(source))
@@ -222,7 +222,7 @@ private:
             return formatted("%s stands before the first profile", measure.name);
         auto& profile = _profiles.back();
         if (std::ranges::find(profile.limits, measure.measure, &Limits::measure) != profile.limits.end())
-            return formatted("the profile %s already has %s", quoted(profile.name), measure.name);
+            return formatted("the profile %s already has %s", inQuotes(profile.name), measure.name);
         Limits limits{measure.measure, 0, 0, 0, 0};
         const double* previous = nullptr;
         for (const auto& [word, limit] : kGradeWords) {
@@ -232,7 +232,7 @@ private:
                 return formatted("after %s come excellent, good, fair and poor, each with a number", measure.name);
             const auto number = numberIn(text);
             if (!number)
-                return quoted(text) + " is no number";
+                return inQuotes(text) + " is no number";
             if (*number < measure.least || *number > measure.greatest)
                 return formatted("%s: %s is not from %s to %s", measure.name, text, shortest(measure.least),
                                  shortest(measure.greatest));
@@ -242,7 +242,7 @@ private:
             previous = &(limits.*limit);
         }
         if (!trimmed(rest).empty())
-            return quoted(trimmed(rest)) + " stands after the number of poor";
+            return inQuotes(trimmed(rest)) + " stands after the number of poor";
         profile.limits.push_back(limits);
         return {};
     }
