@@ -11,7 +11,7 @@ readonly run_packages=(
 # shellcheck disable=SC2034
 readonly test_packages=(
     libgtest-dev libgmock-dev librapidcheck-dev
-    python3 dbus libvterm-dev xvfb at-spi2-core gpsd modemmanager
+    python3 dbus libvterm-dev xvfb at-spi2-core gpsd modemmanager python3-dbusmock dbus-bin
 )
 # For scripts/bench.
 # shellcheck disable=SC2034

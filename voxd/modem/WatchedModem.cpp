@@ -28,7 +28,8 @@ const QString kSetup = QStringLiteral("Setup");
 // Before a service that failed is asked again.
 constexpr seconds kPause = 60s;
 
-constexpr qsizetype kMostCells = 64, kMostBearers = 16;
+// Far more than a modem sees. The tree shows the strongest.
+constexpr qsizetype kMostCells = 1024, kMostBearers = 16;
 constexpr std::uint32_t kWhole = 100; // percent
 
 constexpr std::string_view nameOf(ModemService service)

@@ -245,7 +245,7 @@ TEST_F(ModemManagerTest, KeepsABoundedNumberOfNeighbours)
     ASSERT_TRUE(eventually([&] { return client.states().modems.size() == 1; }));
     queue.advance(1s);
     ASSERT_TRUE(eventually([&] { return !modem().cells.empty(); }));
-    EXPECT_THAT(modem().cells, SizeIs(64));
+    EXPECT_THAT(modem().cells, SizeIs(1024));
 }
 
 TEST_F(ModemManagerTest, NeverAsksForCellsTwiceAtOnceAndDropsALateAnswer)
