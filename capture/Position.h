@@ -2,12 +2,16 @@
 
 #include "support/Date.h"
 
+#include <chrono>
 #include <optional>
 
 namespace kestrum {
 
 inline constexpr double kMostLatitude = 90, kMostLongitude = 180; ///< degrees
 inline constexpr double kMostSpeed = 10'000;                      ///< metres a second; a satellite's is below 8,000
+
+/// A position counts for less than this time after its report.
+inline constexpr std::chrono::seconds kLongestPositionAge{5};
 
 /// A position that a satellite receiver has found. There is no such object without a fix.
 struct Position {

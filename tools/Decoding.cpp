@@ -1,6 +1,7 @@
 #include "tools/Decoding.h"
 
 #include "capture/MessageTime.h"
+#include "capture/PositionRecord.h"
 #include "capture/Technology.h"
 #include "platform/ChannelMessage.h"
 #include "platform/Clock.h"
@@ -174,6 +175,8 @@ void Decoding::use(std::string_view technology)
 
 void Decoding::decode(Bytes message)
 {
+    if (takePosition(message))
+        return;
     Decoded decoded;
     bool reaches = false;
     Tally& tally = classified(message, decoded, reaches);
@@ -194,8 +197,44 @@ void Decoding::decode(Bytes message)
     _inInterval += message.size();
     if (_inInterval >= kInterval)
         endInterval();
+    addPosition(decoded);
     if (_then)
         _then(decoded);
+}
+
+// A record of a position belongs to no technology, so no generator gets it.
+bool Decoding::takePosition(Bytes message)
+{
+    const auto read = ChannelMessage::read(message);
+    if (!read || read->logCode != kPositionRecord)
+        return false;
+    const auto payload = read->record.from(ChannelMessage::kHeaderSize);
+    const Value node = payload ? _lists.parse(payload->bytes()) : Value();
+    _position = positionIn(node);
+    _positionTime = timeOf(*read);
+    Tally& tally = _statistics[kPositionRecord];
+    ++tally.messages;
+    ++(node.borrowedDictionary() != nullptr ? tally.decoded : tally.refused);
+    if (_then)
+        _then({_positionTime, kPositionRecord, _position});
+    return true;
+}
+
+void Decoding::addPosition(Decoded& decoded) const
+{
+    if (!decoded.code) {
+        const Value tree = _state.at(StateKey::kDisplayState);
+        const auto* root = tree.borrowedDictionary();
+        if (const auto* node = root != nullptr ? std::as_const(*root).find(kPositionNode) : nullptr) {
+            decoded.position = positionIn(*node);
+            return;
+        }
+    }
+    if (!_position || !_positionTime || !decoded.time)
+        return;
+    const auto age = *decoded.time - *_positionTime;
+    if (std::chrono::abs(age) < kLongestPositionAge)
+        decoded.position = _position;
 }
 
 // Counts messages that reach no decoder.

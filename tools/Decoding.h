@@ -1,6 +1,7 @@
 #pragma once
 
 #include "LogGenerator/LogGenerator.h"
+#include "capture/Position.h"
 #include "platform/Console.h"
 #include "platform/RecordWatch.h"
 #include "platform/SystemLog.h"
@@ -48,6 +49,7 @@ public:
     struct Decoded {
         std::optional<Date> time; ///< of the record or the tree, see timeOf
         std::optional<LogCode> code;
+        std::optional<Position> position; ///< in the tree, or in the last record of a position, if it is recent
     };
     using Then = std::function<void(const Decoded&)>;
 
@@ -79,6 +81,8 @@ private:
     bool adoptTechnologyOf(Bytes message);
     void use(std::string_view technology);
     void decode(Bytes message);
+    bool takePosition(Bytes message);
+    void addPosition(Decoded& decoded) const;
     Tally& classified(Bytes message, Decoded& decoded, bool& reaches);
     void endInterval();
 
@@ -96,6 +100,8 @@ private:
     std::unique_ptr<LogGenerator> _generator;
     std::set<LogCode> _codes; ///< the codes that the generator takes
     std::size_t _inInterval = 0;
+    std::optional<Position> _position; ///< of the last record of a position
+    std::optional<Date> _positionTime; ///< of that record
 
     std::vector<std::vector<std::byte>> _early;
     std::size_t _earlyBytes = 0;

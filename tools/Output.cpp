@@ -5,6 +5,7 @@
 #include "support/Format.h"
 #include "tools/Changes.h"
 #include "tools/Harmless.h"
+#include "tools/ServingCell.h"
 #include "tools/TemporaryFile.h"
 
 #include <nlohmann/json.hpp>
@@ -13,6 +14,8 @@
 #include <charconv>
 #include <chrono>
 #include <cmath>
+#include <functional>
+#include <map>
 #include <optional>
 #include <utility>
 
@@ -117,6 +120,16 @@ public:
         for (auto at = _text.size() - 2; _text[at] != '.'; --at, fraction /= 10)
             _text[at] = static_cast<char>('0' + fraction % 10);
         to += _text;
+    }
+    void appendJson(std::string& to, std::optional<Date> stamp)
+    {
+        if (!stamp) {
+            to += "null";
+            return;
+        }
+        to += '"';
+        append(to, *stamp);
+        to += '"';
     }
 
 private:
@@ -290,6 +303,7 @@ public:
     void message(const Decoding& decoding, const Decoding::Decoded& decoded) final
     {
         _decoded = &decoded;
+        _technology = decoding.technology();
         _isChanged = false;
         if (decoded.code)
             _changes.look(decoding.display(), *decoded.code,
@@ -315,6 +329,8 @@ protected:
     virtual void append(std::string& text, const Changes::Change& change, bool isFirst) = 0;
     virtual void end(std::string&) {}
 
+    std::string_view technology() const { return _technology; }
+
 private:
     void changed(const Changes::Change& change)
     {
@@ -336,6 +352,7 @@ private:
     static constexpr std::size_t kPiece = 64 << 10; ///< bytes; a message may change any number of values
 
     const Decoding::Decoded* _decoded = nullptr; ///< the message that is looked at
+    std::string_view _technology;                ///< of that message
     bool _isChanged = false, _isResuming = false;
     std::string _text;
     Changes _changes{[this](const Changes::Change& change) { changed(change); }};
@@ -377,13 +394,7 @@ private:
     void begin(std::string& text, const Decoding::Decoded& decoded) override
     {
         text += "{\"time\":";
-        if (decoded.time) {
-            text += '"';
-            _stamp.append(text, *decoded.time);
-            text += '"';
-        } else {
-            text += "null";
-        }
+        _stamp.appendJson(text, decoded.time);
         text += ",\"code\":";
         text += decoded.code ? '"' + codeText(*decoded.code) + '"' : "null";
         text += ",\"changes\":{";
@@ -479,6 +490,114 @@ private:
     std::string _begin; ///< the first cells of the message's rows
 };
 
+/// The number and the unit at the begin of a text: "-98.00 dBm". Trees of modems have their levels so.
+std::optional<Measure> measureIn(std::string_view text)
+{
+    double number = 0;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number, std::chars_format::fixed);
+    if (error != std::errc{} || !std::isfinite(number))
+        return std::nullopt;
+    const auto rest = text.substr(static_cast<std::size_t>(end - text.data()));
+    for (const std::string_view unit : {"dBm", "dB", "%"})
+        if (rest.starts_with(' ') && rest.substr(1) == unit)
+            return Measure{number, unit};
+    return std::nullopt;
+}
+
+/// A map (RFC 7946): a point for each change of the serving cell or of its levels at a known position, with all of its
+/// values. A level is a number, and its name ends in the unit, so that a map can be coloured by it.
+class GeojsonOutput final : public ChangesOutput {
+public:
+    GeojsonOutput(Contents contents, OutputFile& data, OutputFile& remarks) : ChangesOutput(contents, data, remarks)
+    {
+        _data.write("{\"type\":\"FeatureCollection\",\"features\":[");
+    }
+
+    void finish() override { _data.write("\n]}\n"); }
+
+private:
+    void begin(std::string&, const Decoding::Decoded& decoded) override
+    {
+        _time = decoded.time;
+        _position = decoded.position;
+        _isCellChanged = false;
+    }
+    void append(std::string&, const Changes::Change& change, bool) override
+    {
+        auto property = propertyOf(change);
+        if (property) {
+            _properties.insert_or_assign(std::string(change.path), std::move(*property));
+            _isCellChanged = true;
+        } else if (const auto known = _properties.find(change.path); known != _properties.end()) {
+            _properties.erase(known);
+            _isCellChanged = true;
+        }
+    }
+    void end(std::string& text) override
+    {
+        if (!_isCellChanged || !_position)
+            return;
+        text += std::exchange(_isFirst, false) ? "\n" : ",\n";
+        text += R"({"type":"Feature","geometry":{"type":"Point","coordinates":[)";
+        appendNumber(text, _position->longitude);
+        text += ',';
+        appendNumber(text, _position->latitude);
+        text += R"(]},"properties":{"time":)";
+        _stamp.appendJson(text, _time);
+        text += R"(,"technology":)";
+        appendJson(text, technology());
+        if (_position->speed) {
+            text.append(",\"").append(kSpeed).append("\":");
+            appendNumber(text, *_position->speed);
+        }
+        // Trees from outside may have any names, and an object has a name once.
+        std::map<std::string_view, std::string_view> values;
+        for (const auto& [path, property] : _properties)
+            values.try_emplace(property.name, property.value);
+        for (const std::string_view own : {std::string_view("time"), std::string_view("technology"), kSpeed})
+            values.erase(own);
+        for (const auto& [name, value] : values) {
+            text += ',';
+            appendJson(text, name);
+            text.append(":").append(value);
+        }
+        text += "}}";
+    }
+
+    struct Property {
+        std::string name;  ///< "Measured RSRP (dBm)"
+        std::string value; ///< as JSON: -98.25
+    };
+    /// Nothing for a value that does not describe the serving cell, and for one that is not known.
+    std::optional<Property> propertyOf(const Changes::Change& change) const
+    {
+        const bool isKnown = !change.text.empty() && change.text != "N/A";
+        auto name = isKnown ? servingCellName(technology(), change.path) : std::nullopt;
+        if (!name)
+            return std::nullopt;
+        std::string value;
+        const auto* reading = change.value.borrowedReading();
+        const auto measure = reading != nullptr ? measureIn(change.value) : measureIn(change.text);
+        if (measure && !measure->unit.empty()) {
+            appendNumber(value, measure->number);
+            name->append(" (").append(measure->unit).append(")");
+        } else if (reading == nullptr || reading->unit().empty()) {
+            appendJson(value, change.text);
+        } else {
+            return std::nullopt; // "Not Present" is no level
+        }
+        return Property{std::move(*name), std::move(value)};
+    }
+
+    static constexpr std::string_view kSpeed = "speed (m/s)";
+
+    std::optional<Date> _time; ///< of the message that is looked at
+    std::optional<Position> _position;
+    bool _isCellChanged = false, _isFirst = true;
+    std::map<std::string, Property, std::less<>> _properties; ///< by path, of the values that the display has
+    StampText _stamp;
+};
+
 } // namespace
 
 std::unique_ptr<Output> Output::make(OutputFormat format, Contents contents, OutputFile& data, OutputFile& remarks)
@@ -490,6 +609,8 @@ std::unique_ptr<Output> Output::make(OutputFormat format, Contents contents, Out
         return std::make_unique<JsonlOutput>(contents, data, remarks);
     case OutputFormat::Csv:
         return std::make_unique<CsvOutput>(contents, data, remarks);
+    case OutputFormat::Geojson:
+        return std::make_unique<GeojsonOutput>(contents, data, remarks);
     case OutputFormat::Tree:
         break;
     }

@@ -12,7 +12,7 @@
 
 namespace kestrum::tools {
 
-enum class OutputFormat { Tree, Json, Jsonl, Csv };
+enum class OutputFormat { Tree, Json, Jsonl, Csv, Geojson };
 
 /// Writes the decoded messages and the display to standard output.
 class Output {
@@ -27,6 +27,8 @@ public:
     virtual void snapshot(const SnapshotListing& listing) = 0;
     /// Called with the current display at the end, and whenever the end of a followed file is reached.
     virtual void display(const Decoding&) {}
+    /// Called once, after all else, also when the input was bad.
+    virtual void finish() {}
 
     /// What is written besides the values.
     struct Contents {

@@ -117,6 +117,8 @@ public:
             return 0; // The reader wants no more.
         } catch (const WrongUsage&) {
             complain(_file + ": cannot be followed, because a snapshot does not grow");
+            _output->finish();
+            _data.flush();
             return kUsageError;
         }
         return _isBad ? kBadInput : 0;
@@ -284,6 +286,7 @@ private:
         _remarks.flush();
         if (_shownMessages == 0 || _shownMessages != _decoding.total().messages)
             _output->display(_decoding);
+        _output->finish();
         _data.flush();
         if (_options.stats)
             showStatistics();

@@ -28,16 +28,19 @@ const std::map<std::string, std::string> kTechnologies = {
 const std::map<std::string, OutputFormat> kFormats = {{"tree", OutputFormat::Tree},
                                                       {"json", OutputFormat::Json},
                                                       {"jsonl", OutputFormat::Jsonl},
-                                                      {"csv", OutputFormat::Csv}};
+                                                      {"csv", OutputFormat::Csv},
+                                                      {"geojson", OutputFormat::Geojson}};
 
 constexpr const char* kFooter = R"(Formats:
-  tree   what the panes show after the last message
-  json   one object: technology, messages, dropped, display, and (with --log) log
-  jsonl  one object for each message that changed the display: time, code, changes by path; with --numbers, a
-         measurement is an object: text, number, unit
-  csv    the same changes as rows: time, code, path, value, number, unit (number and unit are empty if the value is not
-         a measurement). A value that a spreadsheet would read as a formula (it begins with = + - @, a tab or a return,
-         and is not a number) gets an apostrophe before it
+  tree     what the panes show after the last message
+  json     one object: technology, messages, dropped, display, and (with --log) log
+  jsonl    one object for each message that changed the display: time, code, changes by path; with --numbers, a
+           measurement is an object: text, number, unit
+  csv      the same changes as rows: time, code, path, value, number, unit (number and unit are empty if the value is
+           not a measurement). A value that a spreadsheet would read as a formula (it begins with = + - @, a tab or a
+           return, and is not a number) gets an apostrophe before it
+  geojson  a map (RFC 7946): a point for each change of the serving cell or its levels at a known position (voxd
+           --position), with time, technology, speed, cell and levels; the name of a level ends in its unit
 
 Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum). Files with other names are recognised by their
 content. Several files are read one after the other, as parts of one log. "dropped" counts messages of an invalid type,
@@ -60,7 +63,7 @@ int main(int argc, char** argv)
     std::string technology, format = "tree";
     commands.add_option("--technology", technology, "ifx, gsm, cdma, lte or utran (default: as the messages show)")
         ->check(CLI::IsMember(&kTechnologies));
-    commands.add_option("--format", format, "tree, json, jsonl or csv")
+    commands.add_option("--format", format, "tree, json, jsonl, csv or geojson")
         ->check(CLI::IsMember(&kFormats))
         ->capture_default_str();
     commands.add_flag("--log", options.log,

@@ -76,7 +76,7 @@ Gpsd::Gpsd(Address address, SystemLog& log, Settings settings)
 
 std::optional<Position> Gpsd::current() const
 {
-    const bool isRecent = _known && _settings.now() - _known->arrived < kLongestAge;
+    const bool isRecent = _known && _settings.now() - _known->arrived < kLongestPositionAge;
     return isRecent ? std::optional(_known->position) : std::nullopt;
 }
 

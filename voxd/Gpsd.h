@@ -28,8 +28,6 @@ public:
     /// "HOST", "HOST:PORT", or with an IPv6 address "[::1]:2947"; an empty text is the default. Nothing for other texts.
     static std::optional<Address> addressFrom(std::string_view text);
 
-    /// A position counts for less than this time after it has arrived.
-    static constexpr std::chrono::seconds kLongestAge{5};
     /// The longest line that is read, in bytes; gpsd's own limit is 10,240.
     static constexpr int kLongestLine = 64 << 10;
 
@@ -44,7 +42,7 @@ public:
     Gpsd(const Gpsd&) = delete;
     Gpsd& operator=(const Gpsd&) = delete;
 
-    /// Nothing while there is no fix, and without a recent report of one.
+    /// Nothing while there is no fix, and kLongestPositionAge after the last report of one.
     std::optional<Position> current() const;
 
 private:

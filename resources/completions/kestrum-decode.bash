@@ -6,7 +6,7 @@ _kestrum_decode() {
         --technology)
             mapfile -t COMPREPLY < <(compgen -W 'ifx gsm cdma lte utran' -- "$current") ;;
         --format)
-            mapfile -t COMPREPLY < <(compgen -W 'tree json jsonl csv' -- "$current") ;;
+            mapfile -t COMPREPLY < <(compgen -W 'tree json jsonl csv geojson' -- "$current") ;;
         --extract)
             compopt -o filenames 2>/dev/null
             mapfile -t COMPREPLY < <(compgen -d -- "$current") ;;

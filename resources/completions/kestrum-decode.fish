@@ -1,7 +1,7 @@
 complete -c kestrum-decode -s h -l help -d 'Show the options'
 complete -c kestrum-decode -l version -d 'Show the version'
 complete -c kestrum-decode -l technology -x -a 'ifx gsm cdma lte utran' -d 'Technology of the log'
-complete -c kestrum-decode -l format -x -a 'tree json jsonl csv' -d 'Form of the output'
+complete -c kestrum-decode -l format -x -a 'tree json jsonl csv geojson' -d 'Form of the output'
 complete -c kestrum-decode -l log -d 'Show the system log too'
 complete -c kestrum-decode -l numbers -d 'Show number and unit of each value in jsonl'
 complete -c kestrum-decode -l stats -d 'Count the messages of each log code'

@@ -516,7 +516,7 @@ TEST_F(ProgramTest, TheCostOfRemovedKeysIsNotQuadratic)
         };
         return inSeconds(after.ru_utime) - inSeconds(before.ru_utime);
     };
-    for (const auto* format : {"csv", "jsonl", "json"})
+    for (const auto* format : {"csv", "jsonl", "json", "geojson"})
         EXPECT_LE(seconds(50'000, format), 45 * seconds(5'000, format) + 0.5) << format;
 }
 
