@@ -23,11 +23,19 @@ struct ChannelMessage {
 
     /// Nothing for a message of fewer than 13 bytes, prefix included. A record behind a prefix may so have only 11
     /// bytes; its type and code are always there.
-    static std::optional<ChannelMessage> read(Bytes message);
+    static std::optional<ChannelMessage> read(Bytes message)
+    {
+        if (message.size() < kHeaderSize)
+            return std::nullopt;
+        const Record record(message.front() == kPrefixMarker ? message.subspan(kPrefixSize) : message);
+        const auto type = static_cast<std::uint8_t>(record.read(u8(0)).value_or(0));
+        const LogCode code = record.read(u16(3)).value_or(0);
+        return ChannelMessage{record, type, type == kExtraCode ? kExtraCodes + code : code};
+    }
 
     bool isOfKnownType() const { return type == kOrdinary || type == kExtraCode; }
     /// CDMA system time, see dateFromTimeStamp; nothing when the record was left too short for it.
-    std::optional<std::uint64_t> timeStamp() const;
+    std::optional<std::uint64_t> timeStamp() const { return record.read64(5); }
 };
 
 /// Log codes of the telephony service's records: a property list follows the header.

@@ -3,10 +3,12 @@
 #include "LogGenerator/LogGenerator.h"
 #include "core/KestrumModelNode.h"
 #include "decoding/Messages.h"
+#include "insight/Events.h"
 #include "voxd/scenarios/Scenario.h"
 
 #include <chrono>
 #include <memory>
+#include <optional>
 #include <span>
 #include <string_view>
 #include <vector>
@@ -37,7 +39,15 @@ public:
     /// Continues on the same state with another generator.
     void changeTo(std::string_view technology);
 
-    void receive(Bytes message) { _generator->updateState(_state, message); }
+    /// Finds the events too, as an application that shows them.
+    void findEvents() { _events.emplace(); }
+
+    void receive(Bytes message)
+    {
+        _generator->updateState(_state, message);
+        if (_events)
+            _events->look(*_generator, _state, message);
+    }
     /// Updates the display and makes its tree.
     KestrumModelNodeRef refresh(PathDictionary& paths);
     void refresh();
@@ -50,6 +60,7 @@ private:
     Surroundings _surroundings;
     std::unique_ptr<LogGenerator> _generator;
     State _state;
+    std::optional<EventFinder> _events;
 };
 
 } // namespace kestrum::bench

@@ -81,6 +81,10 @@ public:
     {}
 
     std::string_view technology() const override { return kVoxLogChannelTechnology_Zephra_CDMA; }
+    std::vector<ScenarioCell> servingCells() const override
+    {
+        return {{"1x", cdmaCell(_world, _oneX.site()).baseStation}, {"EV-DO", cdmaCell(_world, _evdo.site()).pilot}};
+    }
 
     void begin(ModemLog& log) override
     {

@@ -1,6 +1,5 @@
 #pragma once
 
-#include "voxd/Source.h"
 #include "voxd/scenarios/Modem.h"
 #include "voxd/scenarios/Scenario.h"
 #include "voxd/scenarios/World.h"
@@ -8,12 +7,13 @@
 #include <deque>
 #include <initializer_list>
 #include <memory>
+#include <vector>
 
 namespace kestrum {
 
 /// The source of a live scenario: a car drives through the world, and the source gives its modem's log. Several
 /// modems alternate in legs of half a minute.
-class Drive final : public Source {
+class Drive final : public ScenarioSource {
 public:
     using MakeModem = std::unique_ptr<Modem> (*)(const World& world, Random random);
 
@@ -21,6 +21,7 @@ public:
 
     std::optional<Message> next() override;
     std::string_view technology() const override { return modem().technology(); }
+    std::vector<ScenarioCell> servingCells() const override { return modem().servingCells(); }
 
 private:
     Modem& modem() const { return *_modems[_leg % _modems.size()]; }

@@ -32,6 +32,12 @@ public:
     {}
 
     std::string_view technology() const override { return kVoxLogChannelTechnology_Zephra_GSM; }
+    std::vector<ScenarioCell> servingCells() const override
+    {
+        if (_onUmts)
+            return {{"UMTS", _umts.cell().identity}};
+        return {{"GSM", _gsm.cell().identity}};
+    }
 
     void begin(ModemLog& log) override
     {

@@ -52,7 +52,7 @@ constexpr CallPhase kPhases[] = {
     {"Wait for release", "SDCCH/8", 2, 4},
 };
 
-class IfxScenario final : public Source {
+class IfxScenario final : public ScenarioSource {
 public:
     explicit IfxScenario(const ScenarioSetting& setting)
         : _lists(setting.lists), _start(setting.start), _random(setting.seed)
@@ -71,6 +71,7 @@ public:
     }
 
     std::string_view technology() const override { return kVoxLogChannelTechnology_IFX; }
+    std::vector<ScenarioCell> servingCells() const override { return {{"GSM", _cells[_serving].identity}}; }
 
     std::optional<Message> next() override
     {
@@ -259,7 +260,7 @@ private:
 
 } // namespace
 
-std::unique_ptr<Source> makeIfxScenario(const ScenarioSetting& setting)
+std::unique_ptr<ScenarioSource> makeIfxScenario(const ScenarioSetting& setting)
 {
     return std::make_unique<IfxScenario>(setting);
 }

@@ -37,6 +37,7 @@ public:
     }
 
     std::string_view technology() const override { return kVoxLogChannelTechnology_Zephra_LTE; }
+    std::vector<ScenarioCell> servingCells() const override { return {{"LTE", cell().identity}}; }
 
     void begin(ModemLog& log) override
     {

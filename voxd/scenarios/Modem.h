@@ -2,6 +2,7 @@
 
 #include "platform/PropertyLists.h"
 #include "voxd/scenarios/RecordWriter.h"
+#include "voxd/scenarios/Scenario.h"
 
 #include <chrono>
 #include <string_view>
@@ -47,6 +48,9 @@ public:
 
     /// kVoxLogChannelTechnology_...
     virtual std::string_view technology() const = 0;
+
+    /// The cells that serve now.
+    virtual std::vector<ScenarioCell> servingCells() const = 0;
 
     /// Starts the log with everything that the modem knows.
     virtual void begin(ModemLog& log) = 0;

@@ -14,7 +14,7 @@ namespace kestrum {
 namespace {
 
 template <Drive::MakeModem... modems>
-std::unique_ptr<Source> drive(const ScenarioSetting& setting)
+std::unique_ptr<ScenarioSource> drive(const ScenarioSetting& setting)
 {
     return std::make_unique<Drive>(setting, std::initializer_list<Drive::MakeModem>{modems...});
 }
@@ -36,7 +36,7 @@ std::span<const Scenario> scenarios()
     return kScenarios;
 }
 
-std::unique_ptr<Source> makeScenario(std::string_view name, const ScenarioSetting& setting)
+std::unique_ptr<ScenarioSource> makeScenario(std::string_view name, const ScenarioSetting& setting)
 {
     const auto found = std::ranges::find(kScenarios, name, &Scenario::name);
     return found == std::end(kScenarios) ? nullptr : found->make(setting);

@@ -36,6 +36,7 @@ public:
     {}
 
     std::string_view technology() const override { return kVoxLogChannelTechnology_Zephra_UTRAN2; }
+    std::vector<ScenarioCell> servingCells() const override { return {{"TD-SCDMA", cell().identity}}; }
 
     void begin(ModemLog& log) override
     {

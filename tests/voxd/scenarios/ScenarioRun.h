@@ -94,7 +94,7 @@ public:
     PropertyListCodec lists;
     DecodingRoles roles{log, console, clock, bundle, lists};
 
-    std::unique_ptr<Source> source;
+    std::unique_ptr<ScenarioSource> source;
     std::unique_ptr<LogGenerator> generator;
     State state;
     Source::Message message{};
