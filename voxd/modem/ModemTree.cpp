@@ -711,7 +711,8 @@ Group modemGroup(const ModemState& modem, const ModemStates& states, bool identi
 void addModem(Group& groups, const ModemState& modem, const ModemStates& states, bool identities)
 {
     groups.add("Status", statusOf(modem));
-    if (modem.signalQuality && *modem.signalQuality <= 100)
+    // Of a modem that is off the daemon says 0 %, as of one without coverage.
+    if (modem.phase >= ModemPhase::Enabled && modem.signalQuality && *modem.signalQuality <= 100)
         groups.add("Signal Quality",
                    formatted("%u %%", *modem.signalQuality) + (modem.signalQualityRecent ? "" : " (not recent)"));
     const auto serving = servingCells(modem);

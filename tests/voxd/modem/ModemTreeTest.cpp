@@ -777,6 +777,15 @@ TEST(ModemTree, OfAModemNamesTheDaemonsVersion)
     EXPECT_THAT(rowsOf(states), HasSubstr("  Lock: None\n  Daemon: ModemManager 1.20.4\n"));
 }
 
+TEST(ModemTree, QualityOfAModemThatIsOffIsUnknown)
+{
+    auto modem = lteModem();
+    modem.signalQuality = 0;
+    EXPECT_THAT(rowsOf(modem), HasSubstr("Signal Quality: 0 %\n"));
+    modem.phase = ModemPhase::Disabled;
+    EXPECT_THAT(rowsOf(modem), Not(HasSubstr("Signal Quality")));
+}
+
 // The service adds this node, whatever its source is.
 TEST(ModemTree, PositionStandsBeforeTheTime)
 {
@@ -841,6 +850,8 @@ TEST(ModemTreeNonsense, LevelsThatAreNoneAreUnknown)
 {
     constexpr double kInfinity = std::numeric_limits<double>::infinity();
     ModemState modem;
+    modem.phase = ModemPhase::Enabled;
+    const auto without = rowsOf(modem);
     modem.signalQuality = UINT32_MAX;
     modem.signal.lte = SignalLevels{std::numeric_limits<double>::quiet_NaN(),
                                     -std::numeric_limits<double>::max(), // what the daemon's libraries call unknown
@@ -850,7 +861,7 @@ TEST(ModemTreeNonsense, LevelsThatAreNoneAreUnknown)
                                     -1001,
                                     101};
     modem.signal.gsm = SignalLevels{{}, {}, {}, {}, {}, {}, -1};
-    EXPECT_EQ(rowsOf(modem), rowsOf(ModemState()));
+    EXPECT_EQ(rowsOf(modem), without);
 }
 
 TEST(ModemTreeNonsense, HugeNumbersAreShownAsTheyCame)
