@@ -17,8 +17,9 @@ states: GSM/GPRS/UMTS/HSDPA, LTE, UTRAN and CDMA2000. Snapshots are saved and
 read back offline.
 .
 It holds the display for a window and for a terminal, the telephony service
-voxd, which replays captures and simulates drives, and the decoder
-kestrum-decode, which turns captures into trees, JSON and CSV.")
+voxd, which shows the machine's own modem, replays captures and simulates
+drives, and the decoder kestrum-decode, which turns captures into trees, JSON
+and CSV.")
 
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 # Dependencies that no program is linked to: Qt's plug-in for the SVG icon, and the window's typeface. The second
@@ -26,6 +27,8 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_DEPENDS
     "qt6-svg-plugins | libqt6svg6 (<< 6.8), fonts-liberation (>= 1:2) | fonts-liberation2")
 set(CPACK_DEBIAN_PACKAGE_RECOMMENDS qt6-wayland)
+# For voxd --modem and voxd --position.
+set(CPACK_DEBIAN_PACKAGE_SUGGESTS "modemmanager, gpsd")
 
 set(CPACK_PRE_BUILD_SCRIPTS ${CMAKE_SOURCE_DIR}/cmake/DebianDocuments.cmake)
 include(CPack)
