@@ -39,8 +39,8 @@ constexpr const char* kFooter = R"(Formats:
   csv      the same changes as rows: time, code, path, value, number, unit (number and unit are empty if the value is
            not a measurement). A value that a spreadsheet would read as a formula (it begins with = + - @, a tab or a
            return, and is not a number) gets an apostrophe before it
-  geojson  a map (RFC 7946): a point for each change of the serving cell or its levels at a known position (voxd
-           --position), with time, technology, speed, cell and levels; the name of a level ends in its unit
+  geojson  a map (RFC 7946): a point for each change of the serving cell or its levels at a known position, which
+           "voxd --position" records; with time, technology, speed, cell and levels, whose names end in their unit
 
 Files: channel captures (.kcap), DLF streams (.dlf), snapshots (.kestrum). Files with other names are recognised by their
 content. Several files are read one after the other, as parts of one log. "dropped" counts messages of an invalid type,
