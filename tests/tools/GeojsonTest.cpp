@@ -1,6 +1,9 @@
 #include "Tool.h"
 #include "capture/Messages.h"
 #include "harness/Scratch.h"
+#include "platform/propertylist/PropertyListCodec.h"
+#include "voxd/PositionTrack.h"
+#include "voxd/scenarios/Scenario.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -121,6 +124,47 @@ TEST_F(GeojsonTest, HasAPointForEachChangeOfALevelAtAKnownPosition)
               HasSubstr(json("'E-ARFCN':'0','Measured RSRP (dBm)':-98.25,")),
               HasSubstr(json("}},\n{'type':'Feature','geometry':{'type':'Point','coordinates':[-18.4,-33.9]},")),
               HasSubstr(json("'Measured RSRP (dBm)':-98,")), EndsWith("}}\n]}\n")));
+}
+
+struct Drive {
+    const char* scenario;
+    std::vector<std::string> names;
+};
+
+TEST_F(GeojsonTest, HasTheValuesOfEachTechnology)
+{
+    for (const auto& [scenario, names] :
+         {Drive{"lte",
+                {"Physical Cell ID", "Cell Identity", "Tracking Area Code", "Freq Band Indicator", "Download Frequency",
+                 "E-ARFCN", "Measured RSRP (dBm)", "Average RSRP (dBm)", "Measured RSRQ (dB)", "Average RSRQ (dB)",
+                 "Measured RSSI (dBm)", "Serving Physical Cell ID", "Serving Filtered RSRP (dBm)",
+                 "Serving Filtered RSRQ (dB)"}},
+          Drive{"gsm",
+                {"Mobile Country Code", "Mobile Network Code", "Location Area Code", "Routing Area Code", "GSM Cell ID",
+                 "GSM ARFCN", "GSM BSIC", "GSM RSSI (dBm)", "UMTS Cell ID", "UMTS UARFCN", "UMTS Scrambling Code",
+                 "UMTS RSCP (dB)", "UMTS Energy Per Chip (dB)"}},
+          Drive{"cdma",
+                {"System ID", "Network ID", "Base Station ID", "1x Rx0 Band Class", "1x Rx0 Channel",
+                 "1x Rx0 AGC (dBm)", "EV-DO Band Class", "EV-DO Channel", "EV-DO Rx0 AGC (dBm)"}},
+          Drive{"utran",
+                {"Cell ID", "Local Area Code", "URA ID", "Freq Band Indicator", "Downlink UARFCN",
+                 "Cell Scrambling Code"}},
+          Drive{"ifx", {"MCC", "MNC", "LAC", "Cell ID", "ARFCN", "BSIC", "RSSI (dBm)", "C1", "C2"}}}) {
+        PropertyListCodec lists;
+        const Date start = *dateFromIso("2026-11-16T06:05:42Z");
+        PositionTrack track([] { return Position{3, 52.5, 13.4, {}, {}}; }, lists);
+        const auto source = makeScenario(scenario, {7, start, lists});
+        std::string capture;
+        for (auto message = source->next(); message && message->at < std::chrono::seconds(60);
+             message = source->next()) {
+            if (const auto companion = track.accompany(*message))
+                capture += kcap(textOf(*companion));
+            capture += kcap(textOf(message->bytes));
+        }
+        const auto map = decode(capture).output;
+        for (const auto& name : names)
+            EXPECT_NE(map.find('"' + name + "\":"), map.npos) << scenario << ": " << name;
+    }
 }
 
 TEST_F(GeojsonTest, ValuesThatAreNotOfTheServingCellMakeNoPoint)
