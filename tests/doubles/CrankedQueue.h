@@ -32,6 +32,7 @@ public:
     std::unique_ptr<Timer> repeat(Duration interval, std::function<void()> action) override
     {
         auto shared = std::make_shared<std::function<void()>>(std::move(action));
+        std::erase_if(_timers, [](const auto& each) { return each.expired(); });
         _timers.push_back(shared);
         schedule(_now + interval, interval, shared);
         return std::make_unique<Repetition>(std::move(shared));

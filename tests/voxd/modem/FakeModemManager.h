@@ -139,9 +139,9 @@ public:
     }
     void send(const QDBusMessage& reply) { _connection.send(reply); }
 
-    uint rate(const QString& path) { return objects[path][kSignal]["Rate"].toUInt(); }
-    uint sources(const QString& path) { return objects[path][kLocation]["Enabled"].toUInt(); }
-    bool isLocating(const QString& path) { return (sources(path) & 1U) != 0; }
+    uint rate(const QString& path) const { return property(path, kSignal, "Rate").toUInt(); }
+    uint sources(const QString& path) const { return property(path, kLocation, "Enabled").toUInt(); }
+    bool isLocating(const QString& path) const { return (sources(path) & 1U) != 0; }
     /// The calls of a method so far.
     std::size_t calls(const QString& method) const
     {
@@ -158,6 +158,8 @@ public:
             asked.push_back(message);
         if (isSilent)
             return true;
+        if (message.path().contains("/Modem/") && !objects.contains(message.path()))
+            return connection.send(refusal(message, "org.freedesktop.DBus.Error.UnknownObject"));
         if (const auto found = answers.find(message.member()); found != answers.end()) {
             const auto reply = found->second(message);
             if (reply.type() != QDBusMessage::InvalidMessage)
@@ -182,6 +184,11 @@ public:
     bool isSilent = false;
 
 private:
+    QVariant property(const QString& path, const QString& interface, const QString& name) const
+    {
+        const auto found = objects.find(path);
+        return found == objects.end() ? QVariant() : found->second.value(interface).value(name);
+    }
     static QString name()
     {
         static int last = 0;
