@@ -499,6 +499,64 @@ TEST(ModemTreeCells, TheCellThatTheModemMovedToIsNoNeighborAnyMore)
     EXPECT_THAT(rowsOf(modem), Not(HasSubstr("Physical Cell ID: 204")));
 }
 
+TEST(ModemTreeCells, OfAnAreaThatWasLeftAreNotMixedInEither)
+{
+    auto modem = lteModem();
+    modem.location = ModemLocation{"001", "01", {}, {}, 0x1503};
+    EXPECT_THAT(rowsOf(modem), Not(HasSubstr("Physical Cell ID: 76")));
+}
+
+TEST(ModemTreeCells, OnAnotherFrequencyOrWithAnotherIdentityAreNeighbors)
+{
+    auto modem = lteModem();
+    auto other = modem.cells.front();
+    other.serving = false;
+    other.ci = 0x1A2303;
+    other.rsrp = -90;
+    modem.cells.push_back(other);
+    other.ci.reset();
+    other.channel = 6300;
+    other.rsrp = -91;
+    modem.cells.push_back(other);
+    const auto rows = rowsOf(modem);
+    EXPECT_THAT(rows, HasSubstr("    Measured RSRP: -90.00 dBm\n"));
+    EXPECT_THAT(rows, HasSubstr("    Measured RSRP: -91.00 dBm\n"));
+}
+
+TEST(ModemTreeCells, OfTheRegisteredTechnologyComeFirst)
+{
+    auto modem = lteModem();
+    auto& gsm = modem.cells.emplace_back();
+    gsm.type = CellType::Gsm;
+    gsm.rxLevel = 60;
+    EXPECT_THAT(rowsOf(modem), HasSubstr("  2\n"
+                                         "    Technology: GSM\n"
+                                         "    RXLEV: 60\n"
+                                         "    RSSI (derived): -50.00 dBm\n"));
+}
+
+TEST(ModemTreeCells, HaveNothingDerivedFromNumbersThatHaveNoParts)
+{
+    auto lte = lteModem();
+    lte.location.reset();
+    lte.cells.front().ci = 0x1000'0000; // 29 bits
+    auto umts = umtsModem();
+    umts.cells.front().ci = 0xFFFF; // without an RNC
+    ModemState gsm;
+    gsm.cells.emplace_back().type = CellType::Gsm;
+    gsm.cells.front().rxLevel = 99; // "not known" in 3GPP TS 27.007
+    for (const auto& modem : {lte, umts, gsm})
+        EXPECT_THAT(rowsOf(modem), Not(HasSubstr("derived")));
+}
+
+TEST(ModemTreeCells, IdentityOfZeroIsOneWhereItsAreaIsKnown)
+{
+    ModemState modem;
+    modem.accessTechnologies = bit(AccessTechnology::Lte);
+    modem.location = ModemLocation{"001", "01", {}, 0, 0x1502};
+    EXPECT_THAT(rowsOf(modem), HasSubstr("  Cell Identity: 0\n"));
+}
+
 TEST(ModemTreeCells, OfAnotherTechnologyThanTheRegisteredOneAreNoServingCell)
 {
     auto modem = lteModem();
@@ -510,6 +568,11 @@ TEST(ModemTreeCells, OfAnotherTechnologyThanTheRegisteredOneAreNoServingCell)
                                          "  Cell ID: 12128519\n"
                                          "  RNC (derived): 185\n"
                                          "  Location Area Code: 8193\n"));
+    modem.location.reset();
+    EXPECT_THAT(rowsOf(modem), HasSubstr("Serving Cell\n"
+                                         "  Technology: UMTS\n"
+                                         "  LTE\n"
+                                         "    Technology: LTE\n"));
 }
 
 TEST(ModemTreeCells, LocationWithoutAreaAndIdentityIsNone)
@@ -625,7 +688,7 @@ TEST(ModemTreeIdentities, AreNowhereInTheMessageOtherwise)
 TEST(ModemTreeIdentities, OfAnotherFormAreMaskedCompletely)
 {
     auto modem = lteModem();
-    modem.sim->imsi = "00101";
+    modem.sim->imsi = "00101123"; // too short to hide anything
     modem.sim->identifier = "F89secret";
     modem.equipmentIdentifier = "A10000009296F2";
     const auto rows = rowsOf(modem);
@@ -833,7 +896,10 @@ TEST(EveryModem, IsCountedBeyondTheLimit)
 {
     auto states = statesOf(lteModem());
     states.modems.resize(40);
-    EXPECT_THAT(rowsOf(states, {.everyModem = true}), HasSubstr("More Modems: 24\nTime: "));
+    const auto rows = rowsOf(states, {.everyModem = true});
+    EXPECT_THAT(rows, HasSubstr("\nModem 16\n"));
+    EXPECT_THAT(rows, Not(HasSubstr("Modem 17")));
+    EXPECT_THAT(rows, HasSubstr("More Modems: 24\nTime: "));
 }
 
 // A display shows a key with two semicolons with its number.
@@ -900,13 +966,13 @@ TEST(ModemTreeNonsense, AnyTechnologyIsNone)
 TEST(ModemTreeNonsense, TextsAreOneCleanLine)
 {
     ModemState modem;
-    modem.revision = "  1.2\r\n\t3\x01\xFF\xE2\x80\xAE"
+    modem.revision = "  1.2\r\n\t3\x01\xFF\xE2\x80\xAE\xE2\x80\x8E"
                      "abc\x7F\xC2\x9B \n";
     modem.manufacturer = " \n";
     modem.model = std::string(1000, 'x');
     modem.operatorCode = "001;01";
     const auto rows = rowsOf(modem);
-    EXPECT_THAT(rows, HasSubstr("  Revision: 1.2   3\uFFFD\uFFFD\uFFFDabc\uFFFD\uFFFD\n"));
+    EXPECT_THAT(rows, HasSubstr("  Revision: 1.2   3\uFFFD\uFFFD\uFFFD\uFFFDabc\uFFFD\uFFFD\n"));
     EXPECT_THAT(rows, Not(HasSubstr("Manufacturer")));
     EXPECT_THAT(rows, HasSubstr("  Model: " + std::string(128, 'x') + "\u2026\n"));
     EXPECT_THAT(rows, HasSubstr("  Operator Code: 001;01\n"));
