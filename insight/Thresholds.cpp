@@ -22,6 +22,7 @@ constexpr Limits kDriveTest[] = {
     {Measure::Rsrp,                   -80,  -90, -100, -120},
     {Measure::Rsrq,                   -10,  -13,  -16,  -20},
     {Measure::Srxlev,                  30,   20,   10,    1},
+    {Measure::Sinr,                    20,   13,    0,   -6},
     {Measure::Rscp,                   -75,  -85,  -95, -110},
     {Measure::EcNo,                    -6,  -10,  -14,  -20},
     {Measure::RxLev,                  -70,  -85,  -95, -105},

@@ -34,6 +34,9 @@ struct BandRange {
 };
 std::optional<BandRange> lteBand(std::int64_t number);
 
+/// NR (NR-ARFCN), the global raster of 3GPP TS 38.104, table 5.4.2.1-1: MHz. Bands overlap, so it tells no band.
+std::optional<double> frequencyOfNrArfcn(std::int64_t number);
+
 /// UTRA FDD (UARFCN), 3GPP TS 25.101, tables 5.1 and 5.1A. Downlinks and uplinks share numbers, so there are two
 /// functions.
 std::vector<Carrier> carriersOfDownlinkUarfcn(std::int64_t number);

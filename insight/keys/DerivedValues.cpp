@@ -146,6 +146,15 @@ DerivedValues fromEarfcn(const Given& given)
     return carriers<carriersOfEarfcn>(given);
 }
 
+DerivedValues fromNrArfcn(const Given& given)
+{
+    const auto number = given.whole();
+    const auto frequency = number ? frequencyOfNrArfcn(*number) : std::nullopt;
+    if (!frequency)
+        return {};
+    return {{"Frequency", megahertz(*frequency)}};
+}
+
 DerivedValues fromDownlinkUarfcn(const Given& given)
 {
     return carriers<carriersOfDownlinkUarfcn>(given);
@@ -249,6 +258,12 @@ DerivedValues fromUtranCellIdentity(const Given& given)
     if (*identity <= 0xFFFF)
         return {{"Cell of the RNC", decimal(*identity)}};
     return {{"RNC", decimal(*identity >> 16)}, {"Cell of the RNC", decimal(*identity & 0xFFFF)}};
+}
+
+DerivedValues fromCellIdentity(const Given& given)
+{
+    const auto identity = given.whole();
+    return identity && *identity > 0xFFFF ? fromUtranCellIdentity(given) : inHexadecimal(given);
 }
 
 DerivedValues fromScramblingCode(const Given& given)

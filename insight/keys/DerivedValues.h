@@ -41,7 +41,7 @@ std::string_view shownName(std::string_view key);
 using Derive = DerivedValues(const Given& given);
 
 // Channel numbers: band and frequencies.
-Derive fromEarfcn, fromDownlinkUarfcn, fromUplinkUarfcn, fromTddUarfcn, fromArfcn;
+Derive fromEarfcn, fromNrArfcn, fromDownlinkUarfcn, fromUplinkUarfcn, fromTddUarfcn, fromArfcn;
 /// A UARFCN of FDD or TDD: both, where both have the number.
 Derive fromAnyUarfcn;
 // CDMA channels need the band class beside them: under "Band Class", "Rx0 Band Class", "Rx1 Band Class" or "Band".
@@ -53,6 +53,8 @@ Derive fromLteBand, fromLteBandwidth;
 // Identities: their parts.
 Derive fromLteCellIdentity, fromPhysicalCellId, fromUtranCellIdentity, fromScramblingCode, fromCellParameter, fromBsic,
     fromPilot;
+/// Of GSM (16 bits) or of UMTS (more).
+Derive fromCellIdentity;
 /// Hexadecimal, as maps and networks write location areas, tracking areas and GSM cells.
 Derive inHexadecimal;
 

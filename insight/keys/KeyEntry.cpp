@@ -32,13 +32,13 @@ bool endsWithName(std::string_view path, std::string_view name)
     return path.empty() || path.ends_with('/');
 }
 
-/// A level has the same meaning in all sections.
-const KeyEntry* gradedEntry(std::string_view key)
+/// The entry of a key; null when there is none.
+const KeyEntry* entryIn(std::span<const KeyEntry> entries, std::string_view key)
 {
-    for (const auto& sections : {keys::kLte, keys::kGsm})
-        for (const auto& section : sections)
-            if (const auto* entry = section.entry(key); entry != nullptr && entry->in.measure != Measure::None)
-                return entry;
+    key = shownName(key);
+    for (const auto& each : entries)
+        if (each.key == key || (each.key == kAnyNumber && isNumber(key)))
+            return &each;
     return nullptr;
 }
 
@@ -53,24 +53,14 @@ std::string_view word(Kind kind)
 
 const KeyEntry* SectionEntry::entry(std::string_view key) const
 {
-    key = shownName(key);
-    for (const auto& each : keys)
-        if (each.key == key || (each.key == kAnyNumber && isNumber(key)))
-            return &each;
-    return nullptr;
+    return entryIn(keys, key);
 }
 
-const KeyEntry* SectionEntry::level() const
-{
-    const auto found = std::ranges::find(keys, InRow::Level, &KeyEntry::inRow);
-    return found != keys.end() ? &*found : nullptr;
-}
-
-std::vector<const KeyEntry*> SectionEntry::identity() const
+std::vector<const KeyEntry*> SectionEntry::with(InRow role) const
 {
     std::vector<const KeyEntry*> found;
     for (const auto& each : keys)
-        if (each.inRow == InRow::Identity)
+        if (each.inRow == role)
             found.push_back(&each);
     return found;
 }
@@ -105,9 +95,10 @@ const KeyEntry* keyEntry(std::string_view technology, std::string_view section, 
 {
     const auto* place = sectionEntry(technology, section);
     const auto* entry = place != nullptr ? place->entry(key) : nullptr;
-    if (entry == nullptr && technology == kVoxLogChannelTechnology_IFX)
-        return gradedEntry(key);
-    return entry;
+    if (entry != nullptr || technology != kVoxLogChannelTechnology_IFX)
+        return entry;
+    entry = entryIn(keys::kIfxCell, key);
+    return entry != nullptr ? entry : entryIn(keys::kIfxModem, key);
 }
 
 const KeyEntry* keyEntryAt(std::string_view technology, std::string_view path)

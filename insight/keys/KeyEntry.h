@@ -36,7 +36,7 @@ struct Dimension {
 enum class InRow : std::uint8_t {
     Value,
     Identity, ///< all identities of a row together tell it from the others, whatever its index
-    Level,    ///< the level by which the rows are sorted: one for each list of cells
+    Level,    ///< a level by which the rows are sorted
 };
 
 /// What a key of the display means. Constant.
@@ -70,9 +70,18 @@ struct SectionEntry {
     /// Null when the section has no such key. "n;Name" is "Name".
     const KeyEntry* entry(std::string_view key) const;
     /// The entry by which a list is sorted; null when there is none.
-    const KeyEntry* level() const;
-    /// The entries that together identify a row; empty when only its index does.
-    std::vector<const KeyEntry*> identity() const;
+    const KeyEntry* level() const
+    {
+        const auto all = levels();
+        return all.empty() ? nullptr : all.front();
+    }
+    /// The same where rows have different technologies: each row is sorted by the first level that it has.
+    std::vector<const KeyEntry*> levels() const { return with(InRow::Level); }
+    /// The entries that together identify a row, as far as it has them; empty when only its index does.
+    std::vector<const KeyEntry*> identity() const { return with(InRow::Identity); }
+
+private:
+    std::vector<const KeyEntry*> with(InRow role) const;
 };
 
 /// The sections of a technology (an identifier of platform/TelephonyService.h), in the order of its template; empty for
@@ -84,7 +93,7 @@ std::span<const SectionEntry> sectionEntries(std::string_view technology);
 const SectionEntry* sectionEntry(std::string_view technology, std::string_view nameOrPath);
 
 /// What a key means. `section` is a name or a path, as for `sectionEntry`. Null for an unknown key. An IFX modem
-/// chooses its own sections: there, a key without an entry has that of a level of the same name.
+/// chooses its own sections: there, a key of a cell means the same in every section.
 const KeyEntry* keyEntry(std::string_view technology, std::string_view section, std::string_view key);
 
 /// The same for the path of a leaf: "/Idle Mode/Neighbor Cells List/3/Measured RSRP".

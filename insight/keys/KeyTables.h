@@ -12,6 +12,8 @@ extern const std::span<const SectionEntry> kUtran;
 extern const std::span<const SectionEntry> kGsm;
 extern const std::span<const SectionEntry> kCdma;
 extern const std::span<const SectionEntry> kIfx;
+// Keys that mean the same in every section of an IFX tree: those of a cell, and the first rows of a modem.
+extern const std::span<const KeyEntry> kIfxCell, kIfxModem;
 
 using enum Kind;
 

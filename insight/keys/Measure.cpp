@@ -9,6 +9,7 @@ std::span<const MeasureTraits> measures()
         {Measure::Rsrp,                  "RSRP",    "dBm", -160,   0},
         {Measure::Rsrq,                  "RSRQ",    "dB",   -40,  10},
         {Measure::Srxlev,                "Srxlev",  "dBm", -140, 140}, // a ratio, but displays show it in dBm
+        {Measure::Sinr,                  "SINR",    "dB",   -40,  60},
         {Measure::Rscp,                  "RSCP",    "dBm", -140,   0},
         {Measure::EcNo,                  "Ec/No",   "dB",   -40,  10},
         {Measure::RxLev,                 "RxLev",   "dBm", -120,   0},

@@ -12,6 +12,7 @@ enum class Measure : std::uint8_t {
     Rsrp,
     Rsrq,
     Srxlev,
+    Sinr,
     Rscp,
     EcNo,
     RxLev,

@@ -217,6 +217,19 @@ TEST(Channels, CdmaChannelNeedsABandClassAndItsNumber)
     EXPECT_FALSE(carrierOfCdmaChannel(1, 1200));
 }
 
+TEST(Channels, NrArfcnIsAFrequency)
+{
+    EXPECT_EQ(frequencyOfNrArfcn(0), 0.0);
+    EXPECT_EQ(frequencyOfNrArfcn(361000), 1805.0);
+    EXPECT_EQ(frequencyOfNrArfcn(599999), 2999.995);
+    EXPECT_EQ(frequencyOfNrArfcn(600000), 3000.0);
+    EXPECT_EQ(frequencyOfNrArfcn(636666), 3549.99);
+    EXPECT_EQ(frequencyOfNrArfcn(2016667), 24250.08);
+    EXPECT_EQ(frequencyOfNrArfcn(2079167), 28000.08);
+    EXPECT_FALSE(frequencyOfNrArfcn(-1));
+    EXPECT_FALSE(frequencyOfNrArfcn(3279166));
+}
+
 TEST(Channels, LteBandHasItsFrequencies)
 {
     EXPECT_EQ(lteBand(20)->downlink, (FrequencyRange{791, 821}));

@@ -82,6 +82,9 @@ TEST(DerivedValues, OfIdentities)
     EXPECT_EQ(derived(fromPhysicalCellId, reading(504)), "");
     EXPECT_EQ(derived(fromUtranCellIdentity, reading(18877210)), "RNC 288; Cell of the RNC 2842");
     EXPECT_EQ(derived(fromUtranCellIdentity, reading(2842)), "Cell of the RNC 2842");
+    EXPECT_EQ(derived(fromCellIdentity, Value("18877210")), "RNC 288; Cell of the RNC 2842");
+    EXPECT_EQ(derived(fromCellIdentity, Value("0x2a01")), "Decimal 10753");
+    EXPECT_EQ(derived(fromNrArfcn, Value("636666")), "Frequency 3549.99 MHz");
     EXPECT_EQ(derived(fromScramblingCode, reading(213)), "Code group 26; Code in the group 5");
     EXPECT_EQ(derived(fromScramblingCode, reading(512)), "");
     EXPECT_EQ(derived(fromCellParameter, reading(104)), "Code group 27");
@@ -138,31 +141,13 @@ TEST(DerivedValues, TakeNumbersFromTextsThatAreNumbers)
 // Nothing of what a display may hold stops the program.
 RC_GTEST_PROP(DerivedValues, OfAnyTextAndAnyNumberAreBounded, (const std::string& text, std::uint32_t raw))
 {
-    Derive* const all[] = {fromEarfcn,
-                           fromDownlinkUarfcn,
-                           fromUplinkUarfcn,
-                           fromTddUarfcn,
-                           fromAnyUarfcn,
-                           fromArfcn,
-                           fromEvdoChannel,
-                           fromRx0Channel,
-                           fromRx1Channel,
-                           fromCandidateChannel,
-                           fromLteBand,
-                           fromLteBandwidth,
-                           fromLteCellIdentity,
-                           fromPhysicalCellId,
-                           fromUtranCellIdentity,
-                           fromScramblingCode,
-                           fromCellParameter,
-                           fromBsic,
-                           fromPilot,
-                           inHexadecimal,
-                           fromRxLev,
-                           fromRxQual,
-                           fromTimingAdvance,
-                           fromHoppingSequence,
-                           fromBlockErrors};
+    Derive* const all[] = {
+        fromNrArfcn,         fromCellIdentity,      fromEarfcn,         fromDownlinkUarfcn, fromUplinkUarfcn,
+        fromTddUarfcn,       fromAnyUarfcn,         fromArfcn,          fromEvdoChannel,    fromRx0Channel,
+        fromRx1Channel,      fromCandidateChannel,  fromLteBand,        fromLteBandwidth,   fromLteCellIdentity,
+        fromPhysicalCellId,  fromUtranCellIdentity, fromScramblingCode, fromCellParameter,  fromBsic,
+        fromPilot,           inHexadecimal,         fromRxLev,          fromRxQual,         fromTimingAdvance,
+        fromHoppingSequence, fromBlockErrors};
     const auto beside = makeDictionary({{text, text}, {"Band", text}, {"CRC Received", reading(raw)}});
     for (const Value& value : {Value(text), reading(raw), Value(), Value(makeArray()), Value("[" + text + "]")})
         for (auto* derive : all)
