@@ -1,7 +1,9 @@
 #include "insight/Events.h"
 
-#include "insight/Measure.h"
+#include "capture/MessageTime.h"
+#include "insight/NumberIn.h"
 #include "platform/ChannelMessage.h"
+#include "platform/TelephonyService.h"
 #include "support/Format.h"
 
 #include <algorithm>
@@ -77,18 +79,9 @@ void EventFinder::look(const LogGenerator& generator, const State& state, Bytes 
             _stamp = stamp;
             if (recent.reach == nullptr || !isSampleDue(*recent.reach))
                 return;
-            // The history keeps parts of earlier displays alive: nothing would ever change in them.
-            if (isShown(state))
-                return sample(*recent.reach);
         }
     }
     lookAgain(generator, state, message);
-}
-
-bool EventFinder::isShown(const State& state) const
-{
-    const Value* display = state.find(StateKey::kDisplay);
-    return display != nullptr && display->borrowedDictionary() == _display.dictionary();
 }
 
 bool EventFinder::isQuiet(const Reach& reach) const
@@ -98,12 +91,15 @@ bool EventFinder::isQuiet(const Reach& reach) const
     return std::ranges::all_of(reach.places, &WatchedPlace::isUnchanged);
 }
 
+/// A changed reading, or a sample of the levels; then it also finds a new display. Parts of earlier displays, which the
+/// history keeps alive, would never change.
 void EventFinder::lookAgain(const LogGenerator& generator, const State& state, Bytes message)
 {
     const auto read = ChannelMessage::read(message);
-    const auto stamp = read ? read->timeStamp().value_or(0) : 0; // 0 means no time
-    look(generator, state, read && read->isOfKnownType() ? std::optional(read->logCode) : std::nullopt,
-         stamp != 0 ? std::optional(dateFromTimeStamp(stamp)) : std::nullopt);
+    if (generator.technology() == kVoxLogChannelTechnology_IFX)
+        return look(generator, state, std::nullopt, timeOf(state.at(StateKey::kDisplay)));
+    if (read)
+        look(generator, state, read->isOfKnownType() ? std::optional(read->logCode) : std::nullopt, timeOf(*read));
 }
 
 void EventFinder::look(const LogGenerator& generator, const State& state, std::optional<LogCode> code,
@@ -401,9 +397,11 @@ void EventFinder::imply(const StateName& state)
 void EventFinder::compare(Followed& followed, bool isChange)
 {
     std::string now;
-    for (const auto& part : followed.parts)
-        if (!part.text().empty())
-            now += (now.empty() ? "" : "-") + part.text();
+    for (const auto& part : followed.parts) {
+        const std::string_view text = part.text();
+        if (!text.empty())
+            now += formatted("%s%@", now.empty() ? "" : "-", text.substr(0, text.find_last_not_of(' ') + 1)); // "01 "
+    }
     if (followed.value->wordOf != nullptr)
         now = followed.value->wordOf(now);
     auto before = std::exchange(followed.shown, now);
@@ -431,7 +429,7 @@ void EventFinder::sample(const Reach::Sample& at)
     const auto* reading = value->borrowedReading();
     if (reading == nullptr || level.reading != *reading) {
         level.reading.reset();
-        const auto measure = measureOf(*value);
+        const auto measure = numberIn(*value);
         if (!measure)
             return;
         level.number = measure->number;
@@ -452,7 +450,7 @@ std::string EventFinder::levelsNow() const
         for (std::size_t i = 0; i < serving.levels.size(); ++i) {
             const auto& level = serving.levels[i];
             const Value* value = level.latest != nullptr ? level.latest->value() : nullptr;
-            if (value == nullptr || !measureOf(*value))
+            if (value == nullptr || !numberIn(*value))
                 continue;
             all += all.empty() ? "" : ", ";
             if (_serving.size() > 1)

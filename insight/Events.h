@@ -144,7 +144,6 @@ private:
     void begin(Serving& serving, EventKind kind, std::string was);
     void compare(Serving& serving);
     void compare(Followed& followed, bool isChange);
-    bool isShown(const State& state) const;
     /// Whether nothing but levels can have changed.
     bool isQuiet(const Reach& reach) const;
     /// Without times all levels count.

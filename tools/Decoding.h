@@ -70,6 +70,9 @@ public:
     Value display() const { return _state.at(StateKey::kDisplay); }
     /// The nodes of the display that a message of the code may change. Nothing when it may change any node.
     std::optional<std::vector<Value>> nodesOf(LogCode code) const { return _generator->nodesOf(code); }
+    /// Only while messages are decoded, from the first call of `then` on.
+    const LogGenerator& generator() const { return *_generator; }
+    const State& state() const { return _state; }
     const Statistics& statistics() const { return _statistics; }
     Tally total() const;
 

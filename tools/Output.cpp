@@ -4,6 +4,7 @@
 #include "support/Base64.h"
 #include "support/Format.h"
 #include "tools/Changes.h"
+#include "tools/CsvCells.h"
 #include "tools/Harmless.h"
 #include "tools/ServingCell.h"
 #include "tools/TemporaryFile.h"
@@ -404,46 +405,6 @@ private:
     const bool _withNumbers;
     StampText _stamp;
 };
-
-/// Appends a CSV cell (RFC 4180). A cell with a quote, a comma or a line end is put in quotes, and quotes inside it are
-/// doubled. Lines end with CR LF.
-void appendCell(std::string& to, std::string_view raw)
-{
-    if (Changes::isPlain(raw) || raw.find_first_of("\",\r\n") == raw.npos) {
-        to += raw;
-        return;
-    }
-    to += '"';
-    for (const char each : raw)
-        to.append(each == '"' ? 2 : 1, each);
-    to += '"';
-}
-
-/// "-98.25 dBm": a sign, a number, and optionally a blank and a unit.
-bool isNumber(std::string_view raw)
-{
-    raw.remove_prefix(raw.starts_with('+') || raw.starts_with('-') ? 1 : 0);
-    std::size_t digits = 0, points = 0;
-    for (; digits < raw.size() && (raw[digits] == '.' || (raw[digits] >= '0' && raw[digits] <= '9')); ++digits)
-        points += raw[digits] == '.' ? 1u : 0u;
-    if (digits == points || points > 1)
-        return false;
-    const auto unit = raw.substr(digits);
-    return unit.empty() || (unit.front() == ' ' && std::ranges::all_of(unit, [](char c) {
-                                return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '%' || c == '/' ||
-                                       c == ' ';
-                            }));
-}
-
-/// Appends a cell that no spreadsheet takes for a formula: an apostrophe makes it a text.
-void appendGuardedCell(std::string& to, std::string_view raw)
-{
-    const auto begins = [](char c) { return c == '=' || c == '+' || c == '-' || c == '@' || c == '\t' || c == '\r'; };
-    if (!raw.empty() && begins(raw.front()) && !isNumber(raw))
-        appendCell(to, formatted("'%@", raw));
-    else
-        appendCell(to, raw);
-}
 
 class CsvOutput final : public ChangesOutput {
 public:

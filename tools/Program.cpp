@@ -3,6 +3,7 @@
 #include "capture/CaptureReader.h"
 #include "platform/propertylist/PropertyListCodec.h"
 #include "support/Format.h"
+#include "tools/EventsOutput.h"
 #include "tools/Extraction.h"
 #include "tools/Harmless.h"
 #include "tools/Input.h"
@@ -36,6 +37,19 @@ struct PieceWritten {};
 /// The messages of one piece, in bytes: some tenths of a second of work.
 constexpr std::size_t kPiece = 1 << 20;
 
+std::unique_ptr<Output> makeOutput(const DecodeOptions& options, OutputFile& data, OutputFile& remarks)
+{
+    switch (options.shown) {
+    case DecodeOptions::Shown::Events:
+        return makeEventsOutput(options.format, data, remarks);
+    case DecodeOptions::Shown::Cells:
+        return makeCellsOutput(options.format, data, remarks);
+    case DecodeOptions::Shown::Display:
+        break;
+    }
+    return Output::make(options.format, {.log = options.log, .numbers = options.numbers}, data, remarks);
+}
+
 /// Whether pieces of the log can be written by several processes: each of them reads the files by itself.
 bool mayShare(const DecodeOptions& options)
 {
@@ -45,8 +59,9 @@ bool mayShare(const DecodeOptions& options)
         return file != "-" &&
                (type == std::filesystem::file_type::regular || type == std::filesystem::file_type::not_found);
     };
-    return options.jobs > 1 && (options.format == OutputFormat::Jsonl || options.format == OutputFormat::Csv) &&
-           !options.follow && options.extract.empty() && std::ranges::all_of(options.files, isReadTwice);
+    return options.jobs > 1 && options.shown == DecodeOptions::Shown::Display &&
+           (options.format == OutputFormat::Jsonl || options.format == OutputFormat::Csv) && !options.follow &&
+           options.extract.empty() && std::ranges::all_of(options.files, isReadTwice);
 }
 
 /// Shows the progress of a long run on a terminal.
@@ -84,7 +99,7 @@ class Program {
 public:
     Program(const DecodeOptions& options, Bundle& bundle)
         : _options(options),
-          _output(Output::make(options.format, {.log = options.log, .numbers = options.numbers}, _data, _remarks)),
+          _output(makeOutput(options, _data, _remarks)),
           _decoding(options.technology, bundle, _lists,
                     options.log ? [this](Priority priority, std::string_view text) {
                                 if (!_isSilent)

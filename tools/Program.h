@@ -16,6 +16,8 @@ struct DecodeOptions {
     std::vector<std::string> files; ///< "-": standard input
     std::string technology;         ///< an identifier; empty: found in the messages
     OutputFormat format = OutputFormat::Tree;
+    enum class Shown { Display, Events, Cells };
+    Shown shown = Shown::Display;
     bool log = false, numbers = false, stats = false, follow = false;
     std::string extract;  ///< a directory; empty: nothing is extracted
     bool force = false;   ///< extracted files replace existing ones

@@ -70,6 +70,14 @@ int main(int argc, char** argv)
                       "Show the system log too: with json in the object, otherwise on standard error");
     commands.add_flag("--numbers", options.numbers,
                       "With jsonl: write each measurement as an object of text, number and unit");
+    bool events = false, cells = false;
+    auto* asksForEvents =
+        commands.add_flag("--events", events,
+                          "Show what happened, not the display: cell changes, areas, states, silence; not with jsonl");
+    commands
+        .add_flag("--cells", cells,
+                  "Show the cells that served, not the display: visits, time, levels, last seen; not with jsonl")
+        ->excludes(asksForEvents);
     commands.add_flag("--stats", options.stats, "Count the messages of each log code, on standard error");
     commands.add_flag("--follow", options.follow,
                       "Wait for more messages at the end of the last file, until interrupted");
@@ -90,6 +98,13 @@ int main(int argc, char** argv)
             for (const auto& file : options.files)
                 if (file.ends_with(".kcap") || file.ends_with(".dlf"))
                     throw CLI::ValidationError("--extract", file + " is not a snapshot");
+        if (events || cells) {
+            options.shown = events ? DecodeOptions::Shown::Events : DecodeOptions::Shown::Cells;
+            if (format != "tree" && format != "json" && format != "csv")
+                throw CLI::ValidationError(events ? "--events" : "--cells", "needs --format tree, json or csv");
+            if (options.log)
+                throw CLI::ValidationError("--log", "shows nothing with --events and --cells");
+        }
         if (options.numbers && format != "jsonl")
             throw CLI::ValidationError("--numbers", "needs --format jsonl");
         if (options.follow && options.files.back().ends_with(".kestrum"))

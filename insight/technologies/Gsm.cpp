@@ -40,11 +40,13 @@ constexpr ServingCellTable kCells[] = {
 };
 
 constexpr Place kRr[] = {kRrState}, kRrc[] = {kRrcState};
+// Not from the service's cell report, which writes "1" where the modem writes "001".
+constexpr LogCode kNetwork = 0x7135;
 constexpr Place kArea[] = {
-    {"Network and Registration/Serving PLMN/Mobile Country Code"},
-    {"Network and Registration/Serving PLMN/Mobile Network Code"},
-    {"Network and Registration/Serving PLMN/Location Area Code"},
-    {"Network and Registration/Serving PLMN/Routing Area Code"},
+    {"Network and Registration/Serving PLMN/Mobile Country Code", kNetwork},
+    {"Network and Registration/Serving PLMN/Mobile Network Code", kNetwork},
+    {"Network and Registration/Serving PLMN/Location Area Code",  kNetwork},
+    {"Network and Registration/Serving PLMN/Routing Area Code",   kNetwork},
 };
 constexpr Place kCircuitService[] = {{"Network and Registration/Process CS/MM Sub State"}};
 constexpr Place kPacketService[] = {{"Network and Registration/Process PS/MM Sub State"}};

@@ -4,6 +4,8 @@ complete -c kestrum-decode -l technology -x -a 'ifx gsm cdma lte utran' -d 'Tech
 complete -c kestrum-decode -l format -x -a 'tree json jsonl csv geojson' -d 'Form of the output'
 complete -c kestrum-decode -l log -d 'Show the system log too'
 complete -c kestrum-decode -l numbers -d 'Show number and unit of each value in jsonl'
+complete -c kestrum-decode -l events -d 'Show what happened, not the display'
+complete -c kestrum-decode -l cells -d 'Show the cells that served, not the display'
 complete -c kestrum-decode -l stats -d 'Count the messages of each log code'
 complete -c kestrum-decode -l follow -d 'Wait for more messages at the end of the last file'
 complete -c kestrum-decode -l extract -r -a '(__fish_complete_directories)' -f -d 'Write the records of a snapshot to files'

@@ -125,6 +125,17 @@ TEST_P(EventsOfScenarios, CellsAddUpToTheEventsAndToTheTime)
     EXPECT_EQ(finder.cells().dropped(), 0u);
 }
 
+// An area changes with a cell, and not without one.
+TEST_P(EventsOfScenarios, AreasChangeWithCellsOnly)
+{
+    std::map<std::string_view, std::size_t> areas;
+    for (const auto& event : finder.events())
+        if (event.kind == EventKind::Registration && event.name.find("area") != event.name.npos)
+            ++areas[event.name];
+    for (const auto& [name, count] : areas)
+        EXPECT_LE(count, truth.size()) << name;
+}
+
 // A path of a table that no record writes would never make an event.
 TEST_P(EventsOfScenarios, EveryPlaceOfTheTableIsInTheDisplay)
 {

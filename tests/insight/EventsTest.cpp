@@ -481,14 +481,28 @@ TEST_F(GsmEvents, ADedicatedChannelMakesItAHandover)
 TEST_F(GsmEvents, NetworkAndAreaAreOneTextThatMayBeCompleted)
 {
     const std::string plmn = "0;Network and Registration";
-    watching.set({plmn, "Serving PLMN", "Mobile Country Code"}, "1");
-    watching.message(0xFF0001);
+    watching.set({plmn, "Serving PLMN", "Mobile Country Code"}, "001");
+    watching.set({plmn, "Serving PLMN", "Mobile Network Code"}, "01 ");
+    watching.message(0x7135);
     watching.set({plmn, "Serving PLMN", "Location Area Code"}, "4354");
     watching.message(0x7135);
     watching.set({plmn, "Serving PLMN", "Location Area Code"}, "4355")
         .set({plmn, "Serving PLMN", "Mobile Country Code"}, "2");
     watching.message(0x7135);
-    EXPECT_THAT(watching.events(), ElementsAre("registration network and area: 1-4354 -> 2-4355"));
+    EXPECT_THAT(watching.events(), ElementsAre("registration network and area: 001-01-4354 -> 2-01-4355"));
+}
+
+// The service's cell report writes the same network with fewer digits.
+TEST_F(GsmEvents, TheServicesReportChangesNoNetwork)
+{
+    const std::string plmn = "0;Network and Registration";
+    watching.set({plmn, "Serving PLMN", "Mobile Country Code"}, "001");
+    watching.message(0x7135);
+    watching.set({plmn, "Serving PLMN", "Mobile Country Code"}, "1");
+    watching.message(0xFF0001);
+    watching.set({plmn, "Serving PLMN", "Mobile Country Code"}, "001");
+    watching.message(0x7135);
+    EXPECT_THAT(watching.events(), IsEmpty());
 }
 
 class CdmaEvents : public testing::Test {

@@ -1,4 +1,4 @@
-#include "insight/Measure.h"
+#include "insight/NumberIn.h"
 
 #include "LogGenerator/Quantities.h"
 
@@ -11,9 +11,9 @@
 namespace kestrum {
 namespace {
 
-TEST(Measure, AReadingHasItsNumberAndUnit)
+TEST(NumberIn, AReadingHasItsNumberAndUnit)
 {
-    const auto measure = measureOf(Reading(inWholeDbm<signed32>, static_cast<std::uint32_t>(-98)));
+    const auto measure = numberIn(Reading(inWholeDbm<signed32>, static_cast<std::uint32_t>(-98)));
     ASSERT_TRUE(measure);
     EXPECT_EQ(measure->number, -98);
     EXPECT_EQ(measure->unit, "dBm");
@@ -28,18 +28,18 @@ struct Case {
     friend void PrintTo(const Case& shown, std::ostream* out) { *out << shown.name; }
 };
 
-class MeasureOfText : public testing::TestWithParam<Case> {};
+class NumberInText : public testing::TestWithParam<Case> {};
 
-TEST_P(MeasureOfText, IsItsNumberAndUnitOrNothing)
+TEST_P(NumberInText, IsItsNumberAndUnitOrNothing)
 {
     const Value value(GetParam().text);
-    const auto measure = measureOf(value);
+    const auto measure = numberIn(value);
     EXPECT_EQ(measure ? std::optional(measure->number) : std::nullopt, GetParam().number);
     EXPECT_EQ(measure ? measure->unit : "", GetParam().unit);
 }
 
 INSTANTIATE_TEST_SUITE_P(
-    Measure, MeasureOfText,
+    NumberIn, NumberInText,
     testing::Values(Case{"Level", "-98.25 dBm", -98.25, "dBm"}, Case{"Plain", "42", 42}, Case{"Plus", "+3 dB", 3, "dB"},
                     Case{"Percent", "1.5%", 1.5, "%"}, Case{"PercentAndBlank", "1.5 %", 1.5, "%"},
                     Case{"Rate", "3.0 kbit/s", 3, "kbit/s"}, Case{"Empty", "", {}}, Case{"Blank", " ", {}},

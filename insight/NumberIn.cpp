@@ -1,4 +1,4 @@
-#include "insight/Measure.h"
+#include "insight/NumberIn.h"
 
 #include <algorithm>
 #include <charconv>
@@ -15,7 +15,7 @@ bool isUnit(std::string_view text)
            });
 }
 
-std::optional<Measure> measureIn(std::string_view text)
+std::optional<NumberAndUnit> numberInText(std::string_view text)
 {
     // Only digits and a sign begin a number: from_chars would also take "nan" and "inf".
     const auto begin = text.starts_with('+') || text.starts_with('-') ? 1u : 0u;
@@ -31,19 +31,19 @@ std::optional<Measure> measureIn(std::string_view text)
         unit.remove_prefix(1);
     else if (!unit.empty() && unit != "%")
         return std::nullopt; // "0x1107", "A5/3", "001-01"
-    return isUnit(unit) ? std::optional(Measure{number, unit}) : std::nullopt;
+    return isUnit(unit) ? std::optional(NumberAndUnit{number, unit}) : std::nullopt;
 }
 
 } // namespace
 
-std::optional<Measure> measureOf(const Value& value)
+std::optional<NumberAndUnit> numberIn(const Value& value)
 {
     if (const auto* reading = value.borrowedReading()) {
         const auto number = reading->number();
-        return number ? std::optional(Measure{*number, reading->unit()}) : std::nullopt;
+        return number ? std::optional(NumberAndUnit{*number, reading->unit()}) : std::nullopt;
     }
     const auto* text = value.borrowedString();
-    return text != nullptr ? measureIn(*text) : std::nullopt;
+    return text != nullptr ? numberInText(*text) : std::nullopt;
 }
 
 } // namespace kestrum

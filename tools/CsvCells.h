@@ -1,0 +1,15 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace kestrum::tools {
+
+/// Appends a CSV cell (RFC 4180). A cell with a quote, a comma or a line end is put in quotes, and quotes inside it are
+/// doubled. Lines end with CR LF.
+void appendCell(std::string& to, std::string_view raw);
+
+/// Appends a cell that no spreadsheet takes for a formula: an apostrophe makes it a text.
+void appendGuardedCell(std::string& to, std::string_view raw);
+
+} // namespace kestrum::tools
