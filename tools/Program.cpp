@@ -97,9 +97,9 @@ private:
 
 class Program {
 public:
-    Program(const DecodeOptions& options, Bundle& bundle)
+    Program(const DecodeOptions& options, Bundle& bundle, std::unique_ptr<Output> output)
         : _options(options),
-          _output(makeOutput(options, _data, _remarks)),
+          _output(output ? std::move(output) : makeOutput(options, _data, _remarks)),
           _decoding(options.technology, bundle, _lists,
                     options.log ? [this](Priority priority, std::string_view text) {
                                 if (!_isSilent)
@@ -381,11 +381,11 @@ private:
 
 } // namespace
 
-int decodeFiles(const DecodeOptions& options, Bundle& bundle)
+int decodeFiles(const DecodeOptions& options, Bundle& bundle, std::unique_ptr<Output> output)
 {
     // With SIGPIPE ignored, write() reports that the reader has closed the pipe.
     std::signal(SIGPIPE, SIG_IGN);
-    return Program(options, bundle).run();
+    return Program(options, bundle, std::move(output)).run();
 }
 
 } // namespace kestrum::tools

@@ -2,6 +2,7 @@
 
 #include "tools/Output.h"
 
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -26,6 +27,7 @@ struct DecodeOptions {
 
 /// Decodes the files, as parts of one log, to standard output. Everything else goes to standard error. Returns the
 /// exit status: 0, or 1 for bad input, whose good parts are shown nevertheless.
-int decodeFiles(const DecodeOptions& options, Bundle& bundle);
+/// `output` takes the place of what the options choose.
+int decodeFiles(const DecodeOptions& options, Bundle& bundle, std::unique_ptr<Output> output = nullptr);
 
 } // namespace kestrum::tools

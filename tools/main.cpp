@@ -1,5 +1,6 @@
 #include "platform/TelephonyService.h"
 #include "platform/posix/LinuxBundle.h"
+#include "tools/Comparison.h"
 #include "tools/Harmless.h"
 #include "tools/Program.h"
 
@@ -48,7 +49,8 @@ messages too short for their decoder, and messages that lack the expected proper
 
 The display goes to standard output, everything else to standard error. Control characters are shown as \xnn on a
 terminal. Extracted files replace existing files only with --force.
-Exit status: 0 all input was read, 1 there was bad input (the rest is shown), 2 wrong usage.)";
+Exit status: 0 all input was read, 1 there was bad input (the rest is shown), 2 wrong usage. With --compare: 0 nothing
+differs, 1 something does, 2 bad input or wrong usage.)";
 
 } // namespace
 
@@ -78,6 +80,11 @@ int main(int argc, char** argv)
         .add_flag("--cells", cells,
                   "Show the cells that served, not the display: visits, time, levels, last seen; not with jsonl")
         ->excludes(asksForEvents);
+    bool compares = false;
+    commands
+        .add_flag("--compare", compares,
+                  "Show only what differs between the ends of two files; the exit status is that of diff(1)")
+        ->excludes(asksForEvents);
     commands.add_flag("--stats", options.stats, "Count the messages of each log code, on standard error");
     commands.add_flag("--follow", options.follow,
                       "Wait for more messages at the end of the last file, until interrupted");
@@ -105,6 +112,9 @@ int main(int argc, char** argv)
             if (options.log)
                 throw CLI::ValidationError("--log", "shows nothing with --events and --cells");
         }
+        if (compares && (options.files.size() != 2 || cells || options.follow || options.log || options.stats ||
+                         !options.extract.empty() || format != "tree"))
+            throw CLI::ValidationError("--compare", "takes two files, and of the other options only --technology");
         if (options.numbers && format != "jsonl")
             throw CLI::ValidationError("--numbers", "needs --format jsonl");
         if (options.follow && options.files.back().ends_with(".kestrum"))
@@ -118,9 +128,9 @@ int main(int argc, char** argv)
 
     try {
         LinuxBundle bundle;
-        return decodeFiles(options, bundle);
+        return compares ? compareFiles(options, bundle) : decodeFiles(options, bundle);
     } catch (const std::exception& error) {
         std::cerr << "kestrum-decode: " << onOneLine(error.what()) << '\n';
-        return kFailed;
+        return compares ? kUsageError : kFailed;
     }
 }

@@ -12,7 +12,7 @@ _kestrum_decode() {
             mapfile -t COMPREPLY < <(compgen -d -- "$current") ;;
         *)
             if [[ $current == -* ]]; then
-                mapfile -t COMPREPLY < <(compgen -W '-h --help --version --technology --format --log --numbers --events --cells --stats
+                mapfile -t COMPREPLY < <(compgen -W '-h --help --version --technology --format --log --numbers --events --cells --compare --stats
                     --follow --extract --force -j --jobs' -- "$current")
             else
                 compopt -o filenames 2>/dev/null
