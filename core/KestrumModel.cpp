@@ -1,5 +1,6 @@
 #include "core/KestrumModel.h"
 
+#include "core/DisplayWatch.h"
 #include "platform/MainQueue.h"
 #include "platform/PropertyLists.h"
 #include "platform/SystemLog.h"
@@ -120,8 +121,18 @@ KestrumModelNodeRef KestrumModel::topLevelNodes()
         const Value display = _logGenerator->generateLogUsingState(_state);
         _nodesByPath.emplace();
         _nodes = KestrumModelNode::makeTreeFromObject(display, *_nodesByPath);
+        tellWatch();
     }
     return _nodes;
+}
+
+void KestrumModel::tellWatch() const
+{
+    const Value* history = _watch ? _state.find(StateKey::kHistory) : nullptr;
+    const Array* entries = history ? history->borrowedArray() : nullptr;
+    if (entries && !entries->empty())
+        if (const Dictionary* newest = entries->back().borrowedDictionary())
+            _watch->displayMade(*newest);
 }
 
 KestrumModelNodeRef KestrumModel::nodeAtPath(const std::string& path)
@@ -140,6 +151,13 @@ std::string KestrumModel::lossNotice() const
 ArrayRef KestrumModel::getSaveContents() const
 {
     return _logGenerator ? _logGenerator->getSaveContentsFromState(_state) : nullptr;
+}
+
+ArrayRef KestrumModel::getSaveContents(ArrayRef history) const
+{
+    State state;
+    state.set(StateKey::kHistory, std::move(history));
+    return _logGenerator ? _logGenerator->getSaveContentsFromState(state) : nullptr;
 }
 
 void KestrumModel::dropTree()

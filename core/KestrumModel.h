@@ -16,6 +16,7 @@
 
 namespace kestrum {
 
+class DisplayWatch;
 class Timer;
 
 /// Receives the model's notifications, always from the main queue and never from inside a call of the model.
@@ -48,6 +49,8 @@ public:
 
     /// Borrowed, may be null. Reset it before the observer is destroyed.
     void setObserver(KestrumModelObserver* observer) { _observer = observer; }
+    /// Borrowed, may be null. It is told of each display that `topLevelNodes` makes.
+    void setWatch(DisplayWatch* watch) { _watch = watch; }
 
     /// Opens the channel, asks for the technology, starts the log and refreshes every 2 s. After a failure it closes
     /// the channel and tries again 5 s later. Does nothing while monitoring runs or is being started.
@@ -77,6 +80,8 @@ public:
     /// The contents of a snapshot: dictionaries with a "Description" each. The list is new, its entries are shared with
     /// the history. Null without a generator.
     ArrayRef getSaveContents() const;
+    /// The same for a list of history entries instead of the newest ones.
+    ArrayRef getSaveContents(ArrayRef history) const;
 
     // The log channel (LogChannel.cpp).
 
@@ -101,11 +106,13 @@ private:
     void takeGenerator(std::unique_ptr<LogGenerator> generator);
 
     void logError(std::string_view text) const;
+    void tellWatch() const;
     void dropTree();
     void notify(void (KestrumModelObserver::*message)());
 
     MonitorRoles& _roles;
     KestrumModelObserver* _observer = nullptr;
+    DisplayWatch* _watch = nullptr;
 
     // Shared: a port that is closed during its wait for a reply must live until that call returns.
     std::shared_ptr<LocalPort> _recvPort;
