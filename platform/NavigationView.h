@@ -1,5 +1,6 @@
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -9,12 +10,27 @@ namespace kestrum {
 class SaveInterface;
 class TableScreen;
 
+/// What the user asks of the moment that is shown.
+enum class Look {
+    Freeze,  ///< the panes stand still; again: they follow the modem
+    Earlier, ///< the refresh before; freezes first
+    Later,
+};
+
 /// What a navigation view reports.
 class NavigationViewDelegate {
 public:
     virtual ~NavigationViewDelegate() = default;
     /// The user wants the pane before this one: the back button, Escape, a swipe.
     virtual void backRequested() = 0;
+    virtual void lookRequested(Look look) = 0;
+};
+
+/// The moment at which the panes stand still.
+struct FrozenMoment {
+    std::string text; ///< the moment that is shown, and since when the panes stand still
+    bool hasEarlier, hasLater;
+    friend bool operator==(const FrozenMoment&, const FrozenMoment&) = default;
 };
 
 enum class Transition { None, Push, Pop };
@@ -33,6 +49,8 @@ public:
     virtual void setToolbarHidden(bool hidden) = 0;
     /// Shows one line of text over every pane until another text replaces it; empty for none. The line takes no input.
     virtual void setNotice(std::string_view text) = 0;
+    /// Offers the ways to other moments, and back. Nothing: the panes follow the modem, as they do at first.
+    virtual void setFrozen(std::optional<FrozenMoment> moment) = 0;
 
     /// Shows a modal screen over the panes, and closes it. At most one is shown; `screen` is borrowed until then.
     virtual void present(SaveInterface& screen, bool animated) = 0;

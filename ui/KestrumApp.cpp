@@ -17,6 +17,7 @@ constexpr std::string_view kInternalInstallMarker =
     "/NorvaneInternal/Library/PreferenceBundles/Carrier Settings.bundle";
 constexpr std::string_view kShowGSMRSSI = "HXShowGSMRSSI";
 constexpr std::string_view kConnecting = "Connecting...";
+constexpr std::string_view kNothingToFreeze = "There is nothing to freeze yet";
 constexpr std::chrono::seconds kNoticeTime{8}; // enough to read a path
 
 } // namespace
@@ -26,7 +27,8 @@ std::shared_ptr<KestrumApp> KestrumApp::make(ApplicationRoles& roles)
     return std::shared_ptr<KestrumApp>(new KestrumApp(roles));
 }
 
-KestrumApp::KestrumApp(ApplicationRoles& roles) : _roles(roles) {}
+KestrumApp::KestrumApp(ApplicationRoles& roles) : _roles(roles), _moments(roles.clock), _freeze(_moments, roles.clock)
+{}
 
 KestrumApp::~KestrumApp()
 {
@@ -39,6 +41,7 @@ void KestrumApp::applicationDidFinishLaunching()
     _window = _roles.toolkit.makeWindow(_roles.toolkit.mainScreenBounds());
     _model = std::make_shared<KestrumModel>(_roles);
     _model->setObserver(this);
+    _model->setWatch(&_moments);
     setUpdateMessage(std::string(kConnecting));
     _dateFormatter.emplace(_roles.clock, "'Updated' yyyy-MM-dd 'at' HH:mm:ss");
 
@@ -87,7 +90,8 @@ void KestrumApp::showSaveView()
 {
     if (_saveViewController || !_model)
         return;
-    _saveViewController = std::make_shared<KestrumSaveViewController>(_roles, *this, _model->getSaveContents());
+    const auto contents = _freeze.isOn() ? _model->getSaveContents(_freeze.history()) : _model->getSaveContents();
+    _saveViewController = std::make_shared<KestrumSaveViewController>(_roles, *this, contents);
     _navController->presentViewController(*_saveViewController, true);
 }
 
@@ -112,7 +116,9 @@ void KestrumApp::showNotice(std::string_view text)
 
 void KestrumApp::updateStatusForViewController(KestrumPaneController& viewController)
 {
-    if (isConnected())
+    if (_freeze.isOn())
+        viewController.setStatus(_freeze.status(), !isConnected());
+    else if (isConnected())
         viewController.setStatus(updateMessage(), false);
     else
         viewController.setStatus(kConnecting, true);
@@ -122,8 +128,20 @@ void KestrumApp::updateViewControllerFromModel()
 {
     if (!_model)
         return;
+    _newest = _model->topLevelNodes(); // while the panes stand still too: the history goes on
+    if (_freeze.isOn())
+        offerMoments();
+    else
+        reloadPanes();
+    if (isConnected())
+        setUpdateMessage(_dateFormatter->stringFromDate(_roles.clock.now()));
+    updateStatus();
+}
+
+void KestrumApp::reloadPanes()
+{
     const auto& panes = _navController->viewControllers();
-    panes.front()->reloadWithNode(_model->topLevelNodes());
+    panes.front()->reloadWithNode(_newest);
     for (std::size_t i = 1; i < panes.size(); ++i) {
         auto node = _model->nodeAtPath(panes[i]->path());
         if (!node) {
@@ -132,8 +150,45 @@ void KestrumApp::updateViewControllerFromModel()
         }
         panes[i]->reloadWithNode(std::move(node));
     }
-    if (isConnected())
-        setUpdateMessage(_dateFormatter->stringFromDate(_roles.clock.now()));
+}
+
+void KestrumApp::lookRequested(Look look)
+{
+    const bool wasLive = !_freeze.isOn();
+    if (wasLive && look == Look::Later)
+        return;
+    if (!wasLive && look == Look::Freeze) {
+        returnToLive();
+        return;
+    }
+    // Without a display now, the newest moment is an earlier one.
+    if (wasLive && ((look == Look::Freeze && !_newest) || !_freeze.begin())) {
+        showNotice(kNothingToFreeze);
+        return;
+    }
+    if (look == Look::Earlier && (!wasLive || _newest))
+        _freeze.goEarlier();
+    else if (look == Look::Later)
+        _freeze.goLater();
+    for (const auto& pane : _navController->viewControllers())
+        pane->reloadWithNode(_freeze.nodeOf(*pane));
+    offerMoments();
+    updateStatus();
+}
+
+void KestrumApp::offerMoments()
+{
+    _navController->view().setFrozen(FrozenMoment{_freeze.status(), _freeze.hasEarlier(), _freeze.hasLater()});
+}
+
+void KestrumApp::returnToLive()
+{
+    _freeze.end();
+    _navController->view().setFrozen(std::nullopt);
+    if (std::exchange(_replacedWhileFrozen, false))
+        closePanes();
+    if (_newest)
+        reloadPanes();
     updateStatus();
 }
 
@@ -162,6 +217,15 @@ void KestrumApp::displayReplaced()
 {
     if (!_navController)
         return;
+    _newest = nullptr;
+    if (_freeze.isOn())
+        _replacedWhileFrozen = true;
+    else
+        closePanes();
+}
+
+void KestrumApp::closePanes()
+{
     _navController->popToRootViewController(true);
     _navController->topViewController().reloadWithNode(nullptr);
 }
@@ -174,8 +238,10 @@ void KestrumApp::messagesLost()
 void KestrumApp::releaseModel()
 {
     // While monitoring runs the refresh timer owns the model too: the channel stays open until the queue is cleared.
-    if (const auto model = std::exchange(_model, nullptr))
+    if (const auto model = std::exchange(_model, nullptr)) {
         model->setObserver(nullptr);
+        model->setWatch(nullptr);
+    }
 }
 
 void KestrumApp::willShowViewController(NavigationStack&, KestrumPaneController& viewController, bool)

@@ -1,11 +1,13 @@
 #pragma once
 
 #include "core/KestrumModel.h"
+#include "insight/Moments.h"
 #include "platform/ApplicationDelegate.h"
 #include "platform/MainQueue.h"
 #include "platform/Roles.h"
 #include "platform/Window.h"
 #include "ui/DateFormatter.h"
+#include "ui/Freeze.h"
 #include "ui/KestrumPaneController.h"
 #include "ui/KestrumSaveViewController.h"
 #include "ui/NavigationStack.h"
@@ -52,6 +54,8 @@ public:
     void messagesLost() override;
     void willShowViewController(NavigationStack& navigationController, KestrumPaneController& viewController,
                                 bool animated) override;
+    /// Freezes what is shown, goes to another moment, or returns to the modem.
+    void lookRequested(Look look) override;
 
     const std::optional<std::string>& updateMessage() const { return _properties.updateMessage; }
     void setUpdateMessage(std::optional<std::string> message) { _properties.updateMessage = std::move(message); }
@@ -75,8 +79,16 @@ private:
     void releaseModel();
     /// Shows the root pane's hint after `kConnectionPatience` without a connection, and removes it on connection.
     void followConnection();
+    void closePanes();
+    void reloadPanes();
+    void offerMoments();
+    void returnToLive();
 
     ApplicationRoles& _roles;
+    Moments _moments;
+    Freeze _freeze;
+    KestrumModelNodeRef _newest;       ///< the display that live panes show; null when they show none
+    bool _replacedWhileFrozen = false; ///< by that of another technology
     // In this order, so that a member is destroyed before the members that it borrows.
     std::shared_ptr<KestrumModel> _model;
     std::optional<DateFormatter> _dateFormatter;

@@ -87,6 +87,12 @@ void NavigationStack::backRequested()
         popToViewController(**std::prev(_panes.end(), 2), true);
 }
 
+void NavigationStack::lookRequested(Look look)
+{
+    if (!_presenting && _delegate)
+        _delegate->lookRequested(look);
+}
+
 void NavigationStack::show(KestrumPaneController& pane, Transition transition, bool animated)
 {
     pane.viewWillAppear(animated);

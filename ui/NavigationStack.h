@@ -20,6 +20,8 @@ public:
     /// A pushed or revealed pane is about to be shown. It is already the top of the stack.
     virtual void willShowViewController(NavigationStack& navigationController, KestrumPaneController& viewController,
                                         bool animated) = 0;
+    /// The user wants to see another moment. Not while the save screen is shown.
+    virtual void lookRequested(Look) {}
 };
 
 /// The open panes, root first, and the save screen over them. Owns the panes and notifies their controllers; the
@@ -56,6 +58,7 @@ public:
 
 private:
     void backRequested() override;
+    void lookRequested(Look look) override;
 
     void show(KestrumPaneController& pane, Transition transition, bool animated);
     std::vector<std::string> titles() const;

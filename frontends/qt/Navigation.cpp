@@ -6,6 +6,7 @@
 #include "frontends/qt/Type.h"
 
 #include <QAccessible>
+#include <QApplication>
 #include <QKeyEvent>
 #include <QMouseEvent>
 
@@ -123,7 +124,13 @@ void Notice::paintEvent(QPaintEvent*)
 }
 
 Navigation::Navigation(NavigationViewDelegate& delegate)
-    : _delegate(delegate), _panes(this), _bar(&_panes), _stage(&_panes), _notice(&_stage), _jump(&_panes)
+    : _delegate(delegate),
+      _panes(this),
+      _bar(&_panes),
+      _stage(&_panes),
+      _notice(&_stage),
+      _moments([this](Look asked) { look(asked); }, &_panes),
+      _jump(&_panes)
 {
     setAutoFillBackground(true);
     _stage.setBackgroundRole(QPalette::Base);
@@ -148,6 +155,12 @@ void Navigation::goBack()
         _delegate.backRequested();
 }
 
+void Navigation::look(Look look)
+{
+    if (!_sheet)
+        _delegate.lookRequested(look);
+}
+
 void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transition transition, bool animated)
 {
     // This front end creates every screen, so the cast is safe.
@@ -168,6 +181,10 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     bring(screen.toolbar(), _panes);
     fresh->clearSelection();
     fresh->onSwipeBack([this] { goBack(); });
+    fresh->onMenu([this]() -> Table::MenuEntry {
+        return {_moments.isHidden() ? QStringLiteral("Freeze") : QStringLiteral("Live"),
+                [this] { look(Look::Freeze); }};
+    });
     setTitles(std::move(titles));
     arrange();
     fresh->show();
@@ -176,6 +193,7 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     if (old) {
         takeAway(*old);
         old->onSwipeBack(nullptr);
+        old->onMenu(nullptr);
     }
     if (oldBar)
         takeAway(*oldBar);
@@ -221,6 +239,16 @@ void Navigation::setNotice(std::string_view text)
         return;
     QAccessibleEvent alert(&_notice, QAccessible::Alert);
     QAccessible::updateAccessibility(&alert);
+}
+
+void Navigation::setFrozen(std::optional<FrozenMoment> moment)
+{
+    const QPointer<QWidget> focused = QApplication::focusWidget();
+    _moments.setMoment(moment);
+    arrange();
+    // A button that is hidden must not pass the focus on to the next: another press would mean something else.
+    if (focused && _moments.isAncestorOf(focused) && !focused->isVisible())
+        takeFocus();
 }
 
 void Navigation::present(SaveInterface& screen, bool animated)
@@ -276,8 +304,10 @@ void Navigation::arrange()
 {
     _panes.setGeometry(rect());
     const int bottom = _toolbarHidden || !_toolbar ? 0 : kBarHeight;
+    const int moments = _moments.isHidden() ? 0 : kBarHeight;
     _bar.setGeometry(0, 0, width(), kBarHeight);
-    _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - bottom));
+    _stage.setGeometry(0, kBarHeight, width(), std::max(0, height() - kBarHeight - moments - bottom));
+    _moments.setGeometry(0, height() - bottom - kBarHeight, width(), kBarHeight);
     if (_table)
         _table->setGeometry(_stage.rect());
     _notice.arrange(_stage.rect());
@@ -306,6 +336,10 @@ void Navigation::keyPressEvent(QKeyEvent* event)
     const bool once = !event->isAutoRepeat();
     if (once && (back || (alt && key == Qt::Key_Left)))
         goBack();
+    else if (once && key == Qt::Key_Space && !event->modifiers())
+        look(Look::Freeze);
+    else if (event->text() == u"," || event->text() == u".")
+        look(event->text() == u"," ? Look::Earlier : Look::Later);
     else if (once && control && key == Qt::Key_S)
         pressSave();
     else if (once && _table && ((control && key == Qt::Key_F) || event->text() == u"/"))

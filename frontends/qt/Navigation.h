@@ -2,6 +2,7 @@
 
 #include "frontends/qt/Button.h"
 #include "frontends/qt/Jump.h"
+#include "frontends/qt/MomentBar.h"
 #include "frontends/qt/Motion.h"
 #include "frontends/qt/SaveSheet.h"
 #include "frontends/qt/Screen.h"
@@ -52,6 +53,7 @@ public:
     void setTitles(std::vector<std::string> titles) override;
     void setToolbarHidden(bool hidden) override;
     void setNotice(std::string_view text) override;
+    void setFrozen(std::optional<FrozenMoment> moment) override;
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 
@@ -61,6 +63,7 @@ public:
     Toolbar* toolbar() const { return _toolbar; }
     SaveSheet* sheet() const { return _sheet; }
     Jump& jump() { return _jump; }
+    MomentBar& momentBar() { return _moments; }
     bool isMoving() const { return _slide.isRunning() || _rise.isRunning(); }
     /// Gives the keyboard focus to the topmost part: the sheet, or the pane.
     void takeFocus();
@@ -74,12 +77,14 @@ private:
     void arrange();
     void goBack();
     void pressSave();
+    void look(Look look);
 
     NavigationViewDelegate& _delegate;
     QWidget _panes; ///< the bars and the stage: everything that a modal screen covers
     TitleBar _bar;
     QWidget _stage; ///< contains everything that slides
     Notice _notice; ///< over the stage's lower end
+    MomentBar _moments;
     Jump _jump;
     QPointer<Table> _table;
     QPointer<Toolbar> _toolbar;

@@ -586,7 +586,6 @@ void Table::keyPressEvent(QKeyEvent* event)
         return current() ? scrollSideways(at, -kSidewaysStep) : void();
     case Qt::Key_Return:
     case Qt::Key_Enter:
-    case Qt::Key_Space:
     case Qt::Key_Select:
         if (current() && !event->isAutoRepeat()) {
             makeCurrent(at);

@@ -61,6 +61,15 @@ public:
     /// Called after a swipe from the left edge.
     void onSwipeBack(std::function<void()> action) { _swipedBack = std::move(action); }
 
+    /// An entry of the menu that does not concern the row.
+    struct MenuEntry {
+        QString text;
+        std::function<void()> action;
+    };
+    /// Called when the menu opens.
+    void onMenu(std::function<MenuEntry()> entry) { _menuEntry = std::move(entry); }
+    const std::function<MenuEntry()>& menuEntry() const { return _menuEntry; }
+
     QSize sizeHint() const override;
 
 protected:
@@ -123,6 +132,7 @@ private:
     FollowedRow _current, _selected;
     std::optional<Press> _press;
     std::function<void()> _swipedBack;
+    std::function<MenuEntry()> _menuEntry;
     int _laidOutWidth = -1;
     bool _filling = false, _stale = true, _fitsRows = false, _ringKept = false;
     QTimer _hold; ///< runs while a finger stays on a row

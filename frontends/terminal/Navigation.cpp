@@ -24,6 +24,8 @@ constexpr std::array kHelp = {
     HelpLine{"Left Esc h", "back"},
     HelpLine{"< >", "scroll a row sideways"},
     HelpLine{"/  n", "jump to a name, next"},
+    HelpLine{"Space", "stand still, live again"},
+    HelpLine{", .", "a refresh back, forward"},
     HelpLine{"s", "save, where offered"},
     HelpLine{"Ctrl-L", "redraw"},
     HelpLine{"q", "quit"},
@@ -96,6 +98,13 @@ void TerminalNavigationView::setToolbarHidden(bool hidden)
 void TerminalNavigationView::setNotice(std::string_view text)
 {
     _notice = text;
+    _repaint.repaintLater();
+}
+
+void TerminalNavigationView::setFrozen(std::optional<FrozenMoment> moment)
+{
+    // The panes' status says which moment it is.
+    _frozen = std::move(moment);
     _repaint.repaintLater();
 }
 
@@ -181,6 +190,13 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
     _hints.clear();
     if (_pane->saveItem())
         _hints.push_back({L's', "s save"});
+    if (_frozen) {
+        _hints.push_back({L' ', "Space live"});
+        if (_frozen->hasEarlier)
+            _hints.push_back({L',', ", back"});
+        if (_frozen->hasLater)
+            _hints.push_back({L'.', ". on"});
+    }
     _hints.push_back({L'?', "? help"});
     _hints.push_back({L'q', "q quit"});
     const int spinning = _pane->isSpinning() ? columns(spinner) + 1 : 0;
@@ -188,17 +204,17 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
     std::size_t kept = 0;
     for (; kept < _hints.size() && columns(_hints[kept].text) + kGap <= room; ++kept)
         room -= columns(_hints[kept].text) + kGap;
-    // Save is always shown; the status is shortened for it.
-    if (_pane->saveItem())
-        kept = std::max<std::size_t>(kept, 1);
+    // Save and the way back to live are always shown; the status is shortened for them.
+    const auto always = static_cast<std::size_t>(_pane->saveItem() != nullptr) + (_frozen ? 1U : 0U);
+    kept = std::max(kept, always);
     _hints.resize(kept);
 
     int right = line.width() - kInset;
     for (auto each = _hints.rbegin(); each != _hints.rend(); ++each) {
         right -= columns(each->text);
         each->column = right;
-        const bool save = each->key == L's';
-        line.put(right, each->text, {.dim = !save, .colour = save ? Colour::Accent : Colour::Plain});
+        const bool action = each->key == L's' || each->key == L' ';
+        line.put(right, each->text, {.dim = !action, .colour = action ? Colour::Accent : Colour::Plain});
         right -= kGap;
     }
     if (spinning)
@@ -326,6 +342,15 @@ void TerminalNavigationView::handleCommand(wchar_t key)
     case L'n':
         if (!_lastJump.empty())
             table.choose(_lastJump, table.chosen() + 1);
+        return;
+    case L' ':
+        _delegate.lookRequested(Look::Freeze);
+        return;
+    case L',':
+        _delegate.lookRequested(Look::Earlier);
+        return;
+    case L'.':
+        _delegate.lookRequested(Look::Later);
         return;
     case L's':
         // A copy, because the action may replace the toolbar that holds it.

@@ -54,6 +54,7 @@ public:
     void setTitles(std::vector<std::string> titles) override;
     void setToolbarHidden(bool hidden) override;
     void setNotice(std::string_view text) override;
+    void setFrozen(std::optional<FrozenMoment> moment) override;
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
 
@@ -85,6 +86,7 @@ private:
     TerminalSaveInterface* _save = nullptr;
     std::vector<std::string> _titles;
     std::string _notice;
+    std::optional<FrozenMoment> _frozen;
     bool _toolbarHidden = false, _helpShown = false;
     std::vector<Hint> _hints;
     int _bottom = 0; // the toolbar's line

@@ -324,6 +324,7 @@ public:
     }
     void setToolbarHidden(bool hidden) override { toolbarHidden = hidden; }
     void setNotice(std::string_view text) override { notice = text; }
+    void setFrozen(std::optional<FrozenMoment> moment) override { frozen = std::move(moment); }
     void present(SaveInterface& screen, bool animated) override
     {
         ++presentations;
@@ -339,6 +340,7 @@ public:
     }
 
     void pressBack() { _delegate.backRequested(); }
+    void look(Look look) { _delegate.lookRequested(look); }
 
     RecordingScreen* shown = nullptr;
     std::vector<std::string> path; ///< the titles, root first
@@ -346,6 +348,7 @@ public:
     std::vector<std::pair<Transition, bool>> transitions;
     bool toolbarHidden = true;
     std::string notice;
+    std::optional<FrozenMoment> frozen;
     RecordingSaveInterface* presented = nullptr;
     int presentations = 0;
     std::optional<bool> presentedAnimated;

@@ -105,6 +105,44 @@ TEST_F(Keys, GoBackByAltLeft)
     EXPECT_EQ(backs, 1);
 }
 
+TEST_F(Keys, FreezeBySpaceAndLookBackAndForth)
+{
+    key(Qt::Key_Space);
+    EXPECT_THAT(looks, ElementsAre(Look::Freeze));
+    looks.clear();
+    type(",.");
+    EXPECT_THAT(looks, ElementsAre(Look::Earlier, Look::Later));
+    walkTo(1);
+    looks.clear();
+    key(Qt::Key_Space);
+    EXPECT_THAT(looks, ElementsAre(Look::Freeze));
+    EXPECT_THAT(rows.selected, IsEmpty()) << "Enter opens the row";
+}
+
+TEST_F(Keys, HeldSpaceFreezesOnce)
+{
+    QTest::keyPress(QApplication::focusWidget(), Qt::Key_Space);
+    QTest::simulateEvent(QApplication::focusWidget(), true, Qt::Key_Space, Qt::NoModifier, " ", true);
+    EXPECT_EQ(looks.size(), 1u);
+}
+
+TEST_F(Keys, TypeABlankWhereATextIsEdited)
+{
+    type("/");
+    type("serving nei");
+    EXPECT_EQ(table().current(), 7u);
+    type(",.");
+    EXPECT_THAT(looks, IsEmpty());
+    key(Qt::Key_Escape);
+}
+
+TEST_F(Keys, DoNotFreezeUnderAnAlert)
+{
+    toolkit().showAlert("File Error", "Unable to write file to disk", "Close");
+    key(Qt::Key_Space); // closes the alert
+    EXPECT_THAT(looks, IsEmpty());
+}
+
 TEST_F(Keys, SaveByControlSWhereSaveIsOffered)
 {
     key(Qt::Key_S, Qt::ControlModifier);
@@ -155,13 +193,13 @@ TEST_F(Keys, OpenTheMenuOfTheCurrentRow)
 {
     walkTo(1);
     key(Qt::Key_Menu);
-    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text"));
+    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze"));
     key(Qt::Key_Escape);
     EXPECT_EQ(menu(), nullptr);
     EXPECT_EQ(backs, 0);
     walkTo(3);
     key(Qt::Key_F10, Qt::ShiftModifier);
-    EXPECT_THAT(choices(), ElementsAre("Copy row", "Copy pane as text")) << "what opens has no value";
+    EXPECT_THAT(choices(), ElementsAre("Copy row", "Copy pane as text", "Freeze")) << "what opens has no value";
     key(Qt::Key_Down);
     key(Qt::Key_Return);
     EXPECT_EQ(clipboard(), "Neighbours");
@@ -171,7 +209,7 @@ TEST_F(Keys, OpenTheMenuOfTheCurrentRow)
 TEST_F(Keys, CopyFromTheMenuByTheMouse)
 {
     click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
-    ASSERT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text"));
+    ASSERT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze"));
     EXPECT_EQ(table().current(), 1u);
     choose("Copy value");
     EXPECT_EQ(clipboard(), "-95.25 dBm");
@@ -210,7 +248,7 @@ TEST_F(Keys, OpenTheMenuByALongPressOfAFinger)
     QTest::touchEvent(window().windowHandle(), device).press(0, at);
     EXPECT_TRUE(QTest::qWaitFor([] { return menu() != nullptr; }));
     QTest::touchEvent(window().windowHandle(), device).release(0, at);
-    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text"));
+    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze"));
     EXPECT_THAT(rows.selected, IsEmpty());
     for (const auto* each : menu()->actions())
         EXPECT_GE(menu()->actionGeometry(const_cast<QAction*>(each)).height(), 44);

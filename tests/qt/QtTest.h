@@ -86,6 +86,7 @@ protected:
     }
 
     void backRequested() override { ++backs; }
+    void lookRequested(Look look) override { looks.push_back(look); }
 
     qt::Navigation& navigation() { return static_cast<qt::Navigation&>(*_navigation); }
     qt::MainWindow& window() { return static_cast<qt::MainWindow&>(*_window); }
@@ -127,6 +128,7 @@ protected:
     }
 
     int backs = 0;
+    std::vector<Look> looks;
 
 private:
     using Act = void (*)(QWindow*, Qt::MouseButton, Qt::KeyboardModifiers, QPoint, int);

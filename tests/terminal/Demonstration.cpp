@@ -32,13 +32,7 @@ Demonstration::~Demonstration()
 void Demonstration::serve(const std::vector<std::string>& displays, const std::vector<std::string>& options)
 {
     const auto capture = (_directory / "displays.kcap").string();
-    std::ofstream file(capture, std::ios::binary);
-    for (const auto& each : displays) {
-        for (unsigned shift = 0; shift < 32; shift += 8)
-            file.put(static_cast<char>(each.size() >> shift & 0xFF));
-        file << each;
-    }
-    file.close();
+    writeCapture(capture, displays);
     _arguments = {builtProgram("voxd"), "--replay", capture};
     _arguments.insert(_arguments.end(), options.begin(), options.end());
     restartService();
@@ -108,6 +102,16 @@ std::map<std::string, std::string> Demonstration::environment() const
             {"KESTRUM_DEVICE_ROOT", (_directory / "device").string()},
             {"HOME", _directory.string()},
             {"XDG_CONFIG_HOME", (_directory / "config").string()}};
+}
+
+void writeCapture(const std::string& path, const std::vector<std::string>& messages)
+{
+    std::ofstream file(path, std::ios::binary);
+    for (const auto& each : messages) {
+        for (unsigned shift = 0; shift < 32; shift += 8)
+            file.put(static_cast<char>(each.size() >> shift & 0xFF));
+        file << each;
+    }
 }
 
 std::string propertyList(const std::string& entries)

@@ -25,6 +25,7 @@ public:
     void restartService();
 
     void offerSave();
+    std::filesystem::path directory() const { return _directory; }
     std::filesystem::path diagnosticLogs() const { return _directory / "device/var/log/diagnostics"; }
     /// The number of displays with a socket for the log.
     std::size_t displaysSockets() const;
@@ -36,6 +37,9 @@ private:
     std::vector<std::string> _arguments;
     pid_t _service = -1;
 };
+
+/// Writes a channel capture of the messages.
+void writeCapture(const std::string& path, const std::vector<std::string>& messages);
 
 /// A property list of a dictionary with these entries.
 std::string propertyList(const std::string& entries);
