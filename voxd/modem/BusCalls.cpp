@@ -16,22 +16,14 @@ constexpr std::chrono::seconds kSpare{2};
 } // namespace
 
 struct BusCalls::Call {
-    struct Later {
-        void operator()(QDBusPendingCallWatcher* watcher) const { watcher->deleteLater(); }
-    };
-
-    std::unique_ptr<QDBusPendingCallWatcher, Later> watcher;
+    std::unique_ptr<QDBusPendingCallWatcher> watcher;
     std::chrono::seconds left;
     Done done;
 };
 
 BusCalls::BusCalls(QDBusConnection bus) : _bus(std::move(bus)) {}
 
-BusCalls::~BusCalls()
-{
-    for (const auto& each : _calls)
-        each.watcher->disconnect();
-}
+BusCalls::~BusCalls() = default;
 
 void BusCalls::call(const QString& path, const QString& interface, const QString& method, const QVariantList& arguments,
                     std::chrono::seconds limit, Done done)
@@ -60,7 +52,7 @@ void BusCalls::tick()
         const auto call = each++;
         if ((call->left -= std::chrono::seconds(1)) > std::chrono::seconds(0))
             continue;
-        call->watcher->disconnect();
+        call->watcher.reset();
         late.splice(late.end(), _calls, call);
     }
     for (const auto& each : late)
@@ -70,8 +62,9 @@ void BusCalls::tick()
 // Taken out first: `done` may make the next call.
 void BusCalls::finish(Calls::iterator call, const QDBusMessage& reply)
 {
-    const Call finished = std::move(*call);
+    Call finished = std::move(*call);
     _calls.erase(call);
+    finished.watcher.release()->deleteLater(); // this runs in its signal
     finished.done(reply);
 }
 

@@ -9,6 +9,7 @@
 #include <QDBusObjectPath>
 #include <QDBusPendingCall>
 #include <QDBusVariant>
+#include <QElapsedTimer>
 #include <QJsonDocument>
 #include <QJsonObject>
 #include <QProcess>
@@ -56,6 +57,13 @@ protected:
     {
         process.setProcessChannelMode(QProcess::MergedChannels);
         process.start(QString::fromStdString(builtProgram(program)), arguments);
+    }
+
+    static QElapsedTimer started()
+    {
+        QElapsedTimer timer;
+        timer.start();
+        return timer;
     }
 
     // Debian's place for it is no part of an ordinary user's path.
@@ -155,8 +163,11 @@ TEST_F(ARealModemManager, IsShownWithLevelsThatMoveAndGetsItsSettingsBack)
 {
     start();
     ASSERT_TRUE(shows("Measured RSRP: -91.00 dBm")) << shown() << voxd.readAll().toStdString();
+    const QElapsedTimer sinceTheChange = started();
     modem.setRsrp(-81);
     ASSERT_TRUE(shows("Measured RSRP: -81.00 dBm")) << shown();
+    // The picture counts when the next one begins, 2 s later.
+    RecordProperty("level_ms", static_cast<int>(sinceTheChange.elapsed()));
     ASSERT_TRUE(shows("Cell Identity: 1712897")) << shown();
     const auto rows = shown();
     for (const char* row :
@@ -206,7 +217,9 @@ TEST_F(ARealModemManager, AModemThatIsUnpluggedGoesAndComesAgain)
     const QString before = modemPath();
     // For its clients the modem is unplugged: the daemon lets it go, and examines it anew afterwards.
     ASSERT_EQ(call(kManager, kService, "InhibitDevice", {"/virtual/test", true}).type(), QDBusMessage::ReplyMessage);
+    const QElapsedTimer sinceTheChange = started();
     ASSERT_TRUE(shows("No modem")) << shown();
+    RecordProperty("unplugged_ms", static_cast<int>(sinceTheChange.elapsed()));
     EXPECT_THAT(shown(), Not(HasSubstr("RSRP")));
     modem.setRsrp(-85);
     ASSERT_EQ(call(kManager, kService, "InhibitDevice", {"/virtual/test", false}).type(), QDBusMessage::ReplyMessage);
