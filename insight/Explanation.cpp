@@ -1,5 +1,6 @@
 #include "insight/Explanation.h"
 
+#include "insight/NumberIn.h"
 #include "support/Format.h"
 
 #include <algorithm>
@@ -11,27 +12,6 @@ namespace {
 double levelOfRxLev(double index)
 {
     return index - 110;
-}
-
-struct Measured {
-    double number;
-    std::string_view unit; ///< refers to the text, or to a constant
-};
-
-std::optional<Measured> measuredIn(const Value& value)
-{
-    if (const auto* reading = value.borrowedReading()) {
-        const auto number = reading->number();
-        return number ? std::optional(Measured{*number, reading->unit()}) : std::nullopt;
-    }
-    if (const auto* text = value.borrowedString()) {
-        Measured measured{};
-        if (const auto number = leadingNumber(*text, measured.unit)) {
-            measured.number = *number;
-            return measured;
-        }
-    }
-    return std::nullopt;
 }
 
 /// In a tree of several technologies RSSI is a received level only for GSM.
@@ -48,7 +28,7 @@ bool isOtherThanGsm(const Dictionary* beside)
 
 std::optional<double> numberOf(const KeyEntry& entry, const Value& value)
 {
-    const auto measured = measuredIn(value);
+    const auto measured = numberIn(value);
     if (!measured)
         return std::nullopt;
     const auto& [number, unit] = *measured;

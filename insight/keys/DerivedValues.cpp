@@ -111,23 +111,6 @@ std::string_view shownName(std::string_view key)
                : key.substr(order + 1);
 }
 
-std::optional<double> leadingNumber(std::string_view text, std::string_view& unit)
-{
-    if (text.starts_with('+') && !text.starts_with("+-"))
-        text.remove_prefix(1);
-    double number = 0;
-    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), number, std::chars_format::fixed);
-    if (error != std::errc() || !std::isfinite(number))
-        return std::nullopt;
-    auto rest = text.substr(static_cast<std::size_t>(end - text.data()));
-    if (rest.starts_with(' '))
-        rest.remove_prefix(1);
-    else if (!rest.empty() && rest != "%")
-        return std::nullopt;
-    unit = rest;
-    return number;
-}
-
 std::optional<std::int64_t> Given::whole() const
 {
     return wholeOf(value);

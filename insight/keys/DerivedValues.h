@@ -30,10 +30,6 @@ struct Given {
     std::optional<std::int64_t> wholeBeside(std::string_view key) const;
 };
 
-/// The number at the beginning of a text that is only a number, or a number, a blank and a unit; `unit` is then set.
-/// "-53 dBm", "98.25%"; nothing for "192.0.2.17".
-std::optional<double> leadingNumber(std::string_view text, std::string_view& unit);
-
 /// A key as a pane shows it: "3;Neighbor" is "Neighbor".
 std::string_view shownName(std::string_view key);
 

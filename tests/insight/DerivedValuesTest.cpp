@@ -124,20 +124,6 @@ TEST(DerivedValues, OfBlockErrorsNeedBothCounters)
     EXPECT_EQ(derived(fromBlockErrors, reading(3)), "");
 }
 
-TEST(DerivedValues, TakeNumbersFromTextsThatAreNumbers)
-{
-    std::string_view unit;
-    EXPECT_EQ(leadingNumber("-53 dBm", unit), -53);
-    EXPECT_EQ(unit, "dBm");
-    EXPECT_EQ(leadingNumber("+5 dBm", unit), 5);
-    EXPECT_EQ(leadingNumber("0.75%", unit), 0.75);
-    EXPECT_EQ(unit, "%");
-    EXPECT_EQ(leadingNumber("7", unit), 7);
-    EXPECT_EQ(unit, "");
-    for (const char* none : {"", "-", "dBm", "192.0.2.17", "0x2a01", "nan dBm", "inf", "1e3", "12:30", "+-5", "N/A"})
-        EXPECT_EQ(leadingNumber(none, unit), std::nullopt) << none;
-}
-
 // Nothing of what a display may hold stops the program.
 RC_GTEST_PROP(DerivedValues, OfAnyTextAndAnyNumberAreBounded, (const std::string& text, std::uint32_t raw))
 {
