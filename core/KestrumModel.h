@@ -72,6 +72,8 @@ public:
     /// Checks that the channel is open, and rebuilds the display when messages have arrived since the last refresh.
     void refresh();
 
+    /// The identifier of the modem's technology; empty without a generator.
+    std::string_view technology() const { return _logGenerator ? _logGenerator->technology() : std::string_view(); }
     /// The root of the display tree, built when needed; null without a generator.
     KestrumModelNodeRef topLevelNodes();
     /// The node under a path, see `joinPath`; null when there is none.

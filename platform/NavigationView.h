@@ -1,5 +1,6 @@
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <string_view>
@@ -8,6 +9,8 @@
 namespace kestrum {
 
 class SaveInterface;
+class Sheet;
+class SheetOwner;
 class TableScreen;
 
 /// What the user asks of the moment that is shown.
@@ -17,12 +20,21 @@ enum class Look {
     Later,
 };
 
+/// A screen that the user can open over the panes.
+enum class SheetKind {
+    Glance,   ///< the shown list as a table
+    Overview, ///< the whole display in one look
+};
+
 /// What a navigation view reports.
 class NavigationViewDelegate {
 public:
     virtual ~NavigationViewDelegate() = default;
     /// The user wants the pane before this one: the back button, Escape, a swipe.
     virtual void backRequested() = 0;
+    /// Whether the shown pane has that sheet.
+    virtual bool offers(SheetKind) const { return false; }
+    virtual void sheetRequested(SheetKind) {}
     virtual void lookRequested(Look look) = 0;
 };
 
@@ -55,6 +67,9 @@ public:
     /// Shows a modal screen over the panes, and closes it. At most one is shown; `screen` is borrowed until then.
     virtual void present(SaveInterface& screen, bool animated) = 0;
     virtual void dismiss(bool animated) = 0;
+
+    /// Opens an empty sheet over the panes; its end closes it. At most one is open, and no modal screen with it.
+    virtual std::unique_ptr<Sheet> openSheet(SheetOwner& owner) = 0;
 };
 
 } // namespace kestrum

@@ -49,6 +49,7 @@ void KestrumApp::applicationDidFinishLaunching()
     root->setStatus("Connecting", true); // without dots until the first attempt has ended
     _navController = std::make_unique<NavigationStack>(_roles.toolkit, std::move(root));
     _navController->setDelegate(this);
+    _sheets.emplace(_navController->view());
     _window->setRoot(_navController->view());
     _window->makeKeyAndVisible();
     followConnection();
@@ -150,6 +151,8 @@ void KestrumApp::reloadPanes()
         }
         panes[i]->reloadWithNode(std::move(node));
     }
+    if (_model)
+        _sheets->refresh(_model->technology(), panes.front()->node());
 }
 
 void KestrumApp::lookRequested(Look look)
@@ -197,6 +200,9 @@ void KestrumApp::updateStatus()
     if (!_navController)
         return;
     updateStatusForViewController(_navController->topViewController());
+    _sheets->show(_freeze.isOn()  ? _freeze.status()
+                  : isConnected() ? updateMessage().value_or("")
+                                  : std::string(kConnecting));
     followConnection();
 }
 
@@ -226,6 +232,7 @@ void KestrumApp::displayReplaced()
 
 void KestrumApp::closePanes()
 {
+    _sheets->close();
     _navController->popToRootViewController(true);
     _navController->topViewController().reloadWithNode(nullptr);
 }
@@ -242,6 +249,20 @@ void KestrumApp::releaseModel()
         model->setObserver(nullptr);
         model->setWatch(nullptr);
     }
+}
+
+bool KestrumApp::offers(SheetKind kind) const
+{
+    const auto& pane = _navController->topViewController();
+    return _model && _sheets->offers(kind, _model->technology(), pane.path(), pane.node());
+}
+
+void KestrumApp::sheetRequested(SheetKind kind)
+{
+    const auto& panes = _navController->viewControllers();
+    _sheets->open(kind, _model->technology(), panes.back()->path());
+    _sheets->refresh(_model->technology(), panes.front()->node());
+    updateStatus();
 }
 
 void KestrumApp::willShowViewController(NavigationStack&, KestrumPaneController& viewController, bool)

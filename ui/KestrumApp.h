@@ -12,6 +12,7 @@
 #include "ui/KestrumSaveViewController.h"
 #include "ui/NavigationStack.h"
 #include "ui/SharedApplication.h"
+#include "ui/Sheets.h"
 
 #include <memory>
 #include <optional>
@@ -56,6 +57,8 @@ public:
                                 bool animated) override;
     /// Freezes what is shown, goes to another moment, or returns to the modem.
     void lookRequested(Look look) override;
+    bool offers(SheetKind kind) const override;
+    void sheetRequested(SheetKind kind) override;
 
     const std::optional<std::string>& updateMessage() const { return _properties.updateMessage; }
     void setUpdateMessage(std::optional<std::string> message) { _properties.updateMessage = std::move(message); }
@@ -94,6 +97,7 @@ private:
     std::optional<DateFormatter> _dateFormatter;
     std::shared_ptr<KestrumSaveViewController> _saveViewController;
     std::unique_ptr<NavigationStack> _navController;
+    std::optional<Sheets> _sheets; ///< over the panes
     std::shared_ptr<Window> _window;
     std::unique_ptr<Timer> _unconnected; ///< not null while there is no connection
     std::unique_ptr<Timer> _noticeEnd;   ///< not null while a notice is shown

@@ -23,6 +23,7 @@ public:
     KestrumPaneController(Toolkit& toolkit, SharedApplication& application, Node node, std::string atPath);
 
     const std::string& path() const { return _keyPath; }
+    const Node& node() const { return _nodes; }
     TableScreen& screen() { return *_screen; }
 
     /// Called by the stack before the pane appears and before it disappears.

@@ -22,6 +22,8 @@ public:
                                         bool animated) = 0;
     /// The user wants to see another moment. Not while the save screen is shown.
     virtual void lookRequested(Look) {}
+    virtual bool offers(SheetKind) const { return false; }
+    virtual void sheetRequested(SheetKind) {}
 };
 
 /// The open panes, root first, and the save screen over them. Owns the panes and notifies their controllers; the
@@ -59,6 +61,12 @@ public:
 private:
     void backRequested() override;
     void lookRequested(Look look) override;
+    bool offers(SheetKind kind) const override { return _delegate && !_presenting && _delegate->offers(kind); }
+    void sheetRequested(SheetKind kind) override
+    {
+        if (offers(kind))
+            _delegate->sheetRequested(kind);
+    }
 
     void show(KestrumPaneController& pane, Transition transition, bool animated);
     std::vector<std::string> titles() const;

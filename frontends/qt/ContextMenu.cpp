@@ -25,10 +25,8 @@ ContextMenu::ContextMenu(Table& table, std::optional<std::size_t> row, QPoint at
         addAction(QStringLiteral("Copy row"), &table, [whole] { copy(whole); });
     }
     addAction(QStringLiteral("Copy pane as text"), &table, [&table] { copy(paneAsText(table)); });
-    if (const auto& entry = table.menuEntry()) {
-        const auto [text, action] = entry();
+    for (const auto& [text, action] : table.menuEntries())
         addAction(text, &table, action);
-    }
     table.installEventFilter(this);
     popup(at);
 }

@@ -30,6 +30,29 @@ void takeAway(QWidget& widget)
     widget.setEnabled(false);
 }
 
+/// The sheet as its owner has it. The widget outlives it where its own input ends it.
+class OpenSheet final : public Sheet {
+public:
+    OpenSheet(SheetView& view, std::function<void()> closed) : _view(&view), _closed(std::move(closed)) {}
+    ~OpenSheet() override
+    {
+        if (_view)
+            _closed();
+    }
+    OpenSheet(const OpenSheet&) = delete;
+    OpenSheet& operator=(const OpenSheet&) = delete;
+
+    void setContents(SheetContents contents) override
+    {
+        if (_view)
+            _view->setContents(contents);
+    }
+
+private:
+    QPointer<SheetView> _view;
+    std::function<void()> _closed;
+};
+
 } // namespace
 
 TitleBar::TitleBar(QWidget* parent) : QWidget(parent), _back(Button::Kind::Back, {}, this), _title(this)
@@ -151,7 +174,7 @@ Navigation::~Navigation()
 
 void Navigation::goBack()
 {
-    if (_depth > 1 && !_sheet)
+    if (_depth > 1 && !_sheet && !_insight)
         _delegate.backRequested();
 }
 
@@ -181,9 +204,14 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     bring(screen.toolbar(), _panes);
     fresh->clearSelection();
     fresh->onSwipeBack([this] { goBack(); });
-    fresh->onMenu([this]() -> Table::MenuEntry {
-        return {_moments.isHidden() ? QStringLiteral("Freeze") : QStringLiteral("Live"),
-                [this] { look(Look::Freeze); }};
+    fresh->onMenu([this] {
+        std::vector<Table::MenuEntry> entries{
+            {_moments.isHidden() ? QStringLiteral("Freeze") : QStringLiteral("Live"), [this] { look(Look::Freeze); }}};
+        if (_delegate.offers(SheetKind::Glance))
+            entries.push_back({QStringLiteral("Show as table"), [this] { requestSheet(SheetKind::Glance); }});
+        if (_delegate.offers(SheetKind::Overview))
+            entries.push_back({QStringLiteral("Overview"), [this] { requestSheet(SheetKind::Overview); }});
+        return entries;
     });
     setTitles(std::move(titles));
     arrange();
@@ -290,12 +318,39 @@ void Navigation::dismiss(bool animated)
         [still] { delete still; });
 }
 
+std::unique_ptr<Sheet> Navigation::openSheet(SheetOwner& owner)
+{
+    _jump.end();
+    _insight = new SheetView(owner, this);
+    _insight->setGeometry(rect());
+    _insight->show();
+    takeFocus();
+    return std::make_unique<OpenSheet>(*_insight, [this] { closeInsight(); });
+}
+
+void Navigation::closeInsight()
+{
+    SheetView* const view = std::exchange(_insight, nullptr);
+    view->end();
+    view->hide();
+    takeFocus();
+    view->deleteLater(); // its own input may have closed it
+}
+
+void Navigation::requestSheet(SheetKind kind)
+{
+    if (!_sheet && !_insight)
+        _delegate.sheetRequested(kind);
+}
+
 void Navigation::takeFocus()
 {
     // Widgets under a modal screen are disabled for Tab and for screen readers too.
-    _panes.setEnabled(!_sheet);
+    _panes.setEnabled(!_sheet && !_insight);
     if (_sheet)
         _sheet->takeFocus();
+    else if (_insight)
+        _insight->setFocus(Qt::OtherFocusReason);
     else if (_table)
         _table->setFocus(Qt::OtherFocusReason);
 }
@@ -326,6 +381,8 @@ void Navigation::resizeEvent(QResizeEvent*)
     arrange();
     if (_sheet)
         _sheet->setGeometry(rect());
+    if (_insight)
+        _insight->setGeometry(rect());
 }
 
 void Navigation::keyPressEvent(QKeyEvent* event)
@@ -340,6 +397,10 @@ void Navigation::keyPressEvent(QKeyEvent* event)
         look(Look::Freeze);
     else if (event->text() == u"," || event->text() == u".")
         look(event->text() == u"," ? Look::Earlier : Look::Later);
+    else if (once && event->text() == u"v")
+        requestSheet(SheetKind::Glance);
+    else if (once && event->text() == u"o")
+        requestSheet(SheetKind::Overview);
     else if (once && control && key == Qt::Key_S)
         pressSave();
     else if (once && _table && ((control && key == Qt::Key_F) || event->text() == u"/"))

@@ -6,6 +6,7 @@
 #include "frontends/qt/Motion.h"
 #include "frontends/qt/SaveSheet.h"
 #include "frontends/qt/Screen.h"
+#include "frontends/qt/SheetView.h"
 #include "platform/NavigationView.h"
 
 #include <QPointer>
@@ -56,12 +57,14 @@ public:
     void setFrozen(std::optional<FrozenMoment> moment) override;
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
+    std::unique_ptr<Sheet> openSheet(SheetOwner& owner) override;
 
     TitleBar& titleBar() { return _bar; }
     Table* table() const { return _table; }
     const Notice& notice() const { return _notice; }
     Toolbar* toolbar() const { return _toolbar; }
     SaveSheet* sheet() const { return _sheet; }
+    SheetView* insight() const { return _insight; } ///< the open sheet of `openSheet`, null for none
     Jump& jump() { return _jump; }
     MomentBar& momentBar() { return _moments; }
     bool isMoving() const { return _slide.isRunning() || _rise.isRunning(); }
@@ -78,6 +81,8 @@ private:
     void goBack();
     void pressSave();
     void look(Look look);
+    void requestSheet(SheetKind kind);
+    void closeInsight();
 
     NavigationViewDelegate& _delegate;
     QWidget _panes; ///< the bars and the stage: everything that a modal screen covers
@@ -89,6 +94,7 @@ private:
     QPointer<Table> _table;
     QPointer<Toolbar> _toolbar;
     QPointer<SaveSheet> _sheet;
+    QPointer<SheetView> _insight;
     std::size_t _depth = 0;
     bool _toolbarHidden = true;
     Movement _slide, _rise;

@@ -67,8 +67,8 @@ public:
         std::function<void()> action;
     };
     /// Called when the menu opens.
-    void onMenu(std::function<MenuEntry()> entry) { _menuEntry = std::move(entry); }
-    const std::function<MenuEntry()>& menuEntry() const { return _menuEntry; }
+    void onMenu(std::function<std::vector<MenuEntry>()> entries) { _menuEntries = std::move(entries); }
+    std::vector<MenuEntry> menuEntries() const { return _menuEntries ? _menuEntries() : std::vector<MenuEntry>(); }
 
     QSize sizeHint() const override;
 
@@ -132,7 +132,7 @@ private:
     FollowedRow _current, _selected;
     std::optional<Press> _press;
     std::function<void()> _swipedBack;
-    std::function<MenuEntry()> _menuEntry;
+    std::function<std::vector<MenuEntry>()> _menuEntries;
     int _laidOutWidth = -1;
     bool _filling = false, _stale = true, _fitsRows = false, _ringKept = false;
     QTimer _hold; ///< runs while a finger stays on a row

@@ -26,6 +26,9 @@ constexpr std::array kHelp = {
     HelpLine{"/  n", "jump to a name, next"},
     HelpLine{"Space", "stand still, live again"},
     HelpLine{", .", "a refresh back, forward"},
+    HelpLine{"v", "a list as a table"},
+    HelpLine{"o", "overview, from the first pane"},
+    HelpLine{"Tab r  < >", "table: sort, reverse, columns"},
     HelpLine{"s", "save, where offered"},
     HelpLine{"Ctrl-L", "redraw"},
     HelpLine{"q", "quit"},
@@ -122,12 +125,26 @@ void TerminalNavigationView::dismiss(bool)
     _repaint.repaintLater();
 }
 
+std::unique_ptr<Sheet> TerminalNavigationView::openSheet(SheetOwner& owner)
+{
+    _jump.reset();
+    return std::make_unique<TerminalSheet>(owner, _repaint, _sheet);
+}
+
 void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool inBackground)
 {
     screen.clear();
     screen.setDimmed(inBackground || _helpShown);
     if (_save) {
         _save->draw(screen);
+        return;
+    }
+    if (_sheet) {
+        _sheet->draw(screen);
+        if (_helpShown) {
+            screen.setDimmed(inBackground);
+            drawHelp(screen);
+        }
         return;
     }
     const int rows = screen.rows(), columns = std::min(screen.columns(), kColumn);
@@ -197,6 +214,10 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
         if (_frozen->hasLater)
             _hints.push_back({L'.', ". on"});
     }
+    if (_delegate.offers(SheetKind::Glance))
+        _hints.push_back({L'v', "v table"});
+    if (_delegate.offers(SheetKind::Overview))
+        _hints.push_back({L'o', "o overview"});
     _hints.push_back({L'?', "? help"});
     _hints.push_back({L'q', "q quit"});
     const int spinning = _pane->isSpinning() ? columns(spinner) + 1 : 0;
@@ -243,6 +264,8 @@ void TerminalNavigationView::handle(const Input& input)
         _save->handle(input);
     else if (_helpShown)
         _helpShown = input.key == Key::Release || input.key == Key::Other; // any key or mouse press closes it
+    else if (_sheet && !input.is(L'?') && !input.is(L'q'))
+        _sheet->handle(input);
     else if (_jump)
         handleJump(input);
     else if (_pane)
@@ -358,6 +381,12 @@ void TerminalNavigationView::handleCommand(wchar_t key)
             const auto action = save->action;
             action();
         }
+        return;
+    case L'v':
+        _delegate.sheetRequested(SheetKind::Glance);
+        return;
+    case L'o':
+        _delegate.sheetRequested(SheetKind::Overview);
         return;
     case L'?':
         _helpShown = true;

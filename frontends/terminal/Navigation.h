@@ -4,6 +4,7 @@
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/SaveScreen.h"
 #include "frontends/terminal/Screen.h"
+#include "frontends/terminal/SheetScreen.h"
 #include "frontends/terminal/Table.h"
 #include "platform/NavigationView.h"
 #include "platform/SaveInterface.h"
@@ -57,6 +58,7 @@ public:
     void setFrozen(std::optional<FrozenMoment> moment) override;
     void present(SaveInterface& screen, bool animated) override;
     void dismiss(bool animated) override;
+    std::unique_ptr<Sheet> openSheet(SheetOwner& owner) override;
 
     /// `spinner` is the current picture of the activity indicator. `inBackground`: another part takes the input.
     void draw(Screen& screen, std::string_view spinner, bool inBackground);
@@ -84,6 +86,7 @@ private:
     std::function<void()> _quit;
     TerminalTableScreen* _pane = nullptr;
     TerminalSaveInterface* _save = nullptr;
+    TerminalSheet* _sheet = nullptr;
     std::vector<std::string> _titles;
     std::string _notice;
     std::optional<FrozenMoment> _frozen;

@@ -5,6 +5,7 @@
 #include "platform/NavigationView.h"
 #include "platform/SaveInterface.h"
 #include "platform/ScrollView.h"
+#include "platform/Sheet.h"
 #include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
 #include "platform/Window.h"
@@ -299,6 +300,30 @@ public:
     Rect frame;
 };
 
+/// The sheet that is open.
+struct OpenSheet {
+    SheetOwner& owner; ///< the user's actions call it
+    SheetContents contents = {};
+    int changes = 0;
+};
+
+class RecordingSheet final : public Sheet {
+public:
+    RecordingSheet(std::optional<OpenSheet>& open, SheetOwner& owner) : _open(open) { _open.emplace(owner); }
+    ~RecordingSheet() override { _open.reset(); }
+    RecordingSheet(const RecordingSheet&) = delete;
+    RecordingSheet& operator=(const RecordingSheet&) = delete;
+
+    void setContents(SheetContents contents) override
+    {
+        _open->contents = std::move(contents);
+        ++_open->changes;
+    }
+
+private:
+    std::optional<OpenSheet>& _open;
+};
+
 class RecordingNavigationView final : public NavigationView {
 public:
     explicit RecordingNavigationView(NavigationViewDelegate& delegate) : _delegate(delegate) {}
@@ -338,9 +363,15 @@ public:
         presented = nullptr;
         presentedAnimated = animated;
     }
+    std::unique_ptr<Sheet> openSheet(SheetOwner& owner) override
+    {
+        return std::make_unique<RecordingSheet>(sheet, owner);
+    }
 
     void pressBack() { _delegate.backRequested(); }
     void look(Look look) { _delegate.lookRequested(look); }
+    bool isOffered(SheetKind kind) const { return _delegate.offers(kind); }
+    void press(SheetKind kind) { _delegate.sheetRequested(kind); }
 
     RecordingScreen* shown = nullptr;
     std::vector<std::string> path; ///< the titles, root first
@@ -352,6 +383,7 @@ public:
     RecordingSaveInterface* presented = nullptr;
     int presentations = 0;
     std::optional<bool> presentedAnimated;
+    std::optional<OpenSheet> sheet;
 
 private:
     NavigationViewDelegate& _delegate;

@@ -826,5 +826,133 @@ TEST_F(Terminal, RefusesATerminalThatCannotPlaceItsCursor)
     EXPECT_TRUE(terminal.shows("cannot place its cursor")) << terminal.text();
 }
 
+// Tables and the overview
+
+std::string cell(const char* number, const char* channel, const char* level)
+{
+    return dictionary(number, text("ARFCN", channel) + text("BSIC", "7") + text("RSSI", level) + text("C1", "12") +
+                                  text("A first long key of the modem", "1") +
+                                  text("A second long key of the modem", "2"));
+}
+
+/// `level` is that of the second neighbour.
+std::string cells(const char* level)
+{
+    return propertyList(dictionary("Serving Cell", text("ARFCN", "60") + text("BSIC", "28") + text("RSSI", "-53 dBm")) +
+                        dictionary("Neighbor Cells", cell("0", "38", "-79 dBm") + cell("1", "64", level)));
+}
+
+class TerminalSheets : public Terminal {
+protected:
+    void startWithCells(std::map<std::string, std::string> changes = {})
+    {
+        device.serve({cells("-110 dBm"), cells("-110 dBm")});
+        start(std::move(changes));
+        ASSERT_TRUE(terminal.waitFor("Updated 20")) << terminal.text();
+    }
+    void openTable()
+    {
+        terminal.type("jl");
+        expectTitle("Kestrum › Neighbor Cells");
+        expectShown("v table");
+        terminal.type("v");
+        expectRow(1, HasSubstr("BSIC  ARFCN  RSSI dBm"));
+    }
+};
+
+TEST_F(TerminalSheets, ShowAListAsATable)
+{
+    startWithCells();
+    openTable();
+    expectTitle("Neighbor Cells");
+    expectRow(0, EndsWith("S serving cell"));
+    expectRow(1, StartsWith("  BSIC  ARFCN  RSSI dBm ↓"));
+    expectRow(2, StartsWith("S   28     60         -53 █████████▎ excellent"));
+    expectRow(3, StartsWith("     7     38         -79 █████····· good        12"));
+    expectRow(4, StartsWith("     7     64        -110 ·········· no service  12"));
+    expectRow(23, HasSubstr("Tab sort  ? help  Esc back"));
+    EXPECT_TRUE(terminal.shows("…")) << "more columns stand at the right";
+    terminal.press(Key::Escape);
+    expectTitle("Kestrum › Neighbor Cells");
+    expectChosen("0");
+}
+
+TEST_F(TerminalSheets, SortByAnyColumn)
+{
+    startWithCells();
+    openTable();
+    terminal.press(Key::Tab);
+    expectRow(1, HasSubstr("C1 ↓"));
+    terminal.type("r");
+    expectRow(1, HasSubstr("C1 ↑"));
+    clickOn("ARFCN");
+    expectRow(1, HasSubstr("ARFCN ↑"));
+    expectRow(3, HasSubstr("38"));
+    clickOn("ARFCN");
+    expectRow(3, HasSubstr("64"));
+}
+
+TEST_F(TerminalSheets, ScrollColumnsSideways)
+{
+    startWithCells();
+    openTable();
+    EXPECT_FALSE(terminal.shows("A second long key"));
+    terminal.type("l");
+    terminal.press(Key::Right);
+    expectRow(1, testing::AllOf(StartsWith("  BSIC  ARFCN  A first"), HasSubstr("A second long key")));
+    terminal.type("hh");
+    expectRow(1, HasSubstr("RSSI dBm"));
+}
+
+TEST_F(TerminalSheets, LoseNothingWithoutColourAndUnicode)
+{
+    startWithCells({{"LC_ALL", "POSIX"}, {"NO_COLOR", "1"}});
+    terminal.type("jl");
+    expectShown("v table");
+    terminal.type("v");
+    expectRow(3, StartsWith("     7     38         -79 #####..... good"));
+    expectRow(1, HasSubstr("RSSI dBm v"));
+}
+
+TEST_F(TerminalSheets, OverviewOpensFromTheFirstPaneAndCloses)
+{
+    startWithCells();
+    expectShown("o overview");
+    terminal.type("o");
+    expectTitle("Overview");
+    expectRow(1, StartsWith(" Serving cell  ARFCN 60  BSIC 28"));
+    expectRow(2, testing::AllOf(HasSubstr("RSSI"), HasSubstr("-53 dBm"), HasSubstr("excellent")));
+    expectShown("Neighbor Cells");
+    terminal.type("?");
+    expectShown("overview, from the first pane");
+    terminal.type("?");
+    expectGone("overview, from the first pane");
+    terminal.click(0, 3);
+    expectTitle("Kestrum");
+    expectChosen("Serving Cell");
+}
+
+TEST_F(TerminalSheets, FollowTheRefresh)
+{
+    device.serve({cells("-110 dBm"), cells("-110 dBm"), cells("-60 dBm")}); // four in each refresh
+    start();
+    ASSERT_TRUE(terminal.waitFor("Updated 20"));
+    openTable();
+    expectShown("-110");
+    expectRefresh();
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.shows("-60"); })) << terminal.text();
+}
+
+TEST_F(TerminalSheets, FitASmallTerminal)
+{
+    startWithCells();
+    openTable();
+    terminal.resize(6, 20);
+    expectRow(1, StartsWith("  BSIC  ARFCN"));
+    terminal.resize(1, 3);
+    terminal.resize(24, 80);
+    expectRow(4, HasSubstr("-110"));
+}
+
 } // namespace
 } // namespace kestrum

@@ -1,0 +1,108 @@
+#include "frontends/qt/SheetView.h"
+#include "QtTest.h"
+
+#include <QHeaderView>
+
+namespace kestrum {
+namespace {
+
+using namespace qt;
+
+class SheetViewTest : public InAWindow, public SheetOwner {
+protected:
+    bool offers(SheetKind) const override { return true; }
+    void sheetRequested(SheetKind kind) override { requested.push_back(kind); }
+    void sheetLeft() override { sheet.reset(); }
+    void columnChosen(std::size_t column) override { chosen.push_back(column); }
+
+    void open()
+    {
+        pane = screenOf(rows);
+        navigation().show(*pane, {"Kestrum"}, Transition::None, false);
+        makeVisible();
+        sheet = navigation().openSheet(*this);
+        sheet->setContents(contents());
+    }
+    static SheetContents contents()
+    {
+        SheetPart part{.caption = "Neighbours", .facts = {{"PCI", {"7"}}, {"RSRP", {"-90 dBm", 0.5, "good"}}}};
+        part.table.columns = {{.heading = "PCI", .isNumeric = true, .isIdentity = true},
+                              {.heading = "RSRP", .unit = "dBm", .isNumeric = true, .hasBars = true}};
+        part.table.rows = {{.identity = "a", .cells = {{"112"}, {"-90"}}, .isReference = true},
+                           {.identity = "b", .cells = {{"88"}, {"-95", 0.4, "fair"}}, .moved = SheetRow::Moved::Up}};
+        part.table.sort = {1, true};
+        return {.title = "A list", .parts = {part}, .status = "Updated now", .canSort = true};
+    }
+    SheetTableView& shownTable() { return navigation().insight()->parts().front()->table(); }
+
+    Rows rows = Rows::leaves(3);
+    std::unique_ptr<TableScreen> pane;
+    std::unique_ptr<Sheet> sheet;
+    std::vector<SheetKind> requested;
+    std::vector<std::size_t> chosen;
+};
+
+TEST_F(SheetViewTest, ShowsHeadingsRowsAndWordsAsText)
+{
+    open();
+    EXPECT_EQ(navigation().insight()->title(), "A list");
+    EXPECT_EQ(navigation().insight()->status(), "Updated now");
+    EXPECT_EQ(shownTable().horizontalHeaderItem(1)->text(), QStringLiteral("RSRP dBm ↓"));
+    EXPECT_EQ(shownTable().item(0, 0)->text(), QStringLiteral("Serving 112"));
+    EXPECT_EQ(shownTable().item(1, 0)->text(), QStringLiteral("↑ 88"));
+    EXPECT_EQ(shownTable().item(1, 1)->text(), QStringLiteral("-95  fair"));
+}
+
+TEST_F(SheetViewTest, TakesAllInputAndClosesByEscapeAndTheBackButton)
+{
+    open();
+    EXPECT_FALSE(table().isEnabled());
+    QTest::keyClick(navigation().insight(), Qt::Key_Escape);
+    EXPECT_EQ(navigation().insight(), nullptr);
+    EXPECT_TRUE(table().isEnabled());
+    EXPECT_EQ(backs, 0);
+    sheet = navigation().openSheet(*this);
+    click(navigation().insight()->back());
+    EXPECT_EQ(navigation().insight(), nullptr);
+}
+
+TEST_F(SheetViewTest, AHeadingThatIsPressedSorts)
+{
+    open();
+    auto* header = shownTable().horizontalHeader();
+    QTest::mouseClick(header->viewport(), Qt::LeftButton, {},
+                      {header->sectionViewportPosition(1) + 5, header->height() / 2});
+    EXPECT_THAT(chosen, testing::ElementsAre(1u));
+}
+
+TEST_F(SheetViewTest, KeysOpenThem)
+{
+    open();
+    sheet.reset();
+    QTest::keyClicks(&table(), QStringLiteral("vo"));
+    EXPECT_THAT(requested, testing::ElementsAre(SheetKind::Glance, SheetKind::Overview));
+}
+
+TEST_F(SheetViewTest, AScreenReaderHasTheTable)
+{
+    open();
+    auto* table = QAccessible::queryAccessibleInterface(&shownTable());
+    ASSERT_NE(table->tableInterface(), nullptr);
+    EXPECT_EQ(table->tableInterface()->rowCount(), 2);
+    EXPECT_EQ(table->tableInterface()->cellAt(1, 1)->text(QAccessible::Name), QStringLiteral("-95  fair"));
+}
+
+TEST_F(SheetViewTest, PartsComeAndGoAndTheWindowMayEndFirst)
+{
+    open();
+    auto changed = contents();
+    changed.parts.push_back(changed.parts.front());
+    sheet->setContents(changed);
+    changed.parts.clear();
+    sheet->setContents(changed);
+    sheet->setContents(contents());
+    EXPECT_EQ(navigation().insight()->parts().size(), 1u);
+}
+
+} // namespace
+} // namespace kestrum
