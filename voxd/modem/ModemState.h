@@ -97,7 +97,7 @@ enum class ModemRegistration : std::uint32_t {
 };
 
 /// MMModem3gppPacketServiceState.
-enum class PacketService : std::uint32_t { Unknown, Attached, Detached };
+enum class PacketService : std::uint32_t { Unknown, Detached, Attached };
 
 /// MMCellType.
 enum class CellType : std::uint32_t { Unknown, Cdma, Gsm, Umts, TdScdma, Lte, Nr };

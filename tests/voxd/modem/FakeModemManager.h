@@ -18,6 +18,7 @@ namespace kestrum {
 using FakeInterfaces = QMap<QString, QVariantMap>;
 using FakeObjects = QMap<QDBusObjectPath, FakeInterfaces>;
 using FakeFindings = QMap<uint, QDBusVariant>; ///< of GetLocation, by source
+using FakeRetries = QMap<uint, uint>;          ///< that are left, by lock
 
 /// "(ub)", as the property SignalQuality has it.
 struct FakeQuality {
@@ -62,6 +63,8 @@ public:
         qDBusRegisterMetaType<FakeFindings>();
         qDBusRegisterMetaType<FakeQuality>();
         qDBusRegisterMetaType<QList<QVariantMap>>();
+        qDBusRegisterMetaType<QList<uint>>();
+        qDBusRegisterMetaType<FakeRetries>();
         _connection.registerVirtualObject("/", this, QDBusConnection::SubPath);
         _connection.registerService(kService);
 
@@ -87,6 +90,7 @@ public:
                  {{"State", 8},
                   {"StateFailedReason", 0U},
                   {"UnlockRequired", 1U},
+                  {"UnlockRetries", QVariant::fromValue(FakeRetries{{2U, 3U}})},
                   {"AccessTechnologies", 0x4000U},
                   {"SignalQuality", QVariant::fromValue(FakeQuality{54, true})},
                   {"Manufacturer", "Test"},
@@ -94,13 +98,24 @@ public:
                   {"Revision", "1"},
                   {"EquipmentIdentifier", "123456789012345"},
                   {"DeviceIdentifier", identifier},
+                  {"Device", "/virtual/test"},
+                  {"Drivers", QStringList{"virtual"}},
+                  {"Plugin", "generic"},
+                  {"PrimaryPort", "cdc-wdm0"},
+                  {"OwnNumbers", QStringList()},
+                  {"PowerState", 3U},
+                  {"SupportedCapabilities", QVariant::fromValue(QList<uint>{4})},
+                  {"CurrentCapabilities", 4U},
+                  {"SupportedBands", QVariant::fromValue(QList<uint>())},
+                  {"CurrentBands", QVariant::fromValue(QList<uint>())},
+                  {"SupportedIpFamilies", 3U},
                   {"Sim", QVariant::fromValue(QDBusObjectPath("/"))},
                   {"Bearers", QVariant::fromValue(QList<QDBusObjectPath>())}}},
                 {kModem3gpp,
                  {{"RegistrationState", 1U},
                   {"OperatorCode", "00101"},
                   {"OperatorName", "Test Net"},
-                  {"PacketServiceState", 1U}}},
+                  {"PacketServiceState", 2U}}},
                 {kSignal,
                  {{"Rate", 0U},
                   {"Gsm", QVariantMap()},
