@@ -1,18 +1,21 @@
 #include "AtModem.h"
+#include "Mmcli.h"
 #include "Polkit.h"
 
 #include "harness/Places.h"
+#include "platform/TelephonyService.h"
+#include "platform/propertylist/PropertyListCodec.h"
 #include "qtplatform/EventLoop.h"
+#include "tools/Tool.h"
+#include "voxd/ReplaySource.h"
 
 #include <QDBusArgument>
 #include <QDBusMessage>
 #include <QDBusObjectPath>
 #include <QDBusPendingCall>
 #include <QDBusVariant>
+#include <QDateTime>
 #include <QElapsedTimer>
-#include <QJsonDocument>
-#include <QJsonObject>
-#include <QProcess>
 #include <QStandardPaths>
 #include <gmock/gmock.h>
 
@@ -45,11 +48,11 @@ protected:
         QDBusConnection::disconnectFromBus("test");
     }
 
-    void start()
+    void start(const QStringList& more = {})
     {
         ASSERT_TRUE(modem.listens());
         startDaemon();
-        start(voxd, "voxd", {"--modem"});
+        start(voxd, "voxd", QStringList{"--modem"} + more);
         ASSERT_TRUE(eventually([&] { return voxd.canReadLine(); }));
         start(display, "kestrum-terminal", {"--text=100000"});
     }
@@ -115,12 +118,9 @@ protected:
             qdbus_cast<QMap<QDBusObjectPath, QMap<QString, QVariantMap>>>(reply.arguments()[0].value<QDBusArgument>());
         return objects.isEmpty() ? QString() : objects.firstKey().path();
     }
-    QJsonObject mmcli(const QStringList& arguments) const
+    static QJsonObject modemByMmcli(const QStringList& arguments)
     {
-        QProcess process;
-        process.start("mmcli", QStringList{"-m", "any", "-J"} + arguments);
-        EXPECT_TRUE(eventually([&] { return process.state() == QProcess::NotRunning; }));
-        return QJsonDocument::fromJson(process.readAllStandardOutput())["modem"].toObject();
+        return mmcli(QStringList{"-m", "any"} + arguments)["modem"].toObject();
     }
 
     /// The latest picture of the display that is complete.
@@ -137,6 +137,17 @@ protected:
     bool shows(const std::string& text)
     {
         return eventually([&] { return shown().find(text) != std::string::npos; }, std::chrono::seconds(60));
+    }
+    /// Does not wait until the picture that has the text is complete.
+    bool prints(const std::string& text)
+    {
+        return eventually(
+            [&] {
+                const bool isComplete = shown().find(text) != std::string::npos;
+                const auto begun = _output.rfind("\nUpdated ");
+                return isComplete || (begun != std::string::npos && _output.find(text, begun) != std::string::npos);
+            },
+            std::chrono::seconds(60));
     }
     int endVoxd()
     {
@@ -165,9 +176,9 @@ TEST_F(ARealModemManager, IsShownWithLevelsThatMoveAndGetsItsSettingsBack)
     ASSERT_TRUE(shows("Measured RSRP: -91.00 dBm")) << shown() << voxd.readAll().toStdString();
     const QElapsedTimer sinceTheChange = started();
     modem.setRsrp(-81);
-    ASSERT_TRUE(shows("Measured RSRP: -81.00 dBm")) << shown();
-    // The picture counts when the next one begins, 2 s later.
+    ASSERT_TRUE(prints("Measured RSRP: -81.00 dBm")) << shown();
     RecordProperty("level_ms", static_cast<int>(sinceTheChange.elapsed()));
+    ASSERT_TRUE(shows("Measured RSRP: -81.00 dBm")) << shown();
     ASSERT_TRUE(shows("Cell Identity: 1712897")) << shown();
     const auto rows = shown();
     for (const char* row :
@@ -178,12 +189,12 @@ TEST_F(ARealModemManager, IsShownWithLevelsThatMoveAndGetsItsSettingsBack)
     EXPECT_THAT(rows, Not(HasSubstr("123456789012345")));
 
     // The daemon's own client sees the same.
-    EXPECT_EQ(mmcli({"--signal-get"})["signal"].toObject()["lte"].toObject()["rsrp"].toString(), "-81.00");
-    const auto seen = mmcli({});
+    EXPECT_EQ(modemByMmcli({"--signal-get"})["signal"].toObject()["lte"].toObject()["rsrp"].toString(), "-81.00");
+    const auto seen = modemByMmcli({});
     EXPECT_EQ(seen["generic"].toObject()["state"].toString(), "registered");
     EXPECT_EQ(seen["3gpp"].toObject()["operator-code"].toString(), "00101");
     EXPECT_THAT(rows, HasSubstr("Operator: " + seen["3gpp"].toObject()["operator-name"].toString().toStdString()));
-    const auto location = mmcli({"--location-get"})["location"].toObject()["3gpp"].toObject();
+    const auto location = modemByMmcli({"--location-get"})["location"].toObject()["3gpp"].toObject();
     EXPECT_EQ(location["cid"].toString().toUInt(nullptr, 16), 1712897U);
 
     const auto sources = property(kService + ".Modem.Location", "Enabled");
@@ -218,8 +229,9 @@ TEST_F(ARealModemManager, AModemThatIsUnpluggedGoesAndComesAgain)
     // For its clients the modem is unplugged: the daemon lets it go, and examines it anew afterwards.
     ASSERT_EQ(call(kManager, kService, "InhibitDevice", {"/virtual/test", true}).type(), QDBusMessage::ReplyMessage);
     const QElapsedTimer sinceTheChange = started();
-    ASSERT_TRUE(shows("No modem")) << shown();
+    ASSERT_TRUE(prints("No modem")) << shown();
     RecordProperty("unplugged_ms", static_cast<int>(sinceTheChange.elapsed()));
+    ASSERT_TRUE(shows("No modem")) << shown();
     EXPECT_THAT(shown(), Not(HasSubstr("RSRP")));
     modem.setRsrp(-85);
     ASSERT_EQ(call(kManager, kService, "InhibitDevice", {"/virtual/test", false}).type(), QDBusMessage::ReplyMessage);
@@ -242,6 +254,78 @@ TEST_F(ARealModemManager, MayDieAndRestart)
     EXPECT_TRUE(shows("Measured RSRP: -85.00 dBm")) << shown();
     EXPECT_EQ(endVoxd(), 0);
     EXPECT_EQ(property(kService + ".Modem.Signal", "Rate"), 0U);
+}
+
+/// A row of kestrum-decode's csv.
+struct CsvRow {
+    QDateTime time;
+    QString path, value;
+};
+
+std::vector<CsvRow> rowsOf(const std::string& capture)
+{
+    const auto decoded = tools::run({"--format", "csv", capture});
+    EXPECT_EQ(decoded.status, 0) << decoded.remarks;
+    std::vector<CsvRow> rows;
+    for (const auto& line : QString::fromStdString(decoded.output).split('\n', Qt::SkipEmptyParts).mid(1)) {
+        const auto fields = line.split(',');
+        rows.push_back({QDateTime::fromString(fields[0], Qt::ISODateWithMs), fields.value(2), fields.value(3)});
+    }
+    return rows;
+}
+
+TEST_F(ARealModemManager, IsRecordedWithTrueTimesAndReplayed)
+{
+    const std::string capture = directory / "modem.kcap";
+    struct SetLevel {
+        QString value;
+        QDateTime set, shown;
+    };
+    std::vector<SetLevel> levels;
+    const auto begin = QDateTime::currentDateTimeUtc();
+    start({"--record", QString::fromStdString(capture)});
+    ASSERT_TRUE(shows("Measured RSRP: -91.00 dBm")) << shown() << voxd.readAll().toStdString();
+    for (const int level : {-81, -71}) {
+        SetLevel each{QString("%1.00 dBm").arg(level), QDateTime::currentDateTimeUtc(), {}};
+        modem.setRsrp(level);
+        ASSERT_TRUE(shows("Measured RSRP: " + each.value.toStdString())) << shown();
+        each.shown = QDateTime::currentDateTimeUtc();
+        levels.push_back(each);
+    }
+    ASSERT_EQ(endVoxd(), 0);
+    const auto end = QDateTime::currentDateTimeUtc();
+
+    const auto rows = rowsOf(capture);
+    ASSERT_FALSE(rows.empty());
+    for (const auto& each : rows) {
+        EXPECT_GT(each.time, begin) << each.path.toStdString();
+        EXPECT_LT(each.time, end) << each.path.toStdString();
+    }
+    // A row's number grows when a row comes before it, and its value is told again under the new path.
+    std::vector<CsvRow> measured;
+    std::ranges::copy_if(rows, std::back_inserter(measured), [](const CsvRow& each) {
+        return each.path.endsWith(";Measured RSRP") && !each.value.isEmpty();
+    });
+    ASSERT_FALSE(measured.empty());
+    EXPECT_EQ(measured.front().value, "-91.00 dBm");
+    EXPECT_EQ(measured.back().value, "-71.00 dBm");
+    for (const auto& level : levels) {
+        const auto first = std::ranges::find(measured, level.value, &CsvRow::value);
+        ASSERT_NE(first, measured.end()) << level.value.toStdString();
+        EXPECT_GE(first->time, level.set);
+        EXPECT_LE(first->time, level.shown);
+    }
+
+    // The replay takes as long as the recording took.
+    PropertyListCodec lists;
+    ReplaySource replay(capture, false, lists);
+    EXPECT_EQ(replay.technology(), kVoxLogChannelTechnology_IFX);
+    std::chrono::microseconds last{};
+    while (const auto message = replay.next())
+        last = message->at;
+    EXPECT_EQ(replay.fault(), "");
+    const std::chrono::milliseconds recorded(rows.front().time.msecsTo(rows.back().time));
+    EXPECT_EQ(last, recorded);
 }
 
 } // namespace
