@@ -27,8 +27,8 @@ constexpr std::array kHelp = {
     HelpLine{"Space", "stand still, live again"},
     HelpLine{", .", "a refresh back, forward"},
     HelpLine{"v", "a list as a table"},
-    HelpLine{"o", "overview, from the first pane"},
-    HelpLine{"Tab r  < >", "table: sort, reverse, columns"},
+    HelpLine{"o", "overview at the start"},
+    HelpLine{"Tab r", "table: sort, reverse"},
     HelpLine{"s", "save, where offered"},
     HelpLine{"Ctrl-L", "redraw"},
     HelpLine{"q", "quit"},
@@ -214,14 +214,21 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
         if (_frozen->hasLater)
             _hints.push_back({L'.', ". on"});
     }
-    if (_delegate.offers(SheetKind::Glance))
-        _hints.push_back({L'v', "v table"});
-    if (_delegate.offers(SheetKind::Overview))
-        _hints.push_back({L'o', "o overview"});
+    const auto sheets = static_cast<std::ptrdiff_t>(_hints.size());
     _hints.push_back({L'?', "? help"});
     _hints.push_back({L'q', "q quit"});
     const int spinning = _pane->isSpinning() ? columns(spinner) + 1 : 0;
     int room = line.width() - 2 * kInset - spinning - columns(_pane->status());
+    // The sheets are named where there is room for all hints: the help has them too.
+    const auto nameSheet = [&](SheetKind kind, wchar_t key, std::string_view text) {
+        int wanted = columns(text) + kGap;
+        for (const auto& each : _hints)
+            wanted += columns(each.text) + kGap;
+        if (wanted <= room && _delegate.offers(kind))
+            _hints.insert(_hints.begin() + sheets, {key, std::string(text)});
+    };
+    nameSheet(SheetKind::Glance, L'v', "v table");
+    nameSheet(SheetKind::Overview, L'o', "o overview");
     std::size_t kept = 0;
     for (; kept < _hints.size() && columns(_hints[kept].text) + kGap <= room; ++kept)
         room -= columns(_hints[kept].text) + kGap;

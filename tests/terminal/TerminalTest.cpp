@@ -924,9 +924,9 @@ TEST_F(TerminalSheets, OverviewOpensFromTheFirstPaneAndCloses)
     expectRow(2, testing::AllOf(HasSubstr("RSSI"), HasSubstr("-53 dBm"), HasSubstr("excellent")));
     expectShown("Neighbor Cells");
     terminal.type("?");
-    expectShown("overview, from the first pane");
+    expectShown("overview at the start");
     terminal.type("?");
-    expectGone("overview, from the first pane");
+    expectGone("overview at the start");
     terminal.click(0, 3);
     expectTitle("Kestrum");
     expectChosen("Serving Cell");
