@@ -95,6 +95,39 @@ TEST_F(ModemManagerTest, LeavesSettingsAloneThatServeAlready)
     EXPECT_EQ(daemon->calls("Setup"), 0U);
 }
 
+TEST_F(ModemManagerTest, LeavesItAsItIsWhetherTheDaemonTellsEveryoneThePosition)
+{
+    auto interfaces = Fake::modem("abcd");
+    interfaces[Fake::kLocation]["SignalsLocation"] = true;
+    const auto path = daemon->plugIn(interfaces);
+    client.setMeasuring(true);
+    ASSERT_TRUE(measures(path));
+    EXPECT_TRUE(daemon->objects[path][Fake::kLocation]["SignalsLocation"].toBool());
+    client.setMeasuring(false);
+    ASSERT_TRUE(eventually([&] { return client.isAtRest() && daemon->sources(path) == 0; }));
+    EXPECT_TRUE(daemon->objects[path][Fake::kLocation]["SignalsLocation"].toBool());
+}
+
+TEST_F(ModemManagerTest, APropertyThatIsInvalidatedIsUnknown)
+{
+    const auto path = daemon->plugIn(Fake::modem("abcd"));
+    ASSERT_TRUE(eventually([&] { return modem().operatorName == "Test Net"; }));
+    daemon->emitSignal(path, "org.freedesktop.DBus.Properties", "PropertiesChanged",
+                       {Fake::kModem3gpp, QVariantMap(), QStringList{"OperatorName"}});
+    EXPECT_TRUE(eventually([&] { return modem().operatorName.empty(); }));
+    EXPECT_EQ(modem().operatorCode, "00101");
+}
+
+TEST_F(ModemManagerTest, TakesNoChangeOfAnotherModem)
+{
+    daemon->plugIn(Fake::modem("abcd"));
+    const auto second = daemon->plugIn(Fake::modem("efgh"));
+    ASSERT_TRUE(eventually([&] { return client.states().otherModems == 1; }));
+    daemon->set(second, Fake::kModem, {{"Model", "Other"}});
+    settle();
+    EXPECT_EQ(modem().model, "Fake");
+}
+
 TEST_F(ModemManagerTest, DoesNotPutBackWhatAnotherProgramHasChanged)
 {
     const auto path = daemon->plugIn(Fake::modem("abcd"));
