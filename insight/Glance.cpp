@@ -123,7 +123,8 @@ void Glance::readServing(const KestrumModelNode& root)
         const auto* text = entry ? leafText(*serving->node, entry->key) : nullptr;
         if (text == nullptr || text->empty())
             continue;
-        cell = column.shown.hasBars ? gradedCell(entry, *text, *_thresholds) : SheetCell{shortened(*text)};
+        cell = column.shown.hasBars ? gradedCell(entry, *text, *_thresholds, leafText(*serving->node, kTechnologyKey))
+                                    : SheetCell{shortened(*text)};
         if (std::string_view unit; measured(cell.text, unit) && !unit.empty() && unit == column.shown.unit)
             removeUnit(cell.text, column.shown.unit);
         hasText = hasText || !column.shown.isIdentity;

@@ -205,7 +205,8 @@ std::optional<double> measured(std::string_view text, std::string_view& unit)
     return found->number;
 }
 
-SheetCell gradedCell(const KeyEntry* entry, std::string_view text, const Thresholds& thresholds)
+SheetCell gradedCell(const KeyEntry* entry, std::string_view text, const Thresholds& thresholds,
+                     const std::string* technology)
 {
     SheetCell cell{.text = shortened(text)};
     if (entry == nullptr || entry->kind == Kind::Identity)
@@ -215,7 +216,10 @@ SheetCell gradedCell(const KeyEntry* entry, std::string_view text, const Thresho
         const auto [least, greatest] = *entry->in.scale;
         cell.bar = std::clamp((*number - least) / (greatest - least), 0.0, 1.0);
     }
-    if (const auto verdict = verdictOf(*entry, value, nullptr, thresholds))
+    Dictionary beside;
+    if (technology != nullptr)
+        beside.setText(kTechnologyKey, *technology);
+    if (const auto verdict = verdictOf(*entry, value, &beside, thresholds))
         cell.word = word(verdict->grade);
     return cell;
 }
@@ -289,6 +293,7 @@ ListTable readList(std::string_view technology, std::string_view path, const Kes
             row.cells.erase(row.cells.begin());
     }
 
+    const auto technologies = std::ranges::find(table.columns, kTechnologyKey, &ListTable::Column::key);
     for (std::size_t i = 0; i < table.columns.size(); ++i) {
         auto& [key, entry, shown] = table.columns[i];
         shown.isIdentity = entry == nullptr ? i == 0 && !identified : entry->inRow == InRow::Identity;
@@ -302,7 +307,11 @@ ListTable readList(std::string_view technology, std::string_view path, const Kes
             if (!cell.number)
                 cell.number = measured(cell.shown.text, unit);
             if (shown.hasBars)
-                cell.shown = gradedCell(entry, cell.shown.text, thresholds);
+                cell.shown = gradedCell(
+                    entry, cell.shown.text, thresholds,
+                    technologies != table.columns.end()
+                        ? &row.cells[static_cast<std::size_t>(technologies - table.columns.begin())].shown.text
+                        : nullptr);
             shown.isNumeric = shown.isNumeric || cell.number;
         }
     }

@@ -46,7 +46,12 @@ ListTable readList(std::string_view technology, std::string_view path, const Kes
 std::optional<double> measured(std::string_view text, std::string_view& unit);
 
 /// A value as a sheet shows it: with its place on the scale of its key, and its grade. Without an entry the text only.
-SheetCell gradedCell(const KeyEntry* entry, std::string_view text, const Thresholds& thresholds);
+/// `technology` is the text "Technology" beside the value, null where there is none: it tells what a level means.
+SheetCell gradedCell(const KeyEntry* entry, std::string_view text, const Thresholds& thresholds,
+                     const std::string* technology = nullptr);
+
+/// The key that tells the technology of a cell, where cells of several stand in one tree.
+inline constexpr std::string_view kTechnologyKey = "Technology";
 
 /// Takes the unit, and the blank before it, from the end of the text.
 void removeUnit(std::string& text, std::string_view unit);

@@ -143,7 +143,7 @@ std::vector<SheetPart> Overview::update(const KestrumModelNode& root)
             if (text == nullptr || text->empty())
                 continue;
             const auto* entry = keyEntry(_technology, name, key);
-            auto cell = gradedCell(entry, *text, *_thresholds);
+            auto cell = gradedCell(entry, *text, *_thresholds, leafText(*section->node, kTechnologyKey));
             if (entry == nullptr || !isLevel(*entry))
                 cell.bar.reset();
             part.facts.push_back({std::string(entry != nullptr ? entry->heading : key), std::move(cell)});

@@ -94,6 +94,17 @@ TEST_F(GlanceTest, ShowsLevelsWithTheirPlaceOnTheScaleAndTheirGrade)
     EXPECT_EQ(rows.at(2).cells.at(3).bar, std::nullopt) << "one bar in a row";
 }
 
+TEST_F(GlanceTest, DoesNotGradeTheLevelOfAnotherTechnologyAsOneOfGsm)
+{
+    const auto cell = [](const char* technology) {
+        return makeDictionary({{"Technology", technology}, {"RSSI", "-60 dBm"}});
+    };
+    ASSERT_TRUE(glance.update(*display({cell("GSM"), cell("UMTS")})));
+    const auto rows = glance.part().table.rows;
+    EXPECT_EQ(rows.at(1).cells.at(1).word, "excellent");
+    EXPECT_EQ(rows.at(2).cells.at(1).word, "");
+}
+
 TEST_F(GlanceTest, KeepsTheUnitInTheCellsWhereRowsDiffer)
 {
     ASSERT_TRUE(glance.update(*display({neighbour("38", "54", "-76 dBm"), neighbour("1", "2", "-4 dB")})));
