@@ -19,7 +19,8 @@ constexpr int kEscapeDelay = 25; // ms; the rest of a key's sequence must follow
 // The replacement of the program's marks on a terminal without Unicode; '?' for all other characters.
 wchar_t asciiFor(wchar_t c)
 {
-    constexpr std::wstring_view kMarks = L"›…✓─│╭╮╰╯⠋⠙⠹⠸⠼⠴⠦⠧⠇⠏↑↓·█▉▊▋▌▍▎▏", kAscii = L">~*-|++++|/-\\|/-\\|/^v.#####---";
+    constexpr std::wstring_view kMarks = L"›…✓─│╭╮╰╯⠋⠙⠹⠸⠼⠴⠦⠧⠇⠏↑↓·█▉▊▋▌▍▎▏",
+                                kAscii = L">~*-|++++|/-\\|/-\\|/^v.#####---";
     static_assert(kMarks.size() == kAscii.size());
     const auto found = kMarks.find(c);
     return found == kMarks.npos ? L'?' : kAscii[found];
