@@ -67,7 +67,7 @@ struct CellLevel {
 struct ServingCellTable {
     std::string_view radio; ///< "LTE", "UMTS"
     std::span<const CellPart> identity;
-    std::size_t decisive; ///< so many parts alone tell two cells apart, where all of them are known
+    std::size_t decisive; ///< this many parts alone tell two cells apart, where all of them are known
     /// The records of this code come only while this radio access serves, and no other of the technology then does. 0:
     /// it always serves.
     LogCode campedBy = 0;

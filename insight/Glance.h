@@ -29,7 +29,7 @@ public:
     void sortBy(std::size_t column);
 
     const std::string& title() const { return _title; }
-    /// The list now: at most so many rows, and columns.
+    /// The list now: at most this many rows and columns.
     SheetPart part(std::size_t rows = SIZE_MAX, std::size_t columns = SIZE_MAX) const;
 
 private:

@@ -168,7 +168,7 @@ void Moments::displayMade(const Dictionary& entry)
 {
     const Moment* before = _moments.empty() ? nullptr : &_moments.back();
     auto copy = changedContainer(entry, before ? before->entry.get() : nullptr);
-    // Each moment has an entry of its own: its raw records may be dropped alone.
+    // Each moment has a separate entry, so that its raw records can be dropped alone.
     Moment moment{++_made, _clock.now(), copy ? copy->dictionary() : copyOf(*before->entry)};
     _bytes += bytesOf(moment, before);
     _moments.push_back(std::move(moment));
@@ -220,7 +220,7 @@ bool Moments::dropOldestRawRecords()
     _withoutRaw = next->number;
     if (const Value* raw = next->entry->find(StateKey::kDisplayState); raw && raw->data()) {
         _bytes -= raw->data()->size();
-        // A new entry: whoever holds this moment keeps its records.
+        // A new entry: a caller that holds this moment keeps its records.
         next->entry = copyOf(*next->entry);
         next->entry->set(StateKey::kDisplayState, Data());
     }

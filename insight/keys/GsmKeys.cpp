@@ -111,7 +111,7 @@ constexpr KeyEntry kGsmRrInfo[] = {
      "call this word of the record holds C2.",
      fromRxQual},
     {"DTX Used", "DTX", State, kPlain, "3GPP TS 45.008, 8.3",
-     "Whether the transmitter pauses when nobody speaks (discontinuous transmission)."},
+     "Whether the transmitter pauses in the silences of speech (discontinuous transmission)."},
     {"DRX Used", "DRX", Time, {"sec"}, "3GPP TS 44.060, 5.5.1.5",
      "For how long after a transfer the phone listens to all blocks of its channel, before it sleeps between pages. It is "
      "the record's number, shown in seconds."},
@@ -182,7 +182,7 @@ constexpr KeyEntry kMobileAllocation[] = {
 
 constexpr KeyEntry kUmtsRrInfo[] = {
     {"RRC State", "RRC", State, kPlain, "3GPP TS 25.331, 7",
-     "The state of the radio connection. In CELL_DCH the phone has a channel of its own, in CELL_FACH it shares one, in "
+     "The state of the radio connection. In CELL_DCH the phone has a dedicated channel, in CELL_FACH it shares one, in "
      "CELL_PCH and URA_PCH it only listens to paging. \"Disconnected\" is idle mode."},
     {"Scrambling Code", "PSC", Identity, kPlain, "3GPP TS 25.213, 5.2.2",
      "The primary scrambling code of the cell, 0 to 511. Nearby cells on the same channel differ by it.",

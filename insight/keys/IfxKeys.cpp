@@ -243,7 +243,7 @@ constexpr KeyEntry kRadioResource[] = {
 
 constexpr KeyEntry kStatus[] = {
     {"State", "State", State, kPlain, "3GPP TS 44.018, 3",
-     "Dedicated: the phone has a channel of its own. Idle: it listens to broadcasts and pages."},
+     "Dedicated: the phone has a dedicated channel. Idle: it listens to broadcasts and pages."},
     {"Channel", "Channel", State, kPlain, "3GPP TS 45.002, 3",
      "The kind of channel: BCCH/CCCH in idle mode, SDCCH for signalling, TCH/F for a call."},
     {"RxQual", "RxQual", Number, kRxQual, "3GPP TS 45.008, 8.2",

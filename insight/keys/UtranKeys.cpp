@@ -8,7 +8,7 @@ namespace {
 // clang-format off
 constexpr KeyEntry kRrcInfo[] = {
     {"State", "RRC", State, kPlain, "3GPP TS 25.331, 7",
-     "The state of the radio connection. In CELL_DCH the phone has a channel of its own, in CELL_FACH it shares one, in "
+     "The state of the radio connection. In CELL_DCH the phone has a dedicated channel, in CELL_FACH it shares one, in "
      "CELL_PCH and URA_PCH it only listens to paging. \"Disconnected\" is idle mode."},
 };
 

@@ -101,7 +101,7 @@ TEST_F(MmcliTest, FindsTheSameLocation)
     EXPECT_EQ(modem().location->ci, number("cid"));
 }
 
-// mmcli prints each cell as a text, and the cells in an order of its own.
+// mmcli prints each cell as a text, and the cells in another order.
 TEST_F(MmcliTest, SeesTheSameCells)
 {
     path = daemon->plugIn(Fake::modem("abcd"));
