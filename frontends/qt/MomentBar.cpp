@@ -12,7 +12,7 @@
 
 namespace kestrum::qt {
 
-MomentBar::MomentBar(std::function<void(Look)> look, QWidget* parent)
+MomentBar::MomentBar(const std::function<void(Look)>& look, QWidget* parent)
     : QWidget(parent),
       _earlier(Button::Kind::Plain, QStringLiteral("Earlier"), this),
       _live(Button::Kind::Filled, QStringLiteral("Live"), this),

@@ -13,7 +13,7 @@ namespace kestrum::qt {
 /// The bar over the toolbar while the panes stand still: to other moments, and back to the modem.
 class MomentBar final : public QWidget {
 public:
-    MomentBar(std::function<void(Look)> look, QWidget* parent);
+    MomentBar(const std::function<void(Look)>& look, QWidget* parent);
 
     /// Hidden without a moment. A screen reader is told each new one.
     void setMoment(const std::optional<FrozenMoment>& moment);
