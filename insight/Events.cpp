@@ -163,8 +163,8 @@ void EventFinder::connected(bool isConnected, std::optional<Date> at)
     if (std::exchange(_isConnected, isConnected) == isConnected)
         return;
     _now = at;
-    note(EventKind::Connection, "log channel", std::string(isConnected ? kLostText : kConnectedText),
-         std::string(isConnected ? kConnectedText : kLostText));
+    note(EventKind::Connection, "log channel", isConnected ? kLostText : kConnectedText,
+         isConnected ? kConnectedText : kLostText);
 }
 
 const Cells& EventFinder::cells()
@@ -183,7 +183,7 @@ void EventFinder::silent()
         return;
     _stamp = 0; // the next message is no quiet one
     _now = _time;
-    note(EventKind::Silence, "log", std::string(kStreaming), std::string(kSilent));
+    note(EventKind::Silence, "log", kStreaming, kSilent);
 }
 
 void EventFinder::pass(Date time)
@@ -199,12 +199,12 @@ void EventFinder::pass(Date time)
         return;
     if (!std::exchange(_isSilent, false)) {
         _now = before;
-        note(EventKind::Silence, "log", std::string(kStreaming), std::string(kSilent));
+        note(EventKind::Silence, "log", kStreaming, kSilent);
         _now = time;
     }
     if (isClockSet)
-        return note(EventKind::Silence, "log", std::string(kSilent), std::string(kStreaming));
-    note(EventKind::Silence, "log", formatted("silent for %@", secondsText(time - *before)), std::string(kStreaming));
+        return note(EventKind::Silence, "log", kSilent, kStreaming);
+    note(EventKind::Silence, "log", formatted("silent for %@", secondsText(time - *before)), kStreaming);
 }
 
 void EventFinder::adopt(const Value& display, std::string_view technology)
@@ -325,23 +325,23 @@ void EventFinder::camp(Serving& now)
     if (_camped != nullptr) {
         kind = isConnected(*_camped) ? EventKind::Handover : EventKind::Reselection;
         was = _camped->text();
-        note(EventKind::Technology, "radio access", std::string(_camped->table->radio), std::string(now.table->radio));
+        note(EventKind::Technology, "radio access", _camped->table->radio, now.table->radio);
         leave(*_camped);
     }
     _camped = &now;
     for (auto& place : now.identity)
         place.look();
-    begin(now, kind, std::move(was));
+    begin(now, kind, was);
 }
 
-void EventFinder::begin(Serving& serving, EventKind kind, std::string was)
+void EventFinder::begin(Serving& serving, EventKind kind, std::string_view was)
 {
     for (std::size_t i = 0; i < serving.known.size(); ++i)
         serving.known[i] = serving.identity[i].text();
-    auto is = serving.text();
+    const auto is = serving.text();
     if (is.empty())
         return;
-    note(kind, serving.table->radio, std::move(was), is);
+    note(kind, serving.table->radio, was, is);
     std::string key;
     const auto decisive = serving.known.begin() + static_cast<std::ptrdiff_t>(serving.table->decisive);
     const bool isDecided = std::find(serving.known.begin(), decisive, std::string()) == decisive;
@@ -368,9 +368,9 @@ void EventFinder::compare(Serving& serving)
         return;
     }
     const auto kind = isConnected(serving) ? EventKind::Handover : EventKind::Reselection;
-    auto was = serving.text();
+    const auto was = serving.text();
     leave(serving);
-    begin(serving, kind, std::move(was));
+    begin(serving, kind, was);
 }
 
 void EventFinder::leave(Serving& serving)
@@ -390,7 +390,7 @@ bool EventFinder::isConnected(const Serving& serving) const
 void EventFinder::imply(const StateName& state)
 {
     if (_implied != nullptr)
-        note(EventKind::RrcState, "RRC state", std::string(_implied->text), std::string(state.text));
+        note(EventKind::RrcState, "RRC state", _implied->text, state.text);
     _implied = &state;
 }
 
@@ -404,9 +404,9 @@ void EventFinder::compare(Followed& followed, bool isChange)
     }
     if (followed.value->wordOf != nullptr)
         now = followed.value->wordOf(now);
-    auto before = std::exchange(followed.shown, now);
+    const auto before = std::exchange(followed.shown, now);
     if (isChange && before != now)
-        note(followed.value->kind, followed.value->name, std::move(before), std::move(now));
+        note(followed.value->kind, followed.value->name, before, now);
 }
 
 void EventFinder::sample(const Reach& reach)
@@ -461,7 +461,7 @@ std::string EventFinder::levelsNow() const
     return shortened(all, kLongestText);
 }
 
-void EventFinder::note(EventKind kind, std::string_view name, std::string was, std::string is)
+void EventFinder::note(EventKind kind, std::string_view name, std::string_view was, std::string_view is)
 {
     _events.add({_now, kind, name, shortened(was, kLongestText), shortened(is, kLongestText), levelsNow()});
 }

@@ -141,7 +141,7 @@ private:
     void pass(Date time);
     void camp(Serving& now);
     void imply(const StateName& state);
-    void begin(Serving& serving, EventKind kind, std::string was);
+    void begin(Serving& serving, EventKind kind, std::string_view was);
     void compare(Serving& serving);
     void compare(Followed& followed, bool isChange);
     /// Whether nothing but levels can have changed.
@@ -156,7 +156,7 @@ private:
     void leave(Serving& serving);
     bool isConnected(const Serving& serving) const;
     std::string levelsNow() const;
-    void note(EventKind kind, std::string_view name, std::string was, std::string is);
+    void note(EventKind kind, std::string_view name, std::string_view was, std::string_view is);
 
     const EventTable* _table = nullptr;
     SectionRef _display;

@@ -130,7 +130,7 @@ std::size_t bytesOfKeys(const Dictionary& dictionary)
     std::size_t bytes = 0;
     const bool indexed = dictionary.size() > kIndexFrom;
     for (const auto& [key, value] : dictionary)
-        bytes += sizeof key + bytesOf(key) + (indexed ? kIndexEntry + kBlock + bytesOf(key) : 0);
+        bytes += sizeof(std::string) + bytesOf(key) + (indexed ? kIndexEntry + kBlock + bytesOf(key) : 0);
     return bytes;
 }
 

@@ -88,7 +88,7 @@ QSize LevelBar::sizeHint() const
 void LevelBar::paintEvent(QPaintEvent*)
 {
     QPainter painter(this);
-    fillBar(painter, *this, QRectF(0, (height() - kBarThickness) / 2, width(), kBarThickness), _part);
+    fillBar(painter, *this, QRect(0, (height() - kBarThickness) / 2, width(), kBarThickness), _part);
 }
 
 SheetTableView::SheetTableView(QWidget* parent) : QTableWidget(parent)
@@ -335,10 +335,9 @@ void SheetView::keyPressEvent(QKeyEvent* event)
 {
     const int key = event->key();
     const bool alt = event->modifiers() == Qt::AltModifier;
-    if (event->isAutoRepeat())
-        event->ignore();
-    else if (key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back || (alt && key == Qt::Key_Left) ||
-             event->text() == u"v" || event->text() == u"o")
+    const bool leaves = key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back ||
+                        (alt && key == Qt::Key_Left) || event->text() == u"v" || event->text() == u"o";
+    if (leaves && !event->isAutoRepeat())
         leave();
     else if (key == Qt::Key_Down || key == Qt::Key_PageDown)
         scroll(key == Qt::Key_Down ? QAbstractSlider::SliderSingleStepAdd : QAbstractSlider::SliderPageStepAdd);
