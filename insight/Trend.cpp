@@ -62,7 +62,7 @@ std::string shortText(double number)
     return text == "-0" ? "0" : text;
 }
 
-std::string withUnit(std::string text, std::string_view unit)
+std::string withUnit(const std::string& text, std::string_view unit)
 {
     return unit.empty() ? text : formatted("%@ %@", text, unit);
 }

@@ -129,9 +129,10 @@ std::vector<Carrier> carriersOfUplinkUarfcn(std::int64_t number)
 
 std::vector<Carrier> carriersOfTddUarfcn(std::int64_t number)
 {
+    constexpr std::int64_t kPerMegahertz = 5;
     std::vector<Carrier> found;
     for (const auto& band : kTddBands)
-        if (5 * band.low < number && number < 5 * band.high)
+        if (kPerMegahertz * band.low < number && number < kPerMegahertz * band.high)
             found.push_back({band.name, static_cast<double>(number) / 5, static_cast<double>(number) / 5});
     return found;
 }
