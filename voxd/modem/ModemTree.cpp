@@ -212,7 +212,7 @@ std::string registrationName(ModemRegistration registration)
 
 std::string packetServiceName(PacketService service)
 {
-    static constexpr std::string_view kNames[] = {"Unknown", "Attached", "Detached"};
+    static constexpr std::string_view kNames[] = {"Unknown", "Detached", "Attached"};
     return nameOf(service, kNames);
 }
 
