@@ -50,7 +50,8 @@ void BusCalls::tick()
     Calls late;
     for (auto each = _calls.begin(); each != _calls.end();) {
         const auto call = each++;
-        if ((call->left -= std::chrono::seconds(1)) > std::chrono::seconds(0))
+        call->left -= std::chrono::seconds(1);
+        if (call->left > std::chrono::seconds(0))
             continue;
         call->watcher.reset();
         late.splice(late.end(), _calls, call);

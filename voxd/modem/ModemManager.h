@@ -50,13 +50,12 @@ public:
     /// Stops measuring. Calls `done` once: as soon as the settings are put back, which may be now, or after `limit`.
     void end(std::chrono::seconds limit, std::function<void()> done);
 
-private Q_SLOTS:
-    void objectsAdded(const QDBusMessage& signal);
-    void objectsRemoved(const QDBusMessage& signal);
-    void propertiesChanged(const QDBusMessage& signal);
-
 private:
     using Modems = std::map<QString, std::unique_ptr<WatchedModem>>; ///< by path
+
+    Q_SLOT void objectsAdded(const QDBusMessage& signal);
+    Q_SLOT void objectsRemoved(const QDBusMessage& signal);
+    Q_SLOT void propertiesChanged(const QDBusMessage& signal);
 
     void connectBus();
     void disconnectBus();

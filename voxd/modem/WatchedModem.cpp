@@ -295,7 +295,9 @@ void WatchedModem::tick()
 {
     _now += 1s;
     _calls.tick();
-    if (_cellsAwaited && (*_cellsAwaited += 1s) == kCellsLimit) {
+    if (_cellsAwaited)
+        *_cellsAwaited += 1s;
+    if (_cellsAwaited == kCellsLimit) {
         _state.cells.clear();
         refuse({ModemService::CellInformation, RefusalReason::NoAnswer, {}});
     }
