@@ -2,6 +2,7 @@
 
 #include "insight/Explanation.h"
 #include "insight/NumberIn.h"
+#include "insight/WatchedPlace.h"
 
 #include <algorithm>
 #include <map>
@@ -13,7 +14,7 @@ namespace {
 constexpr std::size_t kMostRows = 500;
 constexpr std::size_t kMostUnknownColumns = 48; // keys that the key table does not have
 constexpr std::size_t kMostValues = 20'000;     // leaves that are looked at
-constexpr std::size_t kLongestText = 200;       // bytes
+constexpr std::size_t kLongestCell = 200;       // bytes
 constexpr std::size_t kLongestUnit = 8;
 constexpr std::size_t kMostSections = 500, kDeepestSection = 6;
 
@@ -186,12 +187,7 @@ bool hasNumberedRows(const KestrumModelNode& node)
 
 std::string shortened(std::string_view text)
 {
-    if (text.size() <= kLongestText)
-        return std::string(text);
-    std::size_t end = kLongestText;
-    while (end > 0 && (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80)
-        --end;
-    return std::string(text.substr(0, end)) + "…";
+    return shortened(text, kLongestCell);
 }
 
 std::optional<double> measured(std::string_view text, std::string_view& unit)

@@ -35,10 +35,7 @@ std::string shortened(std::string_view text, std::size_t most)
 {
     if (text.size() <= most)
         return std::string(text);
-    std::size_t end = 0;
-    for (std::size_t at = 0; at <= most; nextCharacter(text, at))
-        end = at;
-    return std::string(text.substr(0, end)) + "…";
+    return std::string(beginOf(text, most)) + "…";
 }
 
 WatchedPlace::WatchedPlace(const Place& place) : _code(place.code)

@@ -24,6 +24,18 @@ std::optional<char32_t> nextCharacter(std::string_view text, std::size_t& at)
     return character;
 }
 
+std::string_view beginOf(std::string_view text, std::size_t most)
+{
+    constexpr std::size_t kLongestCharacter = 4;
+    if (text.size() <= most)
+        return text;
+    const auto continues = [&](std::size_t at) { return (static_cast<unsigned char>(text[at]) & 0xC0) == 0x80; };
+    for (std::size_t back = 0; back < kLongestCharacter && back <= most; ++back)
+        if (!continues(most - back))
+            return text.substr(0, most - back);
+    return text.substr(0, most);
+}
+
 void appendUtf8(std::string& text, char32_t character)
 {
     const auto append = [&](char32_t byte) { text += static_cast<char>(byte); };

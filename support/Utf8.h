@@ -12,6 +12,10 @@ namespace kestrum {
 /// not valid.
 std::optional<char32_t> nextCharacter(std::string_view text, std::size_t& at);
 
+/// The beginning of a UTF-8 text, of at most `most` bytes, that ends between two characters. A text that is not UTF-8 is
+/// cut after `most` bytes.
+std::string_view beginOf(std::string_view text, std::size_t most);
+
 /// Appends a character. It is at most U+10FFFF and not a surrogate.
 void appendUtf8(std::string& text, char32_t character);
 

@@ -2,6 +2,7 @@
 
 #include "platform/posix/SyslogSocket.h"
 #include "support/Format.h"
+#include "support/Utf8.h"
 
 #include <algorithm>
 #include <array>
@@ -23,17 +24,12 @@ int levelOf(Priority priority)
     return priority == Priority::Raw16 ? LOG_NOTICE : static_cast<int>(priority);
 }
 
-// Cuts between two UTF-8 characters.
 std::string lineOf(std::string_view text)
 {
     constexpr std::string_view kEllipsis = "\u2026";
     if (text.size() <= LinuxSystemLog::kLongestLine)
         return std::string(text);
-    auto end = LinuxSystemLog::kLongestLine - kEllipsis.size();
-    const auto continues = [&] { return (static_cast<unsigned char>(text[end]) & 0xC0) == 0x80; };
-    for (int i = 0; i < 3 && continues(); ++i)
-        --end;
-    return std::string(text.substr(0, end)).append(kEllipsis);
+    return std::string(beginOf(text, LinuxSystemLog::kLongestLine - kEllipsis.size())).append(kEllipsis);
 }
 
 struct Line {

@@ -100,7 +100,7 @@ TEST(LinuxSystemLog, CutsLongLinesBetweenCharactersAndMarksThem)
     EXPECT_EQ(sink.state->lines[0].second, longest);
     EXPECT_EQ(sink.state->lines[1].second, std::string(8189, 'x') + "\u2026");
     EXPECT_EQ(sink.state->lines[2].second, euros.substr(0, 8187) + "\u2026");
-    EXPECT_EQ(sink.state->lines[3].second, std::string(8186, '\x80') + "\u2026");
+    EXPECT_EQ(sink.state->lines[3].second, std::string(8189, '\x80') + "\u2026");
 }
 
 TEST(LinuxSystemLog, NeverWaitsForADaemonThatHangsAndCountsWhatIsLost)

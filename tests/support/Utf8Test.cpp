@@ -37,5 +37,14 @@ TEST(Utf8, InvalidSequencesAreLeftByteByByte)
     }
 }
 
+TEST(Utf8, BeginEndsBetweenCharacters)
+{
+    const std::string text = "a\xC3\xA9\xF0\x9F\x98\x80z"; // of 1, 2, 4 and 1 bytes
+    const std::size_t kept[] = {0, 1, 1, 3, 3, 3, 3, 7, 8, 8};
+    for (std::size_t most = 0; most < std::size(kept); ++most)
+        EXPECT_EQ(beginOf(text, most), text.substr(0, kept[most])) << most;
+    EXPECT_EQ(beginOf("\x80\x80\x80\x80\x80\x80", 5).size(), 5u) << "which is not UTF-8";
+}
+
 } // namespace
 } // namespace kestrum

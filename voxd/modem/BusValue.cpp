@@ -1,5 +1,7 @@
 #include "voxd/modem/BusValue.h"
 
+#include "support/Utf8.h"
+
 #include <QMetaType>
 
 #include <cfloat>
@@ -12,11 +14,6 @@ namespace {
 
 // No level of a modem is greater: a greater number is a mistake or a mark for "unknown".
 constexpr double kGreatestLevel = 1000;
-
-bool isContinuation(char c)
-{
-    return (static_cast<unsigned char>(c) & 0xC0U) == 0x80U;
-}
 
 bool isWhole(const QVariant& value)
 {
@@ -78,14 +75,7 @@ std::optional<QDBusArgument> argumentFrom(const QVariant& value, std::string_vie
 
 std::string textFrom(const QString& text)
 {
-    std::string bytes = text.left(kLongestBusText).toStdString();
-    if (bytes.size() > kLongestBusText) {
-        std::size_t end = kLongestBusText;
-        while (isContinuation(bytes[end]))
-            --end;
-        bytes.resize(end);
-    }
-    return bytes;
+    return std::string(beginOf(text.left(kLongestBusText).toStdString(), kLongestBusText));
 }
 
 std::string textFrom(const QVariant& value)
