@@ -1,5 +1,7 @@
 #pragma once
 
+#include <array>
+#include <cstddef>
 #include <memory>
 #include <optional>
 #include <string>
@@ -24,7 +26,32 @@ enum class Look {
 enum class SheetKind {
     Glance,   ///< the shown list as a table
     Overview, ///< the whole display in one look
+    Trend,    ///< how the value of a row has been
+    Meaning,  ///< what the key of a row means, and how good its value is
+    Events,   ///< what happened
+    Cells,    ///< the cells that have served
 };
+
+/// How the user opens a sheet.
+struct SheetCommand {
+    SheetKind kind;
+    char key;
+    std::string_view name;  ///< in a menu
+    std::string_view brief; ///< beside the key
+    bool isOfRow;           ///< of a row of the pane, not of the pane
+};
+
+inline constexpr std::array kSheetCommands = {
+    SheetCommand{SheetKind::Glance, 'v', "Show as table", "table", false},
+    SheetCommand{SheetKind::Overview, 'o', "Overview", "overview", false},
+    SheetCommand{SheetKind::Trend, 't', "Trend", "trend", true},
+    SheetCommand{SheetKind::Meaning, 'i', "What it means", "meaning", true},
+    SheetCommand{SheetKind::Events, 'e', "Events", "events", false},
+    SheetCommand{SheetKind::Cells, 'c', "Cells", "cells", false},
+};
+
+/// The key with which the user keeps the last 15 minutes as files.
+inline constexpr char kKeepKey = 'K';
 
 /// What a navigation view reports.
 class NavigationViewDelegate {
@@ -32,10 +59,12 @@ public:
     virtual ~NavigationViewDelegate() = default;
     /// The user wants the pane before this one: the back button, Escape, a swipe.
     virtual void backRequested() = 0;
-    /// Whether the shown pane has that sheet.
-    virtual bool offers(SheetKind) const { return false; }
-    virtual void sheetRequested(SheetKind) {}
+    /// Whether the shown pane has that sheet. A trend and a meaning are of a row of its table.
+    virtual bool offers(SheetKind kind, std::optional<std::size_t> row) const = 0;
+    virtual void sheetRequested(SheetKind kind, std::optional<std::size_t> row) = 0;
     virtual void lookRequested(Look look) = 0;
+    /// The user wants the last 15 minutes as files.
+    virtual void keepRequested() = 0;
 };
 
 /// The moment at which the panes stand still.

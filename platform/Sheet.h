@@ -60,10 +60,56 @@ struct SheetFact {
     friend bool operator==(const SheetFact&, const SheetFact&) = default;
 };
 
-/// Facts, and a table under them.
+/// How a value has been, over time. Places are 0 at the left end of the time axis and 1 at the right end, and never
+/// decrease.
+struct SheetPlot {
+    /// A number, or several of one place: equal, unless the point stands for a longer time. Not numbers: a gap, in
+    /// which no line is drawn.
+    struct Point {
+        double at, least, mean, greatest;
+        friend bool operator==(const Point&, const Point&) = default;
+    };
+    /// A state, from one place to another: part of a strip.
+    struct Span {
+        double from, to;
+        std::string text;
+        friend bool operator==(const Span&, const Span&) = default;
+    };
+    /// A moment at which something changed.
+    struct Mark {
+        double at;
+        std::string text; ///< what it changed to; empty for a change of the serving cell
+        friend bool operator==(const Mark&, const Mark&) = default;
+    };
+    /// The numbers from `least` up to the next band's, and their word.
+    struct Band {
+        double least;
+        std::string word;
+        friend bool operator==(const Band&, const Band&) = default;
+    };
+
+    std::vector<Point> points = {}; ///< of a number; at most 1,440
+    std::vector<Span> spans = {};   ///< of a name, instead of points
+    std::vector<Mark> marks = {};
+    double bottom = 0, top = 1;             ///< the ends of the axis; points beyond them stand at the ends
+    std::vector<Band> bands = {};           ///< the worst word first or last: in order of `least`
+    std::vector<std::string> numbers = {};  ///< beside the axis: at its bottom, its middle and its top, with the unit
+    std::vector<std::string> times = {};    ///< under it: at its left end, its middle and its right end
+    std::vector<std::string> ranges = {};   ///< the times that the user may choose: "15 min", "1 h", "1 day"
+    std::size_t range = 0;                  ///< the chosen one
+    std::optional<std::size_t> cursor = {}; ///< a point, or a span; nothing: the newest
+    std::string reading = {};               ///< moment and value at the cursor
+    std::string sentence = {};              ///< the plot for a screen reader
+
+    friend bool operator==(const SheetPlot&, const SheetPlot&) = default;
+};
+
+/// Lines of text, facts, a plot, and a table under them. Each may be missing.
 struct SheetPart {
     std::string caption = {};
+    std::vector<std::string> lines = {}; ///< each may be longer than the screen is wide
     std::vector<SheetFact> facts = {};
+    std::optional<SheetPlot> plot = {};
     SheetTable table = {};
     std::string note = {}; ///< about the table; empty for none
 
@@ -88,6 +134,10 @@ public:
     virtual void sheetLeft() = 0;
     /// The user chose a column for the order of the rows; again: the reverse order.
     virtual void columnChosen(std::size_t column) = 0;
+    /// The user moved the plot's cursor to a point or a span; nothing: away.
+    virtual void cursorMoved(std::optional<std::size_t> to) = 0;
+    /// The user chose one of the plot's times.
+    virtual void rangeChosen(std::size_t range) = 0;
 };
 
 /// A screen over the panes, with facts and tables that the user can only read. It is shown, and takes all input, from

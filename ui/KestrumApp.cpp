@@ -251,13 +251,13 @@ void KestrumApp::releaseModel()
     }
 }
 
-bool KestrumApp::offers(SheetKind kind) const
+bool KestrumApp::offers(SheetKind kind, std::optional<std::size_t>) const
 {
     const auto& pane = _navController->topViewController();
     return _model && _sheets->offers(kind, _model->technology(), pane.path(), pane.node());
 }
 
-void KestrumApp::sheetRequested(SheetKind kind)
+void KestrumApp::sheetRequested(SheetKind kind, std::optional<std::size_t>)
 {
     const auto& panes = _navController->viewControllers();
     _sheets->open(kind, _model->technology(), panes.back()->path());

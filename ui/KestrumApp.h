@@ -57,8 +57,8 @@ public:
                                 bool animated) override;
     /// Freezes what is shown, goes to another moment, or returns to the modem.
     void lookRequested(Look look) override;
-    bool offers(SheetKind kind) const override;
-    void sheetRequested(SheetKind kind) override;
+    bool offers(SheetKind kind, std::optional<std::size_t> row) const override;
+    void sheetRequested(SheetKind kind, std::optional<std::size_t> row) override;
 
     const std::optional<std::string>& updateMessage() const { return _properties.updateMessage; }
     void setUpdateMessage(std::optional<std::string> message) { _properties.updateMessage = std::move(message); }

@@ -22,8 +22,9 @@ public:
                                         bool animated) = 0;
     /// The user wants to see another moment. Not while the save screen is shown.
     virtual void lookRequested(Look) {}
-    virtual bool offers(SheetKind) const { return false; }
-    virtual void sheetRequested(SheetKind) {}
+    virtual bool offers(SheetKind, std::optional<std::size_t>) const { return false; }
+    virtual void sheetRequested(SheetKind, std::optional<std::size_t>) {}
+    virtual void keepRequested() {}
 };
 
 /// The open panes, root first, and the save screen over them. Owns the panes and notifies their controllers; the
@@ -61,11 +62,19 @@ public:
 private:
     void backRequested() override;
     void lookRequested(Look look) override;
-    bool offers(SheetKind kind) const override { return _delegate && !_presenting && _delegate->offers(kind); }
-    void sheetRequested(SheetKind kind) override
+    bool offers(SheetKind kind, std::optional<std::size_t> row) const override
     {
-        if (offers(kind))
-            _delegate->sheetRequested(kind);
+        return _delegate && !_presenting && _delegate->offers(kind, row);
+    }
+    void sheetRequested(SheetKind kind, std::optional<std::size_t> row) override
+    {
+        if (offers(kind, row))
+            _delegate->sheetRequested(kind, row);
+    }
+    void keepRequested() override
+    {
+        if (_delegate && !_presenting)
+            _delegate->keepRequested();
     }
 
     void show(KestrumPaneController& pane, Transition transition, bool animated);

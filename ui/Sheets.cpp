@@ -11,7 +11,9 @@ bool Sheets::offers(SheetKind kind, std::string_view technology, std::string_vie
 {
     if (_sheet || !node)
         return false;
-    return kind == SheetKind::Overview ? path == kRootPath : isGlanceable(technology, path, *node);
+    if (kind == SheetKind::Overview)
+        return path == kRootPath;
+    return kind == SheetKind::Glance && isGlanceable(technology, path, *node);
 }
 
 void Sheets::open(SheetKind kind, std::string_view technology, std::string_view path)

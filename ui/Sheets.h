@@ -30,6 +30,8 @@ public:
 private:
     void sheetLeft() override { close(); }
     void columnChosen(std::size_t column) override;
+    void cursorMoved(std::optional<std::size_t>) override {}
+    void rangeChosen(std::size_t) override {}
     void takeGlance(const Glance& glance);
 
     NavigationView& _view;

@@ -207,10 +207,9 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     fresh->onMenu([this] {
         std::vector<Table::MenuEntry> entries{
             {_moments.isHidden() ? QStringLiteral("Freeze") : QStringLiteral("Live"), [this] { look(Look::Freeze); }}};
-        if (_delegate.offers(SheetKind::Glance))
-            entries.push_back({QStringLiteral("Show as table"), [this] { requestSheet(SheetKind::Glance); }});
-        if (_delegate.offers(SheetKind::Overview))
-            entries.push_back({QStringLiteral("Overview"), [this] { requestSheet(SheetKind::Overview); }});
+        for (const auto& command : kSheetCommands)
+            if (_delegate.offers(command.kind, std::nullopt))
+                entries.push_back({lineOf(command.name), [this, kind = command.kind] { requestSheet(kind, {}); }});
         return entries;
     });
     setTitles(std::move(titles));
@@ -337,10 +336,10 @@ void Navigation::closeInsight()
     view->deleteLater(); // its own input may have closed it
 }
 
-void Navigation::requestSheet(SheetKind kind)
+void Navigation::requestSheet(SheetKind kind, std::optional<std::size_t> row)
 {
     if (!_sheet && !_insight)
-        _delegate.sheetRequested(kind);
+        _delegate.sheetRequested(kind, row);
 }
 
 void Navigation::takeFocus()
@@ -398,9 +397,9 @@ void Navigation::keyPressEvent(QKeyEvent* event)
     else if (event->text() == u"," || event->text() == u".")
         look(event->text() == u"," ? Look::Earlier : Look::Later);
     else if (once && event->text() == u"v")
-        requestSheet(SheetKind::Glance);
+        requestSheet(SheetKind::Glance, {});
     else if (once && event->text() == u"o")
-        requestSheet(SheetKind::Overview);
+        requestSheet(SheetKind::Overview, {});
     else if (once && control && key == Qt::Key_S)
         pressSave();
     else if (once && _table && ((control && key == Qt::Key_F) || event->text() == u"/"))

@@ -81,7 +81,7 @@ private:
     void goBack();
     void pressSave();
     void look(Look look);
-    void requestSheet(SheetKind kind);
+    void requestSheet(SheetKind kind, std::optional<std::size_t> row);
     void closeInsight();
 
     NavigationViewDelegate& _delegate;

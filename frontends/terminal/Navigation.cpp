@@ -224,7 +224,7 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
         int wanted = columns(text) + kGap;
         for (const auto& each : _hints)
             wanted += columns(each.text) + kGap;
-        if (wanted <= room && _delegate.offers(kind))
+        if (wanted <= room && _delegate.offers(kind, std::nullopt))
             _hints.insert(_hints.begin() + sheets, {key, std::string(text)});
     };
     nameSheet(SheetKind::Glance, L'v', "v table");
@@ -390,10 +390,10 @@ void TerminalNavigationView::handleCommand(wchar_t key)
         }
         return;
     case L'v':
-        _delegate.sheetRequested(SheetKind::Glance);
+        _delegate.sheetRequested(SheetKind::Glance, std::nullopt);
         return;
     case L'o':
-        _delegate.sheetRequested(SheetKind::Overview);
+        _delegate.sheetRequested(SheetKind::Overview, std::nullopt);
         return;
     case L'?':
         _helpShown = true;

@@ -118,7 +118,8 @@ void TerminalSheet::layOutFacts(const SheetPart& part, int width)
 
 void TerminalSheet::layOutTable(std::size_t index)
 {
-    const auto& [caption, facts, table, note] = _contents.parts[index];
+    const auto& part = _contents.parts[index];
+    const auto& table = part.table;
     auto& widths = _widths[index];
     for (std::size_t i = 0; i < table.columns.size(); ++i) {
         const bool isSorted = table.sort && table.sort->column == i;
@@ -133,10 +134,10 @@ void TerminalSheet::layOutTable(std::size_t index)
     if (!table.rows.empty()) {
         _rows.push_back({Row::Kind::Heading, {}, index});
         for (std::size_t i = 0; i < table.rows.size(); ++i)
-            _rows.push_back({Row::Kind::Cells, {}, index, facts.size() + i});
+            _rows.push_back({Row::Kind::Cells, {}, index, part.facts.size() + i});
     }
-    if (!note.empty())
-        _rows.push_back({Row::Kind::Pieces, {{kInset, note, kDim}}});
+    if (!part.note.empty())
+        _rows.push_back({Row::Kind::Pieces, {{kInset, part.note, kDim}}});
 }
 
 /// Calls `draw` with each column in view and the place where it begins.
@@ -183,7 +184,8 @@ void TerminalSheet::drawHeading(const Line& line, std::size_t part)
 
 void TerminalSheet::drawCells(const Line& line, std::size_t part, std::size_t row)
 {
-    const auto& [caption, facts, table, note] = _contents.parts[part];
+    const auto& facts = _contents.parts[part].facts;
+    const auto& table = _contents.parts[part].table;
     if (row < facts.size()) { // a level
         const auto& [heading, value] = facts[row];
         line.put(kIndent, cutAtTheEnd(heading, kNameOfLevel - 1), kDim);

@@ -370,8 +370,9 @@ public:
 
     void pressBack() { _delegate.backRequested(); }
     void look(Look look) { _delegate.lookRequested(look); }
-    bool isOffered(SheetKind kind) const { return _delegate.offers(kind); }
-    void press(SheetKind kind) { _delegate.sheetRequested(kind); }
+    bool isOffered(SheetKind kind, std::optional<std::size_t> row = {}) const { return _delegate.offers(kind, row); }
+    void press(SheetKind kind, std::optional<std::size_t> row = {}) { _delegate.sheetRequested(kind, row); }
+    void keep() { _delegate.keepRequested(); }
 
     RecordingScreen* shown = nullptr;
     std::vector<std::string> path; ///< the titles, root first

@@ -87,6 +87,9 @@ protected:
 
     void backRequested() override { ++backs; }
     void lookRequested(Look look) override { looks.push_back(look); }
+    bool offers(SheetKind, std::optional<std::size_t>) const override { return false; }
+    void sheetRequested(SheetKind, std::optional<std::size_t>) override {}
+    void keepRequested() override { ++keeps; }
 
     qt::Navigation& navigation() { return static_cast<qt::Navigation&>(*_navigation); }
     qt::MainWindow& window() { return static_cast<qt::MainWindow&>(*_window); }
@@ -127,7 +130,7 @@ protected:
             QTest::mouseMove(window().windowHandle(), on.mapTo(&window(), from + (to - from) * i / kSteps));
     }
 
-    int backs = 0;
+    int backs = 0, keeps = 0;
     std::vector<Look> looks;
 
 private:

@@ -10,10 +10,15 @@ using namespace qt;
 
 class SheetViewTest : public InAWindow, public SheetOwner {
 protected:
-    bool offers(SheetKind) const override { return true; }
-    void sheetRequested(SheetKind kind) override { requested.push_back(kind); }
+    bool offers(SheetKind kind, std::optional<std::size_t>) const override
+    {
+        return kind == SheetKind::Glance || kind == SheetKind::Overview;
+    }
+    void sheetRequested(SheetKind kind, std::optional<std::size_t>) override { requested.push_back(kind); }
     void sheetLeft() override { sheet.reset(); }
     void columnChosen(std::size_t column) override { chosen.push_back(column); }
+    void cursorMoved(std::optional<std::size_t> to) override { cursors.push_back(to); }
+    void rangeChosen(std::size_t range) override { ranges.push_back(range); }
 
     void open()
     {
@@ -39,7 +44,8 @@ protected:
     std::unique_ptr<TableScreen> pane;
     std::unique_ptr<Sheet> sheet;
     std::vector<SheetKind> requested;
-    std::vector<std::size_t> chosen;
+    std::vector<std::size_t> chosen, ranges;
+    std::vector<std::optional<std::size_t>> cursors;
 };
 
 TEST_F(SheetViewTest, ShowsHeadingsRowsAndWordsAsText)
