@@ -4,7 +4,7 @@
 #   kestrum_folder(core USES LogGenerator platform SOURCES KestrumModel.cpp)
 #
 # FOLDER gives the include prefix where it differs from the target's name (target platform_propertylist, headers
-# <platform/propertylist/...>).
+# <platform/propertylist/...>). HEADERS names this target's headers where another target has the rest of the folder.
 find_package(Threads REQUIRED)
 
 # Off for developers: a precompiled header hides a missing #include.
@@ -13,7 +13,7 @@ set(standard_headers <algorithm> <array> <chrono> <cmath> <cstdint> <filesystem>
     <span> <string> <string_view> <variant> <vector>)
 
 function(kestrum_folder name)
-    cmake_parse_arguments(arg "" "FOLDER" "USES;SOURCES;LIBRARIES" ${ARGN})
+    cmake_parse_arguments(arg "" "FOLDER" "USES;SOURCES;HEADERS;LIBRARIES" ${ARGN})
     if(NOT arg_FOLDER)
         set(arg_FOLDER ${name})
     endif()
@@ -23,7 +23,10 @@ function(kestrum_folder name)
     set(root ${CMAKE_BINARY_DIR}/roots/${name})
     file(REMOVE_RECURSE ${root})
     file(MAKE_DIRECTORY ${root}/${arg_FOLDER})
-    file(GLOB headers CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR}/*.h)
+    set(headers ${arg_HEADERS})
+    if(NOT headers)
+        file(GLOB headers CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} ${CMAKE_CURRENT_SOURCE_DIR}/*.h)
+    endif()
     foreach(header IN LISTS headers)
         file(CREATE_LINK ${CMAKE_CURRENT_SOURCE_DIR}/${header} ${root}/${arg_FOLDER}/${header} SYMBOLIC)
     endforeach()
