@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/Stored.h"
 #include "support/Bytes.h"
 #include "support/Value.h"
 
@@ -28,7 +29,7 @@ public:
     /// The property list in a file; null when it cannot be read or parsed.
     virtual Value load(const std::string& path) const = 0;
 
-    enum class Stored { Written, NameTaken, Failed };
+    using Stored = kestrum::Stored;
     /// Writes a dictionary in XML form to a file that only the user can read. The file is complete or does not exist.
     /// Creates a missing directory. Replaces only the file that the last call wrote; for any other file at the path the
     /// result is NameTaken.

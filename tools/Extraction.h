@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/propertylist/WholeFile.h"
+#include "platform/posix/WholeFile.h"
 #include "support/Bytes.h"
 #include "tools/Snapshot.h"
 

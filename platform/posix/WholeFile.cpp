@@ -1,9 +1,10 @@
-#include "platform/propertylist/WholeFile.h"
+#include "platform/posix/WholeFile.h"
 
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <fcntl.h>
+#include <filesystem>
 #include <string_view>
 #include <sys/stat.h>
 #include <system_error>
@@ -28,6 +29,12 @@ WholeFile::WholeFile(std::string path) : _path(std::move(path)), _written(_path 
     _file = ::mkostemp(_written.data(), O_CLOEXEC); // creates the file, mode 0600
     if (_file < 0)
         fail();
+}
+
+void WholeFile::createDirectoryOf(const std::string& path)
+{
+    std::error_code ignored;
+    std::filesystem::create_directories(directoryOf(path), ignored);
 }
 
 WholeFile::~WholeFile()

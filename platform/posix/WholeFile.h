@@ -14,6 +14,8 @@ namespace kestrum {
 class WholeFile {
 public:
     explicit WholeFile(std::string path);
+    /// Creates the directory of a path where it is missing. The constructor reports one that is still missing.
+    static void createDirectoryOf(const std::string& path);
     /// Removes a file that was not finished.
     ~WholeFile();
     WholeFile(const WholeFile&) = delete;

@@ -6,7 +6,6 @@
 #include "platform/propertylist/XmlWriter.h"
 
 #include <cstdio>
-#include <filesystem>
 #include <memory>
 #include <system_error>
 
@@ -87,10 +86,7 @@ PropertyLists::Stored PropertyListCodec::write(const Dictionary& dictionary, con
     const auto text = xmlText(std::make_shared<Dictionary>(dictionary));
     if (!text || text->size() > _maxBytes)
         return Stored::Failed;
-    if (const auto directory = std::filesystem::path(path).parent_path(); !directory.empty()) {
-        std::error_code ignored; // creating the file reports a directory that is still missing
-        std::filesystem::create_directories(directory, ignored);
-    }
+    WholeFile::createDirectoryOf(path);
     try {
         WholeFile file(path);
         file.write(bytesOf(*text));

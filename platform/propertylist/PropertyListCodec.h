@@ -1,7 +1,7 @@
 #pragma once
 
 #include "platform/PropertyLists.h"
-#include "platform/propertylist/WholeFile.h"
+#include "platform/posix/WholeFile.h"
 
 #include <cstddef>
 #include <string>

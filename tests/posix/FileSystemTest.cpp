@@ -4,7 +4,9 @@
 
 #include <gtest/gtest.h>
 
+#include <filesystem>
 #include <pwd.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 namespace kestrum {
@@ -33,6 +35,19 @@ TEST(LinuxFileSystem, LooksInTheSystemWithoutADeviceRoot)
     }
     const ScopedVariable state("XDG_STATE_HOME", std::nullopt);
     EXPECT_EQ(LinuxFileSystem().diagnosticLogDirectory(), "/home/x/.local/state/kestrum/DiagnosticLogs");
+}
+
+TEST(LinuxFileSystem, RefusesAConfigurationThatIsNoFile)
+{
+    const ScratchDirectory home;
+    const ScopedVariable configuration("XDG_CONFIG_HOME", home.path());
+    std::filesystem::create_directories(home / "kestrum/folder");
+    ASSERT_EQ(::mkfifo((home / "kestrum/pipe").c_str(), 0600), 0);
+    for (const char* name : {"folder", "pipe"}) {
+        const auto found = LinuxFileSystem().configuration(name);
+        EXPECT_EQ(found.problem, (Problem{"it is not a regular file"})) << name;
+        EXPECT_EQ(found.path, home / "kestrum/" + name);
+    }
 }
 
 TEST(UserDirectories, IgnoreRelativePathsAndAMissingHome)

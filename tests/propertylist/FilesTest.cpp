@@ -1,5 +1,5 @@
 #include "Lists.h"
-#include "platform/propertylist/WholeFile.h"
+#include "platform/posix/WholeFile.h"
 
 #include <gtest/gtest.h>
 
