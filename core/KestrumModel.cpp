@@ -43,7 +43,12 @@ void KestrumModel::startMonitor()
         scheduleRetry();
     } else {
         logError("Starting the display update timer");
-        _displayUpdateTimer = _roles.queue.repeat(kRefreshInterval, [self] { self->refresh(); });
+        _displayUpdateTimer = _roles.queue.repeat(kRefreshInterval, [self] {
+            if (self->_watch)
+                self->_watch->timePassed(kRefreshInterval);
+            self->refresh();
+        });
+        tellConnection(true);
     }
     notify(&KestrumModelObserver::updateStatus);
 }
@@ -87,6 +92,8 @@ void KestrumModel::scheduleRetry()
 void KestrumModel::restartMonitor()
 {
     const auto self = shared_from_this();
+    if (_displayUpdateTimer)
+        tellConnection(false);
     destroyPorts();
     startMonitor();
 }
@@ -94,14 +101,20 @@ void KestrumModel::restartMonitor()
 void KestrumModel::updateWithData(Bytes data)
 {
     const auto self = shared_from_this();
-    if (_logGenerator) {
-        try {
-            _logGenerator->updateState(_state, data);
-        } catch (const std::exception& failure) {
-            logError(failure.what());
-        }
-    }
+    if (_logGenerator && decode(data) && _watch)
+        _watch->messageDecoded(*_logGenerator, _state, data);
     _updated = true;
+}
+
+bool KestrumModel::decode(Bytes data)
+{
+    try {
+        _logGenerator->updateState(_state, data);
+        return true;
+    } catch (const std::exception& failure) {
+        logError(failure.what());
+        return false;
+    }
 }
 
 void KestrumModel::refresh()
@@ -121,18 +134,24 @@ KestrumModelNodeRef KestrumModel::topLevelNodes()
         const Value display = _logGenerator->generateLogUsingState(_state);
         _nodesByPath.emplace();
         _nodes = KestrumModelNode::makeTreeFromObject(display, *_nodesByPath);
-        tellWatch();
+        tellDisplay();
     }
     return _nodes;
 }
 
-void KestrumModel::tellWatch() const
+void KestrumModel::tellDisplay() const
 {
     const Value* history = _watch ? _state.find(StateKey::kHistory) : nullptr;
     const Array* entries = history ? history->borrowedArray() : nullptr;
     if (entries && !entries->empty())
         if (const Dictionary* newest = entries->back().borrowedDictionary())
             _watch->displayMade(*newest);
+}
+
+void KestrumModel::tellConnection(bool isConnected) const
+{
+    if (_watch)
+        _watch->connectionChanged(isConnected);
 }
 
 KestrumModelNodeRef KestrumModel::nodeAtPath(const std::string& path)

@@ -49,7 +49,7 @@ public:
 
     /// Borrowed, may be null. Reset it before the observer is destroyed.
     void setObserver(KestrumModelObserver* observer) { _observer = observer; }
-    /// Borrowed, may be null. It is told of each display that `topLevelNodes` makes.
+    /// Borrowed, may be null. Reset it before the watch is destroyed.
     void setWatch(DisplayWatch* watch) { _watch = watch; }
 
     /// Opens the channel, asks for the technology, starts the log and refreshes every 2 s. After a failure it closes
@@ -108,7 +108,9 @@ private:
     void takeGenerator(std::unique_ptr<LogGenerator> generator);
 
     void logError(std::string_view text) const;
-    void tellWatch() const;
+    bool decode(Bytes data);
+    void tellDisplay() const;
+    void tellConnection(bool isConnected) const;
     void dropTree();
     void notify(void (KestrumModelObserver::*message)());
 

@@ -110,6 +110,8 @@ void EventFinder::look(const LogGenerator& generator, const State& state, std::o
     if (time) {
         pass(*time);
         _stamp = *time > dateFromTimeStamp(0) ? timeStampFromDate(*time) : 0;
+    } else if (std::exchange(_isSilent, false)) {
+        note(EventKind::Silence, "log", kSilent, kStreaming);
     }
     lookAt(generator, state, code);
 }
@@ -179,7 +181,8 @@ const Cells& EventFinder::cells()
 void EventFinder::silent()
 {
     catchUp();
-    if (!_time || std::exchange(_isSilent, true))
+    const bool hasSeen = _time || _display.dictionary() != nullptr;
+    if (!hasSeen || std::exchange(_isSilent, true))
         return;
     _stamp = 0; // the next message is no quiet one
     _now = _time;

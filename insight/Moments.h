@@ -1,6 +1,5 @@
 #pragma once
 
-#include "core/DisplayWatch.h"
 #include "support/Date.h"
 #include "support/Value.h"
 
@@ -25,7 +24,7 @@ struct Moment {
 
 /// The displays of the last 15 minutes: a copy for each refresh with new data. What has not changed from one refresh to
 /// the next is kept once. Bounded: the oldest raw records go first, then the oldest moments.
-class Moments final : public DisplayWatch {
+class Moments {
 public:
     struct Limits {
         std::size_t moments = 450;    ///< 15 minutes of refreshes, every 2 s
@@ -35,7 +34,8 @@ public:
     explicit Moments(const Clock& clock) : Moments(clock, Limits{}) {}
     Moments(const Clock& clock, Limits limits) : _clock(clock), _limits(limits) {}
 
-    void displayMade(const Dictionary& entry) override;
+    /// Copies a display; see DisplayWatch.
+    void displayMade(const Dictionary& entry);
 
     std::size_t size() const { return _moments.size(); }
     /// The memory of the copies, containers and texts included.

@@ -27,7 +27,8 @@ std::shared_ptr<KestrumApp> KestrumApp::make(ApplicationRoles& roles)
     return std::shared_ptr<KestrumApp>(new KestrumApp(roles));
 }
 
-KestrumApp::KestrumApp(ApplicationRoles& roles) : _roles(roles), _moments(roles.clock), _freeze(_moments, roles.clock)
+KestrumApp::KestrumApp(ApplicationRoles& roles)
+    : _roles(roles), _history(roles.clock), _freeze(_history.moments(), roles.clock)
 {}
 
 KestrumApp::~KestrumApp()
@@ -41,7 +42,7 @@ void KestrumApp::applicationDidFinishLaunching()
     _window = _roles.toolkit.makeWindow(_roles.toolkit.mainScreenBounds());
     _model = std::make_shared<KestrumModel>(_roles);
     _model->setObserver(this);
-    _model->setWatch(&_moments);
+    _model->setWatch(&_history);
     setUpdateMessage(std::string(kConnecting));
     _dateFormatter.emplace(_roles.clock, "'Updated' yyyy-MM-dd 'at' HH:mm:ss");
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "core/KestrumModel.h"
-#include "insight/Moments.h"
+#include "insight/History.h"
 #include "platform/ApplicationDelegate.h"
 #include "platform/MainQueue.h"
 #include "platform/Roles.h"
@@ -88,7 +88,7 @@ private:
     void returnToLive();
 
     ApplicationRoles& _roles;
-    Moments _moments;
+    History _history;
     Freeze _freeze;
     KestrumModelNodeRef _newest;       ///< the display that live panes show; null when they show none
     bool _replacedWhileFrozen = false; ///< by that of another technology

@@ -3,6 +3,7 @@
 
 #include "LogGenerator/State.h"
 #include "core/Monitor.h"
+#include "support/Format.h"
 
 namespace kestrum {
 namespace {
@@ -20,9 +21,19 @@ protected:
 
     void displayMade(const Dictionary& entry) override { seen.push_back(deepCopy(entry.at(StateKey::kDisplay))); }
 
+    void messageDecoded(const LogGenerator& generator, const State& state, Bytes message) override
+    {
+        calls.push_back(formatted("%@ %@ %lu bytes", generator.technology(), describe(state.at(StateKey::kDisplay)),
+                                  static_cast<unsigned long>(message.size())));
+    }
+    void connectionChanged(bool isConnected) override { calls.emplace_back(isConnected ? "connected" : "lost"); }
+    void timePassed(std::chrono::milliseconds time) override { passed += time; }
+
     static Value display(const char* rat) { return makeDictionary({{"RAT", rat}, {"Cell", "17"}}); }
 
     std::vector<Value> seen;
+    std::vector<std::string> calls;
+    std::chrono::milliseconds passed{0};
 };
 
 TEST_F(WatchTest, LearnsEachDisplayOnceWhenAScreenAsksForIt)
@@ -51,6 +62,38 @@ TEST_F(WatchTest, IsNotToldAfterItWasRemoved)
     seconds(2);
     EXPECT_TRUE(model->topLevelNodes());
     EXPECT_THAT(seen, IsEmpty());
+}
+
+TEST_F(WatchTest, LearnsEachMessageWhenTheStateHasIt)
+{
+    stream(display("GSM"));
+    stream(display("UMTS"));
+    EXPECT_THAT(calls, ElementsAre(formatted("kVoxLogChannelTechnology_IFX %@ 4 bytes", describe(display("GSM"))),
+                                   formatted("kVoxLogChannelTechnology_IFX %@ 4 bytes", describe(display("UMTS")))));
+    model->setWatch(nullptr);
+    stream(display("LTE"));
+    EXPECT_EQ(calls.size(), 2u);
+}
+
+TEST_F(WatchTest, LearnsThatTheConnectionIsLostAndBack)
+{
+    ports.kill(kCommandPort);
+    seconds(2);
+    EXPECT_THAT(calls, ElementsAre("lost"));
+    seconds(20); // further attempts fail
+    EXPECT_THAT(calls, ElementsAre("lost"));
+    serve();
+    seconds(5);
+    EXPECT_THAT(calls, ElementsAre("lost", "connected"));
+}
+
+TEST_F(WatchTest, LearnsOfTheTimeThatPassesWithAConnection)
+{
+    seconds(10);
+    EXPECT_EQ(passed, std::chrono::seconds(10));
+    ports.kill(kCommandPort);
+    seconds(60);
+    EXPECT_EQ(passed, std::chrono::seconds(12));
 }
 
 TEST_F(WatchTest, ContentsOfASnapshotAreThoseOfTheHistoryThatIsGiven)

@@ -1,0 +1,40 @@
+#pragma once
+
+#include "core/DisplayWatch.h"
+#include "insight/Events.h"
+#include "insight/Moments.h"
+#include "insight/Trend.h"
+
+#include <chrono>
+#include <string>
+
+namespace kestrum {
+
+class Clock;
+
+/// What a display has shown, and what has happened: filled by a model, whatever is looked at.
+class History final : public DisplayWatch {
+public:
+    explicit History(const Clock& clock) : _clock(clock), _moments(clock) {}
+
+    void displayMade(const Dictionary& entry) override;
+    void messageDecoded(const LogGenerator& generator, const State& state, Bytes message) override;
+    void connectionChanged(bool isConnected) override;
+    void timePassed(std::chrono::milliseconds time) override;
+
+    const Moments& moments() const { return _moments; }
+    const Trends& trends() const { return _trends; }
+    const Events& events() const { return _finder.events(); }
+    /// Up to the last message.
+    const Cells& cells() { return _finder.cells(); }
+
+private:
+    const Clock& _clock;
+    Moments _moments;
+    Trends _trends;
+    EventFinder _finder;
+    std::string _technology;             ///< of the last message
+    std::chrono::milliseconds _quiet{0}; ///< since the last message, while the log channel was open
+};
+
+} // namespace kestrum
