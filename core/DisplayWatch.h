@@ -4,6 +4,7 @@
 #include "support/Bytes.h"
 
 #include <chrono>
+#include <cstdint>
 
 namespace kestrum {
 
@@ -17,8 +18,11 @@ public:
     /// A new display was made. `entry` is its entry of the history (StateKey): valid during the call, and its
     /// containers change with the next message.
     virtual void displayMade(const Dictionary& entry) = 0;
-    /// The generator has read a message into the state. Called up to thousands of times a second.
+    /// The generator was given a message: it is in the state, unless it was invalid. Called up to thousands of times a
+    /// second.
     virtual void messageDecoded(const LogGenerator&, const State&, Bytes) {}
+    /// The service has dropped that number of messages, which this display did not read in time.
+    virtual void messagesLost(std::uint64_t) {}
     /// The log channel is open, or was lost.
     virtual void connectionChanged(bool /*isConnected*/) {}
     /// So much time has passed while the log channel was open. By the queue's timer: no clock that is set matters.

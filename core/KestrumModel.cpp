@@ -101,20 +101,16 @@ void KestrumModel::restartMonitor()
 void KestrumModel::updateWithData(Bytes data)
 {
     const auto self = shared_from_this();
-    if (_logGenerator && decode(data) && _watch)
-        _watch->messageDecoded(*_logGenerator, _state, data);
-    _updated = true;
-}
-
-bool KestrumModel::decode(Bytes data)
-{
-    try {
-        _logGenerator->updateState(_state, data);
-        return true;
-    } catch (const std::exception& failure) {
-        logError(failure.what());
-        return false;
+    if (_logGenerator) {
+        try {
+            _logGenerator->updateState(_state, data);
+        } catch (const std::exception& failure) {
+            logError(failure.what());
+        }
+        if (_watch)
+            _watch->messageDecoded(*_logGenerator, _state, data);
     }
+    _updated = true;
 }
 
 void KestrumModel::refresh()

@@ -108,7 +108,6 @@ private:
     void takeGenerator(std::unique_ptr<LogGenerator> generator);
 
     void logError(std::string_view text) const;
-    bool decode(Bytes data);
     void tellDisplay() const;
     void tellConnection(bool isConnected) const;
     void dropTree();

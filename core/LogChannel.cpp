@@ -1,6 +1,7 @@
 // The model's log channel: opening, closing, choice of the generator, received messages.
 #include "core/KestrumModel.h"
 
+#include "core/DisplayWatch.h"
 #include "platform/MainQueue.h"
 #include "platform/PropertyLists.h"
 #include "platform/SystemLog.h"
@@ -145,6 +146,8 @@ void KestrumModel::countLost(Bytes payload)
         return;
     const auto most = std::numeric_limits<std::uint64_t>::max();
     _lostMessages = count > most - _lostMessages ? most : _lostMessages + count;
+    if (_watch != nullptr)
+        _watch->messagesLost(count);
     // A slow display gets many of these messages. One task reports all that arrive before it runs.
     if (std::exchange(_lossPending, true))
         return;

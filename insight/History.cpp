@@ -14,8 +14,11 @@ void History::displayMade(const Dictionary& entry)
 void History::messageDecoded(const LogGenerator& generator, const State& state, Bytes message)
 {
     _quiet = {};
-    if (_technology != generator.technology())
+    if (_technology != generator.technology()) {
         _technology = generator.technology();
+        _recent.clear();
+    }
+    _recent.add(message);
     _finder.look(generator, state, message);
 }
 
@@ -27,6 +30,7 @@ void History::connectionChanged(bool isConnected)
 
 void History::timePassed(std::chrono::milliseconds time)
 {
+    _recent.turn();
     _quiet += time;
     if (_quiet > EventFinder::kSilence) // above: a message may come shortly before the first of these calls
         _finder.silent();

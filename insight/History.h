@@ -1,11 +1,13 @@
 #pragma once
 
+#include "capture/RecentMessages.h"
 #include "core/DisplayWatch.h"
 #include "insight/Events.h"
 #include "insight/Moments.h"
 #include "insight/Trend.h"
 
 #include <chrono>
+#include <cstdint>
 #include <string>
 
 namespace kestrum {
@@ -19,11 +21,14 @@ public:
 
     void displayMade(const Dictionary& entry) override;
     void messageDecoded(const LogGenerator& generator, const State& state, Bytes message) override;
+    void messagesLost(std::uint64_t count) override { _recent.addGap(count); }
     void connectionChanged(bool isConnected) override;
     void timePassed(std::chrono::milliseconds time) override;
 
     const Moments& moments() const { return _moments; }
     const Trends& trends() const { return _trends; }
+    /// Those of the last 15 minutes, invalid ones too. Another technology's messages begin anew: a capture is of one.
+    const RecentMessages& recent() const { return _recent; }
     const Events& events() const { return _finder.events(); }
     /// Up to the last message.
     const Cells& cells() { return _finder.cells(); }
@@ -32,6 +37,7 @@ private:
     const Clock& _clock;
     Moments _moments;
     Trends _trends;
+    RecentMessages _recent;
     EventFinder _finder;
     std::string _technology;             ///< of the last message
     std::chrono::milliseconds _quiet{0}; ///< since the last message, while the log channel was open

@@ -1,8 +1,8 @@
 #include "tools/EventsOutput.h"
 
-#include "insight/Events.h"
+#include "insight/EventsCsv.h"
+#include "support/CsvCells.h"
 #include "support/Format.h"
-#include "tools/CsvCells.h"
 #include "tools/Harmless.h"
 
 #include <nlohmann/json.hpp>
@@ -35,16 +35,6 @@ double seconds(std::chrono::microseconds time)
 std::string written(const Json& json)
 {
     return json.dump(2, ' ', false, Json::error_handler_t::replace) + '\n';
-}
-
-void appendRow(std::string& to, std::initializer_list<std::string_view> cells)
-{
-    bool isFirst = true;
-    for (const auto cell : cells) {
-        to += std::exchange(isFirst, false) ? "" : ",";
-        appendGuardedCell(to, cell);
-    }
-    to += "\r\n";
 }
 
 /// Follows the messages; what is found is written at the end, or when a followed file pauses.
@@ -116,10 +106,8 @@ private:
     void appendCsv(std::string& to) override
     {
         if (_written == 0)
-            to += "time,event,name,was,is,levels\r\n";
-        forEachNew([&](const Event& each) {
-            appendRow(to, {timeText(each.time, kFraction), word(each.kind), each.name, each.was, each.is, each.levels});
-        });
+            to += kEventsCsvHead;
+        forEachNew([&](const Event& each) { kestrum::appendCsv(to, each); });
     }
 
     void appendTree(std::string& to) override
@@ -181,10 +169,10 @@ private:
         for (const auto& each : _finder.cells()) {
             const bool isMeasured = each.level.count() != 0;
             const auto number = [&](double value) { return isMeasured ? formatted("%.2f", value) : std::string(); };
-            appendRow(to,
-                      {each.radio, each.identity, std::to_string(each.visits), formatted("%.3f", seconds(each.time)),
-                       timeText(each.lastSeen, kFraction), number(each.level.least()), number(each.level.mean()),
-                       number(each.level.greatest()), each.unit});
+            appendGuardedRow(to, {each.radio, each.identity, std::to_string(each.visits),
+                                  formatted("%.3f", seconds(each.time)), timeText(each.lastSeen, kFraction),
+                                  number(each.level.least()), number(each.level.mean()), number(each.level.greatest()),
+                                  each.unit});
         }
         tellDropped(_finder.cells().dropped(), "cells");
     }

@@ -2,9 +2,9 @@
 
 #include "core/KestrumModelNode.h"
 #include "support/Base64.h"
+#include "support/CsvCells.h"
 #include "support/Format.h"
 #include "tools/Changes.h"
-#include "tools/CsvCells.h"
 #include "tools/Harmless.h"
 #include "tools/ServingCell.h"
 #include "tools/TemporaryFile.h"

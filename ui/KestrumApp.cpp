@@ -4,9 +4,12 @@
 #include "platform/Clock.h"
 #include "platform/FileSystem.h"
 #include "platform/Preferences.h"
+#include "platform/SystemLog.h"
 #include "platform/TableScreen.h"
 #include "platform/Toolkit.h"
+#include "support/Format.h"
 #include "ui/ConnectionHint.h"
+#include "ui/Keep.h"
 
 #include <utility>
 
@@ -50,7 +53,7 @@ void KestrumApp::applicationDidFinishLaunching()
     root->setStatus("Connecting", true); // without dots until the first attempt has ended
     _navController = std::make_unique<NavigationStack>(_roles.toolkit, std::move(root));
     _navController->setDelegate(this);
-    _sheets.emplace(_navController->view());
+    _sheets.emplace(_navController->view(), readThresholds());
     _window->setRoot(_navController->view());
     _window->makeKeyAndVisible();
     followConnection();
@@ -114,6 +117,23 @@ void KestrumApp::showNotice(std::string_view text)
         _navController->view().setNotice("");
         _noticeEnd.reset();
     });
+}
+
+Thresholds KestrumApp::readThresholds()
+{
+    Thresholds thresholds;
+    const auto file = _roles.files.configuration(kThresholdsFile);
+    if (const auto problem = file.problem ? file.problem : thresholds.read(file.text)) {
+        const auto text = formatted("%@: %@", file.path, problem->text);
+        _roles.log.write(Priority::Error, "%@", text);
+        showNotice(text);
+    }
+    return thresholds;
+}
+
+void KestrumApp::keepRequested()
+{
+    keepHistory(_history, _roles, *this);
 }
 
 void KestrumApp::updateStatusForViewController(KestrumPaneController& viewController)

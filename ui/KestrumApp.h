@@ -59,6 +59,7 @@ public:
     void lookRequested(Look look) override;
     bool offers(SheetKind kind, std::optional<std::size_t> row) const override;
     void sheetRequested(SheetKind kind, std::optional<std::size_t> row) override;
+    void keepRequested() override;
 
     const std::optional<std::string>& updateMessage() const { return _properties.updateMessage; }
     void setUpdateMessage(std::optional<std::string> message) { _properties.updateMessage = std::move(message); }
@@ -82,6 +83,8 @@ private:
     void releaseModel();
     /// Shows the root pane's hint after `kConnectionPatience` without a connection, and removes it on connection.
     void followConnection();
+    /// The program's and the user's. A bad file of the user is told.
+    Thresholds readThresholds();
     void closePanes();
     void reloadPanes();
     void offerMoments();

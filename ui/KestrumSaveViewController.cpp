@@ -2,15 +2,12 @@
 
 #include "LogGenerator/State.h"
 #include "platform/Clock.h"
-#include "platform/FileSystem.h"
 #include "platform/MainQueue.h"
 #include "platform/PropertyLists.h"
-#include "platform/SystemLog.h"
 #include "platform/Toolkit.h"
-#include "support/Format.h"
+#include "ui/NewFile.h"
 #include "ui/SharedApplication.h"
 
-#include <chrono>
 #include <string>
 
 namespace kestrum {
@@ -18,14 +15,6 @@ namespace {
 
 constexpr std::string_view kReuseIdentifier = "SaveHistoryContentCell";
 constexpr Font kRowFont{"Helvetica", 13};
-
-// A name contains the second. When another display has taken the name, the next second is tried, up to a minute.
-constexpr std::chrono::seconds kMostNames{60};
-
-std::string snapshotPath(const FileSystem& files, std::chrono::seconds moment)
-{
-    return formatted("%@/KestrumSnapshot-%ld.kestrum", files.diagnosticLogDirectory(), moment.count());
-}
 
 } // namespace
 
@@ -84,20 +73,15 @@ void KestrumSaveViewController::savePressed()
     const auto snapshot = makeDictionaryUntilNull({{"Timestamp", dateText(_timeStamp)},
                                                    {"Data", _saveHistory},
                                                    {StateKey::kDescription, text ? Value(*text) : Value()}});
-    auto moment = std::chrono::floor<std::chrono::seconds>(_roles.clock.now()).time_since_epoch();
-    const auto last = moment + kMostNames;
     std::string path;
-    PropertyLists::Stored stored;
-    do
-        path = snapshotPath(_roles.files, moment);
-    while ((stored = _roles.propertyLists.write(*snapshot, path)) == PropertyLists::Stored::NameTaken &&
-           ++moment != last);
-    if (stored == PropertyLists::Stored::Written) {
+    const auto stored = storeInNewFile("KestrumSnapshot", _roles, [&](const std::string& stem) {
+        path = stem + ".kestrum";
+        return _roles.propertyLists.write(*snapshot, path);
+    });
+    if (stored == Stored::Written)
         _application.showNotice("Saved to " + path);
-    } else {
-        _roles.log.write(Priority::Error, "Unable to write snapshot to %s", path);
-        _roles.toolkit.showAlert("File Error", "Unable to write file to disk", "Close");
-    }
+    else
+        tellOfFailedFile("snapshot", path, _roles);
     postClose();
 }
 

@@ -8,6 +8,7 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <variant>
 
 namespace kestrum {
@@ -15,7 +16,7 @@ namespace kestrum {
 /// The sheets over the panes: at most one is open. They read the tree that the panes show.
 class Sheets final : private SheetOwner {
 public:
-    explicit Sheets(NavigationView& view) : _view(view) {}
+    Sheets(NavigationView& view, Thresholds thresholds) : _view(view), _thresholds(std::move(thresholds)) {}
 
     /// Whether the pane of that node has the sheet. `node` may be null.
     bool offers(SheetKind kind, std::string_view technology, std::string_view path,

@@ -1,9 +1,10 @@
 #pragma once
 
+#include <initializer_list>
 #include <string>
 #include <string_view>
 
-namespace kestrum::tools {
+namespace kestrum {
 
 /// Appends a CSV cell (RFC 4180). A cell with a quote, a comma or a line end is put in quotes, and quotes inside it are
 /// doubled. Lines end with CR LF.
@@ -12,4 +13,7 @@ void appendCell(std::string& to, std::string_view raw);
 /// Appends a cell that no spreadsheet takes for a formula: an apostrophe makes it a text.
 void appendGuardedCell(std::string& to, std::string_view raw);
 
-} // namespace kestrum::tools
+/// Appends a line of guarded cells.
+void appendGuardedRow(std::string& to, std::initializer_list<std::string_view> cells);
+
+} // namespace kestrum

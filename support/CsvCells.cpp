@@ -1,11 +1,11 @@
-#include "tools/CsvCells.h"
+#include "support/CsvCells.h"
 
 #include "support/Format.h"
-#include "tools/Changes.h"
 
 #include <algorithm>
+#include <utility>
 
-namespace kestrum::tools {
+namespace kestrum {
 namespace {
 
 /// "-98.25 dBm": a sign, a number, and optionally a blank and a unit.
@@ -28,7 +28,7 @@ bool isNumber(std::string_view raw)
 
 void appendCell(std::string& to, std::string_view raw)
 {
-    if (Changes::isPlain(raw) || raw.find_first_of("\",\r\n") == raw.npos) {
+    if (std::ranges::none_of(raw, [](char c) { return c == '"' || c == ',' || c == '\r' || c == '\n'; })) {
         to += raw;
         return;
     }
@@ -47,4 +47,15 @@ void appendGuardedCell(std::string& to, std::string_view raw)
         appendCell(to, raw);
 }
 
-} // namespace kestrum::tools
+void appendGuardedRow(std::string& to, std::initializer_list<std::string_view> cells)
+{
+    bool isFirst = true;
+    for (const auto cell : cells) {
+        if (!std::exchange(isFirst, false))
+            to += ',';
+        appendGuardedCell(to, cell);
+    }
+    to += "\r\n";
+}
+
+} // namespace kestrum
