@@ -16,7 +16,7 @@ struct HelpLine {
     std::string_view keys, what;
 };
 
-constexpr std::array kHelp = {
+constexpr std::array kHelpOfPanes = {
     HelpLine{"Up Down  k j", "choose a row"},
     HelpLine{"Home End  g G", "first row, last row"},
     HelpLine{"PgUp PgDn", "a screen up, down"},
@@ -24,17 +24,29 @@ constexpr std::array kHelp = {
     HelpLine{"Left Esc h", "back"},
     HelpLine{"< >", "scroll a row sideways"},
     HelpLine{"/  n", "jump to a name, next"},
-    HelpLine{"Space", "stand still, live again"},
-    HelpLine{", .", "a refresh back, forward"},
-    HelpLine{"v", "a list as a table"},
-    HelpLine{"o", "overview at the start"},
-    HelpLine{"Tab r", "table: sort, reverse"},
+    HelpLine{"Space", "freeze, live again"},
+    HelpLine{", .", "a refresh back, on"},
     HelpLine{"s", "save, where offered"},
-    HelpLine{"Ctrl-L", "redraw"},
+    HelpLine{std::string_view(&kKeepKey, 1), "keep 15 minutes"},
     HelpLine{"q", "quit"},
+};
+constexpr std::array kHelpOfSheets = {
+    HelpLine{"Tab r", "table: sort, reverse"},
+    HelpLine{"Left Right", "plot: move the cursor"},
+    HelpLine{"Tab 1 2 3", "plot: choose the time"},
+    HelpLine{"Ctrl-L", "redraw"},
     HelpLine{"mouse", "click, wheel"},
 };
-constexpr int kHelpKeys = 15; // columns
+constexpr int kHelpKeys = 14; // columns
+
+std::vector<HelpLine> helpLines()
+{
+    std::vector<HelpLine> lines(kHelpOfPanes.begin(), kHelpOfPanes.end());
+    for (const auto& each : kSheetCommands)
+        lines.push_back({{&each.key, 1}, each.name});
+    lines.insert(lines.end(), kHelpOfSheets.begin(), kHelpOfSheets.end());
+    return lines;
+}
 
 } // namespace
 
@@ -115,7 +127,7 @@ void TerminalNavigationView::present(SaveInterface& screen, bool)
 {
     _save = static_cast<TerminalSaveInterface*>(&screen);
     _jump.reset();
-    _helpShown = false;
+    _help.reset();
     _repaint.repaintLater();
 }
 
@@ -128,20 +140,20 @@ void TerminalNavigationView::dismiss(bool)
 std::unique_ptr<Sheet> TerminalNavigationView::openSheet(SheetOwner& owner)
 {
     _jump.reset();
-    return std::make_unique<TerminalSheet>(owner, _repaint, _sheet);
+    return std::make_unique<TerminalSheet>(owner, _repaint, _sheet, std::exchange(_asked, L'\0'));
 }
 
 void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool inBackground)
 {
     screen.clear();
-    screen.setDimmed(inBackground || _helpShown);
+    screen.setDimmed(inBackground || _help);
     if (_save) {
         _save->draw(screen);
         return;
     }
     if (_sheet) {
         _sheet->draw(screen);
-        if (_helpShown) {
+        if (_help) {
             screen.setDimmed(inBackground);
             drawHelp(screen);
         }
@@ -173,7 +185,7 @@ void TerminalNavigationView::draw(Screen& screen, std::string_view spinner, bool
     } else if (!_toolbarHidden) {
         drawToolbar(bottom, spinner);
     }
-    if (_helpShown) {
+    if (_help) {
         screen.setDimmed(inBackground);
         drawHelp(screen);
     }
@@ -214,21 +226,20 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
         if (_frozen->hasLater)
             _hints.push_back({L'.', ". on"});
     }
-    const auto sheets = static_cast<std::ptrdiff_t>(_hints.size());
+    auto sheets = static_cast<std::ptrdiff_t>(_hints.size());
     _hints.push_back({L'?', "? help"});
     _hints.push_back({L'q', "q quit"});
     const int spinning = _pane->isSpinning() ? columns(spinner) + 1 : 0;
     int room = line.width() - 2 * kInset - spinning - columns(_pane->status());
     // The sheets are named where there is room for all hints: the help has them too.
-    const auto nameSheet = [&](SheetKind kind, wchar_t key, std::string_view text) {
-        int wanted = columns(text) + kGap;
-        for (const auto& each : _hints)
-            wanted += columns(each.text) + kGap;
-        if (wanted <= room && _delegate.offers(kind, std::nullopt))
-            _hints.insert(_hints.begin() + sheets, {key, std::string(text)});
-    };
-    nameSheet(SheetKind::Glance, L'v', "v table");
-    nameSheet(SheetKind::Overview, L'o', "o overview");
+    for (const auto& each : kSheetCommands) {
+        const Hint hint{static_cast<wchar_t>(each.key), std::string(1, each.key) + ' ' + std::string(each.brief)};
+        int wanted = columns(hint.text) + kGap;
+        for (const auto& other : _hints)
+            wanted += columns(other.text) + kGap;
+        if (wanted <= room && _delegate.offers(each.kind, rowFor(each)))
+            _hints.insert(_hints.begin() + sheets++, hint);
+    }
     std::size_t kept = 0;
     for (; kept < _hints.size() && columns(_hints[kept].text) + kGap <= room; ++kept)
         room -= columns(_hints[kept].text) + kGap;
@@ -250,18 +261,31 @@ void TerminalNavigationView::drawToolbar(const Line& line, std::string_view spin
     line.put(kInset + spinning, cutAtTheEnd(_pane->status(), right - kInset - spinning));
 }
 
-void TerminalNavigationView::drawHelp(Screen& screen) const
+void TerminalNavigationView::drawHelp(Screen& screen)
 {
+    const auto lines = helpLines();
     int widest = 0;
-    for (const auto& each : kHelp)
+    for (const auto& each : lines)
         widest = std::max(widest, kHelpKeys + columns(each.what));
-    const Area inside = drawBox(screen, static_cast<int>(kHelp.size()), widest);
-    for (int row = 0; row < std::min(inside.rows, static_cast<int>(kHelp.size())); ++row) {
-        const Line line(screen, inside.row + row, inside.column, inside.columns);
-        const auto& [keys, what] = kHelp[static_cast<std::size_t>(row)];
+    const auto count = static_cast<int>(lines.size());
+    const int side = screen.columns() >= kColumn ? 2 : 1; // columns of lines
+    const Area inside = drawBox(screen, (count + side - 1) / side, side * widest + (side - 1) * kGap);
+    // Lines without room come with the next key.
+    int room = side * inside.rows;
+    const bool isCut = count - *_help > room && inside.rows > 2;
+    room -= isCut ? side : 0;
+    _nextHelp = isCut ? *_help + room : 0;
+    const int rows = inside.rows - (isCut ? 1 : 0);
+    for (int i = 0; i < std::min(room, count - *_help); ++i) {
+        const Line line =
+            Line(screen, inside.row + i % rows, inside.column, inside.columns).part(i / rows * (widest + kGap), widest);
+        const auto& [keys, what] = lines[static_cast<std::size_t>(*_help + i)];
         line.put(0, keys, {.bold = true});
         line.put(kHelpKeys, what);
     }
+    if (isCut)
+        Line(screen, inside.row + rows, inside.column, inside.columns)
+            .put(0, "any key: more  Esc: close", {.dim = true});
 }
 
 void TerminalNavigationView::handle(const Input& input)
@@ -269,14 +293,25 @@ void TerminalNavigationView::handle(const Input& input)
     _repaint.repaintLater();
     if (_save)
         _save->handle(input);
-    else if (_helpShown)
-        _helpShown = input.key == Key::Release || input.key == Key::Other; // any key or mouse press closes it
+    else if (_help)
+        handleHelp(input);
     else if (_sheet && !input.is(L'?') && !input.is(L'q'))
         _sheet->handle(input);
     else if (_jump)
         handleJump(input);
     else if (_pane)
         handlePane(input);
+}
+
+/// Any key or mouse press shows what had no room, and then closes it.
+void TerminalNavigationView::handleHelp(const Input& input)
+{
+    if (input.key == Key::Release || input.key == Key::Other)
+        return;
+    if (_nextHelp > 0 && input.key != Key::Escape)
+        _help = _nextHelp;
+    else
+        _help.reset();
 }
 
 void TerminalNavigationView::handleJump(const Input& input)
@@ -389,21 +424,37 @@ void TerminalNavigationView::handleCommand(wchar_t key)
             action();
         }
         return;
-    case L'v':
-        _delegate.sheetRequested(SheetKind::Glance, std::nullopt);
-        return;
-    case L'o':
-        _delegate.sheetRequested(SheetKind::Overview, std::nullopt);
+    case static_cast<wchar_t>(kKeepKey):
+        _delegate.keepRequested();
         return;
     case L'?':
-        _helpShown = true;
+        _help = 0;
         return;
     case L'q':
         _quit();
         return;
     default:
+        openSheetOf(key);
         return;
     }
+}
+
+/// The chosen row, for a sheet of a row.
+std::optional<std::size_t> TerminalNavigationView::rowFor(const SheetCommand& command) const
+{
+    const auto& table = _pane->table();
+    return command.isOfRow && table.rows() > 0 ? std::optional(table.chosen()) : std::nullopt;
+}
+
+void TerminalNavigationView::openSheetOf(wchar_t key)
+{
+    const auto command =
+        std::ranges::find(kSheetCommands, key, [](const auto& each) { return static_cast<wchar_t>(each.key); });
+    if (command == kSheetCommands.end())
+        return;
+    _asked = key; // for `openSheet`
+    _delegate.sheetRequested(command->kind, rowFor(*command));
+    _asked = L'\0';
 }
 
 } // namespace kestrum::terminal

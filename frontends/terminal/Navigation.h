@@ -25,6 +25,7 @@ public:
     TerminalTableScreen(TableDataSource& source, Repaint& repaint) : _table(source, repaint), _repaint(repaint) {}
 
     TerminalTable& table() override { return _table; }
+    const TerminalTable& table() const { return _table; }
     void setTitle(std::string_view title) override { _title = title; }
     std::string title() const override { return _title; }
     void setToolbarItems(std::vector<ToolbarItem> items, bool animated) override;
@@ -73,13 +74,16 @@ private:
         int column = 0;
     };
 
+    void handleHelp(const Input& input);
     void handleJump(const Input& input);
     void handlePane(const Input& input);
     void handleCommand(wchar_t key);
+    std::optional<std::size_t> rowFor(const SheetCommand& command) const;
+    void openSheetOf(wchar_t key);
     void drawHint(Screen& screen, Area area) const;
     void drawTitle(const Line& line) const;
     void drawToolbar(const Line& line, std::string_view spinner);
-    void drawHelp(Screen& screen) const;
+    void drawHelp(Screen& screen);
 
     NavigationViewDelegate& _delegate;
     Repaint& _repaint;
@@ -90,7 +94,10 @@ private:
     std::vector<std::string> _titles;
     std::string _notice;
     std::optional<FrozenMoment> _frozen;
-    bool _toolbarHidden = false, _helpShown = false;
+    bool _toolbarHidden = false;
+    std::optional<int> _help; // while it is shown: its first line
+    int _nextHelp = 0;        // the first line without room, as drawn last; 0 for none
+    wchar_t _asked = L'\0';   // the key of the sheet that is about to open
     std::vector<Hint> _hints;
     int _bottom = 0; // the toolbar's line
 

@@ -39,8 +39,8 @@ std::string headingOf(const SheetColumn& column)
 
 } // namespace
 
-TerminalSheet::TerminalSheet(SheetOwner& owner, Repaint& repaint, TerminalSheet*& place)
-    : _owner(owner), _repaint(repaint), _place(place)
+TerminalSheet::TerminalSheet(SheetOwner& owner, Repaint& repaint, TerminalSheet*& place, wchar_t key)
+    : _owner(owner), _repaint(repaint), _place(place), _key(key)
 {
     _place = this;
     _repaint.repaintLater();
@@ -365,10 +365,9 @@ void TerminalSheet::handle(const Input& input)
         return scrollSideways(1);
     case L'r':
         return sortByNeighbour(0);
-    case L'v':
-    case L'o':
-        return _owner.sheetLeft();
     default:
+        if (input.character == _key)
+            _owner.sheetLeft();
         return;
     }
 }

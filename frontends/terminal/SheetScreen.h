@@ -13,8 +13,8 @@ namespace kestrum::terminal {
 /// A sheet on the whole screen: its title, its parts one under the other, and its status.
 class TerminalSheet final : public Sheet {
 public:
-    /// `place` refers to the sheet as long as it is open.
-    TerminalSheet(SheetOwner& owner, Repaint& repaint, TerminalSheet*& place);
+    /// `place` refers to the sheet as long as it is open. `key` closes it, as Escape does.
+    TerminalSheet(SheetOwner& owner, Repaint& repaint, TerminalSheet*& place, wchar_t key);
     ~TerminalSheet() override;
     TerminalSheet(const TerminalSheet&) = delete;
     TerminalSheet& operator=(const TerminalSheet&) = delete;
@@ -61,6 +61,7 @@ private:
     SheetOwner& _owner;
     Repaint& _repaint;
     TerminalSheet*& _place;
+    wchar_t _key;
     SheetContents _contents;
     std::vector<Row> _rows;
     std::vector<Widths> _widths;   // of each part

@@ -323,6 +323,37 @@ TEST_F(Terminal, ShowsItsKeysAndHidesThemAtTheNextOne)
     expectShown("Serving Cell");
 }
 
+TEST_F(Terminal, ShowsAllItsKeysAtOnceOnAnOrdinaryTerminal)
+{
+    startAndWait();
+    terminal.type("?");
+    for (const std::string line :
+         {"Up Down  k j  choose a row", "K             keep 15 minutes", "v             Show as table",
+          "o             Overview", "t             Trend", "i             What it means", "e             Events",
+          "c             Cells", "mouse         click, wheel"})
+        expectShown(line);
+    EXPECT_FALSE(terminal.shows("any key: more"));
+}
+
+TEST_F(Terminal, ShowsTheRestOfItsKeysAtTheNextKeyOnASmallTerminal)
+{
+    terminal.resize(12, 40);
+    startAndWait();
+    terminal.type("?");
+    expectShown("choose a row");
+    expectShown("any key: more");
+    terminal.type("? ");
+    expectShown("click, wheel");
+    expectGone("any key: more");
+    terminal.type("?");
+    expectGone("click, wheel");
+    expectShown("Serving Cell");
+    terminal.type("?");
+    expectShown("any key: more");
+    terminal.press(Key::Escape);
+    expectGone("any key: more");
+}
+
 TEST_F(Terminal, FitsFortyColumnsAndTwentyLines)
 {
     terminal.resize(20, 40);
@@ -924,9 +955,9 @@ TEST_F(TerminalSheets, OverviewOpensFromTheFirstPaneAndCloses)
     expectRow(2, testing::AllOf(HasSubstr("RSSI"), HasSubstr("-53 dBm"), HasSubstr("excellent")));
     expectShown("Neighbor Cells");
     terminal.type("?");
-    expectShown("overview at the start");
+    expectShown("What it means");
     terminal.type("?");
-    expectGone("overview at the start");
+    expectGone("What it means");
     terminal.click(0, 3);
     expectTitle("Kestrum");
     expectChosen("Serving Cell");
