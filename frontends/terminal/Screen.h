@@ -17,6 +17,8 @@ enum class Colour { Plain, Accent, Danger };
 struct Style {
     bool bold = false, dim = false, underlined = false, reverse = false;
     Colour colour = Colour::Plain;
+
+    friend bool operator==(const Style&, const Style&) = default;
 };
 
 /// The maximum width of rows and bars: on a wider row the value is too far from its key to read them together.
@@ -87,6 +89,7 @@ public:
 
     int rows() const;
     int columns() const;
+    Charset charset() const { return _charset; }
 
     void clear();
     void setDimmed(bool dimmed) { _dimmed = dimmed; } ///< Everything drawn from now on is dimmed.

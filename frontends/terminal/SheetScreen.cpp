@@ -15,6 +15,7 @@ constexpr int kMark = 2;            // before a row: whether it moved, or is the
 constexpr int kIndent = 15;         // facts stand beside their caption
 constexpr int kNameOfLevel = 12, kValueOfLevel = 12, kBarOfLevel = 24;
 constexpr int kBar = 10, kWidestCell = 24;
+constexpr int kLeastPlot = 3, kMostOfLeastPlot = 8; // rows of a curve, where the rest does not leave more
 constexpr Style kDim{.dim = true};
 
 /// A bar of `width` columns, in eighths of a column; dots for the rest of the scale.
@@ -56,57 +57,129 @@ void TerminalSheet::setContents(SheetContents contents)
 {
     if (contents == _contents)
         return;
+    rememberPlace();
     _contents = std::move(contents);
     _width = -1;
+    measureTables();
     _repaint.repaintLater();
 }
 
-void TerminalSheet::layOut(int width, int height)
+const SheetRow* TerminalSheet::tableRow(const Row& row) const
 {
-    if (width == _width && height == _height)
+    const auto& part = _contents.parts[row.part];
+    if (row.kind != Row::Kind::Cells || row.row < part.facts.size())
+        return nullptr;
+    return &part.table.rows[row.row - part.facts.size()];
+}
+
+/// At its top a sheet stays there: the newest rows come first.
+void TerminalSheet::rememberPlace()
+{
+    if (_width < 0) // not drawn since the last contents
+        return;
+    for (std::size_t i = 0; _first > 0 && i < _visible && _first + i < _rows.size(); ++i)
+        if (const auto* row = tableRow(_rows[_first + i]))
+            _anchors.push_back({_rows[_first + i].part, i, row->identity});
+}
+
+void TerminalSheet::returnToPlace()
+{
+    for (const auto& [part, line, identity] : std::exchange(_anchors, {}))
+        for (std::size_t i = line; i < _rows.size(); ++i)
+            if (const auto* row = tableRow(_rows[i]); row && _rows[i].part == part && row->identity == identity) {
+                _first = i - line;
+                return;
+            }
+}
+
+void TerminalSheet::measureTables()
+{
+    _widths.assign(_contents.parts.size(), {});
+    for (std::size_t part = 0; part < _widths.size(); ++part) {
+        const auto& table = _contents.parts[part].table;
+        for (std::size_t i = 0; i < table.columns.size(); ++i) {
+            const bool isSorted = table.sort && table.sort->column == i;
+            int value = columns(headingOf(table.columns[i])) + (isSorted ? 2 : 0), word = 0;
+            for (const auto& row : table.rows) {
+                value = std::max(value, std::min(columns(row.cells[i].text), kWidestCell));
+                word = std::max(word, columns(row.cells[i].word));
+            }
+            _widths[part].values.push_back(value);
+            _widths[part].words.push_back(word);
+        }
+    }
+}
+
+void TerminalSheet::layOut(int width, int height, PlotMarks marks)
+{
+    if (width == _width && height == _height && marks == _marks)
         return;
     _width = width;
     _height = height;
-    layOutParts(width, true);
-    if (_rows.size() > static_cast<std::size_t>(height))
-        layOutParts(width, false);
+    _marks = marks;
+    const int leastPlot = std::clamp(height / 3, kLeastPlot, kMostOfLeastPlot);
+    layOutParts(true, leastPlot);
+    const int free = height - static_cast<int>(_rows.size());
+    const auto plots = static_cast<int>(
+        std::ranges::count_if(_contents.parts, [](const auto& part) { return part.plot.has_value(); }));
+    if (free < 0)
+        layOutParts(false, leastPlot);
+    else if (plots > 0)
+        layOutParts(true, leastPlot + free / plots);
+    returnToPlace();
 }
 
 /// `spaced`: with an empty line before each table.
-void TerminalSheet::layOutParts(int width, bool spaced)
+void TerminalSheet::layOutParts(bool spaced, int plotRows)
 {
     _rows.clear();
-    _widths.assign(_contents.parts.size(), {});
+    _picture = {};
+    const int width = std::min(_width, kColumn);
     for (std::size_t i = 0; i < _contents.parts.size(); ++i) {
-        if (spaced && i > 0 && !_contents.parts[i].table.columns.empty())
+        const auto& part = _contents.parts[i];
+        if (spaced && i > 0 && !part.table.columns.empty())
             _rows.push_back({Row::Kind::Pieces});
-        layOutFacts(_contents.parts[i], width);
+        layOutFacts(part, width);
+        if (part.plot)
+            layOutPlot(*part.plot, plotRows);
         layOutTable(i);
     }
     if (_contents.parts.empty() && !_contents.hint.empty())
-        for (const auto& each : wrapped(_contents.hint, width - 2 * kInset))
-            _rows.push_back({Row::Kind::Pieces, {{kInset, each, kDim}}});
+        layOutText(_contents.hint, width, kDim);
 }
 
-/// The caption, and beside it the facts: one after the other, those with a bar in lines below.
+void TerminalSheet::layOutText(std::string_view text, int width, Style style)
+{
+    for (auto& each : wrapped(text, width - 2 * kInset))
+        _rows.push_back({Row::Kind::Pieces, {{kInset, std::move(each), style}}});
+}
+
+/// The caption, and beside it the facts: one after the other, those with a bar in lines below. Lines of text come
+/// between.
 void TerminalSheet::layOutFacts(const SheetPart& part, int width)
 {
     const bool isList = !part.table.columns.empty();
     Row line{Row::Kind::Pieces};
-    if (!part.caption.empty())
+    int indent = kInset;
+    if (!part.lines.empty()) {
+        layOutText(part.caption, width, {.bold = true});
+        for (const auto& each : part.lines)
+            layOutText(each, width, {});
+    } else if (!part.caption.empty()) {
         line.pieces.push_back({kInset, part.caption, {.bold = true}});
-    const int indent = part.caption.empty() ? kInset : isList ? kInset + columns(part.caption) + kGap : kIndent;
+        indent = isList ? kInset + columns(part.caption) + kGap : kIndent;
+    }
     int at = indent;
     for (const auto& [heading, value] : part.facts) {
         if (value.bar)
             continue;
-        const int wanted = columns(heading) + 1 + columns(value.text);
+        const int name = columns(heading) + 1, wanted = name + columns(value.text);
         if (at > indent && at + wanted > width - kInset) {
             _rows.push_back(std::exchange(line, {Row::Kind::Pieces}));
             at = indent;
         }
         line.pieces.push_back({at, heading, kDim});
-        line.pieces.push_back({at + columns(heading) + 1, cutAtTheEnd(value.text, width - kInset - at), {}});
+        line.pieces.push_back({at + name, cutAtTheEnd(value.text, width - kInset - at - name), {}});
         at += wanted + kGap;
     }
     if (!line.pieces.empty())
@@ -116,24 +189,24 @@ void TerminalSheet::layOutFacts(const SheetPart& part, int width)
             _rows.push_back({Row::Kind::Cells, {}, static_cast<std::size_t>(&part - _contents.parts.data()), i});
 }
 
+void TerminalSheet::layOutPlot(const SheetPlot& plot, int rows)
+{
+    auto picture = terminal::draw(plot, _marks, _width, rows);
+    const std::size_t begin = _rows.size();
+    for (auto& each : std::exchange(picture.lines, {}))
+        _rows.push_back({Row::Kind::Pieces, std::move(each)});
+    if (&plot != this->plot())
+        return;
+    _picture = std::move(picture);
+    _plotRow = begin;
+}
+
 void TerminalSheet::layOutTable(std::size_t index)
 {
     const auto& part = _contents.parts[index];
-    const auto& table = part.table;
-    auto& widths = _widths[index];
-    for (std::size_t i = 0; i < table.columns.size(); ++i) {
-        const bool isSorted = table.sort && table.sort->column == i;
-        int value = columns(headingOf(table.columns[i])) + (isSorted ? 2 : 0), word = 0;
-        for (const auto& row : table.rows) {
-            value = std::max(value, std::min(columns(row.cells[i].text), kWidestCell));
-            word = std::max(word, columns(row.cells[i].word));
-        }
-        widths.values.push_back(value);
-        widths.words.push_back(word);
-    }
-    if (!table.rows.empty()) {
+    if (!part.table.rows.empty()) {
         _rows.push_back({Row::Kind::Heading, {}, index});
-        for (std::size_t i = 0; i < table.rows.size(); ++i)
+        for (std::size_t i = 0; i < part.table.rows.size(); ++i)
             _rows.push_back({Row::Kind::Cells, {}, index, part.facts.size() + i});
     }
     if (!part.note.empty())
@@ -229,7 +302,10 @@ void TerminalSheet::drawTitle(const Line& line) const
 
 void TerminalSheet::drawBottom(const Line& line)
 {
-    const std::string_view keys = _contents.canSort ? "Tab sort  ? help  Esc back" : "? help  Esc back";
+    const auto* plot = this->plot();
+    const std::string_view keys = plot && plot->ranges.size() > 1 ? "Tab time  ? help  Esc back"
+                                  : _contents.canSort             ? "Tab sort  ? help  Esc back"
+                                                                  : "? help  Esc back";
     _back = line.width() - kInset - columns(keys);
     line.put(kInset, cutAtTheEnd(_contents.status, _back - kInset - kGap));
     line.put(_back, keys, kDim);
@@ -241,7 +317,7 @@ void TerminalSheet::draw(Screen& screen)
     const int width = std::min(screen.columns(), kColumn);
     _bottom = screen.rows() - 1;
     _visible = static_cast<std::size_t>(std::max(1, _bottom - 1));
-    layOut(width, static_cast<int>(_visible));
+    layOut(screen.columns(), static_cast<int>(_visible), choosePlotMarks(screen.charset()));
     _first = std::min(_first, _rows.size() > _visible ? _rows.size() - _visible : 0);
     _skipped = std::min(_skipped, mostColumnsToSkip());
     _headingLine = -1;
@@ -250,21 +326,38 @@ void TerminalSheet::draw(Screen& screen)
         const int number = 1 + static_cast<int>(i);
         const Line line(screen, number, 0, width);
         // The heading stays at the top while its rows are scrolled.
-        const bool isRow = row.kind == Row::Kind::Cells && row.row >= _contents.parts[row.part].facts.size();
-        if (row.kind == Row::Kind::Heading || (i == 0 && isRow)) {
+        if (row.kind == Row::Kind::Heading || (i == 0 && tableRow(row))) {
             drawHeading(line, row.part);
             if (row.part == 0)
                 _headingLine = number;
         } else if (row.kind == Row::Kind::Cells) {
             drawCells(line, row.part, row.row);
         } else {
+            const Line whole(screen, number, 0, screen.columns());
             for (const auto& [column, text, style] : row.pieces)
-                line.put(column, text, style);
+                whole.put(column, text, style);
         }
     }
     drawTitle({screen, 0, 0, width});
     drawBottom({screen, _bottom, 0, width});
-    screen.placeCursor(_bottom, 0, false);
+    // Screen readers read the line of the cursor.
+    const int reading = lineOf(_picture.reading);
+    screen.placeCursor(reading > 0 ? reading : _bottom, 0, false);
+}
+
+/// The line of the screen that shows this line of the plot; -1 out of sight.
+int TerminalSheet::lineOf(int plotLine) const
+{
+    const auto row = _plotRow + static_cast<std::size_t>(plotLine);
+    if (plotLine < 0 || row < _first || row >= _first + _visible)
+        return -1;
+    return 1 + static_cast<int>(row - _first);
+}
+
+const SheetPlot* TerminalSheet::plot() const
+{
+    const auto found = std::ranges::find_if(_contents.parts, [](const auto& part) { return part.plot.has_value(); });
+    return found == _contents.parts.end() ? nullptr : &*found->plot;
 }
 
 std::size_t TerminalSheet::mostColumnsToSkip() const
@@ -302,15 +395,68 @@ void TerminalSheet::press(const Input& input)
 {
     if (input.row == 0 || (input.row == _bottom && input.column >= _back))
         return _owner.sheetLeft();
-    if (input.row != _headingLine || !_contents.canSort)
+    if (pressPlot(input) || input.row != _headingLine || !_contents.canSort)
         return;
     for (std::size_t i = _headings.size(); i-- > 0;)
         if (_headings[i] >= 0 && input.column >= _headings[i])
             return _owner.columnChosen(i);
 }
 
+bool TerminalSheet::pressPlot(const Input& input)
+{
+    const auto* plot = this->plot();
+    if (!plot)
+        return false;
+    const auto& cells = _picture.cells;
+    const int top = lineOf(cells.row);
+    if (top > 0 && Area{top, cells.column, cells.rows, cells.columns}.holds(input.row, input.column)) {
+        _owner.cursorMoved(pointAt(*plot, input.column - cells.column, cells.columns));
+        return true;
+    }
+    if (input.row != lineOf(0))
+        return false;
+    for (std::size_t i = 0; i < std::min(_picture.ranges.size(), plot->ranges.size()); ++i)
+        if (Area{input.row, _picture.ranges[i], 1, columns(plot->ranges[i])}.holds(input.row, input.column)) {
+            _owner.rangeChosen(i);
+            return true;
+        }
+    return false;
+}
+
+/// The keys that have another meaning where there is a plot. The owner may change the contents at once.
+bool TerminalSheet::handlePlot(const Input& input)
+{
+    const auto* plot = this->plot();
+    if (!plot)
+        return false;
+    const auto is = [&](Key key, wchar_t letter) { return input.key == key || input.is(letter); };
+    const auto beside = [&](bool isAfter, int columns) {
+        _owner.cursorMoved(pointBeside(*plot, isAfter, columns));
+        return true;
+    };
+    if (is(Key::Left, L'h') || is(Key::Right, L'l'))
+        return beside(is(Key::Right, L'l'), _picture.cells.columns);
+    if (is(Key::ShiftLeft, L'<') || is(Key::ShiftRight, L'>'))
+        return beside(is(Key::ShiftRight, L'>'), 0);
+    const std::size_t ranges = plot->ranges.size();
+    if (input.key == Key::Home || input.key == Key::End) {
+        const bool isToFirst = input.key == Key::Home && !(plot->points.empty() && plot->spans.empty());
+        _owner.cursorMoved(isToFirst ? std::optional<std::size_t>(0) : std::nullopt);
+    } else if (ranges > 0 && (input.key == Key::Tab || input.key == Key::BackTab)) {
+        _owner.rangeChosen((plot->range + (input.key == Key::Tab ? 1 : ranges - 1)) % ranges);
+    } else if (input.key == Key::Character && input.character >= L'1' &&
+               input.character < L'1' + static_cast<wchar_t>(std::min<std::size_t>(ranges, 9))) {
+        _owner.rangeChosen(static_cast<std::size_t>(input.character - L'1'));
+    } else {
+        return false;
+    }
+    return true;
+}
+
 void TerminalSheet::handle(const Input& input)
 {
+    if (handlePlot(input))
+        return _repaint.repaintLater();
     const auto page = static_cast<std::ptrdiff_t>(_visible > 1 ? _visible - 1 : 1);
     _repaint.repaintLater();
     switch (input.key) {
@@ -354,9 +500,9 @@ void TerminalSheet::handle(const Input& input)
     case L'j':
         return scroll(1);
     case L'g':
-        return handle({Key::Home});
+        return scroll(-static_cast<std::ptrdiff_t>(_rows.size()));
     case L'G':
-        return handle({Key::End});
+        return scroll(static_cast<std::ptrdiff_t>(_rows.size()));
     case L'h':
     case L'<':
         return scrollSideways(-1);

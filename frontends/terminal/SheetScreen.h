@@ -1,11 +1,14 @@
 #pragma once
 
+#include "frontends/terminal/Plot.h"
 #include "frontends/terminal/Repaint.h"
 #include "frontends/terminal/Screen.h"
 #include "platform/Sheet.h"
 
 #include <cstddef>
+#include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace kestrum::terminal {
@@ -26,15 +29,10 @@ public:
     void handle(const Input& input);
 
 private:
-    struct Piece {
-        int column;
-        std::string text;
-        Style style;
-    };
     /// A line of the sheet: pieces, or a line of a part's table.
     struct Row {
         enum class Kind { Pieces, Heading, Cells } kind;
-        std::vector<Piece> pieces = {};
+        Pieces pieces = {};
         std::size_t part = 0, row = 0;
     };
     /// The columns of a part's table, as wide as their contents.
@@ -42,9 +40,12 @@ private:
         std::vector<int> values, words; // of each column
     };
 
-    void layOut(int width, int height);
-    void layOutParts(int width, bool spaced);
+    void measureTables();
+    void layOut(int width, int height, PlotMarks marks);
+    void layOutParts(bool spaced, int plotRows);
+    void layOutText(std::string_view text, int width, Style style);
     void layOutFacts(const SheetPart& part, int width);
+    void layOutPlot(const SheetPlot& plot, int rows);
     void layOutTable(std::size_t index);
     void drawHeading(const Line& line, std::size_t part);
     void drawCells(const Line& line, std::size_t part, std::size_t row);
@@ -55,7 +56,15 @@ private:
     void scroll(std::ptrdiff_t lines);
     void scrollSideways(int columns);
     void sortByNeighbour(int step);
+    bool handlePlot(const Input& input);
     void press(const Input& input);
+    bool pressPlot(const Input& input);
+    int lineOf(int plotLine) const;
+    const SheetPlot* plot() const; ///< the first one; null for none
+    void rememberPlace();
+    void returnToPlace();
+    /// The row of a table that a line of the sheet shows; null for another line.
+    const SheetRow* tableRow(const Row& row) const;
     std::size_t mostColumnsToSkip() const;
 
     SheetOwner& _owner;
@@ -64,11 +73,19 @@ private:
     wchar_t _key;
     SheetContents _contents;
     std::vector<Row> _rows;
-    std::vector<Widths> _widths;   // of each part
-    int _width = -1, _height = -1; // of the screen, for which the rows are laid out
-    std::size_t _first = 0;        // row at the top
-    std::size_t _skipped = 0;      // columns that are scrolled out of sight at the left
-    std::size_t _visible = 0;      // rows, as drawn last
+    std::vector<Widths> _widths;           // of each part
+    int _width = -1, _height = -1;         // of the screen, for which the rows are laid out
+    PlotMarks _marks = PlotMarks::Braille; // the same
+    PlotPicture _picture;                  // of the first plot; its lines are among the rows
+    std::size_t _plotRow = 0;              // where they begin
+    struct Anchor {
+        std::size_t part, line; // counted from the top
+        std::string identity;
+    };
+    std::vector<Anchor> _anchors; // rows that were in view before the contents changed
+    std::size_t _first = 0;       // row at the top
+    std::size_t _skipped = 0;     // columns that are scrolled out of sight at the left
+    std::size_t _visible = 0;     // rows, as drawn last
     int _headingLine = -1, _bottom = 0, _back = 0;
     std::vector<int> _headings; // where the first table's columns begin, as drawn last; -1 out of sight
 };
