@@ -1,6 +1,7 @@
 #include "frontends/qt/SheetView.h"
 
 #include "frontends/qt/Colours.h"
+#include "frontends/qt/Drag.h"
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Paint.h"
 #include "frontends/qt/Type.h"
@@ -10,7 +11,6 @@
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
-#include <QScroller>
 #include <QStyledItemDelegate>
 
 #include <utility>
@@ -51,12 +51,6 @@ QString textOf(std::string_view text)
     return lineOf(text);
 }
 
-/// How a finger scrolls a view of Qt's.
-void scrollByTouch(QAbstractScrollArea& area)
-{
-    QScroller::grabGesture(area.viewport(), QScroller::LeftMouseButtonGesture);
-}
-
 void setUp(QLabel& label, const QFont& font, bool muted = false)
 {
     label.setFont(font);
@@ -91,7 +85,7 @@ void LevelBar::paintEvent(QPaintEvent*)
     fillBar(painter, *this, QRect(0, (height() - kBarThickness) / 2, width(), kBarThickness), _part);
 }
 
-SheetTableView::SheetTableView(QWidget* parent) : QTableWidget(parent)
+SheetTableView::SheetTableView(QAbstractScrollArea& around, QWidget* parent) : QTableWidget(parent)
 {
     setFont(fontOf(systemFont(kTextSize)));
     setItemDelegate(new BarDelegate(this));
@@ -100,6 +94,7 @@ SheetTableView::SheetTableView(QWidget* parent) : QTableWidget(parent)
     setFrameShape(NoFrame);
     setShowGrid(false);
     setTabKeyNavigation(false);
+    new DragScroll(*this, &around);
     setVerticalScrollMode(ScrollPerPixel);
     setHorizontalScrollMode(ScrollPerPixel);
     verticalHeader()->hide();
@@ -112,7 +107,6 @@ SheetTableView::SheetTableView(QWidget* parent) : QTableWidget(parent)
     horizontalHeader()->setStyleSheet(QStringLiteral("QHeaderView { background: palette(base); border: none; } "
                                                      "QHeaderView::section { background: palette(base); color: "
                                                      "palette(text); border: none; padding: 0 6px; }"));
-    scrollByTouch(*this);
 }
 
 void SheetTableView::setHeadings(const SheetTable& table)
@@ -170,8 +164,8 @@ void SheetTableView::fitRows()
     setFixedHeight(kRowHeight + rowCount() * kTableRow);
 }
 
-SheetPartView::SheetPartView(QWidget* parent)
-    : QWidget(parent), _caption(this), _facts(this), _note(this), _levels(this), _table(this)
+SheetPartView::SheetPartView(QAbstractScrollArea& around, QWidget* parent)
+    : QWidget(parent), _caption(this), _facts(this), _note(this), _levels(this), _table(around, this)
 {
     auto* layout = new QVBoxLayout(this);
     layout->setContentsMargins(0, 0, 0, 0);
@@ -285,7 +279,7 @@ SheetView::SheetView(SheetOwner& owner, QWidget* parent)
     _scroll.setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     _scroll.setWidget(&_inside);
     _scroll.setFocusPolicy(Qt::NoFocus);
-    scrollByTouch(_scroll);
+    new DragScroll(_scroll);
     _layout.setContentsMargins(0, 2, 0, 0);
     _layout.setSpacing(0);
     _layout.addLayout(bar);
@@ -307,7 +301,7 @@ void SheetView::setContents(const SheetContents& contents)
         _parts.pop_back();
     }
     while (_parts.size() < contents.parts.size()) {
-        auto* part = new SheetPartView(&_inside);
+        auto* part = new SheetPartView(_scroll, &_inside);
         _insideLayout.insertWidget(_insideLayout.count() - 1, part);
         connect(part->table().horizontalHeader(), &QHeaderView::sectionClicked, this, [this](int column) {
             if (_owner && _canSort)

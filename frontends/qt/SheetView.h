@@ -32,7 +32,8 @@ private:
 /// A table of a sheet: Qt's, so that a screen reader has its rows, columns and headings.
 class SheetTableView final : public QTableWidget {
 public:
-    explicit SheetTableView(QWidget* parent);
+    /// `around` scrolls up and down what is higher than the screen.
+    SheetTableView(QAbstractScrollArea& around, QWidget* parent);
     /// Changes only what differs, so that nothing moves under the eye.
     void setTable(const SheetTable& table);
     /// As high as its rows, without scrolling.
@@ -46,7 +47,7 @@ private:
 /// A part of a sheet: caption, facts, levels, table, note.
 class SheetPartView final : public QWidget {
 public:
-    explicit SheetPartView(QWidget* parent);
+    SheetPartView(QAbstractScrollArea& around, QWidget* parent);
     /// `alone`: the table has the rest of the sheet, and scrolls.
     void setPart(const SheetPart& part, bool alone);
     SheetTableView& table() { return _table; }

@@ -2,6 +2,7 @@
 
 #include "frontends/qt/ContextMenu.h"
 #include "frontends/qt/Copying.h"
+#include "frontends/qt/Drag.h"
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/Measures.h"
 #include "frontends/qt/Paint.h"
@@ -14,7 +15,6 @@
 #include <QKeyEvent>
 #include <QMouseEvent>
 #include <QScrollBar>
-#include <QScroller>
 #include <QStyleHints>
 #include <QToolTip>
 #include <algorithm>
@@ -80,12 +80,7 @@ Table::Table(TableDataSource& source) : _source(source), _hint(viewport())
     viewport()->setAutoFillBackground(true);
     _mark = new ScrollMark(*verticalScrollBar(), viewport());
 
-    QScrollerProperties properties;
-    properties.setScrollMetric(QScrollerProperties::VerticalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
-    properties.setScrollMetric(QScrollerProperties::HorizontalOvershootPolicy, QScrollerProperties::OvershootAlwaysOff);
-    // the table itself distinguishes drags from taps
-    properties.setScrollMetric(QScrollerProperties::DragStartDistance, 0.0);
-    QScroller::scroller(this)->setScrollerProperties(properties);
+    setUpScroller(*this); // the table itself distinguishes drags from taps
     _hold.setSingleShot(true);
     connect(&_hold, &QTimer::timeout, this, [this] { held(); });
     connect(&FocusRing::instance(), &FocusRing::changed, this, [this] { refreshLooks(); });
@@ -329,18 +324,11 @@ void Table::scrollContentsBy(int, int)
 
 // Touch and mouse -----------------------------------------------------------------------------------------------
 
-void Table::feed(QScroller& scroller, int input, const QMouseEvent& event)
-{
-    const QPointF at = input == QScroller::InputPress && _press ? _press->at : event.position();
-    scroller.handleInput(static_cast<QScroller::Input>(input), at, static_cast<qint64>(event.timestamp()));
-}
-
 void Table::mousePressEvent(QMouseEvent* event)
 {
     if (event->button() != Qt::LeftButton)
         return event->ignore();
-    QScroller& upright = *QScroller::scroller(this);
-    const bool stops = upright.state() == QScroller::Scrolling;
+    const bool stops = QScroller::scroller(this)->state() == QScroller::Scrolling;
     _press = Press{event->position(), stops ? std::nullopt : rowAt(event->position()), Drag::Undecided, nullptr, {}};
     if (const auto row = rowAt(event->position()))
         if (const Cell* cell = cellAt(*row)) {
@@ -349,9 +337,9 @@ void Table::mousePressEvent(QMouseEvent* event)
         }
     if (_press->row)
         _hold.start(QGuiApplication::styleHints()->mousePressAndHoldInterval());
-    feed(upright, QScroller::InputPress, *event);
+    feed(*this, QScroller::InputPress, *event, _press->at);
     if (_press->strip)
-        feed(*QScroller::scroller(_press->strip.data()), QScroller::InputPress, *event);
+        feed(*_press->strip, QScroller::InputPress, *event, _press->at);
     refreshLooks();
 }
 
@@ -361,8 +349,7 @@ void Table::mouseMoveEvent(QMouseEvent* event)
         return;
     const QPointF moved = event->position() - _press->at;
     if (_press->drag == Drag::Undecided) {
-        constexpr double kStart = 8; // points; a finger moves less than this during a tap
-        if (moved.manhattanLength() < kStart)
+        if (moved.manhattanLength() < kDragStart)
             return;
         const bool sideways = std::abs(moved.x()) > std::abs(moved.y());
         if (!sideways)
@@ -375,18 +362,18 @@ void Table::mouseMoveEvent(QMouseEvent* event)
         refreshLooks();
     }
     if (_press->drag == Drag::Upright)
-        feed(*QScroller::scroller(this), QScroller::InputMove, *event);
+        feed(*this, QScroller::InputMove, *event, event->position());
     else if (_press->drag == Drag::Sideways && _press->strip)
-        feed(*QScroller::scroller(_press->strip.data()), QScroller::InputMove, *event);
+        feed(*_press->strip, QScroller::InputMove, *event, event->position());
 }
 
 void Table::mouseReleaseEvent(QMouseEvent* event)
 {
     if (event->button() != Qt::LeftButton || !_press)
         return event->ignore();
-    feed(*QScroller::scroller(this), QScroller::InputRelease, *event);
+    feed(*this, QScroller::InputRelease, *event, event->position());
     if (_press->strip)
-        feed(*QScroller::scroller(_press->strip.data()), QScroller::InputRelease, *event);
+        feed(*_press->strip, QScroller::InputRelease, *event, event->position());
     const Press press = *std::exchange(_press, std::nullopt);
     _hold.stop();
     refreshLooks();

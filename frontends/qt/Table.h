@@ -15,7 +15,6 @@
 #include <vector>
 
 class QHelpEvent;
-class QScroller;
 
 namespace kestrum::qt {
 
@@ -112,7 +111,6 @@ private:
     void place();
     void refreshLooks();
     void scrollTo(std::size_t row);
-    void feed(QScroller& scroller, int input, const QMouseEvent& event);
     void scrollSideways(std::size_t row, double by);
     /// False when the row already is at its place.
     bool bringBack(std::size_t row);

@@ -2,6 +2,8 @@
 #include "QtTest.h"
 
 #include <QHeaderView>
+#include <QScrollBar>
+#include <QScroller>
 
 namespace kestrum {
 namespace {
@@ -28,6 +30,11 @@ protected:
         sheet = navigation().openSheet(*this);
         sheet->setContents(contents());
     }
+    void fill(const SheetContents& contents)
+    {
+        sheet->setContents(contents);
+        QCoreApplication::processEvents(); // Qt lays it out
+    }
     static SheetContents contents()
     {
         SheetPart part{.caption = "Neighbours", .facts = {{"PCI", {"7"}}, {"RSRP", {"-90 dBm", 0.5, "good"}}}};
@@ -38,6 +45,14 @@ protected:
         part.table.sort = {1, true};
         return {.title = "A list", .parts = {part}, .status = "Updated now", .canSort = true};
     }
+    static std::vector<SheetRow> rowsOf(std::size_t count)
+    {
+        std::vector<SheetRow> rows;
+        for (std::size_t i = 0; i < count; ++i)
+            rows.push_back({.identity = std::to_string(i), .cells = {{std::to_string(i)}, {"-95"}}});
+        return rows;
+    }
+    QPoint placeOf(const QWidget& part) { return part.mapTo(navigation().insight(), QPoint()); }
     SheetTableView& shownTable() { return navigation().insight()->parts().front()->table(); }
 
     Rows rows = Rows::leaves(3);
@@ -79,6 +94,37 @@ TEST_F(SheetViewTest, AHeadingThatIsPressedSorts)
     QTest::mouseClick(header->viewport(), Qt::LeftButton, {},
                       {header->sectionViewportPosition(1) + 5, header->height() / 2});
     EXPECT_THAT(chosen, testing::ElementsAre(1u));
+}
+
+TEST_F(SheetViewTest, AFingerScrollsATableAndPressesNothing)
+{
+    open();
+    auto longer = contents();
+    longer.canSort = false;
+    longer.parts[0].table.rows = rowsOf(60);
+    fill(longer);
+    auto& viewport = *shownTable().viewport();
+    pressAndMove(viewport, {100, 300}, {100, 200});
+    EXPECT_TRUE(QTest::qWaitFor([&] { return shownTable().verticalScrollBar()->value() > 80; }));
+    release(viewport, {100, 200});
+    QScroller::scroller(&viewport)->stop();
+    const int moved = shownTable().verticalScrollBar()->value();
+    click(viewport, {100, 200});
+    QTest::mouseMove(window().windowHandle(), viewport.mapTo(&window(), QPoint(100, 100)));
+    EXPECT_EQ(shownTable().verticalScrollBar()->value(), moved) << "no finger is down";
+}
+
+TEST_F(SheetViewTest, AFingerOnATableOfSeveralScrollsTheSheet)
+{
+    open();
+    auto several = contents();
+    several.parts[0].table.rows = rowsOf(30);
+    several.parts.push_back(several.parts[0]);
+    fill(several);
+    const int before = placeOf(shownTable()).y();
+    pressAndMove(*shownTable().viewport(), {100, 300}, {100, 200});
+    EXPECT_TRUE(QTest::qWaitFor([&] { return placeOf(shownTable()).y() < before - 80; }));
+    release(*navigation().insight(), {100, 300});
 }
 
 TEST_F(SheetViewTest, KeysOpenThem)
