@@ -25,7 +25,7 @@ ContextMenu::ContextMenu(Table& table, std::optional<std::size_t> row, QPoint at
         addAction(QStringLiteral("Copy row"), &table, [whole] { copy(whole); });
     }
     addAction(QStringLiteral("Copy pane as text"), &table, [&table] { copy(paneAsText(table)); });
-    for (const auto& [text, action] : table.menuEntries())
+    for (const auto& [text, action] : table.menuEntries(row))
         addAction(text, &table, action);
     table.installEventFilter(this);
     popup(at);

@@ -30,6 +30,12 @@ void takeAway(QWidget& widget)
     widget.setEnabled(false);
 }
 
+/// The row that a sheet is about.
+std::optional<std::size_t> rowFor(const SheetCommand& command, std::optional<std::size_t> row)
+{
+    return command.isOfRow ? row : std::nullopt;
+}
+
 /// The sheet as its owner has it. The widget outlives it where its own input ends it.
 class OpenSheet final : public Sheet {
 public:
@@ -204,14 +210,7 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
     bring(screen.toolbar(), _panes);
     fresh->clearSelection();
     fresh->onSwipeBack([this] { goBack(); });
-    fresh->onMenu([this] {
-        std::vector<Table::MenuEntry> entries{
-            {_moments.isHidden() ? QStringLiteral("Freeze") : QStringLiteral("Live"), [this] { look(Look::Freeze); }}};
-        for (const auto& command : kSheetCommands)
-            if (_delegate.offers(command.kind, std::nullopt))
-                entries.push_back({lineOf(command.name), [this, kind = command.kind] { requestSheet(kind, {}); }});
-        return entries;
-    });
+    fresh->onMenu([this](std::optional<std::size_t> row) { return menuOf(row); });
     setTitles(std::move(titles));
     arrange();
     fresh->show();
@@ -240,6 +239,17 @@ void Navigation::show(TableScreen& pane, std::vector<std::string> titles, Transi
                 still->move(qRound(-0.8 * way * done), 0);
         },
         [still] { delete still; });
+}
+
+std::vector<Table::MenuEntry> Navigation::menuOf(std::optional<std::size_t> row)
+{
+    std::vector<Table::MenuEntry> entries{
+        {_moments.isHidden() ? QStringLiteral("Freeze") : QStringLiteral("Live"), [this] { look(Look::Freeze); }}};
+    for (const auto& command : kSheetCommands)
+        if (_delegate.offers(command.kind, rowFor(command, row)))
+            entries.push_back({lineOf(command.name), [this, command] { requestSheet(command); }});
+    entries.push_back({QStringLiteral("Keep the last 15 minutes"), [this] { keep(); }});
+    return entries;
 }
 
 void Navigation::setTitles(std::vector<std::string> titles)
@@ -336,10 +346,18 @@ void Navigation::closeInsight()
     view->deleteLater(); // its own input may have closed it
 }
 
-void Navigation::requestSheet(SheetKind kind, std::optional<std::size_t> row)
+void Navigation::requestSheet(const SheetCommand& command)
 {
-    if (!_sheet && !_insight)
-        _delegate.sheetRequested(kind, row);
+    // The row of an open menu is the current one, and stays it when rows are added above it.
+    const auto row = rowFor(command, _table ? _table->current() : std::nullopt);
+    if (!_sheet && !_insight && _delegate.offers(command.kind, row))
+        _delegate.sheetRequested(command.kind, row);
+}
+
+void Navigation::keep()
+{
+    if (!_sheet)
+        _delegate.keepRequested();
 }
 
 void Navigation::takeFocus()
@@ -396,10 +414,10 @@ void Navigation::keyPressEvent(QKeyEvent* event)
         look(Look::Freeze);
     else if (event->text() == u"," || event->text() == u".")
         look(event->text() == u"," ? Look::Earlier : Look::Later);
-    else if (once && event->text() == u"v")
-        requestSheet(SheetKind::Glance, {});
-    else if (once && event->text() == u"o")
-        requestSheet(SheetKind::Overview, {});
+    else if (once && event->text() == QLatin1Char(kKeepKey))
+        keep();
+    else if (const auto* command = sheetCommandOf(*event); once && command)
+        requestSheet(*command);
     else if (once && control && key == Qt::Key_S)
         pressSave();
     else if (once && _table && ((control && key == Qt::Key_F) || event->text() == u"/"))

@@ -81,7 +81,9 @@ private:
     void goBack();
     void pressSave();
     void look(Look look);
-    void requestSheet(SheetKind kind, std::optional<std::size_t> row);
+    void keep();
+    std::vector<Table::MenuEntry> menuOf(std::optional<std::size_t> row);
+    void requestSheet(const SheetCommand& command);
     void closeInsight();
 
     NavigationViewDelegate& _delegate;

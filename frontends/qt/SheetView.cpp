@@ -13,6 +13,7 @@
 #include <QScrollBar>
 #include <QStyledItemDelegate>
 
+#include <algorithm>
 #include <utility>
 
 namespace kestrum::qt {
@@ -62,6 +63,15 @@ void setUp(QLabel& label, const QFont& font, bool muted = false)
 }
 
 } // namespace
+
+const SheetCommand* sheetCommandOf(const QKeyEvent& event)
+{
+    if (event.modifiers() & (Qt::ControlModifier | Qt::AltModifier | Qt::MetaModifier))
+        return nullptr;
+    const auto* found = std::ranges::find_if(
+        kSheetCommands, [&](const auto& command) { return event.text() == QLatin1Char(command.key); });
+    return found == kSheetCommands.end() ? nullptr : found;
+}
 
 LevelBar::LevelBar(QWidget* parent) : QWidget(parent)
 {
@@ -330,7 +340,7 @@ void SheetView::keyPressEvent(QKeyEvent* event)
     const int key = event->key();
     const bool alt = event->modifiers() == Qt::AltModifier;
     const bool leaves = key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back ||
-                        (alt && key == Qt::Key_Left) || event->text() == u"v" || event->text() == u"o";
+                        (alt && key == Qt::Key_Left) || sheetCommandOf(*event);
     if (leaves && !event->isAutoRepeat())
         leave();
     else if (key == Qt::Key_Down || key == Qt::Key_PageDown)

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "frontends/qt/Button.h"
+#include "platform/NavigationView.h"
 #include "platform/Sheet.h"
 
 #include <QAbstractSlider>
@@ -14,6 +15,9 @@
 #include <vector>
 
 namespace kestrum::qt {
+
+/// The command of a key; null for another key.
+const SheetCommand* sheetCommandOf(const QKeyEvent& event);
 
 /// The value of a level as a thin line, on the scale of its key.
 class LevelBar final : public QWidget {

@@ -60,14 +60,18 @@ public:
     /// Called after a swipe from the left edge.
     void onSwipeBack(std::function<void()> action) { _swipedBack = std::move(action); }
 
-    /// An entry of the menu that does not concern the row.
+    /// An entry of the menu that the table does not add itself.
     struct MenuEntry {
         QString text;
         std::function<void()> action;
     };
+    using MenuOf = std::function<std::vector<MenuEntry>(std::optional<std::size_t> row)>;
     /// Called when the menu opens.
-    void onMenu(std::function<std::vector<MenuEntry>()> entries) { _menuEntries = std::move(entries); }
-    std::vector<MenuEntry> menuEntries() const { return _menuEntries ? _menuEntries() : std::vector<MenuEntry>(); }
+    void onMenu(MenuOf entries) { _menuOf = std::move(entries); }
+    std::vector<MenuEntry> menuEntries(std::optional<std::size_t> row) const
+    {
+        return _menuOf ? _menuOf(row) : std::vector<MenuEntry>();
+    }
 
     QSize sizeHint() const override;
 
@@ -130,7 +134,7 @@ private:
     FollowedRow _current, _selected;
     std::optional<Press> _press;
     std::function<void()> _swipedBack;
-    std::function<std::vector<MenuEntry>()> _menuEntries;
+    MenuOf _menuOf;
     int _laidOutWidth = -1;
     bool _filling = false, _stale = true, _fitsRows = false, _ringKept = false;
     QTimer _hold; ///< runs while a finger stays on a row

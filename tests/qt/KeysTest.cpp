@@ -6,6 +6,9 @@
 #include <QClipboard>
 #include <QGuiApplication>
 
+#include <algorithm>
+#include <utility>
+
 namespace kestrum {
 namespace {
 
@@ -61,10 +64,18 @@ protected:
             if (each->text() == text)
                 QTest::mouseClick(menu(), Qt::LeftButton, {}, menu()->actionGeometry(each).center());
     }
+    bool offers(SheetKind kind, std::optional<std::size_t> row) const override
+    {
+        const bool isOfRow = kind == SheetKind::Trend || kind == SheetKind::Meaning;
+        return std::ranges::count(offered, kind) && isOfRow == row.has_value();
+    }
+    void sheetRequested(SheetKind kind, std::optional<std::size_t> row) override { requested.emplace_back(kind, row); }
     qt::Jump& jump() { return navigation().jump(); }
 
     Rows rows = Rows::leaves(40);
     std::unique_ptr<TableScreen> _screen;
+    std::vector<SheetKind> offered;
+    std::vector<std::pair<SheetKind, std::optional<std::size_t>>> requested;
     int saves = 0;
 };
 
@@ -193,13 +204,15 @@ TEST_F(Keys, OpenTheMenuOfTheCurrentRow)
 {
     walkTo(1);
     key(Qt::Key_Menu);
-    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze"));
+    EXPECT_THAT(choices(),
+                ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze", "Keep the last 15 minutes"));
     key(Qt::Key_Escape);
     EXPECT_EQ(menu(), nullptr);
     EXPECT_EQ(backs, 0);
     walkTo(3);
     key(Qt::Key_F10, Qt::ShiftModifier);
-    EXPECT_THAT(choices(), ElementsAre("Copy row", "Copy pane as text", "Freeze")) << "what opens has no value";
+    EXPECT_THAT(choices(), ElementsAre("Copy row", "Copy pane as text", "Freeze", "Keep the last 15 minutes"))
+        << "what opens has no value";
     key(Qt::Key_Down);
     key(Qt::Key_Return);
     EXPECT_EQ(clipboard(), "Neighbours");
@@ -209,7 +222,8 @@ TEST_F(Keys, OpenTheMenuOfTheCurrentRow)
 TEST_F(Keys, CopyFromTheMenuByTheMouse)
 {
     click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
-    ASSERT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze"));
+    ASSERT_THAT(choices(),
+                ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze", "Keep the last 15 minutes"));
     EXPECT_EQ(table().current(), 1u);
     choose("Copy value");
     EXPECT_EQ(clipboard(), "-95.25 dBm");
@@ -248,7 +262,8 @@ TEST_F(Keys, OpenTheMenuByALongPressOfAFinger)
     QTest::touchEvent(window().windowHandle(), device).press(0, at);
     EXPECT_TRUE(QTest::qWaitFor([] { return menu() != nullptr; }));
     QTest::touchEvent(window().windowHandle(), device).release(0, at);
-    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze"));
+    EXPECT_THAT(choices(),
+                ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze", "Keep the last 15 minutes"));
     EXPECT_THAT(rows.selected, IsEmpty());
     for (const auto* each : menu()->actions())
         EXPECT_GE(menu()->actionGeometry(const_cast<QAction*>(each)).height(), 44);
@@ -273,6 +288,56 @@ TEST_F(Keys, CloseTheMenuWhenItsPaneIsCoveredOrLeaves)
     navigation().show(*other, {"Kestrum"}, Transition::Pop, false);
     EXPECT_EQ(menu(), nullptr);
     navigation().show(*_screen, {"Kestrum"}, Transition::None, false);
+}
+
+TEST_F(Keys, OpenTheSheetsOfTheRowAndOfThePane)
+{
+    offered = {SheetKind::Trend, SheetKind::Events};
+    type("te");
+    EXPECT_THAT(requested, ElementsAre(std::pair(SheetKind::Events, std::nullopt))) << "no row is current yet";
+    walkTo(1);
+    type("tevi");
+    EXPECT_THAT(requested, ElementsAre(std::pair(SheetKind::Events, std::nullopt),
+                                       std::pair(SheetKind::Trend, std::optional<std::size_t>(1)),
+                                       std::pair(SheetKind::Events, std::nullopt)));
+    key(Qt::Key_T, Qt::ControlModifier);
+    EXPECT_EQ(requested.size(), 3u);
+}
+
+TEST_F(Keys, OfferTheSheetsOfTheRowInItsMenu)
+{
+    offered = {SheetKind::Overview, SheetKind::Trend, SheetKind::Meaning};
+    click(*table().viewport(), middleOf(table(), 1), Qt::RightButton);
+    EXPECT_THAT(choices(), ElementsAre("Copy value", "Copy row", "Copy pane as text", "Freeze", "Overview", "Trend",
+                                       "What it means", "Keep the last 15 minutes"));
+    rows.rows.insert(rows.rows.begin(), {"new", "row"});
+    _screen->table().reloadData();
+    choose("Trend");
+    EXPECT_THAT(requested, ElementsAre(std::pair(SheetKind::Trend, std::optional<std::size_t>(2)))) << "the same row";
+}
+
+TEST_F(Keys, KeepFromAKeyAndFromTheMenu)
+{
+    type("k");
+    EXPECT_EQ(keeps, 0);
+    type("K");
+    EXPECT_EQ(keeps, 1);
+    walkTo(1);
+    key(Qt::Key_Menu);
+    choose("Keep the last 15 minutes");
+    EXPECT_EQ(keeps, 2);
+}
+
+TEST_F(Keys, HaveTheWholeMenuOnASmallScreen)
+{
+    offered = {SheetKind::Glance,  SheetKind::Overview, SheetKind::Trend,
+               SheetKind::Meaning, SheetKind::Events,   SheetKind::Cells};
+    walkTo(1);
+    key(Qt::Key_Menu);
+    ASSERT_NE(menu(), nullptr);
+    EXPECT_EQ(choices().size(), 11u);
+    EXPECT_LE(menu()->sizeHint().width(), 360);
+    EXPECT_LE(menu()->sizeHint().height(), 640);
 }
 
 // Search for a name
