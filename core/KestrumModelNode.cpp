@@ -49,10 +49,15 @@ std::vector<const Dictionary::Entry*> shownEntries(const Dictionary& dictionary,
 
 KestrumModelNodeRef makeNode(std::string name, const Value& object);
 
-KestrumModelNodes childrenOf(const Dictionary& dictionary)
+bool isSorted(const Dictionary& dictionary)
 {
     const Value* marker = dictionary.find(kSortedKey);
-    const bool sorted = marker != nullptr && !marker->isNull();
+    return marker != nullptr && !marker->isNull();
+}
+
+KestrumModelNodes childrenOf(const Dictionary& dictionary)
+{
+    const bool sorted = isSorted(dictionary);
     const auto entries = shownEntries(dictionary, sorted);
     KestrumModelNodes children;
     children.reserve(entries.size());
@@ -106,6 +111,45 @@ KestrumModelNodeRef nodeBelow(const KestrumModelNode& parent, std::string_view r
     return nullptr;
 }
 
+/// A step from a container, and the name of the row there.
+struct Step {
+    std::string key, name;
+    const Value* value;
+};
+
+/// As `makeNode` names and orders the rows.
+std::vector<Step> stepsFrom(const Value& object)
+{
+    std::vector<Step> steps;
+    if (const auto* dictionary = object.borrowedDictionary()) {
+        const bool sorted = isSorted(*dictionary);
+        for (const auto* entry : shownEntries(*dictionary, sorted))
+            steps.push_back(
+                {entry->key, std::string(sorted ? nameInSortedMode(entry->key) : entry->key), &entry->value});
+    } else if (const auto* array = object.borrowedArray()) {
+        for (const auto& element : *array)
+            steps.push_back({std::to_string(steps.size()), std::to_string(steps.size()), &element});
+    }
+    return steps;
+}
+
+/// As `nodeBelow`; `found` has the steps so far.
+const Value* valueBelow(const Value& parent, std::string_view rest, std::vector<std::string>& found)
+{
+    for (auto& [key, name, value] : stepsFrom(parent) | std::views::reverse) {
+        const auto component = componentOf(name);
+        const bool isWhole = rest == component;
+        if (!isWhole && (!rest.starts_with(component) || rest[component.size()] != '/'))
+            continue;
+        found.push_back(key);
+        const Value* below = isWhole ? value : valueBelow(*value, rest.substr(component.size() + 1), found);
+        if (below != nullptr)
+            return below;
+        found.pop_back();
+    }
+    return nullptr;
+}
+
 /// A path and the "/" that ends it.
 std::string withSlash(std::string_view path)
 {
@@ -128,6 +172,18 @@ KestrumModelNodeRef PathDictionary::find(std::string_view path) const
         return _node;
     const auto start = withSlash(_path);
     return path.starts_with(start) ? nodeBelow(*_node, path.substr(start.size())) : nullptr;
+}
+
+std::vector<std::string> stepsToRow(const Value& object, std::string_view path, std::size_t row)
+{
+    const ArrayLocked locked;
+    std::vector<std::string> steps;
+    const Value* node = path == kRootPath ? &object : valueBelow(object, path.substr(kRootPath.size()), steps);
+    const auto rows = node != nullptr ? stepsFrom(*node) : std::vector<Step>();
+    if (row >= rows.size())
+        return {};
+    steps.push_back(rows[row].key);
+    return steps;
 }
 
 KestrumModelNodeRef buildNode(std::string name, const Value& object, PathDictionary& pathDictionary, std::string path)

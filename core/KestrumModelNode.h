@@ -37,6 +37,10 @@ private:
     KestrumModelNodeRef _node;
 };
 
+/// The keys, and the indexes in lists, that lead to a row of the node at the path, in the object that the tree was made
+/// from. Empty when there is no such row.
+std::vector<std::string> stepsToRow(const Value& object, std::string_view path, std::size_t row);
+
 /// A row of the display and the rows below it.
 class KestrumModelNode {
 public:

@@ -35,6 +35,12 @@ std::string_view identityIn(std::string_view text)
 
 } // namespace
 
+std::string titleOf(const Event& event)
+{
+    const auto kind = word(event.kind);
+    return event.name == kind ? std::string(kind) : formatted("%@ (%@)", kind, event.name);
+}
+
 void Events::add(Event event)
 {
     _events.push_back(std::move(event));

@@ -31,6 +31,9 @@ struct Event {
     std::string levels = {}; ///< of the serving cell at that moment: "RSRP -98.25 dBm, RSRQ -11.00 dB"
 };
 
+/// "reselection (LTE)"
+std::string titleOf(const Event& event);
+
 /// The latest events, the oldest first. At most `kMost`; beyond that the oldest go.
 class Events {
 public:

@@ -4,6 +4,7 @@
 #include "support/Format.h"
 
 #include <algorithm>
+#include <limits>
 
 namespace kestrum {
 namespace {
@@ -31,7 +32,11 @@ std::optional<double> numberOf(const KeyEntry& entry, const Value& value)
     const auto measured = numberIn(value);
     if (!measured)
         return std::nullopt;
-    const auto& [number, unit] = *measured;
+    return numberOf(entry, measured->number, measured->unit);
+}
+
+std::optional<double> numberOf(const KeyEntry& entry, double number, std::string_view unit)
+{
     if (unit == entry.in.unit)
         return number;
     if (unit != entry.in.secondUnit)
@@ -50,6 +55,22 @@ std::optional<Verdict> verdictOf(const KeyEntry& entry, const Value& value, cons
     if (isOtherThanGsm(beside))
         return std::nullopt;
     return thresholds.grade(Measure::RxLev, entry.in.unit.empty() ? levelOfRxLev(*number) : *number);
+}
+
+std::vector<GradeBand> bandsOf(const KeyEntry& entry, const Dictionary* beside, const Thresholds& thresholds)
+{
+    using enum Grade;
+    const bool isRxLev = entry.in.measure == Measure::RxLev;
+    const auto* limits = isRxLev && isOtherThanGsm(beside) ? nullptr : thresholds.limitsOf(entry.in.measure);
+    if (limits == nullptr)
+        return {};
+    const double shift = isRxLev && entry.in.unit.empty() ? levelOfRxLev(0) : 0;
+    const auto at = [shift](double limit) { return limit - shift; };
+    constexpr double kLeast = -std::numeric_limits<double>::infinity();
+    const auto& [measure, excellent, good, fair, poor] = *limits;
+    if (poor < excellent)
+        return {{kLeast, NoService}, {at(poor), Poor}, {at(fair), Fair}, {at(good), Good}, {at(excellent), Excellent}};
+    return {{kLeast, Excellent}, {at(excellent), Good}, {at(good), Fair}, {at(fair), Poor}, {at(poor), NoService}};
 }
 
 Explanation explain(const KeyEntry& entry, const Value& value, const Dictionary* beside, const Thresholds& thresholds)

@@ -1,5 +1,7 @@
 #include "insight/NumberIn.h"
 
+#include "support/Format.h"
+
 #include <algorithm>
 #include <charconv>
 #include <cmath>
@@ -44,6 +46,20 @@ std::optional<NumberAndUnit> numberIn(const Value& value)
     }
     const auto* text = value.borrowedString();
     return text != nullptr ? numberInText(*text) : std::nullopt;
+}
+
+std::string shortText(double number)
+{
+    auto text = formatted("%.2f", number);
+    text.erase(text.find_last_not_of('0') + 1);
+    if (text.ends_with('.'))
+        text.pop_back();
+    return text == "-0" ? "0" : text;
+}
+
+std::string withUnit(std::string_view text, std::string_view unit)
+{
+    return unit.empty() ? std::string(text) : formatted("%@ %@", text, unit);
 }
 
 } // namespace kestrum

@@ -308,15 +308,25 @@ bool Thresholds::use(std::string_view name)
     return true;
 }
 
+const Limits* Thresholds::limitsOf(Measure measure) const
+{
+    const auto* profile = profileOf(measure);
+    return profile != nullptr ? &*std::ranges::find(profile->limits, measure, &Limits::measure) : nullptr;
+}
+
 std::optional<Verdict> Thresholds::grade(Measure measure, double number) const
 {
+    const auto* profile = profileOf(measure);
+    const auto grade = profile != nullptr ? limitsOf(measure)->grade(number) : std::nullopt;
+    return grade ? std::optional(Verdict{*grade, profile->name, profile->source}) : std::nullopt;
+}
+
+const ThresholdProfile* Thresholds::profileOf(Measure measure) const
+{
     for (const auto* profile : {&used(), &_profiles.front()})
-        if (const auto limits = std::ranges::find(profile->limits, measure, &Limits::measure);
-            limits != profile->limits.end()) {
-            const auto grade = limits->grade(number);
-            return grade ? std::optional(Verdict{*grade, profile->name, profile->source}) : std::nullopt;
-        }
-    return std::nullopt;
+        if (std::ranges::find(profile->limits, measure, &Limits::measure) != profile->limits.end())
+            return profile;
+    return nullptr;
 }
 
 } // namespace kestrum

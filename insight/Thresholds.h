@@ -58,11 +58,15 @@ public:
     /// False, without effect, when there is no such profile.
     bool use(std::string_view name);
 
+    /// Of the used profile, or of "drive-test" where it leaves the measure out; null for a measure that is not graded.
+    const Limits* limitsOf(Measure measure) const;
     /// `number` is in the measure's unit. Measures that the used profile leaves out have the limits of "drive-test".
     /// Nothing for a measure that is not graded, and for not-a-number.
     std::optional<Verdict> grade(Measure measure, double number) const;
 
 private:
+    const ThresholdProfile* profileOf(Measure measure) const;
+
     std::vector<ThresholdProfile> _profiles; ///< the first is "drive-test"
     std::size_t _used = 0;
 };

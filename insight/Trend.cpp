@@ -36,6 +36,18 @@ void appendStep(std::string& path, std::string_view name)
     }
 }
 
+/// The path with an index in place of each identity: as the key table knows rows.
+std::string withIndexes(std::string_view path)
+{
+    std::string all;
+    while (!path.empty()) {
+        const auto step = path.substr(0, path.find('/', 1));
+        all += step.find('=') != step.npos ? "/0" : step;
+        path.remove_prefix(step.size());
+    }
+    return all;
+}
+
 /// Texts for "no value", which are gaps in words too.
 bool isNothing(std::string_view text)
 {
@@ -50,21 +62,6 @@ bool isNothing(std::string_view text)
 bool isWord(Kind kind)
 {
     return kind == Kind::Identity || kind == Kind::State || kind == Kind::Text;
-}
-
-/// At most two digits after the point, and no zeros there: "-98", "-98.25".
-std::string shortText(double number)
-{
-    auto text = formatted("%.2f", number);
-    text.erase(text.find_last_not_of('0') + 1);
-    if (text.ends_with('.'))
-        text.pop_back();
-    return text == "-0" ? "0" : text;
-}
-
-std::string withUnit(const std::string& text, std::string_view unit)
-{
-    return unit.empty() ? text : formatted("%@ %@", text, unit);
 }
 
 /// The last step, as a pane shows it.
@@ -88,13 +85,22 @@ public:
     void display(const Value& node)
     {
         if (const auto* dictionary = node.borrowedDictionary())
-            in(*dictionary);
+            in(*dictionary, *dictionary);
     }
 
     std::size_t left() const { return _left; }
 
+    /// Whether it is a list as a tree of a modem has it: rows under numbers.
+    static bool isList(const Dictionary& dictionary)
+    {
+        return !dictionary.empty() && std::ranges::all_of(dictionary, [](const auto& entry) {
+            return !entry.key.empty() && entry.key.find_first_not_of("0123456789") == entry.key.npos &&
+                   entry.value.borrowedDictionary() != nullptr;
+        });
+    }
+
     /// The step to a row: its identity, or its index where it has none, or the same as an earlier row.
-    static std::string rowStep(const Dictionary* row, std::size_t index, const SectionEntry* list,
+    static std::string rowStep(const Dictionary* row, std::string_view index, const SectionEntry* list,
                                const Dictionary* beside, std::map<std::string, int>& seen)
     {
         std::string step;
@@ -112,15 +118,23 @@ public:
                     add(list->channel->key, section->borrowedDictionary()->find(list->channel->key));
         }
         if (step.empty())
-            return std::to_string(index);
+            return std::string(index);
         if (const int count = ++seen[step]; count > 1)
             step += formatted("#%d", count);
         return step;
     }
 
 private:
-    void in(const Dictionary& dictionary)
+    void in(const Dictionary& dictionary, const Dictionary& beside)
     {
+        if (isList(dictionary)) {
+            const auto* entry = sectionEntry(_technology, _path);
+            std::map<std::string, int> seen;
+            for (const auto& [key, value] : dictionary)
+                if (!isTooMany())
+                    below(rowStep(value.borrowedDictionary(), key, entry, &beside, seen), value, beside);
+            return;
+        }
         const bool isSorted = dictionary.contains(kSortedKey);
         for (const auto& [key, value] : dictionary)
             if (key != kSortedKey)
@@ -132,7 +146,15 @@ private:
         const auto* entry = sectionEntry(_technology, _path);
         std::map<std::string, int> seen;
         for (std::size_t i = 0; i < list.size(); ++i)
-            below(rowStep(list[i].borrowedDictionary(), i, entry, &beside, seen), list[i], beside);
+            if (!isTooMany())
+                below(rowStep(list[i].borrowedDictionary(), std::to_string(i), entry, &beside, seen), list[i], beside);
+    }
+
+    /// Counts a row that is left out before its identity is looked for.
+    bool isTooMany()
+    {
+        _left += _looked >= kMostLooked ? 1 : 0;
+        return _looked >= kMostLooked;
     }
 
     void below(std::string_view name, const Value& value, const Dictionary& beside)
@@ -145,7 +167,7 @@ private:
         const auto length = _path.size();
         appendStep(_path, name);
         if (const auto* dictionary = value.borrowedDictionary())
-            in(*dictionary);
+            in(*dictionary, beside);
         else if (const auto* list = value.borrowedArray())
             in(*list, beside);
         else
@@ -195,7 +217,7 @@ Trends::Series* Trends::seriesAt(std::string_view path, std::string_view technol
     if (_series.size() >= kMost && !dropOldest())
         return nullptr;
     auto& series = _series[std::string(path)];
-    const auto* entry = keyEntryAt(technology, path);
+    const auto* entry = keyEntryAt(technology, withIndexes(path));
     series.isOfWords = entry != nullptr && isWord(entry->kind);
     return &series;
 }
@@ -308,29 +330,35 @@ std::string Trends::pathOf(const Value& display, std::string_view technology, co
     const Value* node = &display;
     const Dictionary* beside = nullptr;
     for (const auto& step : steps) {
-        if (const auto* dictionary = node->borrowedDictionary()) {
-            beside = dictionary;
-            node = dictionary->find(step);
-            if (node == nullptr)
-                return {};
-            appendStep(path, nameOf(step, dictionary->contains(kSortedKey)));
-        } else if (const auto* list = node->borrowedArray()) {
-            std::map<std::string, int> seen;
-            const auto* entry = sectionEntry(technology, path);
-            std::string name;
-            std::size_t i = 0;
-            for (; i < list->size() && i < kMostLooked; ++i) {
-                name = Walk::rowStep((*list)[i].borrowedDictionary(), i, entry, beside, seen);
-                if (std::to_string(i) == step)
-                    break;
+        std::string name;
+        std::map<std::string, int> seen;
+        const auto* entry = sectionEntry(technology, path);
+        const auto nameRow = [&](const Value& row, std::string_view index) {
+            name = Walk::rowStep(row.borrowedDictionary(), index, entry, beside, seen);
+            return index == step;
+        };
+        const Value* found = nullptr;
+        if (const auto* list = node->borrowedArray()) {
+            for (std::size_t i = 0; i < list->size() && i < kMostLooked && found == nullptr; ++i)
+                if (nameRow((*list)[i], std::to_string(i)))
+                    found = &(*list)[i];
+        } else if (const auto* dictionary = node->borrowedDictionary()) {
+            if (Walk::isList(*dictionary)) {
+                for (const auto& [key, value] : *dictionary)
+                    if (nameRow(value, key)) {
+                        found = &value;
+                        break;
+                    }
+            } else {
+                found = dictionary->find(step);
+                name = nameOf(step, dictionary->contains(kSortedKey));
+                beside = dictionary;
             }
-            if (i >= list->size() || i >= kMostLooked)
-                return {};
-            appendStep(path, name);
-            node = &(*list)[i];
-        } else {
-            return {};
         }
+        if (found == nullptr)
+            return {};
+        appendStep(path, name);
+        node = found;
     }
     return path;
 }

@@ -114,10 +114,7 @@ private:
     {
         forEachNew([&](const Event& each) {
             std::string line = each.time ? timeText(each.time, kShortFraction) + "  " : std::string();
-            line += word(each.kind);
-            if (each.name != word(each.kind))
-                line += formatted(" (%@)", each.name);
-            line += ": ";
+            line += titleOf(each) + ": ";
             line += each.was.empty() ? each.is : formatted("%@ -> %@", each.was, each.is.empty() ? "?" : each.is);
             if (!each.levels.empty())
                 line += formatted("; %@", each.levels);

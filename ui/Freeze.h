@@ -18,6 +18,8 @@ public:
     Freeze(const Moments& moments, const Clock& clock) : _moments(moments), _clock(clock) {}
 
     bool isOn() const { return _shown.has_value(); }
+    /// The moment that is shown; nothing while the panes follow the modem.
+    const std::optional<Moment>& moment() const { return _shown; }
     /// Stands still at the newest moment. False when there is none.
     bool begin();
     void end() { _shown.reset(); }

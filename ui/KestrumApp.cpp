@@ -53,7 +53,7 @@ void KestrumApp::applicationDidFinishLaunching()
     root->setStatus("Connecting", true); // without dots until the first attempt has ended
     _navController = std::make_unique<NavigationStack>(_roles.toolkit, std::move(root));
     _navController->setDelegate(this);
-    _sheets.emplace(_navController->view(), readThresholds());
+    _sheets.emplace(_navController->view(), _history, readThresholds(), _roles.clock);
     _window->setRoot(_navController->view());
     _window->makeKeyAndVisible();
     followConnection();
@@ -173,7 +173,7 @@ void KestrumApp::reloadPanes()
         panes[i]->reloadWithNode(std::move(node));
     }
     if (_model)
-        _sheets->refresh(_model->technology(), panes.front()->node());
+        _sheets->refresh(shown());
 }
 
 void KestrumApp::lookRequested(Look look)
@@ -272,18 +272,21 @@ void KestrumApp::releaseModel()
     }
 }
 
-bool KestrumApp::offers(SheetKind kind, std::optional<std::size_t>) const
+bool KestrumApp::offers(SheetKind kind, std::optional<std::size_t> row) const
 {
-    const auto& pane = _navController->topViewController();
-    return _model && _sheets->offers(kind, _model->technology(), pane.path(), pane.node());
+    return _model && _sheets->offers(kind, _model->technology(), _navController->topViewController(), row);
 }
 
-void KestrumApp::sheetRequested(SheetKind kind, std::optional<std::size_t>)
+void KestrumApp::sheetRequested(SheetKind kind, std::optional<std::size_t> row)
 {
-    const auto& panes = _navController->viewControllers();
-    _sheets->open(kind, _model->technology(), panes.back()->path());
-    _sheets->refresh(_model->technology(), panes.front()->node());
+    _sheets->open(kind, shown(), _navController->topViewController(), row);
     updateStatus();
+}
+
+Shown KestrumApp::shown() const
+{
+    return {_model->technology(), _navController->viewControllers().front()->node(),
+            _freeze.isOn() ? _freeze.moment() : _history.moments().newest()};
 }
 
 void KestrumApp::willShowViewController(NavigationStack&, KestrumPaneController& viewController, bool)

@@ -85,6 +85,7 @@ private:
     void followConnection();
     /// The program's and the user's. A bad file of the user is told.
     Thresholds readThresholds();
+    Shown shown() const;
     void closePanes();
     void reloadPanes();
     void offerMoments();

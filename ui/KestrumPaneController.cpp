@@ -66,7 +66,7 @@ std::size_t KestrumPaneController::numberOfRowsInSection(TableView&, std::size_t
 
 std::shared_ptr<ReusableCell> KestrumPaneController::cellForRowAtIndexPath(TableView& table, IndexPath indexPath)
 {
-    const auto child = childAtIndexPath(indexPath);
+    const auto child = childAt(indexPath.row);
     auto cell = std::static_pointer_cast<KestrumCell>(table.dequeueReusableCell(kReuseIdentifier));
     // A reused cell may be of the other kind: a leaf then shows its name only, an inner row keeps an empty strip.
     if (child && child->childNodes()) {
@@ -90,7 +90,7 @@ std::shared_ptr<ReusableCell> KestrumPaneController::cellForRowAtIndexPath(Table
 
 void KestrumPaneController::didSelectRowAtIndexPath(TableView& table, std::optional<IndexPath> indexPath)
 {
-    const auto child = indexPath ? childAtIndexPath(*indexPath) : nullptr;
+    const auto child = indexPath ? childAt(indexPath->row) : nullptr;
     if (!child)
         return; // no row, or a row that was just removed
     if (!child->childNodes()) {
@@ -126,10 +126,10 @@ void KestrumPaneController::updateTitle()
         _navigationController->titlesChanged();
 }
 
-KestrumPaneController::Node KestrumPaneController::childAtIndexPath(IndexPath indexPath) const
+KestrumPaneController::Node KestrumPaneController::childAt(std::size_t row) const
 {
     const auto* children = _nodes ? _nodes->childNodes() : nullptr;
-    return children && indexPath.row < children->size() ? (*children)[indexPath.row] : nullptr;
+    return children && row < children->size() ? (*children)[row] : nullptr;
 }
 
 } // namespace kestrum

@@ -25,6 +25,8 @@ public:
     const std::string& path() const { return _keyPath; }
     const Node& node() const { return _nodes; }
     TableScreen& screen() { return *_screen; }
+    /// The node of a row; null when the row no longer exists.
+    Node childAt(std::size_t row) const;
 
     /// Called by the stack before the pane appears and before it disappears.
     void viewWillAppear(bool animated);
@@ -44,8 +46,6 @@ public:
 private:
     void createToolbarItems();
     void updateTitle();
-    /// Null when the row no longer exists.
-    Node childAtIndexPath(IndexPath indexPath) const;
 
     Toolkit& _toolkit;
     SharedApplication& _application;

@@ -326,5 +326,39 @@ TEST_F(WalkedArrays, DictionariesAreNotLocked)
     EXPECT_EQ(counts.locked, 0);
 }
 
+// Each row of each pane of a display with names in all ways that panes show.
+void expectSteps(const Value& display, const Value& object, const KestrumModelNode& node, const std::string& path)
+{
+    for (std::size_t row = 0; node.childNodes() && row < node.childNodes()->size(); ++row) {
+        const auto steps = stepsToRow(display, path, row);
+        ASSERT_FALSE(steps.empty()) << path << " row " << row;
+        const auto& key = steps.back();
+        const Value value = object.array() ? (*object.array())[std::stoul(key)] : object.dictionary()->at(key);
+        const auto& child = *(*node.childNodes())[row];
+        if (child.value() != nullptr)
+            EXPECT_EQ(value.text(), *child.value()) << path << " row " << row;
+        else
+            expectSteps(display, value, child, joinPath(path, child.displayName()));
+    }
+    EXPECT_TRUE(stepsToRow(display, path, 1000).empty());
+}
+
+TEST(StepsToRow, LeadToTheValueThatThePaneShows)
+{
+    const Value display = makeDictionary(
+        {{kSortedKey, kSortedKey},
+         {"10;Ten", "ten"},
+         {"2;Cells", makeArray({"a", makeDictionary({{"Level", "1"}, {"/x/", makeDictionary({{"y", "2"}})}}), "c"})},
+         {"Empty", Value()},
+         {"a;b;c", makeDictionary({{"n;Name", "3"}, {"Name/of", makeDictionary({{"it", "4"}})}})}});
+    PathDictionary paths;
+    const auto root = KestrumModelNode::makeTreeFromObject(display, paths);
+    expectSteps(display, display, *root, "/");
+    EXPECT_EQ(stepsToRow(display, "/Cells/1/x", 0), (std::vector<std::string>{"2;Cells", "1", "/x/", "y"}));
+    EXPECT_TRUE(stepsToRow(display, "/no such", 0).empty());
+    EXPECT_TRUE(stepsToRow(display, "/Ten", 0).empty());
+    EXPECT_TRUE(stepsToRow(Value(), "/", 0).empty());
+}
+
 } // namespace
 } // namespace kestrum

@@ -2,6 +2,7 @@
 
 #include "LogGenerator/Quantities.h"
 #include "doubles/DecodingDoubles.h"
+#include "insight/NoGenerator.h"
 #include "platform/TelephonyService.h"
 
 #include <gmock/gmock.h>
@@ -19,20 +20,6 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 
 constexpr Date kStart{std::chrono::sys_days(std::chrono::year(2026) / 11 / 16)};
-
-/// A generator that decodes nothing: the test changes the display.
-class NoGenerator final : public LogGenerator {
-public:
-    NoGenerator(DecodingRoles& roles, std::string_view technology) : LogGenerator(roles), name(technology) {}
-
-    std::string_view technology() const override { return name; }
-    void updateState(State&, Bytes) override {}
-    Value generateLogUsingState(State&) override { return {}; }
-    DictionaryRef getStartCommand() const override { return makeDictionary(); }
-    ArrayRef getSaveContentsFromState(const State&) const override { return makeArray(); }
-
-    std::string_view name;
-};
 
 /// A display under the test's control, watched after each "message".
 class Watching {
@@ -62,15 +49,7 @@ public:
     void record(LogCode code, std::uint8_t type = 1)
     {
         now += 10ms;
-        std::vector<std::byte> bytes(13);
-        const auto put = [&](std::size_t at, std::uint64_t number, std::size_t count) {
-            for (std::size_t i = 0; i < count; ++i)
-                bytes[at + i] = static_cast<std::byte>(number >> 8 * i);
-        };
-        put(0, type, 1);
-        put(3, code, 2);
-        put(5, timeStampFromDate(now), 8);
-        finder.look(_generator, _state, bytes);
+        finder.look(_generator, _state, recordOf(code, now, type));
     }
     Value display() const { return _state.at("Display"); }
     void message(std::optional<LogCode> code, std::optional<Date> time) { finder.look(_generator, _state, code, time); }

@@ -167,6 +167,31 @@ TEST_F(Trend, RowsOfOneIdentityAreNotMixed)
                 ElementsAre(-100));
 }
 
+// A tree of a modem has its lists as dictionaries.
+TEST_F(Trend, ARowUnderANumberIsFollowedByItsIdentity)
+{
+    const auto list = [this](const char* first, const char* second) {
+        const Value display = makeDictionary(
+            {{"Neighbor Cells",
+              makeDictionary({{"0", makeDictionary({{"ARFCN", first}, {"BSIC", "7"}, {"RSSI", "-60 dBm"}})},
+                              {"1", makeDictionary({{"ARFCN", second}, {"BSIC", "7"}, {"RSSI", "-70 dBm"}})}})}});
+        trends.sample(display, kVoxLogChannelTechnology_IFX, now += 2s);
+        return display;
+    };
+    list("31", "44");
+    const auto last = list("44", "31");
+    const auto path = Trends::pathOf(last, kVoxLogChannelTechnology_IFX, {"Neighbor Cells", "1", "RSSI"});
+    EXPECT_THAT(path, testing::HasSubstr("ARFCN=31"));
+    EXPECT_THAT(numbers(path), ElementsAre(-60, -70));
+}
+
+TEST_F(Trend, AnIdentityInARowIsNoCurve)
+{
+    auto cells = makeArray({makeDictionary({{"Physical Cell ID", Reading(decimalSigned32, 7)}})});
+    refresh(makeDictionary({{"Connected Mode", makeDictionary({{"Measured Neighbor Cells", cells}})}}));
+    EXPECT_THAT(words("/Connected Mode/Measured Neighbor Cells/Physical Cell ID=7/Physical Cell ID"), ElementsAre("7"));
+}
+
 TEST_F(Trend, NamesMakeAStripOfStates)
 {
     const auto state = [this](const char* text) {

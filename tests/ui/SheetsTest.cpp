@@ -153,6 +153,107 @@ TEST_F(SheetsTest, OverviewHasTheServingCellAndTheBestNeighbours)
     EXPECT_EQ(contents.parts[1].caption, "Neighbor Cells");
 }
 
+TEST_F(SheetsTest, EventsAndCellsAreOfferedInEveryPaneOnceTheTechnologyIsKnown)
+{
+    using enum SheetKind;
+    EXPECT_TRUE(view().isOffered(Events));
+    EXPECT_TRUE(view().isOffered(Cells));
+    show({"-76 dBm", "-80 dBm"});
+    openPane("Neighbor Cells");
+    openPane("0");
+    EXPECT_TRUE(view().isOffered(Events));
+    view().press(Cells);
+    ASSERT_TRUE(view().sheet);
+    EXPECT_EQ(view().sheet->contents.title, "Cells");
+    EXPECT_FALSE(view().isOffered(Events)) << "one at a time";
+}
+
+TEST_F(SheetsTest, NothingIsOfferedBeforeTheTechnologyIsKnown)
+{
+    ApplicationDoubles others;
+    const auto unconnected = KestrumApp::make(others.applicationRoles);
+    unconnected->applicationDidFinishLaunching();
+    for (const auto& command : kSheetCommands)
+        EXPECT_FALSE(others.toolkit.navigation->isOffered(command.kind, 0)) << command.name;
+}
+
+TEST_F(SheetsTest, ATrendIsOfferedOfAValueAndAMeaningOfEachRow)
+{
+    using enum SheetKind;
+    show({"-76 dBm", "-80 dBm"});
+    EXPECT_FALSE(view().isOffered(Trend, 0)) << "it opens a pane";
+    EXPECT_TRUE(view().isOffered(Meaning, 0));
+    EXPECT_FALSE(view().isOffered(Trend)) << "no row is chosen";
+    EXPECT_FALSE(view().isOffered(Meaning));
+    openPane("Serving Cell");
+    EXPECT_TRUE(view().isOffered(Trend, 1));
+    EXPECT_TRUE(view().isOffered(Meaning, 1));
+    EXPECT_FALSE(view().isOffered(Trend, 2)) << "there are two rows";
+    EXPECT_FALSE(view().isOffered(Meaning, 2));
+}
+
+TEST_F(SheetsTest, ATrendFollowsEachRefreshAndTheUser)
+{
+    show({"-76 dBm", "-60 dBm"});
+    openPane("Neighbor Cells");
+    openPane("1");
+    view().press(SheetKind::Trend, 2);
+    ASSERT_TRUE(view().sheet);
+    const auto& contents = view().sheet->contents;
+    EXPECT_EQ(contents.title, "RSSI (BSIC 7, ARFCN 32)");
+    show({"-76 dBm", "-59 dBm"});
+    EXPECT_EQ(contents.parts.at(0).plot->points.size(), 2u);
+    EXPECT_EQ(contents.parts[0].facts.at(0).value.text, "-59 dBm");
+    const auto changes = view().sheet->changes;
+    view().sheet->owner.cursorMoved(0);
+    EXPECT_EQ(contents.parts[0].plot->cursor, 0u);
+    view().sheet->owner.rangeChosen(1);
+    EXPECT_EQ(contents.parts[0].plot->range, 1u);
+    EXPECT_EQ(view().sheet->changes, changes + 2);
+    EXPECT_EQ(contents.status, app->updateMessage());
+}
+
+TEST_F(SheetsTest, ATrendEndsWhereThePanesStandStill)
+{
+    show({"-76 dBm", "-60 dBm"});
+    openPane("Serving Cell");
+    view().look(Look::Freeze);
+    show({"-76 dBm", "-60 dBm"});
+    view().press(SheetKind::Trend, 1);
+    ASSERT_TRUE(view().sheet);
+    EXPECT_EQ(view().sheet->contents.parts.at(0).plot->points.size(), 1u);
+}
+
+TEST_F(SheetsTest, AMeaningFollowsItsValue)
+{
+    show({"-76 dBm", "-60 dBm"});
+    openPane("Neighbor Cells");
+    openPane("1");
+    view().press(SheetKind::Meaning, 2);
+    ASSERT_TRUE(view().sheet);
+    EXPECT_EQ(view().sheet->contents.title, "RSSI");
+    show({"-76 dBm", "-59 dBm"});
+    EXPECT_EQ(view().sheet->contents.parts.at(0).facts.at(0).value.text, "-59 dBm");
+}
+
+TEST_F(SheetsTest, EventsComeWhileTheirSheetIsOpen)
+{
+    show({"-76 dBm", "-60 dBm"});
+    view().press(SheetKind::Events);
+    ASSERT_TRUE(view().sheet);
+    const auto rows = [this] {
+        const auto& parts = view().sheet->contents.parts;
+        return parts.empty() ? 0 : parts[0].table.rows.size();
+    };
+    const auto before = rows();
+    modem.kill();
+    doubles.queue.advance(2s);
+    modem.serve();
+    doubles.queue.advance(10s);
+    show({"-76 dBm", "-60 dBm"});
+    EXPECT_GE(rows(), before + 2);
+}
+
 TEST_F(SheetsTest, AnOpenSheetEndsWithTheApplication)
 {
     show({"-76 dBm", "-80 dBm"});
