@@ -974,6 +974,32 @@ TEST_F(TerminalSheets, FollowTheRefresh)
     EXPECT_TRUE(terminal.waitUntil([&] { return terminal.shows("-60"); })) << terminal.text();
 }
 
+TEST_F(TerminalSheets, KeepTheirPlaceWhenRowsComeAtTheFront)
+{
+    const auto many = [](int more) {
+        std::string list;
+        for (int i = 0; i < 40 + more; ++i) // the newest have the best levels, and come first
+            list += cell(std::to_string(i).c_str(), std::to_string(100 + i).c_str(),
+                         ("-" + std::to_string(110 - i) + " dBm").c_str());
+        return propertyList(dictionary("Neighbor Cells", list));
+    };
+    std::vector<std::string> displays(12, many(0)); // 6 s
+    displays.resize(200, many(5));
+    device.serve(displays);
+    start();
+    ASSERT_TRUE(terminal.waitFor("Updated 20")) << terminal.text();
+    terminal.type("l");
+    expectShown("v table");
+    terminal.type("v");
+    expectRow(0, EndsWith("1-22/41")); // with the heading
+    terminal.type("jjjjj");
+    expectRow(0, EndsWith("6-27/41"));
+    const auto third = terminal.row(3);
+    EXPECT_THAT(third, HasSubstr("133")) << terminal.text();
+    expectRow(0, EndsWith("11-32/46"));
+    expectRow(3, third);
+}
+
 TEST_F(TerminalSheets, FitASmallTerminal)
 {
     startWithCells();
