@@ -194,6 +194,11 @@ int widestOf(const std::vector<std::string>& texts)
     return widest;
 }
 
+bool hasRoom(const std::string& text, int room)
+{
+    return room >= std::min(kLeastText, columns(text));
+}
+
 /// A band's word, and the rows where the band begins and where the word stands: there, or above another word.
 struct Word {
     int begin, row;
@@ -212,8 +217,10 @@ std::vector<Word> wordsOf(const SheetPlot& plot, int rows)
             continue;
         const int begin = rowOf(heightOf(plot, least), rows);
         const int row = std::min(begin, free);
-        if (row < 0)
-            break;
+        // Above its band a word would be wrong.
+        const int end = i + 1 < plot.bands.size() ? rowOf(heightOf(plot, plot.bands[i + 1].least), rows) : 0;
+        if (row < end)
+            continue;
         words.push_back({begin, row, &word, least > plot.bottom});
         free = row - 1;
     }
@@ -352,7 +359,7 @@ private:
             const int begin = columnOf(at, width);
             const int end = i + 1 < _plot.marks.size() ? columnOf(_plot.marks[i + 1].at, width) - 1 : width;
             line.push_back({column + begin, "↑", {}});
-            if (end - begin - 1 >= std::min(kLeastText, columns(text)))
+            if (hasRoom(text, end - begin - 1))
                 line.push_back({column + begin + 1, cutAtTheEnd(text, end - begin - 1), {}});
         }
         if (!line.empty())
@@ -435,7 +442,8 @@ Pieces strip(const SheetPlot& plot, int columns)
         if (begin > columnOf(to, columns))
             continue;
         const int end = std::max(to < 1 ? columnOf(to, columns) : columns, begin + 1);
-        std::string shown = "│" + cutAtTheEnd(text, end - begin - 1);
+        const int room = end - begin - 1;
+        std::string shown = "│" + (hasRoom(text, room) ? cutAtTheEnd(text, room) : "");
         for (int at = terminal::columns(shown); at < end - begin; ++at)
             shown += "─";
         pieces.push_back({begin, std::move(shown), plot.cursor == i ? kChosen : Style{}});

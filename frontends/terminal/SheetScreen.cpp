@@ -14,7 +14,7 @@ constexpr int kInset = 1, kGap = 2; // columns
 constexpr int kMark = 2;            // before a row: whether it moved, or is the serving cell
 constexpr int kIndent = 15;         // facts stand beside their caption
 constexpr int kNameOfLevel = 12, kValueOfLevel = 12, kBarOfLevel = 24;
-constexpr int kBar = 10, kWidestCell = 24;
+constexpr int kBar = 10, kWidestCell = 60, kNarrowestCell = 20;
 constexpr int kLeastPlot = 3, kMostOfLeastPlot = 8; // rows of a curve, where the rest does not leave more
 constexpr Style kDim{.dim = true};
 
@@ -99,11 +99,13 @@ void TerminalSheet::measureTables()
         const auto& table = _contents.parts[part].table;
         for (std::size_t i = 0; i < table.columns.size(); ++i) {
             const bool isSorted = table.sort && table.sort->column == i;
-            int value = columns(headingOf(table.columns[i])) + (isSorted ? 2 : 0), word = 0;
+            const int heading = columns(headingOf(table.columns[i])) + (isSorted ? 2 : 0);
+            int value = heading, word = 0;
             for (const auto& row : table.rows) {
                 value = std::max(value, std::min(columns(row.cells[i].text), kWidestCell));
                 word = std::max(word, columns(row.cells[i].word));
             }
+            _widths[part].headings.push_back(heading);
             _widths[part].values.push_back(value);
             _widths[part].words.push_back(word);
         }
@@ -139,7 +141,7 @@ void TerminalSheet::layOutParts(bool spaced, int plotRows)
         const auto& part = _contents.parts[i];
         if (spaced && i > 0 && !part.table.columns.empty())
             _rows.push_back({Row::Kind::Pieces});
-        layOutFacts(part, width);
+        layOutFacts(part, width, !spaced && part.plot.has_value());
         if (part.plot)
             layOutPlot(*part.plot, plotRows);
         layOutTable(i);
@@ -155,8 +157,8 @@ void TerminalSheet::layOutText(std::string_view text, int width, Style style)
 }
 
 /// The caption, and beside it the facts: one after the other, those with a bar in lines below. Lines of text come
-/// between.
-void TerminalSheet::layOutFacts(const SheetPart& part, int width)
+/// between. `isBrief`: no bars, so that a plot has room.
+void TerminalSheet::layOutFacts(const SheetPart& part, int width, bool isBrief)
 {
     const bool isList = !part.table.columns.empty();
     Row line{Row::Kind::Pieces};
@@ -171,7 +173,7 @@ void TerminalSheet::layOutFacts(const SheetPart& part, int width)
     }
     int at = indent;
     for (const auto& [heading, value] : part.facts) {
-        if (value.bar)
+        if (value.bar && !isBrief)
             continue;
         const int name = columns(heading) + 1, wanted = name + columns(value.text);
         if (at > indent && at + wanted > width - kInset) {
@@ -185,7 +187,7 @@ void TerminalSheet::layOutFacts(const SheetPart& part, int width)
     if (!line.pieces.empty())
         _rows.push_back(std::move(line));
     for (std::size_t i = 0; i < part.facts.size(); ++i)
-        if (part.facts[i].value.bar)
+        if (part.facts[i].value.bar && !isBrief)
             _rows.push_back({Row::Kind::Cells, {}, static_cast<std::size_t>(&part - _contents.parts.data()), i});
 }
 
@@ -213,29 +215,45 @@ void TerminalSheet::layOutTable(std::size_t index)
         _rows.push_back({Row::Kind::Pieces, {{kInset, part.note, kDim}}});
 }
 
-/// Calls `draw` with each column in view and the place where it begins.
-template <typename Draw>
-void TerminalSheet::eachColumn(const Line& line, std::size_t part, Draw draw) const
+/// The columns that have room, from the left. Texts make way for further columns, but not numbers and headings.
+std::vector<TerminalSheet::Placed> TerminalSheet::placeColumns(std::size_t part, int width) const
 {
     const auto& shown = _contents.parts[part].table.columns;
     const auto& widths = _widths[part];
-    int at = kMark;
+    std::vector<Placed> placed;
     std::size_t toSkip = part == 0 ? _skipped : 0;
+    int room = width - kMark - kInset;
     for (std::size_t i = 0; i < shown.size(); ++i) {
         if (!shown[i].isIdentity && toSkip > 0) {
             --toSkip;
             continue;
         }
-        int width = widths.values[i];
-        if (shown[i].hasBars)
-            width += 1 + kBar + (widths.words[i] > 0 ? 1 + widths.words[i] : 0);
-        if (at + width > line.width() - kInset) {
-            line.put(line.width() - 1, "…", kDim);
-            return;
-        }
-        draw(i, at, width);
-        at += width + kGap;
+        const int least = shown[i].isNumeric ? widths.values[i] : std::min(widths.values[i], kNarrowestCell);
+        int value = std::max(least, widths.headings[i]);
+        const int beside = shown[i].hasBars ? 1 + kBar + (widths.words[i] > 0 ? 1 + widths.words[i] : 0) : 0;
+        if (placed.empty())
+            value = std::min(value, std::max(room - beside, 1));
+        if (value + beside > room && !placed.empty())
+            break;
+        placed.push_back({i, 0, value, beside});
+        room -= value + beside + kGap;
     }
+    room += kGap; // after the last one
+    for (bool isGrowing = true; isGrowing && room > 0;) {
+        isGrowing = false;
+        for (auto& each : placed)
+            if (room > 0 && each.value < widths.values[each.index]) {
+                ++each.value;
+                --room;
+                isGrowing = true;
+            }
+    }
+    int at = kMark;
+    for (auto& each : placed) {
+        each.at = at;
+        at += each.value + each.beside + kGap;
+    }
+    return placed;
 }
 
 void TerminalSheet::drawHeading(const Line& line, std::size_t part)
@@ -243,16 +261,17 @@ void TerminalSheet::drawHeading(const Line& line, std::size_t part)
     const auto& table = _contents.parts[part].table;
     if (part == 0)
         _headings.assign(table.columns.size(), -1);
-    eachColumn(line, part, [&](std::size_t i, int at, int) {
-        const auto& column = table.columns[i];
+    for (const auto& [index, at, value, beside] : _placed[part]) {
+        const auto& column = table.columns[index];
         if (part == 0)
-            _headings[i] = at;
+            _headings[index] = at;
         auto heading = headingOf(column);
-        if (table.sort && table.sort->column == i)
+        if (table.sort && table.sort->column == index)
             heading += table.sort->isDescending ? " ↓" : " ↑";
-        const int value = _widths[part].values[i];
         line.put(column.isNumeric ? at + value - columns(heading) : at, heading, {.bold = true, .underlined = true});
-    });
+    }
+    if (_placed[part].empty() || _placed[part].back().index + 1 < table.columns.size())
+        line.put(line.width() - 1, "…", kDim);
 }
 
 void TerminalSheet::drawCells(const Line& line, std::size_t part, std::size_t row)
@@ -275,15 +294,17 @@ void TerminalSheet::drawCells(const Line& line, std::size_t part, std::size_t ro
         line.put(0, "S", {.bold = true, .colour = Colour::Accent});
     else if (shown.moved != SheetRow::Moved::No)
         line.put(0, shown.moved == SheetRow::Moved::Up ? "↑" : "↓", {.colour = Colour::Accent});
-    eachColumn(line, part, [&](std::size_t i, int at, int) {
-        const auto& cell = shown.cells[i];
-        const int width = _widths[part].values[i];
-        const auto text = cutAtTheEnd(cell.text, width);
-        line.put(table.columns[i].isNumeric ? at + width - columns(text) : at, text, style);
+    for (const auto& [index, at, value, beside] : _placed[part]) {
+        const auto& cell = shown.cells[index];
+        // The end of a name often tells more than its middle: "LTE cell 3939330, PCI 286".
+        const auto text = cutInTheMiddle(cell.text, value);
+        line.put(table.columns[index].isNumeric ? at + value - columns(text) : at, text, style);
         if (cell.bar)
-            drawBar(line, at + width + 1, kBar, *cell.bar);
-        line.put(at + width + 1 + kBar + 1, table.columns[i].hasBars ? cell.word : std::string());
-    });
+            drawBar(line, at + value + 1, kBar, *cell.bar);
+        line.put(at + value + 1 + kBar + 1, table.columns[index].hasBars ? cell.word : std::string());
+    }
+    if (_placed[part].empty() || _placed[part].back().index + 1 < table.columns.size())
+        line.put(line.width() - 1, "…", kDim);
 }
 
 void TerminalSheet::drawTitle(const Line& line) const
@@ -321,10 +342,13 @@ void TerminalSheet::draw(Screen& screen)
     _first = std::min(_first, _rows.size() > _visible ? _rows.size() - _visible : 0);
     _skipped = std::min(_skipped, mostColumnsToSkip());
     _headingLine = -1;
+    _placed.clear();
+    for (std::size_t part = 0; part < _contents.parts.size(); ++part)
+        _placed.push_back(placeColumns(part, screen.columns()));
     for (std::size_t i = 0; i < _visible && _first + i < _rows.size(); ++i) {
         const auto& row = _rows[_first + i];
         const int number = 1 + static_cast<int>(i);
-        const Line line(screen, number, 0, width);
+        const Line line(screen, number, 0, screen.columns());
         // The heading stays at the top while its rows are scrolled.
         if (row.kind == Row::Kind::Heading || (i == 0 && tableRow(row))) {
             drawHeading(line, row.part);
@@ -333,9 +357,8 @@ void TerminalSheet::draw(Screen& screen)
         } else if (row.kind == Row::Kind::Cells) {
             drawCells(line, row.part, row.row);
         } else {
-            const Line whole(screen, number, 0, screen.columns());
             for (const auto& [column, text, style] : row.pieces)
-                whole.put(column, text, style);
+                line.put(column, text, style);
         }
     }
     drawTitle({screen, 0, 0, width});

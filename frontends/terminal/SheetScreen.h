@@ -37,22 +37,26 @@ private:
     };
     /// The columns of a part's table, as wide as their contents.
     struct Widths {
-        std::vector<int> values, words; // of each column
+        std::vector<int> headings, values, words; // of each column; `values` holds the heading, too
+    };
+    /// A column in view: where it begins, and the columns of its values and of what stands beside them.
+    struct Placed {
+        std::size_t index;
+        int at, value, beside;
     };
 
     void measureTables();
     void layOut(int width, int height, PlotMarks marks);
     void layOutParts(bool spaced, int plotRows);
     void layOutText(std::string_view text, int width, Style style);
-    void layOutFacts(const SheetPart& part, int width);
+    void layOutFacts(const SheetPart& part, int width, bool isBrief);
     void layOutPlot(const SheetPlot& plot, int rows);
     void layOutTable(std::size_t index);
     void drawHeading(const Line& line, std::size_t part);
     void drawCells(const Line& line, std::size_t part, std::size_t row);
     void drawTitle(const Line& line) const;
     void drawBottom(const Line& line);
-    template <typename Draw>
-    void eachColumn(const Line& line, std::size_t part, Draw draw) const;
+    std::vector<Placed> placeColumns(std::size_t part, int width) const;
     void scroll(std::ptrdiff_t lines);
     void scrollSideways(int columns);
     void sortByNeighbour(int step);
@@ -82,10 +86,11 @@ private:
         std::size_t part, line; // counted from the top
         std::string identity;
     };
-    std::vector<Anchor> _anchors; // rows that were in view before the contents changed
-    std::size_t _first = 0;       // row at the top
-    std::size_t _skipped = 0;     // columns that are scrolled out of sight at the left
-    std::size_t _visible = 0;     // rows, as drawn last
+    std::vector<std::vector<Placed>> _placed; // the columns in view of each part, as drawn last
+    std::vector<Anchor> _anchors;             // rows that were in view before the contents changed
+    std::size_t _first = 0;                   // row at the top
+    std::size_t _skipped = 0;                 // columns that are scrolled out of sight at the left
+    std::size_t _visible = 0;                 // rows, as drawn last
     int _headingLine = -1, _bottom = 0, _back = 0;
     std::vector<int> _headings; // where the first table's columns begin, as drawn last; -1 out of sight
 };

@@ -225,6 +225,7 @@ TEST_F(TerminalPlot, ShowsStatesAsAStrip)
 {
     EXPECT_EQ(line(strip(stripOf({{0, 0.5, "idle"}, {0.5, 1, "connected"}}), 20)), "│idle─────│connected");
     EXPECT_EQ(line(strip(stripOf({{0, 0.25, "connected"}, {0.25, 1, "idle"}}), 20)), "│con…│idle──────────");
+    EXPECT_EQ(line(strip(stripOf({{0, 0.15, "118"}, {0.15, 0.3, "7"}, {0.3, 1, "idle"}}), 20)), "│──│7─│idle─────────");
     EXPECT_EQ(line(strip(stripOf({{0, 0.25, "a"}, {0.5, 0.75, "b"}}), 20)), "│a───     │b───") << "a gap";
 }
 
@@ -302,6 +303,14 @@ TEST_F(TerminalPlot, MakesRoomForTheCurveOnANarrowScreen)
     const auto narrow = linesOf(draw(plot, PlotMarks::Ascii, 12, 3));
     EXPECT_THAT(narrow, Each(testing::Not(HasSubstr("dBm │"))));
     EXPECT_THAT(narrow, testing::Contains(" │      _-'"));
+}
+
+TEST_F(TerminalPlot, OmitsAWordThatHasNoRoomInItsBand)
+{
+    SheetPlot plot;
+    plot.bands = {{0, "none"}, {0.3, "poor"}, {0.4, "fair"}, {0.5, "good"}, {0.6, "excellent"}};
+    EXPECT_THAT(linesOf(draw(plot, PlotMarks::Ascii, 30, 3)),
+                ElementsAre(" │                  excellent", " │·   ·   ·   ·   · poor", " │·   ·   ·   ·   · none"));
 }
 
 TEST_F(TerminalPlot, NamesTheLineThatAScreenReaderReads)

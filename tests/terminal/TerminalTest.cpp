@@ -13,7 +13,7 @@ namespace kestrum {
 namespace {
 
 using Key = Pseudoterminal::Key;
-using testing::EndsWith, testing::HasSubstr, testing::SizeIs, testing::StartsWith;
+using testing::AllOf, testing::EndsWith, testing::HasSubstr, testing::SizeIs, testing::StartsWith;
 
 std::string neighbours()
 {
@@ -930,9 +930,18 @@ TEST_F(TerminalSheets, ScrollColumnsSideways)
     EXPECT_FALSE(terminal.shows("A second long key"));
     terminal.type("l");
     terminal.press(Key::Right);
-    expectRow(1, testing::AllOf(StartsWith("  BSIC  ARFCN  A first"), HasSubstr("A second long key")));
+    expectRow(1, AllOf(StartsWith("  BSIC  ARFCN  A first"), HasSubstr("A second long key")));
     terminal.type("hh");
     expectRow(1, HasSubstr("RSSI dBm"));
+}
+
+TEST_F(TerminalSheets, UseTheWholeWidthOfTheTerminal)
+{
+    startWithCells();
+    openTable();
+    EXPECT_FALSE(terminal.shows("A second long key"));
+    terminal.resize(24, 140);
+    expectRow(1, AllOf(HasSubstr("RSSI dBm"), HasSubstr("A second long key")));
 }
 
 TEST_F(TerminalSheets, LoseNothingWithoutColourAndUnicode)
@@ -952,7 +961,7 @@ TEST_F(TerminalSheets, OverviewOpensFromTheFirstPaneAndCloses)
     terminal.type("o");
     expectTitle("Overview");
     expectRow(1, StartsWith(" Serving cell  ARFCN 60  BSIC 28"));
-    expectRow(2, testing::AllOf(HasSubstr("RSSI"), HasSubstr("-53 dBm"), HasSubstr("excellent")));
+    expectRow(2, AllOf(HasSubstr("RSSI"), HasSubstr("-53 dBm"), HasSubstr("excellent")));
     expectShown("Neighbor Cells");
     terminal.type("?");
     expectShown("What it means");
