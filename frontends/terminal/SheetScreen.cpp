@@ -296,8 +296,7 @@ void TerminalSheet::drawCells(const Line& line, std::size_t part, std::size_t ro
         line.put(0, shown.moved == SheetRow::Moved::Up ? "↑" : "↓", {.colour = Colour::Accent});
     for (const auto& [index, at, value, beside] : _placed[part]) {
         const auto& cell = shown.cells[index];
-        // The end of a name often tells more than its middle: "LTE cell 3939330, PCI 286".
-        const auto text = cutInTheMiddle(cell.text, value);
+        const auto text = cutAtTheEnd(cell.text, value);
         line.put(table.columns[index].isNumeric ? at + value - columns(text) : at, text, style);
         if (cell.bar)
             drawBar(line, at + value + 1, kBar, *cell.bar);
@@ -324,9 +323,10 @@ void TerminalSheet::drawTitle(const Line& line) const
 void TerminalSheet::drawBottom(const Line& line)
 {
     const auto* plot = this->plot();
-    const std::string_view keys = plot && plot->ranges.size() > 1 ? "Tab time  ? help  Esc back"
-                                  : _contents.canSort             ? "Tab sort  ? help  Esc back"
-                                                                  : "? help  Esc back";
+    const std::string more = plot && plot->ranges.size() > 1 ? "Tab time  " : _contents.canSort ? "Tab sort  " : "";
+    std::string keys = "? help  Esc back";
+    if (2 * kInset + columns(_contents.status) + kGap + columns(more + keys) <= line.width())
+        keys.insert(0, more);
     _back = line.width() - kInset - columns(keys);
     line.put(kInset, cutAtTheEnd(_contents.status, _back - kInset - kGap));
     line.put(_back, keys, kDim);
