@@ -25,13 +25,13 @@ constexpr std::chrono::seconds kNoticeTime{8}; // enough to read a path
 
 } // namespace
 
-std::shared_ptr<KestrumApp> KestrumApp::make(ApplicationRoles& roles)
+std::shared_ptr<KestrumApp> KestrumApp::make(ApplicationRoles& roles, bool hasHistory)
 {
-    return std::shared_ptr<KestrumApp>(new KestrumApp(roles));
+    return std::shared_ptr<KestrumApp>(new KestrumApp(roles, hasHistory));
 }
 
-KestrumApp::KestrumApp(ApplicationRoles& roles)
-    : _roles(roles), _history(roles.clock), _freeze(_history.moments(), roles.clock)
+KestrumApp::KestrumApp(ApplicationRoles& roles, bool hasHistory)
+    : _roles(roles), _history(roles.clock), _hasHistory(hasHistory), _freeze(_history.moments(), roles.clock)
 {}
 
 KestrumApp::~KestrumApp()
@@ -45,7 +45,8 @@ void KestrumApp::applicationDidFinishLaunching()
     _window = _roles.toolkit.makeWindow(_roles.toolkit.mainScreenBounds());
     _model = std::make_shared<KestrumModel>(_roles);
     _model->setObserver(this);
-    _model->setWatch(&_history);
+    if (_hasHistory)
+        _model->setWatch(&_history);
     setUpdateMessage(std::string(kConnecting));
     _dateFormatter.emplace(_roles.clock, "'Updated' yyyy-MM-dd 'at' HH:mm:ss");
 

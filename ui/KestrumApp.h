@@ -29,7 +29,8 @@ class KestrumApp final : public std::enable_shared_from_this<KestrumApp>,
 public:
     /// Does nothing before the launch. The roles are borrowed. They outlive the application and its tasks and timers in
     /// the queue, which own the model while monitoring runs.
-    static std::shared_ptr<KestrumApp> make(ApplicationRoles& roles);
+    /// Without a history nothing but the present can be shown.
+    static std::shared_ptr<KestrumApp> make(ApplicationRoles& roles, bool hasHistory = true);
     ~KestrumApp() override;
 
     void applicationDidFinishLaunching() override;
@@ -77,7 +78,7 @@ public:
     }
 
 private:
-    explicit KestrumApp(ApplicationRoles& roles);
+    KestrumApp(ApplicationRoles& roles, bool hasHistory);
 
     bool isConnected() const { return _model && _model->isConnected(); }
     void releaseModel();
@@ -92,7 +93,8 @@ private:
     void returnToLive();
 
     ApplicationRoles& _roles;
-    History _history;
+    History _history; ///< stays empty without a history
+    const bool _hasHistory;
     Freeze _freeze;
     KestrumModelNodeRef _newest;       ///< the display that live panes show; null when they show none
     bool _replacedWhileFrozen = false; ///< by that of another technology
