@@ -35,6 +35,12 @@ std::string_view identityIn(std::string_view text)
 
 } // namespace
 
+bool isCellChange(const Event& event)
+{
+    return event.kind == EventKind::ServingCell || event.kind == EventKind::Reselection ||
+           event.kind == EventKind::Handover;
+}
+
 std::string titleOf(const Event& event)
 {
     const auto kind = word(event.kind);

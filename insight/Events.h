@@ -31,6 +31,8 @@ struct Event {
     std::string levels = {}; ///< of the serving cell at that moment: "RSRP -98.25 dBm, RSRQ -11.00 dB"
 };
 
+/// Whether another cell serves, or the first one.
+bool isCellChange(const Event& event);
 /// "reselection (LTE)"
 std::string titleOf(const Event& event);
 

@@ -7,7 +7,9 @@
 #include "insight/Trend.h"
 
 #include <chrono>
+#include <cstddef>
 #include <cstdint>
+#include <deque>
 #include <string>
 
 namespace kestrum {
@@ -32,13 +34,22 @@ public:
     const Events& events() const { return _finder.events(); }
     /// Up to the last message.
     const Cells& cells() { return _finder.cells(); }
+    /// The refreshes that showed another serving cell first, by the clock of the trends: the messages may have been
+    /// recorded long ago. In the order in which they came.
+    const std::deque<Date>& cellChanges() const { return _cellChanges; }
 
 private:
+    static constexpr std::size_t kMostCellChanges = 5000;
+
+    void markCellChanges(Date now);
+
     const Clock& _clock;
     Moments _moments;
     Trends _trends;
     RecentMessages _recent;
     EventFinder _finder;
+    std::deque<Date> _cellChanges;
+    std::uint64_t _marked = 0;           ///< events that have been looked through for cell changes
     std::string _technology;             ///< of the last message
     std::chrono::milliseconds _quiet{0}; ///< since the last message, while the log channel was open
 };

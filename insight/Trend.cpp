@@ -421,25 +421,29 @@ std::string_view Trends::unit(std::string_view path) const
     return series != nullptr ? std::string_view(series->unit) : std::string_view();
 }
 
-std::string Trends::sentence(std::string_view path) const
+std::string Trends::sentence(std::string_view path, Date now) const
 {
     const auto name = nameIn(path);
-    if (const auto strip = words(path); !strip.empty()) {
-        const Date begin = _times[_refresh % kExact] - kExactTime;
+    if (auto strip = words(path); !strip.empty()) {
+        std::erase_if(strip, [now](const Word& each) { return each.since > now; });
+        if (strip.empty())
+            strip.push_back({now, {}});
+        const Date begin = std::min(now, _times[_refresh % kExact]) - kExactTime;
         const auto changes = std::ranges::count_if(std::next(strip.begin()), strip.end(),
                                                    [&](const Word& each) { return each.since > begin; });
-        const auto now = strip.back().text.empty() ? std::string("no value") : strip.back().text;
-        return formatted("%@, %@ now, %ld %s in 15 minutes", name, now, static_cast<long>(changes),
+        const auto last = strip.back().text.empty() ? std::string("no value") : strip.back().text;
+        return formatted("%@, %@ now, %ld %s in 15 minutes", name, last, static_cast<long>(changes),
                          changes == 1 ? "change" : "changes");
     }
-    const auto all = exact(path);
+    auto all = exact(path);
+    std::erase_if(all, [now](const Point& each) { return each.time > now; });
     std::vector<double> numbers;
     for (const auto& each : all)
         if (!std::isnan(each.number))
             numbers.push_back(each.number);
     if (numbers.empty())
         return formatted("%@, no value in 15 minutes", name);
-    const auto now =
+    const auto latest =
         std::isnan(all.back().number) ? std::string("no value") : withUnit(shortText(all.back().number), unit(path));
     const auto [least, greatest] = std::ranges::minmax(numbers);
     // The last quarter against the first, in parts of the whole range.
@@ -449,19 +453,8 @@ std::string Trends::sentence(std::string_view path) const
     std::for_each(numbers.end() - quarter, numbers.end(), [&](double each) { last.add(each); });
     const double change = last.mean() - first.mean();
     const char* direction = std::abs(change) <= (greatest - least) / 4 ? "steady" : change > 0 ? "rising" : "falling";
-    return formatted("%@, %@ now, %@ to %@ in 15 minutes, %s", name, now, shortText(least), shortText(greatest),
+    return formatted("%@, %@ now, %@ to %@ in 15 minutes, %s", name, latest, shortText(least), shortText(greatest),
                      direction);
-}
-
-std::vector<Date> cellChanges(const Events& events, Date from, Date to)
-{
-    std::vector<Date> moments;
-    for (const auto& each : events)
-        if (each.time && *each.time >= from && *each.time <= to &&
-            (each.kind == EventKind::ServingCell || each.kind == EventKind::Reselection ||
-             each.kind == EventKind::Handover))
-            moments.push_back(*each.time);
-    return moments;
 }
 
 } // namespace kestrum

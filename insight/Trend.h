@@ -68,8 +68,9 @@ public:
     /// Of the numbers; empty for a plain number.
     std::string_view unit(std::string_view path) const;
 
-    /// "Measured RSRP, -98 dBm now, -121 to -91 in 15 minutes, falling": the trend for a screen reader.
-    std::string sentence(std::string_view path) const;
+    /// "Measured RSRP, -98 dBm now, -121 to -91 in 15 minutes, falling": the trend for a screen reader. What came later
+    /// than `now` is left out.
+    std::string sentence(std::string_view path, Date now = Date::max()) const;
 
     /// Values of the last refresh that were not followed, because there were too many or their paths too long.
     std::size_t left() const { return _left; }
@@ -117,8 +118,5 @@ private:
     std::size_t _left = 0;
     std::uint64_t _dropped = 0;
 };
-
-/// The moments at which the serving cell changed: marks in every trend.
-std::vector<Date> cellChanges(const Events& events, Date from, Date to);
 
 } // namespace kestrum

@@ -132,7 +132,7 @@ void TrendSheet::fill()
         plot.ranges.emplace_back(each.name);
     plot.range = _range;
     plot.cursor = cursorIndex();
-    plot.sentence = trends.sentence(_path);
+    plot.sentence = trends.sentence(_path, *_end);
     _contents.parts.push_back(std::move(part));
 }
 
@@ -284,17 +284,11 @@ void TrendSheet::fillWords(SheetPart& part)
                       : formatted("%@  %@", timeText(*_end), part.facts.front().value.text);
 }
 
-/// Bounded: changes that would stand at one place are one mark.
 void TrendSheet::markCellChanges(SheetPlot& plot) const
 {
-    double last = -1;
-    std::vector<SheetPlot::Mark> changes;
-    for (const Date each : cellChanges(_history.events(), begin(), *_end))
-        if (const double at = placeOf(each); at >= last + 1.0 / kMostPoints) {
-            changes.push_back({at, {}});
-            last = at;
-        }
-    plot.marks.insert(plot.marks.end(), changes.begin(), changes.end());
+    for (const Date each : _history.cellChanges())
+        if (each > begin() && each <= *_end)
+            plot.marks.push_back({placeOf(each), {}});
     std::ranges::stable_sort(plot.marks, {}, &SheetPlot::Mark::at);
 }
 

@@ -130,6 +130,17 @@ TEST_F(BadDisplays, OfKeysThatCollide)
     EXPECT_EQ(sheets[3]->contents().parts.at(0).plot->points.size(), 11u) << "one for each refresh";
 }
 
+TEST_F(BadDisplays, TooLargeForTheMoments)
+{
+    refresh(makeDictionary({{"a", "1 dBm"}, {"b", "c"}}));
+    openSheets("/", 0);
+    refresh(makeDictionary({{"a", "2 dBm"}, {"b", std::string(Moments::Limits().bytes, 'x')}}));
+    EXPECT_EQ(history.moments().size(), 0u);
+    updateSheets();
+    EXPECT_EQ(history.trends().exact("/a").size(), 2u);
+    expectBoundedHistory();
+}
+
 TEST_F(BadDisplays, WithAClockThatJumps)
 {
     refresh(numbers("key", 10));

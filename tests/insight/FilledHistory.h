@@ -22,7 +22,7 @@ public:
     {
         clock.date += after;
         _state.set(StateKey::kDisplay, display);
-        history.messageDecoded(_generator, _state, recordOf(0xB0C0, clock.date));
+        history.messageDecoded(_generator, _state, recordOf(0xB0C0, clock.date - recordedBefore));
         history.displayMade(*makeDictionary({{StateKey::kDisplay, display}}));
     }
 
@@ -39,6 +39,7 @@ public:
 
     DecodingDoubles doubles;
     VirtualClock& clock = doubles.clock;
+    std::chrono::hours recordedBefore{0}; ///< a service may replay old messages
     History history{clock};
 
 private:

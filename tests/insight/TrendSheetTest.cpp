@@ -198,6 +198,7 @@ TEST_F(TrendSheetTest, EndsAtTheMomentThatIsShown)
     EXPECT_THAT(means(sheet), ElementsAre(-98, -97));
     EXPECT_EQ(plot(sheet).times.back(), "06:05:46");
     EXPECT_EQ(facts(sheet).at(0), "Now: -97 dBm, fair");
+    EXPECT_THAT(plot(sheet).sentence, testing::StartsWith("Measured RSRP, -97 dBm now, -98 to -97"));
 }
 
 TEST_F(TrendSheetTest, StatesAreAStripThatFollowsTheirTime)
@@ -245,10 +246,11 @@ TEST_F(TrendSheetTest, ChangesOfTheServingCellAreMarks)
                                                                     {"Physical Cell ID", cell},
                                                                     {"Download Frequency", "6300"}})}})}}));
     };
+    recordedBefore = std::chrono::hours(24 * 30);
     for (const char* cell : {"1", "1", "2"})
         serve(cell);
     ASSERT_EQ(history.cells().size(), 2u);
-    EXPECT_THAT(plot(open()).marks, testing::Contains(SheetPlot::Mark{1, ""}));
+    EXPECT_THAT(plot(open()).marks, ElementsAre(SheetPlot::Mark{1 - 4.0 / 900, ""}, SheetPlot::Mark{1, ""}));
 }
 
 TEST_F(TrendSheetTest, ANeighbourIsFollowedByItsIdentity)

@@ -311,15 +311,5 @@ TEST_F(Trend, LongPathsAreLeftOut)
     EXPECT_EQ(trends.left(), 1u);
 }
 
-TEST(CellChanges, AreMarksOfTheirTime)
-{
-    Events events;
-    events.add({kStart, EventKind::ServingCell, "LTE", "", "LTE cell 1"});
-    events.add({kStart + 1s, EventKind::RrcState, "RRC state", "Idle", "Connected"});
-    events.add({kStart + 2s, EventKind::Handover, "LTE", "LTE cell 1", "LTE cell 2"});
-    events.add({kStart + 9s, EventKind::Reselection, "LTE", "LTE cell 2", "LTE cell 1"});
-    EXPECT_THAT(cellChanges(events, kStart, kStart + 5s), ElementsAre(kStart, kStart + 2s));
-}
-
 } // namespace
 } // namespace kestrum
