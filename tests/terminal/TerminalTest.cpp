@@ -972,6 +972,74 @@ TEST_F(TerminalSheets, OverviewOpensFromTheFirstPaneAndCloses)
     expectChosen("Serving Cell");
 }
 
+TEST_F(TerminalSheets, TrendOpensFromARowAndTakesTheKeys)
+{
+    startWithCells();
+    terminal.type("l");
+    expectTitle("Kestrum › Serving Cell");
+    terminal.type("G");
+    expectChosen("RSSI");
+    expectShown("t trend  i meaning");
+    terminal.type("t");
+    expectTitle("RSSI");
+    const auto isReverse = [&](const std::string& text) {
+        const int row = terminal.rowOf("15 min  1 h  1 day");
+        return row >= 0 && terminal.isReverse(row, static_cast<int>(terminal.row(row).find(text)));
+    };
+    EXPECT_TRUE(terminal.waitUntil([&] { return isReverse("15 min"); })) << terminal.text();
+    expectShown("excellent");
+    terminal.type("2");
+    EXPECT_TRUE(terminal.waitUntil([&] { return isReverse("1 h"); })) << terminal.text();
+    terminal.press(Key::Tab);
+    EXPECT_TRUE(terminal.waitUntil([&] { return isReverse("1 day"); })) << terminal.text();
+    clickOn("15 min");
+    EXPECT_TRUE(terminal.waitUntil([&] { return isReverse("15 min"); })) << terminal.text();
+    expectShown("RSSI, -53 dBm now");
+    const int reading = terminal.rowOf("-53 dBm, excellent");
+    terminal.press(Key::Home);
+    EXPECT_TRUE(terminal.waitUntil([&] { return terminal.isBold(reading, 77); })) << terminal.text();
+    terminal.type("t");
+    expectTitle("Kestrum › Serving Cell");
+    expectChosen("RSSI");
+}
+
+struct PlotCase {
+    std::map<std::string, std::string> environment;
+    std::string samples; ///< two samples of -53 dBm
+};
+class TerminalPlots : public TerminalSheets, public testing::WithParamInterface<PlotCase> {};
+
+TEST_P(TerminalPlots, AreDrawnWithTheCharactersThatTheTerminalHas)
+{
+    startWithCells(GetParam().environment);
+    terminal.type("lGt");
+    expectShown("RSSI, -53 dBm now");
+    expectShown(" " + GetParam().samples);
+}
+
+INSTANTIATE_TEST_SUITE_P(Terminals, TerminalPlots,
+                         testing::Values(PlotCase{{}, "⠈"}, PlotCase{{{"TERM", "linux"}}, "▇"},
+                                         PlotCase{{{"KESTRUM_PLOT", "blocks"}}, "▇"},
+                                         PlotCase{{{"LC_ALL", "POSIX"}}, "'"}));
+
+TEST_F(TerminalSheets, MeaningIsWrappedAndEventsAreListed)
+{
+    terminal.resize(24, 40);
+    startWithCells();
+    terminal.type("lGi");
+    expectTitle("RSSI");
+    EXPECT_TRUE(terminal.waitUntil([&] { return !terminal.row(3).empty(); })) << terminal.text();
+    for (int row = 1; row < 10; ++row)
+        EXPECT_THAT(terminal.row(row), testing::Not(HasSubstr("…")));
+    terminal.type("i");
+    expectTitle("Kestrum › Serving Cell");
+    terminal.type("e");
+    expectTitle("Events");
+    expectShown("Time");
+    terminal.press(Key::Escape);
+    expectTitle("Kestrum › Serving Cell");
+}
+
 TEST_F(TerminalSheets, FollowTheRefresh)
 {
     device.serve({cells("-110 dBm"), cells("-110 dBm"), cells("-60 dBm")}); // four in each refresh
