@@ -439,8 +439,11 @@ Pieces strip(const SheetPlot& plot, int columns)
             continue;
         // A short span takes a column from the next one, so that it is seen. Of several in one column, the first is.
         const int begin = std::max(columnOf(from, columns), free);
-        if (begin > columnOf(to, columns))
+        if (begin > columnOf(to, columns)) {
+            if (plot.cursor == i && !pieces.empty())
+                pieces.back().style = kChosen;
             continue;
+        }
         const int end = std::max(to < 1 ? columnOf(to, columns) : columns, begin + 1);
         const int room = end - begin - 1;
         std::string shown = "│" + (hasRoom(text, room) ? cutAtTheEnd(text, room) : "");

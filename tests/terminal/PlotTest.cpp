@@ -245,6 +245,16 @@ TEST_F(TerminalPlot, MarksTheStateAtTheCursor)
     EXPECT_TRUE(pieces[1].style.reverse);
 }
 
+TEST_F(TerminalPlot, MarksTheCursorInAColumnOfSeveralStates)
+{
+    auto plot = stripOf({{0, 0.5, "a"}, {0.5, 0.51, "b"}, {0.51, 0.52, "c"}, {0.52, 1, "d"}});
+    plot.cursor = 2;
+    const auto pieces = strip(plot, 10);
+    ASSERT_EQ(line(pieces), "│a───││d──");
+    EXPECT_FALSE(pieces[0].style.reverse);
+    EXPECT_TRUE(pieces[1].style.reverse);
+}
+
 // The whole plot
 
 SheetPlot fullPlot()
