@@ -1,27 +1,16 @@
 // A simulated day of a scenario at full speed, with a refresh every 2 s. The resident size after an hour and after the
 // day must hardly differ. One scenario to a process: what another one leaves on the heap would hide growth.
+#include "Resident.h"
 #include "scenarios/Drive.h"
 
 #include <algorithm>
 #include <cstdio>
-#include <fstream>
 #include <string_view>
-
-#include <unistd.h>
 
 namespace kestrum::bench {
 namespace {
 
 using namespace std::chrono;
-
-/// The memory of this process, in MiB.
-double resident()
-{
-    std::ifstream file("/proc/self/statm");
-    double size = 0, pages = 0;
-    file >> size >> pages;
-    return pages * static_cast<double>(::sysconf(_SC_PAGESIZE)) / (1 << 20);
-}
 
 void runDay(const Scenario& scenario)
 {
