@@ -238,7 +238,8 @@ std::vector<TerminalSheet::Placed> TerminalSheet::placeColumns(std::size_t part,
         placed.push_back({i, 0, value, beside});
         room -= value + beside + kGap;
     }
-    room += kGap; // after the last one
+    const bool hasMore = placed.empty() || placed.back().index + 1 < shown.size();
+    room += hasMore ? kGap - 1 : kGap; // after the last one; "…" follows a blank
     for (bool isGrowing = true; isGrowing && room > 0;) {
         isGrowing = false;
         for (auto& each : placed)
