@@ -83,7 +83,8 @@ struct EventTable {
     std::string_view name;       ///< for people
     std::span<const ServingCellTable> cells;
     std::span<const FollowedValue> values;
-    std::span<const ImpliedState> rrcStates = {}; ///< where the display has no RRC state
+    std::span<const ImpliedState> rrcStates = {};        ///< where the display has no RRC state
+    std::span<const FollowedValue> liveModemValues = {}; ///< of the machine's own modem, whose tree has other names
 };
 
 extern const EventTable kLteEvents, kGsmEvents, kUtranEvents, kCdmaEvents, kIfxEvents;

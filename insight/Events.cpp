@@ -257,8 +257,9 @@ void EventFinder::useTable(const EventTable* table)
             serving.state.emplace(each.state);
         serving.known.resize(each.identity.size());
     }
-    for (const auto& each : table->values)
-        _followed.push_back({&each, watched(each.parts)});
+    for (const auto& values : {table->values, table->liveModemValues})
+        for (const auto& each : values)
+            _followed.push_back({&each, watched(each.parts)});
 }
 
 template <typename Use>

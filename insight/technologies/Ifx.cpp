@@ -34,6 +34,24 @@ constexpr FollowedValue kValues[] = {
     {EventKind::Data,         "GPRS mobility",       kPacketMobility},
     {EventKind::Data,         "access points",       kContexts},
 };
+
+// The tree of the machine's own modem. Which keys identify a cell depends on its technology.
+constexpr Place kLiveCell[] = {
+    {"Serving Cell/Technology"},      {"Serving Cell/Cell Identity"}, {"Serving Cell/Physical Cell ID"},
+    {"Serving Cell/Scrambling Code"}, {"Serving Cell/E-ARFCN"},       {"Serving Cell/NR-ARFCN"},
+};
+constexpr Place kAccess[] = {{"Registration/Access Technology"}};
+constexpr Place kRegistration[] = {{"Registration/Registration State"}};
+constexpr Place kTrackingArea[] = {{"Serving Cell/Tracking Area Code"}};
+constexpr Place kModem[] = {{"Modem/State"}};
+
+constexpr FollowedValue kLiveModemValues[] = {
+    {EventKind::ServingCell,  "serving cell",        kLiveCell},
+    {EventKind::Technology,   "access technology",   kAccess},
+    {EventKind::Registration, "registration",        kRegistration},
+    {EventKind::Registration, "tracking area",       kTrackingArea},
+    {EventKind::Data,         "modem",               kModem},
+};
 // clang-format on
 
 } // namespace
@@ -43,6 +61,7 @@ constinit const EventTable kIfxEvents{
     .name = "IFX",
     .cells = kCells,
     .values = kValues,
+    .liveModemValues = kLiveModemValues,
 };
 
 } // namespace kestrum

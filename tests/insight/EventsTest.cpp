@@ -522,5 +522,31 @@ TEST_F(CdmaEvents, TheUnitIsNoPartOfACellsIdentity)
     EXPECT_THAT(watching.events(), ElementsAre("serving cell EV-DO:  -> EV-DO PN 424"));
 }
 
+TEST(LiveModemEvents, AreItsCellsAndStates)
+{
+    const auto tree = [](const char* cell, const char* access, const char* registration, const char* modem) {
+        return makeDictionary({{kSortedKey, kSortedKey},
+                               {"3;Serving Cell", makeDictionary({{kSortedKey, kSortedKey},
+                                                                  {"1;Technology", "LTE"},
+                                                                  {"2;Physical Cell ID", cell},
+                                                                  {"3;Tracking Area Code", "4354"}})},
+                               {"5;Registration", makeDictionary({{kSortedKey, kSortedKey},
+                                                                  {"1;Registration State", registration},
+                                                                  {"2;Access Technology", access}})},
+                               {"9;Modem", makeDictionary({{kSortedKey, kSortedKey}, {"1;State", modem}})}});
+    };
+    Watching watching(kVoxLogChannelTechnology_IFX, tree("7", "LTE", "Home", "Registered"));
+    watching.message();
+    EXPECT_THAT(watching.events(), IsEmpty());
+    watching.show(tree("8", "LTE", "Home", "Registered"));
+    watching.message();
+    EXPECT_THAT(watching.events(), ElementsAre("serving cell serving cell: LTE-7 -> LTE-8"));
+    watching.show(tree("8", "UMTS", "Searching", "Connected"));
+    watching.message();
+    EXPECT_THAT(watching.events(),
+                ElementsAre("serving cell serving cell: LTE-7 -> LTE-8", "technology access technology: LTE -> UMTS",
+                            "registration registration: Home -> Searching", "data modem: Registered -> Connected"));
+}
+
 } // namespace
 } // namespace kestrum
