@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <string_view>
 #include <utility>
 #include <vector>
 
@@ -30,6 +31,13 @@ std::string noteOf(std::size_t shown, std::size_t listed, std::uint64_t dropped)
     if (dropped != 0)
         note += formatted("%s%lu older ones are no longer listed.", note.empty() ? "" : " ", dropped);
     return note;
+}
+
+/// "cell 1712898, PCI 232": the title of the event has the radio already, and a phone's screen is narrow.
+std::string withoutRadio(std::string_view text, const Event& event)
+{
+    const bool hasRadio = text.starts_with(event.name) && text.substr(event.name.size()).starts_with(' ');
+    return std::string(hasRadio ? text.substr(event.name.size() + 1) : text);
 }
 
 } // namespace
@@ -62,7 +70,11 @@ bool EventSheet::update(const Shown&)
         const auto& event = *--each;
         const auto time = event.time ? momentText(_clock, *event.time, _today) : std::string();
         rows.push_back({.identity = std::to_string(--number),
-                        .cells = {{time}, {titleOf(event)}, {event.was}, {event.is}, {event.levels}}});
+                        .cells = {{time},
+                                  {titleOf(event)},
+                                  {withoutRadio(event.was, event)},
+                                  {withoutRadio(event.is, event)},
+                                  {event.levels}}});
     }
     const auto kept = std::min(part.table.rows.size(), kMostRows - rows.size());
     std::move(part.table.rows.begin(), part.table.rows.begin() + static_cast<std::ptrdiff_t>(kept),

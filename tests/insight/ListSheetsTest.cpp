@@ -34,7 +34,7 @@ class EventSheetTest : public testing::Test {
 protected:
     void add(const char* is, std::optional<Date> at)
     {
-        events.add({at, EventKind::Reselection, "LTE", "cell 1", is, "RSRP -98.25 dBm"});
+        events.add({at, EventKind::Reselection, "LTE", "LTE cell 1", is, "RSRP -98.25 dBm"});
     }
     const SheetContents& contents()
     {
@@ -56,12 +56,12 @@ TEST_F(EventSheetTest, WithoutEventsItSaysSo)
 
 TEST_F(EventSheetTest, TheNewestIsFirstWithItsTimeAndLevels)
 {
-    add("cell 2", clock.date);
+    add("LTE cell 2", clock.date);
     EXPECT_EQ(contents().parts.size(), 1u);
-    add("cell 3", clock.date + 3s);
+    add("GSM cell 3", clock.date + 3s);
     add("cell 4", std::nullopt);
     EXPECT_THAT(rows(contents()), ElementsAre(" | reselection (LTE) | cell 1 | cell 4 | RSRP -98.25 dBm",
-                                              "06:05:45 | reselection (LTE) | cell 1 | cell 3 | RSRP -98.25 dBm",
+                                              "06:05:45 | reselection (LTE) | cell 1 | GSM cell 3 | RSRP -98.25 dBm",
                                               "06:05:42 | reselection (LTE) | cell 1 | cell 2 | RSRP -98.25 dBm"));
     EXPECT_EQ(contents().parts[0].note, "");
 }
