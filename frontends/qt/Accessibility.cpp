@@ -3,7 +3,9 @@
 #include "frontends/qt/Alert.h"
 #include "frontends/qt/FocusRing.h"
 #include "frontends/qt/MainWindow.h"
+#include "frontends/qt/PlotView.h"
 #include "frontends/qt/Table.h"
+#include "frontends/qt/Type.h"
 
 #include <QAccessible>
 #include <QAccessibleWidget>
@@ -19,6 +21,18 @@ Table* tableOf(const Cell& cell)
     QWidget* viewport = cell.parentWidget();
     return viewport ? dynamic_cast<Table*>(viewport->parentWidget()) : nullptr;
 }
+
+/// A plot is its sentence. No event tells of a new one: it is new at every refresh.
+class AccessiblePlot final : public QAccessibleWidget {
+public:
+    explicit AccessiblePlot(Plot& plot) : QAccessibleWidget(&plot, QAccessible::Chart) {}
+
+    QString text(QAccessible::Text kind) const override
+    {
+        return kind == QAccessible::Name ? lineOf(static_cast<Plot*>(widget())->plot().sentence)
+                                         : QAccessibleWidget::text(kind);
+    }
+};
 
 class AccessibleCell final : public QAccessibleWidget {
 public:
@@ -177,6 +191,8 @@ QAccessibleInterface* makeInterface(const QString& type, QObject* object)
 {
     if (auto* cell = dynamic_cast<Cell*>(object))
         return new AccessibleCell(*cell);
+    if (auto* plot = dynamic_cast<Plot*>(object))
+        return new AccessiblePlot(*plot);
     if (auto* table = dynamic_cast<Table*>(object))
         return new AccessibleTable(*table);
     // The table scrolls to the row that is requested. Its scroll bars are never shown and must not be moved from

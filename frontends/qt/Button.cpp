@@ -53,11 +53,13 @@ void Button::paintEvent(QPaintEvent*)
             painter.setBrush(shade);
             painter.drawRoundedRect(body, 8, 8);
         }
-    } else if (isDown()) {
+    } else if (isDown() || isChecked()) {
         painter.setPen(Qt::NoPen);
-        painter.setBrush(colours.pressed());
+        painter.setBrush(isDown() ? colours.pressed() : colours.selected());
         painter.drawRoundedRect(body, 8, 8);
     }
+    if (isChecked()) // a shade alone is hard to see
+        painter.fillRect(QRectF(body.left() + 8, body.bottom() - 2, body.width() - 16, 2), colours.accent);
     QRectF place = rect();
     if (_kind == Kind::Back) {
         strokeChevron(painter, QPointF(kInset + 3, height() / 2.0), Qt::LeftArrow, colours.accent);

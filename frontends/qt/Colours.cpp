@@ -55,6 +55,11 @@ QColor Colours::selected() const
     return mixed(surface, accent, 0.12f);
 }
 
+QColor Colours::spread() const
+{
+    return mixed(surface, accent, 0.3f);
+}
+
 QPalette paletteOf(const Colours& colours)
 {
     QPalette palette;

@@ -19,6 +19,7 @@ struct Colours {
 
     QColor pressed() const;  ///< a row or button while it is held
     QColor selected() const; ///< the chosen row
+    QColor spread() const;   ///< behind a curve in accent, between the least and the greatest number
     QColor onAccent() const { return surface; }
     static QColor dim() { return QColor(0, 0, 0, 115); } ///< laid over the widgets that a modal screen covers
 };

@@ -53,6 +53,8 @@ bool DragScroll::eventFilter(QObject*, QEvent* event)
         }
         return false;
     }
+    if (type == QEvent::MouseMove && !(mouse.buttons() & Qt::LeftButton))
+        _pressed.reset(); // another widget had the release
     if (!_pressed)
         return false;
     if (type == QEvent::MouseMove) {

@@ -14,6 +14,7 @@
 #include <QStyledItemDelegate>
 
 #include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace kestrum::qt {
@@ -47,9 +48,52 @@ public:
     }
 };
 
+/// The identity columns of a table that is scrolled sideways.
+class FrozenColumns final : public QWidget {
+public:
+    explicit FrozenColumns(SheetTableView& table) : QWidget(&table), _table(table) {}
+
+protected:
+    void paintEvent(QPaintEvent*) override
+    {
+        QPainter painter(this);
+        _table.drawFrozen(painter);
+    }
+    void mousePressEvent(QMouseEvent*) override {} // not for what is below
+    void mouseReleaseEvent(QMouseEvent* event) override { _table.pressFrozen(event->pos()); }
+
+private:
+    SheetTableView& _table;
+};
+
+/// How many rows stand before those that were shown; 0 when their order has changed, or most of them are gone.
+std::size_t rowsAtFront(const std::vector<SheetRow>& rows, const std::vector<SheetRow>& before)
+{
+    if (before.empty())
+        return 0;
+    const auto first = std::ranges::find(rows, before.front().identity, &SheetRow::identity);
+    const auto common = std::min<std::ptrdiff_t>(rows.end() - first, std::ssize(before));
+    const bool same = std::equal(first, first + common, before.begin(),
+                                 [](const auto& a, const auto& b) { return a.identity == b.identity; });
+    return same && common * 2 >= std::ssize(before) ? static_cast<std::size_t>(first - rows.begin()) : 0;
+}
+
 QString textOf(std::string_view text)
 {
     return lineOf(text);
+}
+
+/// Thin bars that only show the place, as the panes have them: a finger or the wheel scrolls.
+void setUpBars(QAbstractScrollArea& area)
+{
+    for (QScrollBar* bar : {area.verticalScrollBar(), area.horizontalScrollBar()})
+        bar->setStyleSheet(QStringLiteral(
+            "QScrollBar { background: palette(base); border: none; }"
+            "QScrollBar:vertical { width: 4px; } QScrollBar:horizontal { height: 4px; }"
+            "QScrollBar::handle { background: palette(placeholder-text); border-radius: 2px; min-width: 24px; "
+            "min-height: 24px; }"
+            "QScrollBar::add-line, QScrollBar::sub-line { width: 0; height: 0; }"
+            "QScrollBar::add-page, QScrollBar::sub-page { background: none; }"));
 }
 
 void setUp(QLabel& label, const QFont& font, bool muted = false)
@@ -98,19 +142,23 @@ void LevelBar::paintEvent(QPaintEvent*)
 SheetTableView::SheetTableView(QAbstractScrollArea& around, QWidget* parent) : QTableWidget(parent)
 {
     setFont(fontOf(systemFont(kTextSize)));
+    setUpBars(*this);
     setItemDelegate(new BarDelegate(this));
     setEditTriggers(NoEditTriggers);
     setSelectionMode(NoSelection);
     setFrameShape(NoFrame);
     setShowGrid(false);
     setTabKeyNavigation(false);
-    new DragScroll(*this, &around);
+    auto* drag = new DragScroll(*this, &around);
+    _frozen = new FrozenColumns(*this);
+    _frozen->installEventFilter(drag);
+    _frozen->hide();
     setVerticalScrollMode(ScrollPerPixel);
     setHorizontalScrollMode(ScrollPerPixel);
     verticalHeader()->hide();
     verticalHeader()->setDefaultSectionSize(kTableRow);
     verticalHeader()->setSectionResizeMode(QHeaderView::Fixed);
-    horizontalHeader()->setSectionResizeMode(QHeaderView::ResizeToContents);
+    horizontalHeader()->setSectionResizeMode(QHeaderView::Fixed);
     horizontalHeader()->setMinimumHeight(kRowHeight);
     horizontalHeader()->setFont(semiboldFont(kStatusSize));
     horizontalHeader()->setHighlightSections(false);
@@ -132,6 +180,7 @@ void SheetTableView::setHeadings(const SheetTable& table)
             auto* fresh = new QTableWidgetItem(heading);
             fresh->setTextAlignment(Qt::AlignVCenter | (column.isNumeric ? Qt::AlignRight : Qt::AlignLeft));
             setHorizontalHeaderItem(i, fresh);
+            widen(i, QFontMetrics(horizontalHeader()->font()).horizontalAdvance(heading));
         }
     }
 }
@@ -155,16 +204,110 @@ void SheetTableView::setRow(int row, const SheetTable& table, const SheetRow& sh
         item->setData(kPartRole, cell.bar ? QVariant(*cell.bar) : QVariant());
         item->setTextAlignment(Qt::AlignVCenter | (column.isNumeric ? Qt::AlignRight : Qt::AlignLeft));
         item->setFont(shown.isReference ? semiboldFont(kTextSize) : font());
+        widen(i, QFontMetrics(item->font()).horizontalAdvance(text));
     }
+}
+
+void SheetTableView::widen(int column, int width)
+{
+    constexpr int kAround = 16; // of a cell's and a heading's text
+    if (width + kAround > columnWidth(column))
+        setColumnWidth(column, width + kAround);
+}
+
+void SheetTableView::insertAtFront(std::size_t rows)
+{
+    const int offset = verticalScrollBar()->value(), count = static_cast<int>(rows);
+    model()->insertRows(0, count);
+    _table.rows.insert(_table.rows.begin(), rows, {});
+    if (offset == 0)
+        return; // who looks at the newest row wants the next one too
+    updateGeometries();
+    verticalScrollBar()->setValue(offset + count * kTableRow);
 }
 
 void SheetTableView::setTable(const SheetTable& table)
 {
-    setColumnCount(static_cast<int>(table.columns.size()));
+    if (table == _table)
+        return;
+    if (table.columns != _table.columns) {
+        _table = {};
+        setRowCount(0);
+        setColumnCount(static_cast<int>(table.columns.size()));
+        for (int i = 0; i < columnCount(); ++i)
+            setColumnWidth(i, kRowHeight);
+    }
+    if (const std::size_t fresh = rowsAtFront(table.rows, _table.rows))
+        insertAtFront(fresh);
     setRowCount(static_cast<int>(table.rows.size()));
     setHeadings(table);
-    for (int i = 0; i < rowCount(); ++i)
-        setRow(i, table, table.rows[static_cast<std::size_t>(i)]);
+    for (std::size_t i = 0; i < table.rows.size(); ++i)
+        if (i >= _table.rows.size() || table.rows[i] != _table.rows[i])
+            setRow(static_cast<int>(i), table, table.rows[i]);
+    _table = table;
+    arrangeFrozen();
+}
+
+int SheetTableView::identityColumns() const
+{
+    const auto end = std::ranges::find(_table.columns, false, &SheetColumn::isIdentity);
+    return static_cast<int>(end - _table.columns.begin());
+}
+
+void SheetTableView::arrangeFrozen()
+{
+    int width = 0;
+    for (int i = 0; i < identityColumns(); ++i)
+        width += columnWidth(i);
+    _frozen->setGeometry(0, 0, width, viewport()->geometry().bottom() + 1);
+    // On a narrow screen they would leave too little of the others.
+    _frozen->setVisible(horizontalScrollBar()->value() > 0 && width < viewport()->width() * 2 / 3);
+    _frozen->update();
+}
+
+void SheetTableView::drawFrozen(QPainter& painter)
+{
+    const Colours& colours = coloursOf(*this);
+    const int top = horizontalHeader()->height();
+    painter.fillRect(_frozen->rect(), colours.surface);
+    painter.fillRect(QRectF(_frozen->width() - 1, 0, 1, _frozen->height()), colours.line);
+    painter.setPen(colours.ink);
+    painter.setFont(horizontalHeader()->font());
+    for (int i = 0, x = 0; i < identityColumns(); x += columnWidth(i++)) {
+        const auto* heading = horizontalHeaderItem(i);
+        painter.drawText(QRect(x + 6, 0, columnWidth(i) - 12, top), heading->textAlignment(), heading->text());
+    }
+    painter.setClipRect(QRect(0, top, _frozen->width(), _frozen->height()));
+    QStyleOptionViewItem option;
+    initViewItemOption(&option);
+    for (int row = std::max(rowAt(0), 0); row < rowCount() && rowViewportPosition(row) < viewport()->height(); ++row)
+        for (int i = 0, x = 0; i < identityColumns(); x += columnWidth(i++)) {
+            option.rect = {x, top + rowViewportPosition(row), columnWidth(i), rowHeight(row)};
+            itemDelegate()->paint(&painter, option, model()->index(row, i));
+        }
+}
+
+void SheetTableView::pressFrozen(QPoint at)
+{
+    if (at.y() >= horizontalHeader()->height() || !horizontalHeader()->sectionsClickable())
+        return;
+    for (int i = 0, x = 0; i < identityColumns(); ++i)
+        if (x += columnWidth(i); at.x() < x) {
+            Q_EMIT horizontalHeader()->sectionClicked(i);
+            return;
+        }
+}
+
+void SheetTableView::resizeEvent(QResizeEvent* event)
+{
+    QTableWidget::resizeEvent(event);
+    arrangeFrozen();
+}
+
+void SheetTableView::scrollContentsBy(int dx, int dy)
+{
+    QTableWidget::scrollContentsBy(dx, dy);
+    arrangeFrozen();
 }
 
 void SheetTableView::fitRows()
@@ -174,22 +317,32 @@ void SheetTableView::fitRows()
     setFixedHeight(kRowHeight + rowCount() * kTableRow);
 }
 
-SheetPartView::SheetPartView(QAbstractScrollArea& around, QWidget* parent)
-    : QWidget(parent), _caption(this), _facts(this), _note(this), _levels(this), _table(around, this)
+SheetPartView::SheetPartView(const PlotActions& actions, QAbstractScrollArea& around, QWidget* parent)
+    : QWidget(parent),
+      _caption(this),
+      _lines(this),
+      _facts(this),
+      _note(this),
+      _levels(this),
+      _plot(actions, this),
+      _table(around, this)
 {
     auto* layout = new QVBoxLayout(this);
     layout->setContentsMargins(0, 0, 0, 0);
     layout->setSpacing(kGap / 2);
     setUp(_caption, semiboldFont(kTextSize));
+    setUp(_lines, fontOf(systemFont(kTextSize)));
     setUp(_facts, fontOf(systemFont(kTextSize)));
     setUp(_note, fontOf(systemFont(kStatusSize)), true);
     auto* grid = new QGridLayout(&_levels);
     grid->setContentsMargins(kInset, 0, kInset, 0);
-    for (QLabel* each : {&_caption, &_facts, &_note})
+    for (QLabel* each : {&_caption, &_lines, &_facts, &_note})
         each->setContentsMargins(kInset, 0, kInset, 0);
     layout->addWidget(&_caption);
+    layout->addWidget(&_lines);
     layout->addWidget(&_facts);
     layout->addWidget(&_levels);
+    layout->addWidget(&_plot, 1);
     layout->addWidget(&_table, 1);
     layout->addWidget(&_note);
 }
@@ -204,10 +357,17 @@ void SheetPartView::setPart(const SheetPart& part, bool alone)
     for (const auto& [heading, value] : part.facts)
         if (!value.bar) // no break between a name and its value
             facts << QString(textOf(heading) + u' ' + textOf(value.text)).replace(u' ', QChar::Nbsp);
+    QStringList lines;
+    for (const auto& line : part.lines)
+        lines << textOf(line);
     show(_caption, textOf(part.caption));
+    show(_lines, lines.join(QStringLiteral("\n\n")));
     show(_facts, facts.join(QStringLiteral("   ")));
     show(_note, textOf(part.note));
     setLevels(part);
+    _plot.setVisible(part.plot.has_value());
+    if (part.plot)
+        _plot.setPlot(*part.plot);
     _table.setVisible(!part.table.rows.empty());
     _table.setTable(part.table);
     _table.setAccessibleName(textOf(part.caption));
@@ -289,6 +449,7 @@ SheetView::SheetView(SheetOwner& owner, QWidget* parent)
     _scroll.setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     _scroll.setWidget(&_inside);
     _scroll.setFocusPolicy(Qt::NoFocus);
+    setUpBars(_scroll);
     new DragScroll(_scroll);
     _layout.setContentsMargins(0, 2, 0, 0);
     _layout.setSpacing(0);
@@ -311,7 +472,7 @@ void SheetView::setContents(const SheetContents& contents)
         _parts.pop_back();
     }
     while (_parts.size() < contents.parts.size()) {
-        auto* part = new SheetPartView(_scroll, &_inside);
+        auto* part = new SheetPartView(plotActions(), _scroll, &_inside);
         _insideLayout.insertWidget(_insideLayout.count() - 1, part);
         connect(part->table().horizontalHeader(), &QHeaderView::sectionClicked, this, [this](int column) {
             if (_owner && _canSort)
@@ -323,10 +484,34 @@ void SheetView::setContents(const SheetContents& contents)
         _parts[i]->table().horizontalHeader()->setSectionsClickable(_canSort);
         _parts[i]->setPart(contents.parts[i], alone);
     }
-    // A table that is alone has the room that is left, and scrolls in it.
-    _rest.setVisible(!alone);
-    if (alone)
-        _insideLayout.setStretchFactor(_parts.front(), 1);
+    // A table or a curve that is alone has the room that is left.
+    const auto grows = [](const SheetPart& part) {
+        return !part.table.rows.empty() || (part.plot && !part.plot->numbers.empty());
+    };
+    const bool fills = alone && grows(contents.parts.front());
+    _rest.setVisible(!fills);
+    if (!_parts.empty())
+        _insideLayout.setStretchFactor(_parts.front(), fills ? 1 : 0);
+}
+
+PlotActions SheetView::plotActions()
+{
+    return {[this](std::optional<std::size_t> to) {
+                if (_owner)
+                    _owner->cursorMoved(to);
+            },
+            [this](std::size_t range) {
+                if (_owner)
+                    _owner->rangeChosen(range);
+            }};
+}
+
+PlotView* SheetView::plot()
+{
+    for (auto* part : _parts)
+        if (!part->plot().isHidden())
+            return &part->plot();
+    return nullptr;
 }
 
 void SheetView::leave()
@@ -341,12 +526,17 @@ void SheetView::keyPressEvent(QKeyEvent* event)
     const bool alt = event->modifiers() == Qt::AltModifier;
     const bool leaves = key == Qt::Key_Escape || key == Qt::Key_Backspace || key == Qt::Key_Back ||
                         (alt && key == Qt::Key_Left) || sheetCommandOf(*event);
+    if (PlotView* const shown = plot(); shown && shown->handle(*event))
+        return;
     if (leaves && !event->isAutoRepeat())
         leave();
     else if (key == Qt::Key_Down || key == Qt::Key_PageDown)
         scroll(key == Qt::Key_Down ? QAbstractSlider::SliderSingleStepAdd : QAbstractSlider::SliderPageStepAdd);
     else if (key == Qt::Key_Up || key == Qt::Key_PageUp)
         scroll(key == Qt::Key_Up ? QAbstractSlider::SliderSingleStepSub : QAbstractSlider::SliderPageStepSub);
+    else if ((key == Qt::Key_Left || key == Qt::Key_Right) && !_parts.empty())
+        _parts.front()->table().horizontalScrollBar()->triggerAction(
+            key == Qt::Key_Left ? QAbstractSlider::SliderSingleStepSub : QAbstractSlider::SliderSingleStepAdd);
     else
         event->ignore();
 }

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "frontends/qt/Button.h"
+#include "frontends/qt/PlotView.h"
 #include "platform/NavigationView.h"
 #include "platform/Sheet.h"
 
@@ -43,18 +44,37 @@ public:
     /// As high as its rows, without scrolling.
     void fitRows();
 
+    /// Covers the columns that left the view, where they identify a row. Drawn: a screen reader has them once.
+    const QWidget& frozen() const { return *_frozen; }
+    void drawFrozen(QPainter& painter);
+    void pressFrozen(QPoint at);
+
+protected:
+    void resizeEvent(QResizeEvent* event) override;
+    void scrollContentsBy(int dx, int dy) override;
+
 private:
     void setHeadings(const SheetTable& table);
     void setRow(int row, const SheetTable& table, const SheetRow& shown);
+    void insertAtFront(std::size_t rows);
+    /// Columns never become narrower: the others would move.
+    void widen(int column, int width);
+    void arrangeFrozen();
+    int identityColumns() const;
+
+    SheetTable _table;
+    QWidget* _frozen;
 };
 
-/// A part of a sheet: caption, facts, levels, table, note.
+/// A part of a sheet: caption, lines of text, facts, levels, plot, table, note.
 class SheetPartView final : public QWidget {
 public:
-    SheetPartView(QAbstractScrollArea& around, QWidget* parent);
+    SheetPartView(const PlotActions& actions, QAbstractScrollArea& around, QWidget* parent);
     /// `alone`: the table has the rest of the sheet, and scrolls.
     void setPart(const SheetPart& part, bool alone);
     SheetTableView& table() { return _table; }
+    PlotView& plot() { return _plot; }
+    const QLabel& lines() const { return _lines; }
     const QLabel& facts() const { return _facts; }
 
 private:
@@ -67,9 +87,10 @@ private:
 
     void setLevels(const SheetPart& part);
 
-    QLabel _caption, _facts, _note;
+    QLabel _caption, _lines, _facts, _note;
     QWidget _levels;
     std::vector<Level> _shownLevels;
+    PlotView _plot;
     SheetTableView _table;
 };
 
@@ -83,6 +104,7 @@ public:
     QString title() const { return _title.text(); }
     QString status() const { return _status.text(); }
     const std::vector<SheetPartView*>& parts() const { return _parts; }
+    PlotView* plot(); ///< null where the sheet has none
     /// No call to the owner after this.
     void end() { _owner = nullptr; }
 
@@ -92,6 +114,7 @@ protected:
     void paintEvent(QPaintEvent*) override;
 
 private:
+    PlotActions plotActions();
     void leave();
     void scroll(QAbstractSlider::SliderAction action);
 

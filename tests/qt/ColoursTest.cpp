@@ -45,6 +45,7 @@ TEST_P(AScheme, HasTextThatCanBeRead)
         EXPECT_GE(contrast(colours.muted, behind), kText) << behind.name().toStdString();
         EXPECT_GE(contrast(colours.accent, behind), kText) << behind.name().toStdString();
     }
+    EXPECT_GE(contrast(colours.ink, colours.spread()), kText);
     EXPECT_GE(contrast(colours.danger, colours.surface), kText);
     EXPECT_GE(contrast(colours.onAccent(), colours.accent), kText);
 }
@@ -57,6 +58,8 @@ TEST_P(AScheme, HasMarksThatCanBeSeen)
         EXPECT_GE(contrast(colours.accent, behind), kMark) << "check mark, ring on " << behind.name().toStdString();
     }
     EXPECT_GE(contrast(colours.muted, colours.ground), kMark) << "spinner";
+    EXPECT_GE(contrast(colours.accent, colours.spread()), kMark) << "curve";
+    EXPECT_GE(contrast(colours.muted, colours.spread()), kMark) << "where a state begins";
     EXPECT_NE(colours.pressed(), colours.surface);
     EXPECT_NE(colours.selected(), colours.surface);
 }

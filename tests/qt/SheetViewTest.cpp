@@ -4,6 +4,9 @@
 #include <QHeaderView>
 #include <QScrollBar>
 #include <QScroller>
+#include <QSignalSpy>
+
+#include <algorithm>
 
 namespace kestrum {
 namespace {
@@ -125,6 +128,81 @@ TEST_F(SheetViewTest, AFingerOnATableOfSeveralScrollsTheSheet)
     pressAndMove(*shownTable().viewport(), {100, 300}, {100, 200});
     EXPECT_TRUE(QTest::qWaitFor([&] { return placeOf(shownTable()).y() < before - 80; }));
     release(*navigation().insight(), {100, 300});
+}
+
+TEST_F(SheetViewTest, WhatIdentifiesARowStaysInView)
+{
+    open();
+    auto wide = contents();
+    for (int i = 0; i < 8; ++i)
+        wide.parts[0].table.columns.push_back({.heading = "A long heading"});
+    for (auto& row : wide.parts[0].table.rows)
+        row.cells.resize(10);
+    fill(wide);
+    auto& shown = shownTable();
+    const int identity = shown.columnWidth(0), under = shown.horizontalHeader()->height();
+    const QRect cells(0, under, identity - 1, 2 * 36);
+    const QImage before = shown.grab(cells).toImage();
+    EXPECT_FALSE(shown.frozen().isVisible());
+    shown.horizontalScrollBar()->setValue(200);
+    EXPECT_TRUE(shown.frozen().isVisible());
+    EXPECT_EQ(shown.frozen().width(), identity);
+    EXPECT_EQ(shown.grab(cells).toImage(), before);
+    click(shown.frozen(), {10, 10});
+    EXPECT_THAT(chosen, testing::ElementsAre(0u));
+    for (int i = 0; i < 100; ++i)
+        QTest::keyClick(navigation().insight(), Qt::Key_Left);
+    EXPECT_FALSE(shown.frozen().isVisible());
+    QTest::keyClick(navigation().insight(), Qt::Key_Right);
+    EXPECT_TRUE(shown.frozen().isVisible());
+}
+
+TEST_F(SheetViewTest, ChangesOnlyTheRowsThatDiffer)
+{
+    open();
+    auto many = contents();
+    many.parts[0].table.rows = rowsOf(1000);
+    fill(many);
+    shownTable().verticalScrollBar()->setValue(360);
+    const QSignalSpy changed(shownTable().model(), &QAbstractItemModel::dataChanged);
+    const QSignalSpy inserted(shownTable().model(), &QAbstractItemModel::rowsInserted);
+    fill(many);
+    EXPECT_EQ(changed.count(), 0);
+    auto& rows = many.parts[0].table.rows;
+    rows.insert(rows.begin(), {.identity = "new", .cells = {{"new"}, {"-1"}}});
+    rows.pop_back();
+    fill(many);
+    EXPECT_EQ(inserted.count(), 1);
+    for (const auto& each : changed)
+        EXPECT_EQ(each[1].toModelIndex().row(), 0);
+    EXPECT_EQ(shownTable().item(0, 0)->text(), QStringLiteral("new"));
+    EXPECT_EQ(shownTable().item(999, 0)->text(), QStringLiteral("998"));
+    EXPECT_EQ(shownTable().verticalScrollBar()->value(), 360 + 36) << "the same rows are in view";
+}
+
+TEST_F(SheetViewTest, ANewOrderOfTheRowsDoesNotScroll)
+{
+    open();
+    auto many = contents();
+    many.parts[0].table.rows = rowsOf(100);
+    fill(many);
+    shownTable().verticalScrollBar()->setValue(360);
+    std::ranges::reverse(many.parts[0].table.rows);
+    fill(many);
+    EXPECT_EQ(shownTable().verticalScrollBar()->value(), 360);
+    EXPECT_EQ(shownTable().rowCount(), 100);
+    EXPECT_EQ(shownTable().item(0, 0)->text(), QStringLiteral("99"));
+}
+
+TEST_F(SheetViewTest, ShowsLinesOfTextAboveTheFacts)
+{
+    open();
+    auto said = contents();
+    said.parts[0].lines = {std::string(300, 'a') + " " + std::string(20, 'b'), "Second"};
+    fill(said);
+    auto& part = *navigation().insight()->parts().front();
+    EXPECT_TRUE(part.lines().text().endsWith(QStringLiteral("b\n\nSecond")));
+    EXPECT_LE(part.lines().geometry().bottom(), part.facts().geometry().top());
 }
 
 TEST_F(SheetViewTest, KeysOpenThem)
