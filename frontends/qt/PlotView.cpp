@@ -23,8 +23,8 @@ namespace kestrum::qt {
 namespace {
 
 constexpr int kLeastHeight = 160, kUsualHeight = 300, kStripHeight = 56;
-constexpr double kDot = 4; // the radius of the cursor's
-constexpr double kThin = 1;
+constexpr double kDot = 4;             // the radius of the cursor's
+constexpr double kThin = 1, kTick = 8; // of a mark: a faint line, and a tick at its foot
 
 /// A text over the curve stays legible.
 void drawOver(QPainter& painter, const QRectF& place, const QString& text, QColor behind, const QColor& colour)
@@ -94,11 +94,14 @@ void Plot::paintEvent(QPaintEvent*)
 {
     QPainter painter(this);
     painter.setRenderHint(QPainter::Antialiasing);
-    if (isStrip())
+    if (isStrip()) {
         drawStrip(painter);
-    else
+        drawMarks(painter);
+    } else { // the curve over the marks: the cell may change often
+        drawGround(painter);
+        drawMarks(painter);
         drawCurve(painter);
-    drawMarks(painter);
+    }
     drawWords(painter);
     drawTexts(painter);
     drawCursor(painter);
@@ -106,7 +109,7 @@ void Plot::paintEvent(QPaintEvent*)
         strokeRing(painter, rect(), coloursOf(*this).accent);
 }
 
-void Plot::drawCurve(QPainter& painter) const
+void Plot::drawGround(QPainter& painter) const
 {
     const Colours& colours = coloursOf(*this);
     const QRectF within = place();
@@ -116,6 +119,12 @@ void Plot::drawCurve(QPainter& painter) const
     const double thin = 1 / devicePixelRatioF();
     for (const double y : {within.top(), within.center().y(), within.bottom()})
         painter.fillRect(QRectF(within.left(), y, within.width(), thin), colours.line);
+}
+
+void Plot::drawCurve(QPainter& painter) const
+{
+    const Colours& colours = coloursOf(*this);
+    const PlotShape shape(_plot, place());
     painter.setPen(Qt::NoPen);
     painter.setBrush(colours.spread());
     for (const QPolygonF& spread : shape.spreads())
@@ -169,7 +178,8 @@ void Plot::drawMarks(QPainter& painter) const
     double from = within.left();
     for (const auto& mark : _plot.marks) {
         const double x = shape.x(mark.at);
-        painter.fillRect(QRectF(x, within.top(), kThin, within.height()), colours.muted);
+        painter.fillRect(QRectF(x, within.top(), kThin, within.height()), colours.line);
+        painter.fillRect(QRectF(x - kThin, within.bottom() - kTick, 3 * kThin, kTick), colours.muted);
         const QString text = lineOf(mark.text);
         const double width = fontMetrics().horizontalAdvance(text) + 4;
         if (text.isEmpty() || x + 2 < from || x + 2 + width > within.right())

@@ -43,6 +43,7 @@ private:
     int lineHeight() const { return fontMetrics().height(); }
     int besideTheAxis() const;
     void moveCursorTo(const QMouseEvent& event);
+    void drawGround(QPainter& painter) const;
     void drawCurve(QPainter& painter) const;
     void drawStrip(QPainter& painter) const;
     void drawMarks(QPainter& painter) const;
