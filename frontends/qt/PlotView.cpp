@@ -16,6 +16,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <ranges>
 #include <utility>
 
 namespace kestrum::qt {
@@ -175,18 +176,20 @@ void Plot::drawMarks(QPainter& painter) const
     const Colours& colours = coloursOf(*this);
     const QRectF within = place();
     const PlotShape shape(_plot, within);
-    double from = within.left();
     for (const auto& mark : _plot.marks) {
         const double x = shape.x(mark.at);
         painter.fillRect(QRectF(x, within.top(), kThin, within.height()), colours.line);
         painter.fillRect(QRectF(x - kThin, within.bottom() - kTick, 3 * kThin, kTick), colours.muted);
-        const QString text = lineOf(mark.text);
-        const double width = fontMetrics().horizontalAdvance(text) + 4;
-        if (text.isEmpty() || x + 2 < from || x + 2 + width > within.right())
+    }
+    double end = within.right(); // of the room beside a mark: the next text's
+    for (const auto& mark : _plot.marks | std::views::reverse) {
+        if (mark.text.empty())
             continue;
-        drawOver(painter, {x + 2, within.bottom() - lineHeight(), width, 1.0 * lineHeight()}, text, colours.surface,
-                 colours.muted);
-        from = x + 2 + width;
+        const QString text = lineOf(mark.text);
+        const double x = shape.x(mark.at) + 2, width = fontMetrics().horizontalAdvance(text) + 4;
+        if (x + width <= std::exchange(end, x - 2))
+            drawOver(painter, {x, within.bottom() - lineHeight(), width, 1.0 * lineHeight()}, text, colours.surface,
+                     colours.muted);
     }
 }
 

@@ -256,6 +256,26 @@ TEST_F(APlotView, DrawsTheCurveAndLeavesTheGapEmpty)
     EXPECT_GT(curve(0.75), 0);
 }
 
+TEST_F(APlotView, NamesAnIdentityOnlyWhereThereIsRoom)
+{
+    SheetPlot identity;
+    identity.marks = {{0.5, "112"}, {0.505, ""}};
+    open(identity);
+    const auto nameAtTheMiddle = [&] {
+        const QRectF place = drawing().place();
+        const QRect right(static_cast<int>(place.center().x()) + 4, static_cast<int>(place.bottom()) - 16, 20, 14);
+        return drawing().grab(right).toImage();
+    };
+    const QImage named = nameAtTheMiddle();
+    plot.marks = {{0.5, ""}, {0.505, ""}};
+    refresh();
+    const QImage unnamed = nameAtTheMiddle();
+    EXPECT_NE(named, unnamed);
+    plot.marks = {{0.5, "112"}, {0.505, std::string(100, 'm')}};
+    refresh();
+    EXPECT_EQ(nameAtTheMiddle(), unnamed);
+}
+
 TEST_F(APlotView, FitsASmallScreen)
 {
     open(aPlot());
