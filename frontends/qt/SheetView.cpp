@@ -87,13 +87,13 @@ QString textOf(std::string_view text)
 void setUpBars(QAbstractScrollArea& area)
 {
     for (QScrollBar* bar : {area.verticalScrollBar(), area.horizontalScrollBar()})
-        bar->setStyleSheet(QStringLiteral(
-            "QScrollBar { background: palette(base); border: none; }"
-            "QScrollBar:vertical { width: 4px; } QScrollBar:horizontal { height: 4px; }"
-            "QScrollBar::handle { background: palette(placeholder-text); border-radius: 2px; min-width: 24px; "
-            "min-height: 24px; }"
-            "QScrollBar::add-line, QScrollBar::sub-line { width: 0; height: 0; }"
-            "QScrollBar::add-page, QScrollBar::sub-page { background: none; }"));
+        bar->setStyleSheet(
+            QStringLiteral("QScrollBar { background: palette(base); border: none; }"
+                           "QScrollBar:vertical { width: 4px; } QScrollBar:horizontal { height: 4px; }"
+                           "QScrollBar::handle { background: palette(highlight); border-radius: 2px; min-width: 24px; "
+                           "min-height: 24px; }"
+                           "QScrollBar::add-line, QScrollBar::sub-line { width: 0; height: 0; }"
+                           "QScrollBar::add-page, QScrollBar::sub-page { background: none; }"));
 }
 
 void setUp(QLabel& label, const QFont& font, bool muted = false)

@@ -1,5 +1,6 @@
 #include "frontends/qt/SheetView.h"
 #include "QtTest.h"
+#include "frontends/qt/Colours.h"
 
 #include <QHeaderView>
 #include <QScrollBar>
@@ -155,6 +156,23 @@ TEST_F(SheetViewTest, WhatIdentifiesARowStaysInView)
     EXPECT_FALSE(shown.frozen().isVisible());
     QTest::keyClick(navigation().insight(), Qt::Key_Right);
     EXPECT_TRUE(shown.frozen().isVisible());
+}
+
+TEST_F(SheetViewTest, ShowsWhereALongTableIs)
+{
+    open();
+    auto many = contents();
+    many.parts[0].table.rows = rowsOf(100);
+    fill(many);
+    auto& bar = *shownTable().verticalScrollBar();
+    const auto isMarked = [&](int y) {
+        return bar.grab().toImage().pixelColor(bar.width() / 2, y) == lightColours().accent;
+    };
+    EXPECT_TRUE(isMarked(5));
+    EXPECT_FALSE(isMarked(bar.height() - 5));
+    bar.setValue(bar.maximum());
+    EXPECT_FALSE(isMarked(5));
+    EXPECT_TRUE(isMarked(bar.height() - 5));
 }
 
 TEST_F(SheetViewTest, ChangesOnlyTheRowsThatDiffer)
