@@ -16,7 +16,7 @@ class RecentMessages {
 public:
     struct Limits {
         std::uint64_t turns = 450;    ///< 15 minutes of refreshes, every 2 s
-        std::size_t bytes = 64 << 20; ///< of the capture
+        std::size_t bytes = 48 << 20; ///< in memory: more than an ordinary modem sends in that time
     };
 
     RecentMessages() = default;

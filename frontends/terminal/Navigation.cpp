@@ -279,7 +279,7 @@ void TerminalNavigationView::drawHelp(Screen& screen)
     for (int i = 0; i < std::min(room, count - *_help); ++i) {
         const Line line =
             Line(screen, inside.row + i % rows, inside.column, inside.columns).part(i / rows * (widest + kGap), widest);
-        const auto& [keys, what] = lines[static_cast<std::size_t>(*_help + i)];
+        const auto& [keys, what] = *(lines.begin() + *_help + i);
         line.put(0, keys, {.bold = true});
         line.put(kHelpKeys, what);
     }

@@ -254,6 +254,7 @@ private:
     void placeCells()
     {
         std::vector<std::string> words;
+        words.reserve(_plot.bands.size());
         for (const auto& each : _plot.bands)
             words.push_back(each.word);
         const int all = std::max(_width - 2 * kInset, 1);

@@ -417,7 +417,7 @@ INSTANTIATE_TEST_SUITE_P(OfTheService, Faults,
                          testing::Values(Fault{"reply-never"}, Fault{"reply-1100ms"}, Fault{"wrong-ids"},
                                          Fault{"technology"}, Fault{"notifications"},
                                          Fault{"half-frame,garbage,oversized"}, Fault{"reply-900ms"},
-                                         Fault{"flood", 300 * kMegabyte, "lte"}, Fault{"byte-by-byte"}, Fault{"stop"},
+                                         Fault{"flood", 340 * kMegabyte, "lte"}, Fault{"byte-by-byte"}, Fault{"stop"},
                                          Fault{"die"}),
                          [](const auto& each) {
                              std::string name = each.param.names;
