@@ -112,6 +112,7 @@ TEST_F(ModemManagerTest, APropertyThatIsInvalidatedIsUnknown)
 {
     const auto path = daemon->plugIn(Fake::modem("abcd"));
     ASSERT_TRUE(eventually([&] { return modem().operatorName == "Test Net"; }));
+    daemon->objects[path][Fake::kModem3gpp].remove("OperatorName"); // the client may ask for all once more
     daemon->emitSignal(path, "org.freedesktop.DBus.Properties", "PropertiesChanged",
                        {Fake::kModem3gpp, QVariantMap(), QStringList{"OperatorName"}});
     EXPECT_TRUE(eventually([&] { return modem().operatorName.empty(); }));
