@@ -9,14 +9,14 @@
 namespace kestrum {
 namespace {
 
-constexpr std::size_t kHead = 12;    // length, log code, time stamp
-constexpr std::size_t kBeyond = 256; // bytes that a record may be longer than its length
+constexpr std::size_t kRecordHead = 12; // length, log code, time stamp
+constexpr std::size_t kBeyond = 256;    // bytes that a record may be longer than its length
 constexpr std::size_t kLongestPreamble = 3;
 constexpr LogCode kMostExtraCode = 0xFF;
 constexpr std::byte kOrdinary{ChannelMessage::kOrdinary}, kExtraCode{ChannelMessage::kExtraCode};
 
 // How far lengths are followed; and how far a record proven by time stamps is searched (twice the longest record).
-constexpr std::size_t kLookAhead = 1 << 20, kSearch = 128 << 10;
+constexpr std::size_t kRecordLookAhead = 1 << 20, kSearch = 128 << 10;
 
 // Time stamps in counts of 1.25 ms since 1980.
 constexpr unsigned kSubdivisionBits = 16;
@@ -47,8 +47,8 @@ std::optional<RecordReader::Head> RecordReader::headAt(std::size_t at, const Pre
 {
     if (_origin == Origin::Interval && !preamble.inInterval)
         return std::nullopt;
-    const Bytes all = _window.peek(at + kLongestPreamble + kHead);
-    const auto whole = Record(all).slice(at, preamble.size + kHead);
+    const Bytes all = _window.peek(at + kLongestPreamble + kRecordHead);
+    const auto whole = Record(all).slice(at, preamble.size + kRecordHead);
     if (!whole)
         return std::nullopt;
     if (preamble.size == kLongestPreamble && whole->bytes().front() != ChannelMessage::kPrefixMarker)
@@ -61,7 +61,7 @@ std::optional<RecordReader::Head> RecordReader::headAt(std::size_t at, const Pre
     const Record record = *whole->from(preamble.size);
     const std::size_t length = record.read(u16(0)).value_or(0);
     const std::uint64_t stamp = record.read64(4).value_or(0);
-    if (length < kHead)
+    if (length < kRecordHead)
         return std::nullopt;
     return Head{&preamble, length, record.read(u16(2)).value_or(0), stamp};
 }
@@ -85,12 +85,12 @@ RecordReader::Chain RecordReader::follow()
     const auto offset = _window.offset();
     _broken.erase(_broken.begin(), _broken.lower_bound(offset));
     _way.clear();
-    for (std::size_t at = 0; at <= kLookAhead;) {
-        const std::size_t there = _window.peek(at + kLongestPreamble + kHead).size();
+    for (std::size_t at = 0; at <= kRecordLookAhead;) {
+        const std::size_t there = _window.peek(at + kLongestPreamble + kRecordHead).size();
         if (there <= at)
             return Chain::Ends;
         const auto head = _broken.contains(offset + at) ? std::nullopt : framed(at);
-        if (!head && mayGrow() && (there < at + kLongestPreamble + kHead || headAt(at, kPreambles[kNoPreamble])))
+        if (!head && mayGrow() && (there < at + kLongestPreamble + kRecordHead || headAt(at, kPreambles[kNoPreamble])))
             return Chain::Ends;
         _way.push_back(offset + at);
         if (!head) {
@@ -138,10 +138,10 @@ bool RecordReader::isProvenAhead()
 
 RecordReader::Next RecordReader::whatFollows(std::size_t at, std::uint64_t stamp, int links)
 {
-    const std::size_t there = _window.peek(at + kHead).size();
+    const std::size_t there = _window.peek(at + kRecordHead).size();
     if (there <= at)
         return Next::End;
-    if (there - at < kHead)
+    if (there - at < kRecordHead)
         return _origin == Origin::Dlf ? Next::End : Next::Nothing;
     for (const auto& preamble : kPreambles) {
         const auto head = headAt(at, preamble);
@@ -210,7 +210,7 @@ RecordReader::Look RecordReader::look(std::size_t at, Evidence evidence)
             (preamble.anyType && (byStamp || head->stamp == 0 || !isInTime(head->stamp))))
             continue;
         const auto fits = [&](std::size_t end) {
-            if (end - at < preamble.size + kHead || _window.peek(end).size() < end)
+            if (end - at < preamble.size + kRecordHead || _window.peek(end).size() < end)
                 return false;
             const bool mayJump = !byStamp || isInTime(head->stamp);
             const auto next = whatFollows(end, head->stamp != 0 ? head->stamp : _lastStamp, mayJump ? 1 : 0);
@@ -225,7 +225,7 @@ RecordReader::Look RecordReader::look(std::size_t at, Evidence evidence)
         if (fitting == 0 && preamble.size != 0 && fits(end - 1))
             fitting = end - 1;
         if (fitting == 0 && !byStamp && head->code <= kMostExtraCode)
-            if (const auto last = endOfPropertyList(at + preamble.size + kHead); last != 0 && fits(last))
+            if (const auto last = endOfPropertyList(at + preamble.size + kRecordHead); last != 0 && fits(last))
                 fitting = last;
         if (fitting != 0)
             return {fitting - at, false, head};
@@ -244,12 +244,12 @@ CaptureReader::Found RecordReader::accept(const Head& head, std::size_t size)
 
 CaptureReader::Found RecordReader::byLength()
 {
-    const Record stream(_window.peek(kHead));
+    const Record stream(_window.peek(kRecordHead));
     const auto length = stream.read(u16(0));
     if (!length)
         return {.incomplete = true, .reason = "the length has only 1 of its 2 bytes"};
-    if (*length < kHead)
-        return {.reason = formatted("a record of %u bytes, shorter than its header of %lu", *length, kHead)};
+    if (*length < kRecordHead)
+        return {.reason = formatted("a record of %u bytes, shorter than its header of %lu", *length, kRecordHead)};
     if (const auto there = _window.peek(*length).size(); there < *length)
         return {.incomplete = true,
                 .reason = formatted("the last message is cut off (%lu bytes missing)", *length - there)};
@@ -269,15 +269,15 @@ CaptureReader::Found RecordReader::inOrder()
     if (!found.head && record && !isContradicted(*record))
         return accept(*record, size);
     if (!found.head)
-        return {.incomplete =
-                    found.incomplete || _window.peek(kLongestPreamble + kHead).size() < kLongestPreamble + kHead,
+        return {.incomplete = found.incomplete ||
+                              _window.peek(kLongestPreamble + kRecordHead).size() < kLongestPreamble + kRecordHead,
                 .reason = "no record begins here"};
 
     _accepted = found.head;
     // The record's length is wrong when the next record begins elsewhere.
     const std::size_t said = found.head->size();
     const std::size_t there = std::min(_window.peek(said + kBeyond).size(), said + kBeyond);
-    for (std::size_t at = found.head->preamble->size + kHead; at < there; ++at)
+    for (std::size_t at = found.head->preamble->size + kRecordHead; at < there; ++at)
         if (look(at, Evidence::TimeStamp).size != 0)
             return {.size = at,
                     .reason = formatted("the record's length field says %lu bytes, but the record has %lu", said, at)};
@@ -296,7 +296,7 @@ CaptureReader::Found RecordReader::behindDamage()
     // Without helpful stamps, the lengths must lead on from here, and not directly to the end by accident.
     if (const auto record = framed(0); record && !isProvenAhead() && follow() != Chain::Breaks && _way.size() > 1)
         return accept(*record, record->size());
-    return {.incomplete = _window.peek(kLongestPreamble + kHead).size() < kLongestPreamble + kHead};
+    return {.incomplete = _window.peek(kLongestPreamble + kRecordHead).size() < kLongestPreamble + kRecordHead};
 }
 
 Bytes RecordReader::message(std::size_t size)
@@ -309,7 +309,7 @@ Bytes RecordReader::message(std::size_t size)
         _lastStamp = head.stamp;
     if (head.preamble->inInterval)
         return whole;
-    const bool isList = head.code <= kMostExtraCode && isPropertyList(whole.subspan(std::min(size, kHead)));
+    const bool isList = head.code <= kMostExtraCode && isPropertyList(whole.subspan(std::min(size, kRecordHead)));
     _message.assign(1, head.preamble->size != 0 ? ChannelMessage::kPrefixMarker : isList ? kExtraCode : kOrdinary);
     _message.insert(_message.end(), whole.begin(), whole.end());
     return _message;

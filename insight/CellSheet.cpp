@@ -14,7 +14,7 @@
 namespace kestrum {
 namespace {
 
-SheetTable emptyTable()
+SheetTable cellTable()
 {
     return {.columns = {{.heading = "Cell", .isIdentity = true},
                         {.heading = "Visits", .isNumeric = true},
@@ -51,7 +51,7 @@ bool CellSheet::update(const Shown&)
     _contents.parts.clear();
     if (cells.size() == 0)
         return true;
-    SheetPart part{.table = emptyTable()};
+    SheetPart part{.table = cellTable()};
     const auto today = dayText(_clock, _clock.now());
     for (const auto& cell : cells) {
         if (part.table.rows.size() == kMostRows)

@@ -14,7 +14,7 @@
 namespace kestrum {
 namespace {
 
-SheetTable emptyTable()
+SheetTable eventTable()
 {
     return {.columns = {{.heading = "Time", .isIdentity = true},
                         {.heading = "Event"},
@@ -59,7 +59,7 @@ bool EventSheet::update(const Shown&)
     if (all == _read)
         return true;
     if (_contents.parts.empty())
-        _contents.parts.push_back({.table = emptyTable()});
+        _contents.parts.push_back({.table = eventTable()});
     auto& part = _contents.parts.front();
 
     const auto fresh = std::min({all - _read, std::uint64_t{_events.size()}, std::uint64_t{kMostRows}});

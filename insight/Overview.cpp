@@ -113,7 +113,7 @@ constexpr Plan kPlans[] = {
 // clang-format on
 
 /// Whether the value deserves a line with a bar.
-bool isLevel(const KeyEntry& entry)
+bool hasBar(const KeyEntry& entry)
 {
     return entry.kind == Kind::Level || entry.in.measure != Measure::None;
 }
@@ -144,7 +144,7 @@ std::vector<SheetPart> Overview::update(const KestrumModelNode& root)
                 continue;
             const auto* entry = keyEntry(_technology, name, key);
             auto cell = gradedCell(entry, *text, *_thresholds, leafText(*section->node, kTechnologyKey));
-            if (entry == nullptr || !isLevel(*entry))
+            if (entry == nullptr || !hasBar(*entry))
                 cell.bar.reset();
             part.facts.push_back({std::string(entry != nullptr ? entry->heading : key), std::move(cell)});
         }

@@ -15,7 +15,7 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
-constexpr int kFraction = 6, kShortFraction = 3; ///< digits of a second
+constexpr int kEventFraction = 6, kShortFraction = 3; ///< digits of a second
 
 std::string timeText(std::optional<Date> time, int digits)
 {
@@ -94,7 +94,7 @@ private:
     {
         Json list = Json::array();
         for (const auto& each : _finder.events())
-            list.push_back({{"time", orNull(timeText(each.time, kFraction))},
+            list.push_back({{"time", orNull(timeText(each.time, kEventFraction))},
                             {"event", word(each.kind)},
                             {"name", each.name},
                             {"was", orNull(each.was)},
@@ -154,7 +154,7 @@ private:
                             {"cell", each.identity},
                             {"visits", each.visits},
                             {"seconds", seconds(each.time)},
-                            {"last seen", orNull(timeText(each.lastSeen, kFraction))},
+                            {"last seen", orNull(timeText(each.lastSeen, kEventFraction))},
                             {"level", std::move(level)}});
         }
         return {{"cells", std::move(list)}, {"dropped", _finder.cells().dropped()}};
@@ -167,7 +167,7 @@ private:
             const bool isMeasured = each.level.count() != 0;
             const auto number = [&](double value) { return isMeasured ? formatted("%.2f", value) : std::string(); };
             appendGuardedRow(to, {each.radio, each.identity, std::to_string(each.visits),
-                                  formatted("%.3f", seconds(each.time)), timeText(each.lastSeen, kFraction),
+                                  formatted("%.3f", seconds(each.time)), timeText(each.lastSeen, kEventFraction),
                                   number(each.level.least()), number(each.level.mean()), number(each.level.greatest()),
                                   each.unit});
         }

@@ -35,7 +35,7 @@ constexpr std::chrono::milliseconds kRefresh{2000};
 /// A process has written its piece of the log.
 struct PieceWritten {};
 /// The messages of one piece, in bytes: some tenths of a second of work.
-constexpr std::size_t kPiece = 1 << 20;
+constexpr std::size_t kReaderPiece = 1 << 20;
 
 std::unique_ptr<Output> makeOutput(const DecodeOptions& options, OutputFile& data, OutputFile& remarks)
 {
@@ -143,7 +143,7 @@ private:
     // After the first piece this process only decodes, so that each writer begins with the display of its piece.
     void take(Bytes message)
     {
-        if (_writers && _inPiece >= kPiece) {
+        if (_writers && _inPiece >= kReaderPiece) {
             if (_isWriter)
                 throw PieceWritten();
             _inPiece = 0;

@@ -13,7 +13,7 @@
 namespace kestrum {
 namespace {
 
-constexpr std::string_view kReuseIdentifier = "SaveHistoryContentCell";
+constexpr std::string_view kHistoryIdentifier = "SaveHistoryContentCell";
 constexpr Font kRowFont{"Helvetica", 13};
 
 } // namespace
@@ -47,9 +47,9 @@ std::size_t KestrumSaveViewController::numberOfRowsInSection(TableView&, std::si
 
 std::shared_ptr<ReusableCell> KestrumSaveViewController::cellForRowAtIndexPath(TableView& table, IndexPath indexPath)
 {
-    auto reusable = table.dequeueReusableCell(kReuseIdentifier);
+    auto reusable = table.dequeueReusableCell(kHistoryIdentifier);
     if (!reusable)
-        reusable = std::make_shared<ReusableCell>(table.makeCell(CellStyle::Default), kReuseIdentifier);
+        reusable = std::make_shared<ReusableCell>(table.makeCell(CellStyle::Default), kHistoryIdentifier);
 
     const auto history = _saveHistory.array();
     const auto entry = history && indexPath.row < history->size() ? (*history)[indexPath.row].dictionary() : nullptr;

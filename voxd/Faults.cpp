@@ -23,7 +23,7 @@ using namespace std::chrono;
 
 constexpr seconds kFlood{3}, kPatience{5};
 constexpr std::size_t kStruckMessage = 20;
-constexpr std::int32_t kLogMessage = 0, kNoMessage = 77;
+constexpr std::int32_t kNoMessage = 77;
 
 std::vector<std::byte> bytesOfFrame(const Frame& frame)
 {
@@ -124,7 +124,7 @@ void sendBehindRecords(FrameConnection& connection, const Frame& frame)
 {
     // A record of 1000 bytes, all zero except its length and its type, which no modem uses.
     std::array<std::byte, 1000> record{std::byte{7}, std::byte{0xE7}, std::byte{3}};
-    sendBehindFloodOf(connection, {Frame::Kind::Message, kLogMessage, 0, record}, frame);
+    sendBehindFloodOf(connection, {Frame::Kind::Message, vox::kLogMessage, 0, record}, frame);
 }
 
 void sendBehindNotifications(FrameConnection& connection, const Frame& frame)
@@ -243,7 +243,7 @@ bool Faults::send(FrameConnection& connection, const Frame& frame)
     int Fault::*left = nullptr;
     if (frame.kind == Frame::Kind::Reply)
         left = frame.messageId == vox::kCreateLogChannel ? &Fault::answers : &Fault::technologies;
-    else if (frame.messageId == kLogMessage && ++_logMessages == kStruckMessage)
+    else if (frame.messageId == vox::kLogMessage && ++_logMessages == kStruckMessage)
         left = &Fault::messages;
     if (left == &Fault::technologies)
         _logMessages = 0;

@@ -24,7 +24,6 @@ constexpr milliseconds kBatch{10};
 constexpr milliseconds kSlice{50};
 constexpr milliseconds kConnectTimeout{1000};
 constexpr hours kLongestWait{1};
-constexpr std::size_t kUnsentReplies = 256 << 10;
 constexpr std::string_view kCommandPorts = "org.kestrum.vox.command.";
 constexpr std::string_view kTechnologyChanged = "kVoxTechnologyChangedNotification";
 
@@ -87,7 +86,7 @@ void Service::serve(Clients::iterator client)
 {
     // A malformed frame closes the connection inside `next`, and nothing else changes then. Requests of a client that
     // does not read its replies stay in that client's socket.
-    while (!client->connecting && client->connection->unsent() < kUnsentReplies) {
+    while (!client->connecting && client->connection->unsent() < ServiceChannel::kUnsentReplies) {
         const auto frame = client->connection->next();
         if (!frame)
             return;
@@ -243,7 +242,8 @@ void Service::changeTechnology()
     _technology = _nextTechnology;
     _log.write(Priority::Notice, "the technology is now %s", _technology);
     for (const auto& client : _clients)
-        if (client.connection->unsent() < kUnsentReplies) // a client that does not read gets nothing more
+        if (client.connection->unsent() <
+            ServiceChannel::kUnsentReplies) // a client that does not read gets nothing more
             _settings.send(*client.connection,
                            {Frame::Kind::Message, vox::kNotification, 0, bytesOf(kTechnologyChanged)});
     retire(_channels.begin(), _channels.end());

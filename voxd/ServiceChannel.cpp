@@ -1,6 +1,7 @@
 #include "voxd/ServiceChannel.h"
 
 #include "platform/SystemLog.h"
+#include "platform/posix/VoxProtocol.h"
 #include "support/FieldWriter.h"
 #include "support/Format.h"
 
@@ -13,8 +14,6 @@ namespace {
 
 // The socket's buffer. Further messages wait in the outbox, which can still drop whole messages.
 constexpr std::size_t kSocketBytes = 256 << 10;
-constexpr std::size_t kUnsentReplies = 256 << 10;
-constexpr std::int32_t kLogMessage = 0, kLossMessage = 1;
 
 } // namespace
 
@@ -76,7 +75,7 @@ void ServiceChannel::readLogPort()
 
 void ServiceChannel::obey(const Frame& frame)
 {
-    if (frame.messageId != kLogMessage || frame.kind == Frame::Kind::Reply)
+    if (frame.messageId != vox::kLogMessage || frame.kind == Frame::Kind::Reply)
         return;
     const auto command = _host.lists.parse(frame.payload).dictionary();
     if (!command) {
@@ -128,7 +127,7 @@ void ServiceChannel::flush()
             }
             return;
         }
-        _host.send(*_logPort, {Frame::Kind::Message, kLogMessage, 0, message->bytes()});
+        _host.send(*_logPort, {Frame::Kind::Message, vox::kLogMessage, 0, message->bytes()});
     }
 }
 
@@ -140,7 +139,7 @@ void ServiceChannel::sendLosses()
         return;
     std::array<std::byte, sizeof missing> payload;
     FieldWriter(payload).set64(0, missing);
-    _host.send(*_logPort, {Frame::Kind::Message, kLossMessage, 0, payload});
+    _host.send(*_logPort, {Frame::Kind::Message, vox::kLossMessage, 0, payload});
     _host.dropped(missing);
 }
 

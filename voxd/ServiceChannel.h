@@ -36,6 +36,8 @@ public:
 
     /// The maximum number of bytes that wait for a client that does not read.
     static constexpr std::size_t kHeldBytes = 8 << 20;
+    /// A connection with more bytes of replies than this is not read until its client has read.
+    static constexpr std::size_t kUnsentReplies = 256 << 10;
     /// A client that has not connected to the command port within this time counts as gone.
     static constexpr std::chrono::seconds kCommandTimeout{10};
 

@@ -8,8 +8,6 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kInset = 1; // columns, on both sides of a row
-
 int column(double points)
 {
     return static_cast<int>(std::lround(points / kPointsPerColumn));

@@ -10,8 +10,6 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kInset = 1, kGap = 2; // columns
-
 struct HelpLine {
     std::string_view keys, what;
 };

@@ -9,11 +9,10 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kInset = 1, kGap = 2;  // columns
 constexpr int kLeastColumns = 8;     // of a curve: words, then numbers, make way for it
 constexpr std::size_t kDotEvery = 4; // columns, of the line where a band begins
 constexpr int kLeastText = 3;        // columns, of a mark's text
-constexpr Style kDim{.dim = true}, kCurve{.colour = Colour::Accent}, kChosen{.bold = true, .reverse = true};
+constexpr Style kCurve{.colour = Colour::Accent}, kChosen{.bold = true, .reverse = true};
 
 int columnOf(double place, int columns)
 {

@@ -7,7 +7,6 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kInset = 1;                                   // columns
 constexpr int kFieldRow = 3, kTableRow = 5, kRowsBelow = 4; // lines
 
 } // namespace

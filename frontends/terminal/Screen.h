@@ -23,6 +23,9 @@ struct Style {
 
 /// The maximum width of rows and bars: on a wider row the value is too far from its key to read them together.
 inline constexpr int kColumn = 80;
+/// Free columns on both sides of a row, and between two parts of it.
+inline constexpr int kInset = 1, kGap = 2;
+inline constexpr Style kDim{.dim = true};
 
 /// A rectangle of the screen, in cells.
 struct Area {

@@ -10,13 +10,11 @@ namespace kestrum::terminal {
 
 namespace {
 
-constexpr int kInset = 1, kGap = 2; // columns
-constexpr int kMark = 2;            // before a row: whether it moved, or is the serving cell
-constexpr int kIndent = 15;         // facts stand beside their caption
+constexpr int kMark = 2;    // before a row: whether it moved, or is the serving cell
+constexpr int kIndent = 15; // facts stand beside their caption
 constexpr int kNameOfLevel = 12, kValueOfLevel = 12, kBarOfLevel = 24;
 constexpr int kBar = 10, kWidestCell = 60, kNarrowestCell = 20;
 constexpr int kLeastPlot = 3, kMostOfLeastPlot = 8; // rows of a curve, where the rest does not leave more
-constexpr Style kDim{.dim = true};
 
 /// A bar of `width` columns, in eighths of a column; dots for the rest of the scale.
 void drawBar(const Line& line, int column, int width, double part)

@@ -25,7 +25,7 @@ void note(int signal)
 
 } // namespace
 
-SignalPipe::SignalPipe(std::vector<int> signals) : _signals(std::move(signals)), _before(_signals.size())
+SignalPipe::SignalPipe(std::vector<int> numbers) : _signals(std::move(numbers)), _before(_signals.size())
 {
     if (::pipe2(ends, O_CLOEXEC | O_NONBLOCK) != 0)
         throw std::system_error(errno, std::generic_category(), "cannot create a pipe for signals");

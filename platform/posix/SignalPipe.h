@@ -10,7 +10,7 @@ namespace kestrum {
 class SignalPipe {
 public:
     /// Throws std::system_error when no pipe can be created.
-    explicit SignalPipe(std::vector<int> signals);
+    explicit SignalPipe(std::vector<int> numbers);
     ~SignalPipe();
     SignalPipe(const SignalPipe&) = delete;
     SignalPipe& operator=(const SignalPipe&) = delete;

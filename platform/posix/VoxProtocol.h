@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-/// The messages on a server connection between a display and the telephony service; docs/protocol.md has the bytes.
+/// The messages between a display and the telephony service; docs/protocol.md has the bytes.
 namespace kestrum::vox {
 
 /// The port on which the service accepts server connections.
@@ -19,6 +19,10 @@ inline constexpr std::string_view kServerPort = "org.kestrum.vox";
 // Message ids on a server connection.
 inline constexpr std::int32_t kCreateLogChannel = 1; ///< request: the address of the receiving port, as text
 inline constexpr std::int32_t kNotification = 2;     ///< message from the service: the notification's name, as text
+
+// Message ids on a log channel.
+inline constexpr std::int32_t kLogMessage = 0;  ///< to the service a command, to the display a message of the modem
+inline constexpr std::int32_t kLossMessage = 1; ///< to the display: how many messages were dropped before the next
 
 // Error domains of an answer; 0 is success.
 inline constexpr std::int32_t kServiceErrors = 1; ///< codes below
