@@ -57,7 +57,7 @@ rc::Gen<Value> values(int depth)
 {
     if (depth == 0)
         return scalars();
-    const auto child = gen::scale(0.5, values(depth - 1));
+    const auto child = gen::scale(0.3, values(depth - 1)); // larger values only take longer
     return gen::oneOf(scalars(),
                       gen::map(gen::container<std::vector<Value>>(child),
                                [](const std::vector<Value>& elements) { return Value(makeArray(elements)); }),
