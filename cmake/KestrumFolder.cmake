@@ -5,15 +5,15 @@
 #
 # FOLDER gives the include prefix where it differs from the target's name (target platform_propertylist, headers
 # <platform/propertylist/...>). HEADERS names this target's headers where another target has the rest of the folder.
+# SEPARATE and OWN are for the joined build: see KestrumJoin.
 find_package(Threads REQUIRED)
+include(KestrumJoin)
 
-# Off for developers: a precompiled header hides a missing #include.
-option(KESTRUM_PRECOMPILED "Compile the standard library's headers once" OFF)
 set(standard_headers <algorithm> <array> <chrono> <cmath> <cstdint> <filesystem> <functional> <map> <memory> <optional>
     <span> <string> <string_view> <variant> <vector>)
 
 function(kestrum_folder name)
-    cmake_parse_arguments(arg "" "FOLDER" "USES;SOURCES;HEADERS;LIBRARIES" ${ARGN})
+    cmake_parse_arguments(arg "" "FOLDER" "USES;SOURCES;HEADERS;LIBRARIES;SEPARATE;OWN" ${ARGN})
     if(NOT arg_FOLDER)
         set(arg_FOLDER ${name})
     endif()
@@ -31,18 +31,13 @@ function(kestrum_folder name)
         file(CREATE_LINK ${CMAKE_CURRENT_SOURCE_DIR}/${header} ${root}/${arg_FOLDER}/${header} SYMBOLIC)
     endforeach()
     target_include_directories(${name} PUBLIC ${root})
-    # Libraries of the adapters are private: users of the folder do not see their headers.
-    set(libraries PRIVATE ${arg_LIBRARIES})
-    if(KESTRUM_VERIFY_HEADERS)
-        list(TRANSFORM headers PREPEND ${root}/${arg_FOLDER}/)
-        set_source_files_properties(${headers} PROPERTIES SKIP_AUTOMOC ON) # the originals have their own moc files
-        target_sources(${name} PUBLIC FILE_SET HEADERS BASE_DIRS ${root} FILES ${headers})
-        set_target_properties(${name} PROPERTIES VERIFY_INTERFACE_HEADER_SETS ON)
-        set(libraries PUBLIC ${arg_LIBRARIES}) # headers are compiled with the libraries that the folder's users see
-    endif()
     # The fuzzer follows paths through the product's code, not through a fuzz target or a test.
     if(KESTRUM_FUZZ)
         target_compile_options(${name} PRIVATE -fsanitize=fuzzer-no-link)
+    endif()
+    # Adapters to Qt wait more than they compute, and the sanitizers' code takes long to optimise.
+    if(KESTRUM_SANITIZE AND arg_LIBRARIES MATCHES Qt6)
+        target_compile_options(${name} PRIVATE -O0)
     endif()
     foreach(lower IN LISTS arg_USES)
         if(NOT TARGET ${lower})
@@ -50,11 +45,13 @@ function(kestrum_folder name)
         endif()
         target_link_libraries(${name} PUBLIC ${lower})
     endforeach()
+    # Libraries of the adapters are private: users of the folder do not see their headers.
+    target_link_libraries(${name} PRIVATE ${arg_LIBRARIES})
+    kestrum_join(${name} SEPARATE ${arg_SEPARATE} OWN ${arg_OWN})
     # A precompiled header needs equal options everywhere, and adapters are compiled with their libraries' options.
-    if(KESTRUM_PRECOMPILED AND name STREQUAL support)
+    if(KESTRUM_JOINED AND name STREQUAL support)
         target_precompile_headers(support PRIVATE ${standard_headers})
-    elseif(KESTRUM_PRECOMPILED AND NOT arg_LIBRARIES)
+    elseif(KESTRUM_JOINED AND NOT arg_LIBRARIES)
         target_precompile_headers(${name} REUSE_FROM support)
     endif()
-    target_link_libraries(${name} ${libraries})
 endfunction()

@@ -4,7 +4,8 @@
 #       SOURCES ServingCellMeasurementTest.cpp
 #       WITH_PROPERTY_LISTS LTELogGeneratorTest.cpp)
 #
-# The sources after WITH_PROPERTY_LISTS are omitted from a build without platform_propertylist.
+# The sources after WITH_PROPERTY_LISTS are omitted from a build without platform_propertylist. SEPARATE: see
+# KestrumJoin.
 find_package(GTest)
 find_package(rapidcheck REQUIRED)
 
@@ -22,7 +23,7 @@ kestrum_test_options(test_headers)
 # SHARDS n runs a program's tests as n parallel processes. ctest counts in quarters of a processor (./test sets that):
 # a program takes a whole processor, a program that WAITS for real time a quarter.
 function(kestrum_test name)
-    cmake_parse_arguments(arg "WAITS;MEASURES_MEMORY" "SHARDS" "USES;SOURCES;WITH_PROPERTY_LISTS;LIBRARIES" ${ARGN})
+    cmake_parse_arguments(arg "WAITS;MEASURES_MEMORY" "SHARDS" "USES;SOURCES;WITH_PROPERTY_LISTS;LIBRARIES;SEPARATE" ${ARGN})
     add_executable(${name} ${arg_SOURCES})
     if(arg_WITH_PROPERTY_LISTS AND TARGET platform_propertylist)
         target_sources(${name} PRIVATE ${arg_WITH_PROPERTY_LISTS})
@@ -30,6 +31,7 @@ function(kestrum_test name)
     endif()
     target_link_libraries(${name} PRIVATE ${arg_USES} ${arg_LIBRARIES} test_surroundings test_places GTest::gtest_main)
     kestrum_test_options(${name})
+    kestrum_join(${name} SEPARATE ${arg_SEPARATE})
     target_precompile_headers(${name} REUSE_FROM test_headers)
     set(processors 4)
     if(arg_WAITS)

@@ -277,7 +277,7 @@ constexpr KeyEntry kPacketData[] = {
      "The bytes of user data that the phone has received."},
 };
 
-constexpr KeyEntry kPdpContexts[] = {
+constexpr KeyEntry kContexts[] = {
     {"NSAPI", "NSAPI", Identity, kPlain, "3GPP TS 24.008, 10.5.6.2",
      "The number of the context, 5 to 15.",
      nullptr, kIdentity},
@@ -311,7 +311,7 @@ constexpr SectionEntry kSections[] = {
     {"Radio Resource/Status", "The channel in use.", kStatus},
     {"Mobility Management", "Registration.", kMobilityManagement},
     {"Packet Data", "The state of packet data.", kPacketData},
-    {"Packet Data/PDP Contexts", "The connections to packet networks.", kPdpContexts},
+    {"Packet Data/PDP Contexts", "The connections to packet networks.", kContexts},
     {"Cell Changes", "How often the cell changed.", kCellChanges},
     {"Registration", "The network on which the modem is registered.", kRegistration},
     {"Data", "The data connections.", kData},
