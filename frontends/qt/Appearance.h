@@ -20,10 +20,8 @@ public:
 
     bool eventFilter(QObject* watched, QEvent* event) override;
 
-private Q_SLOTS:
-    void settingChanged(const QString& group, const QString& key, const QDBusVariant& value);
-
 private:
+    Q_SLOT void settingChanged(const QString& group, const QString& key, const QDBusVariant& value);
     void askAll();
     void ask(const QString& group, const QString& key);
     void applyScheme();
