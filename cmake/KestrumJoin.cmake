@@ -1,6 +1,6 @@
 # A quick complete build: the sources of a target are compiled together in a few files, and the standard library's
-# headers once (see KestrumFolder). Off for developers: it hides a missing #include, which scripts/alone finds, and after
-# a change of one file its neighbours are compiled again.
+# headers once (see KestrumFolder). Off for developers: it hides a missing #include, which scripts/alone finds, and
+# after a change of one file its neighbours are compiled again.
 option(KESTRUM_JOINED "Compile the sources of each target together" OFF)
 
 # GCC takes a joined source for a header, where a local type in a class would be an error.
@@ -11,7 +11,7 @@ endif()
 set(joined_most 12) # more sources in one file leave one processor idle at the end
 
 # kestrum_join(TARGET SEPARATE SOURCE... OWN NAME...): the named sources, those in the named folders, or all (".") stay
-# separate. OWN: constants that several sources define; each source gets its own.
+# separate. OWN: names of constants and functions that several sources define; each source gets its own.
 function(kestrum_join target)
     cmake_parse_arguments(arg "" "" "SEPARATE;OWN" ${ARGN})
     if(NOT KESTRUM_JOINED OR arg_SEPARATE STREQUAL ".")
